@@ -1,0 +1,76 @@
+// The library's memory: everything is allocated through the client's hooks, and running out of memory is a result,
+// never an exception.
+#pragma once
+
+#include <new>
+#include <type_traits>
+#include <utility>
+
+#include "torvane/types.h"
+
+namespace _torvane_
+{
+
+// A zeroed block of `size` bytes; null for a size of 0 or less and when memory is short.
+void* GeAlloc(LLong size) noexcept;
+
+// As GeAlloc, but the block's contents are undefined.
+void* GeAllocNC(LLong size) noexcept;
+
+// Changes a block's size and keeps its contents up to the smaller one. Null when memory is short: `block` then stays
+// valid and stays the caller's. A null block is allocated anew.
+void* GeRealloc(void* block, LLong size) noexcept;
+
+// Frees `block` if it is not null and sets it to null.
+template <class T>
+void GeFree(T*& block) noexcept;
+
+// Copies `size` bytes; does nothing unless source, destination and size are all non-zero. The blocks must not overlap.
+void GeCopyMem(void* destination, const void* source, LLong size) noexcept;
+
+namespace detail
+{
+void FreeBlock(void* block) noexcept;
+}
+
+template <class T>
+void GeFree(T*& block) noexcept
+{
+  detail::FreeBlock(const_cast<std::remove_cv_t<T>*>(block));
+  block = nullptr;
+}
+
+// Base of every polymorphic class of the library: `new` takes its memory from the client's hooks and gives null when
+// there is none; `delete` through a base pointer frees it there.
+struct GeMemory
+{
+  static void* operator new(std::size_t size) noexcept { return GeAllocNC(static_cast<LLong>(size)); }
+  static void* operator new(std::size_t, void* place) noexcept { return place; }
+  static void operator delete(void* block) noexcept { detail::FreeBlock(block); }
+  static void operator delete(void*, void*) noexcept {}
+};
+
+// A new T in memory of the client's hooks, or null. The one way to make an object in the library.
+template <class T, class... Args>
+[[nodiscard]] T* NewObj(Args&&... args) noexcept
+{
+  void* place = GeAllocNC(static_cast<LLong>(sizeof(T)));
+  return place ? ::new (place) T(std::forward<Args>(args)...) : nullptr;
+}
+
+// Destroys an object made by NewObj and sets the pointer to null; a null pointer does nothing. A derived object may
+// be deleted through its base when the base has a virtual destructor.
+template <class T>
+void DeleteObj(T*& object) noexcept
+{
+  if constexpr (std::has_virtual_destructor_v<T>) {
+    static_assert(std::is_base_of_v<GeMemory, T>, "polymorphic classes take their memory through GeMemory");
+    delete object;
+  } else if (object) {
+    object->~T();
+    detail::FreeBlock(const_cast<std::remove_cv_t<T>*>(object));
+  }
+  object = nullptr;
+}
+
+} // namespace _torvane_

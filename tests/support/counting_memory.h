@@ -1,0 +1,38 @@
+// Memory hooks for the tests: they count what is allocated and can be told to fail.
+#pragma once
+
+#include "torvane/types.h"
+
+namespace counting_memory
+{
+
+struct Counts
+{
+  _torvane_::LLong blocks;      // blocks allocated and not yet freed
+  _torvane_::LLong bytes;       // their bytes
+  _torvane_::LLong peakBytes;   // the most bytes since ResetPeak
+  _torvane_::LLong allocations; // allocations ever made, failed ones included
+};
+
+Counts Get();
+
+void ResetPeak();
+
+// The allocation that comes after `count` further ones fails, and so do all that follow, until FailNever.
+void FailAfter(_torvane_::LLong count);
+void FailNever();
+
+// Fails the running test, on leaving the scope, if blocks were left allocated since it was made.
+class BalanceCheck
+{
+public:
+  BalanceCheck();
+  ~BalanceCheck();
+  BalanceCheck(const BalanceCheck&) = delete;
+  BalanceCheck& operator=(const BalanceCheck&) = delete;
+
+private:
+  _torvane_::LLong blocks_;
+};
+
+} // namespace counting_memory
