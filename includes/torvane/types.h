@@ -7,7 +7,7 @@
 namespace _torvane_
 {
 
-using Bool = bool;          // In a file one byte, 0 or 1.
+using Bool = bool; // In a file one byte, 0 or 1.
 using Char = std::int8_t;
 using UChar = std::uint8_t;
 using Word = std::int16_t;

@@ -25,13 +25,13 @@ void FailNever();
 // Fails the running test, on leaving the scope, if blocks were left allocated since it was made.
 class BalanceCheck
 {
-public:
+ public:
   BalanceCheck();
   ~BalanceCheck();
   BalanceCheck(const BalanceCheck&) = delete;
   BalanceCheck& operator=(const BalanceCheck&) = delete;
 
-private:
+ private:
   _torvane_::LLong blocks_;
 };
 
