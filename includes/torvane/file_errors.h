@@ -1,0 +1,31 @@
+// Error codes of the byte and value streams. 0 is no error; a file keeps its first error (see BaseFile, HyperFile).
+#pragma once
+
+#include "torvane/types.h"
+
+namespace _torvane_
+{
+
+inline constexpr Long FILEERROR_NONE = 0;
+inline constexpr Long FILEERROR_OPEN = -1;              // the byte file could not be opened
+inline constexpr Long FILEERROR_CLOSE = -2;             // closing failed
+inline constexpr Long FILEERROR_READ = -3;              // a read came short
+inline constexpr Long FILEERROR_WRITE = -4;             // a write came short
+inline constexpr Long FILEERROR_SEEK = -5;              // positioning failed
+inline constexpr Long FILEERROR_INVALID = -6;           // the operation does not fit the file's state or mode
+inline constexpr Long FILEERROR_MEMORY = -7;            // no memory
+inline constexpr Long FILEERROR_WRONG_VALUE = -100;     // bad magic, ident, header, tag, array size or type
+inline constexpr Long FILEERROR_CHUNK_STRUCTURE = -103; // a value where only a chunk start or end may stand
+inline constexpr Long FILEERROR_PREMATURE_END = -104;   // the walk to a chunk's end stopped on an error
+
+// Where and why reading or writing a file failed.
+struct FileProblem
+{
+  Long code = FILEERROR_NONE;
+  LLong position = 0; // byte position at which the failure was met
+};
+
+// A short English phrase for an error code, such as "a read came short".
+const char* GetFileErrorText(Long code);
+
+} // namespace _torvane_
