@@ -12,13 +12,17 @@ set(CMAKE_CXX_FLAGS_RELWITHDEBINFO "-O2 -g1 -DNDEBUG")
 add_library(torvane_options INTERFACE)
 target_compile_options(torvane_options INTERFACE
   -Wall -Wextra -Wpedantic -Wconversion -Wshadow -Werror)
+# The check of virtual tables needs the type information that the library doesn't have.
 if(TORVANE_SANITIZE)
   target_compile_options(torvane_options INTERFACE
-    -fsanitize=${TORVANE_SANITIZE} -fno-sanitize-recover=all -fno-omit-frame-pointer)
+    -fsanitize=${TORVANE_SANITIZE} -fno-sanitize=vptr -fno-sanitize-recover=all -fno-omit-frame-pointer)
   target_link_options(torvane_options INTERFACE -fsanitize=${TORVANE_SANITIZE})
 endif()
 
-# The library and everything that derives from its classes: no exceptions pass through it, no type information is
-# needed.
-add_library(torvane_library_options INTERFACE)
-target_compile_options(torvane_library_options INTERFACE $<$<COMPILE_LANGUAGE:CXX>:-fno-rtti>)
+# While a folder has no sources its target is made of this one file, so that the tree configures from its first day.
+function(torvane_placeholder variable text)
+  if(NOT ${variable})
+    file(CONFIGURE OUTPUT ${CMAKE_CURRENT_BINARY_DIR}/placeholder.cpp CONTENT "${text}\n")
+    set(${variable} ${CMAKE_CURRENT_BINARY_DIR}/placeholder.cpp PARENT_SCOPE)
+  endif()
+endfunction()
