@@ -1,0 +1,13 @@
+// Identifiers that no other machine makes.
+#pragma once
+
+#include "torvane/types.h"
+
+namespace _torvane_
+{
+
+// Fills 16 bytes with a fresh random identifier from the system. A failure is reported and leaves the bytes as they
+// are. Any thread may call it at any time.
+void CreateUuid(UChar* bytes) noexcept;
+
+} // namespace _torvane_
