@@ -254,6 +254,10 @@ class HyperFile : public GeMemory
   // A new block of `size` bytes read from the stream, null for size 0. A size that the file cannot hold is an error
   // before anything is allocated for it.
   Bool ReadBlock(void*& block, LLong size);
+  // Asked before memory is taken for a count from the file: true if `count` is not negative and the rest of the file
+  // can hold that many records of at least `bytesEach` bytes. Else fails with FILEERROR_WRONG_VALUE. Where the rest is
+  // unknown (network) only the sign is looked at: then allocate as records come.
+  Bool HasRoomFor(LLong count, LLong bytesEach);
 
  private:
   template <class Bits>
