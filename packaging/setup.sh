@@ -1,0 +1,106 @@
+# Shared by q7r and run-tests, which source it: installs packages that are missing, configures and builds. Messages are
+# one line each on standard error; what the commands print goes to build/setup.log and is shown when one fails. Needs
+# `set -o pipefail`.
+# shellcheck shell=bash
+
+top=$(cd "$(dirname "${BASH_SOURCE[0]}")/.." && pwd -P)
+program=$(basename "$0")
+log=$top/build/setup.log
+
+say() { printf '%s: %s\n' "$program" "$*" >&2; }
+
+fail() {
+  say "$*"
+  exit 2
+}
+
+# Only one process at a time installs and builds in this tree; the others wait here.
+lock_tree() {
+  mkdir -p "$top/build" || fail "cannot make $top/build"
+  exec 9>"$top/build/.lock"
+  if ! flock --nonblock 9; then
+    say "waiting for another build in this tree"
+    flock 9
+  fi
+}
+
+unlock_tree() { exec 9>&-; }
+
+# Runs a command with its output in the log; tells the end of it when the command fails.
+logged() {
+  "$@" >"$log" 2>&1 9>&- && return
+  tail -n 40 "$log" >&2
+  return 1
+}
+
+# Prints those packages of the groups that are not installed.
+missing_packages() {
+  local group name
+  local -A installed=()
+  while read -r name; do
+    installed[$name]=1
+  done < <(dpkg-query --show --showformat '${db:Status-Status} ${Package}\n' | sed -n 's/^installed //p')
+  while read -r group name; do
+    if [[ " $* " == *" $group "* && -z ${installed[$name]-} ]]; then
+      echo "$name"
+    fi
+  done <"$top/packaging/debian-packages"
+}
+
+# Installs what the groups lack. Where there is no dpkg, the configuration step tells what is missing.
+install_packages() {
+  command -v dpkg-query >/dev/null || return 0
+  local packages
+  mapfile -t packages < <(missing_packages "$@")
+  ((${#packages[@]})) || return 0
+
+  local as_root=()
+  if ((EUID != 0)); then
+    as_root=(sudo)
+    [[ -t 0 ]] || as_root+=(--non-interactive)
+  fi
+  local apt=("${as_root[@]}" env DEBIAN_FRONTEND=noninteractive apt-get --quiet --option DPkg::Lock::Timeout=600)
+  say "installing ${packages[*]}"
+  if ! logged "${apt[@]}" update || ! logged "${apt[@]}" install --yes --no-install-recommends "${packages[@]}"; then
+    fail "could not install; please install these packages: ${packages[*]}"
+  fi
+}
+
+# Configures a preset, with further arguments for cmake. A folder that was configured for another place (the tree was
+# copied or moved) starts afresh.
+configure() {
+  local preset=$1 fresh=()
+  local cache=$top/build/$preset/CMakeCache.txt
+  if [[ -e $cache ]] && ! grep -qxF "CMAKE_HOME_DIRECTORY:INTERNAL=$top" "$cache"; then
+    fresh=(--fresh)
+  fi
+  (cd "$top" && logged cmake --preset "$preset" "${fresh[@]}" "${@:2}")
+}
+
+# Passes a build's output on to the log and shows, on a terminal, how far it has come.
+show_progress() {
+  local line shown=
+  while IFS= read -r line; do
+    printf '%s\n' "$line" >>"$log"
+    if [[ $line =~ ^\[[0-9]+/[0-9]+\] && $line != *" Re-checking globbed directories"* ]]; then
+      if [[ -t 2 ]]; then
+        printf '\r%s: building %s' "$program" "${BASH_REMATCH[0]}" >&2
+      elif [[ -z $shown ]]; then
+        say "building"
+      fi
+      shown=1
+    fi
+  done
+  if [[ $shown && -t 2 ]]; then
+    printf '\r\e[K' >&2
+  fi
+}
+
+# Builds the targets of a configured preset; silent when there is nothing to do.
+build() {
+  : >"$log"
+  if ! NINJA_STATUS='[%f/%t] ' ninja -C "$top/build/$1" "${@:2}" 2>&1 9>&- | show_progress; then
+    grep -v '^\[' "$log" | tail -n 40 >&2
+    return 1
+  fi
+}
