@@ -123,8 +123,10 @@ static_assert(sizeof(AEGP_ItemType) == 2 && sizeof(AEGP_LTimeMode) == 2);
 static_assert(sizeof(AEGP_ObjectType) == 4 && sizeof(AEGP_LayerFlags) == 4 && sizeof(AEGP_LayerStream) == 4);
 static_assert(sizeof(AEGP_StreamType) == 4 && sizeof(AEGP_FilmSizeUnits) == 4 && sizeof(AEGP_FootageSignature) == 4);
 static_assert(sizeof(AEGP_CameraType) == 4 && sizeof(AEGP_LightType) == 4);
+// The handles themselves are meant here, not what they point at. NOLINTBEGIN(bugprone-sizeof-expression)
 static_assert(sizeof(AEGP_ItemH) == 8 && sizeof(AEGP_CompH) == 8 && sizeof(AEGP_LayerH) == 8);
 static_assert(sizeof(AEGP_FootageH) == 8 && sizeof(AEGP_StreamRefH) == 8 && sizeof(AEGP_MemHandle) == 8);
+// NOLINTEND(bugprone-sizeof-expression)
 static_assert(sizeof(AEGP_StreamVal2) == 32);
 static_assert(sizeof(AEGP_StreamValue2) == 40 && offsetof(AEGP_StreamValue2, val) == 8);
 
