@@ -2,6 +2,7 @@
 // read-only stream, chosen by the Filename that is opened.
 #pragma once
 
+#include <cstdio>
 #include <cstring>
 
 #include "torvane/file_errors.h"
@@ -13,7 +14,6 @@ namespace _torvane_
 {
 
 class FileStream;
-class MemoryBlockWriter;
 class NetworkConnection;
 
 // How a file is opened. The share rule holds on Windows alone.
@@ -142,20 +142,25 @@ class BaseFile : public GeMemory
   // Writes what is pending and closes. True if no error is set. A closed file stays closed.
   Bool Close();
 
-  // Moves to `offset`, from the start or from the present position.
+  // Moves to `offset`, from the start or from the present position. A network file only moves forward, reading what
+  // it passes; memory has no position behind its end, and what is written to it goes to its end wherever the position
+  // is. Moving by 0 is true at once, whatever the state.
   Bool Seek(LLong offset, Long mode = kSeekStart);
 
   LLong GetPosition() const { return windowPosition_ + (cursor_ - window_); }
 
-  // The length in bytes; reading modes only (any other sets FILEERROR_INVALID and gives 0). A network file answers
+  // The length in bytes; reading modes only (any other sets FILEERROR_INVALID and gives 0). A disk file that is only
+  // read keeps the length that it had when it was opened, whatever becomes of it meanwhile. A network file answers
   // 2147483647 until its end was seen.
   LLong GetLength();
 
-  // The bytes that are certainly left to read, or -1 where that can't be told (network). Sets no error.
+  // How many bytes are left to read: no more than that will come. -1 where that can't be told (a network file whose
+  // end was not seen, a file that is only written); 0 when closed. Sets no error.
   LLong GetRemaining();
 
   // Reads `count` bytes and gives how many came. Fewer than `count` is an error (FILEERROR_READ, result 0) unless
-  // `allowShort` is set. A count of 0 gives 0 with `allowShort`, else 1 while no error is set.
+  // `allowShort` is set and the file is at its end; a device or connection that fails is one in any case. A count of
+  // 0 gives 0 with `allowShort`, else 1 while no error is set.
   LLong ReadBytes(void* destination, LLong count, Bool allowShort = false);
 
   // Writes `count` bytes. A count of 0 gives true unless an error is set.
@@ -209,33 +214,89 @@ class BaseFile : public GeMemory
   }
 
  private:
-  // The target's handle: the C stream of a disk file; exactly one of the pointers below stands for the target.
-  void* handle_ = nullptr;
-  MemoryBlockWriter* memoryWriter_ = nullptr; // of the Filename's target description; not owned
-  NetworkConnection* connection_ = nullptr;   // not owned
-  FileStream* stream_ = nullptr;              // not owned
+  enum class Target : UChar
+  {
+    kNone, // closed
+    kDisk,
+    kMemoryRead,
+    kMemoryWrite,
+    kNetwork,
+    kStream,
+  };
+  // What was done last with the C stream: between reading and writing it must be positioned.
+  enum class HandleUse : UChar
+  {
+    kNone,
+    kRead,
+    kWrite,
+  };
+
+  Bool Refuse(Long line, const char* message);
+  template <class Value>
+  Bool GetNumber(Value& value);
+  template <class Value>
+  Bool PutNumber(Value value);
+  LLong TakeWindow(void* destination, LLong count);
+  void FillWindow(const void* source, LLong count);
+  void EmptyWindow(LLong position);
+
+  // Each target's part of an operation. They give an error code or leave one in `problem`; SetError is called above
+  // them.
+  Long OpenTarget(Long mode);
+  Long OpenDisk(Long mode);
+  Long OpenMemoryRead();
+  Long OpenMemoryWrite();
+  Long OpenNetwork();
+  LLong ReadTarget(void* destination, LLong count, Long& problem);
+  LLong ReadDisk(void* destination, LLong count, Long& problem);
+  LLong ReadNetwork(void* destination, LLong count, Long& problem);
+  LLong ReadStream(void* destination, LLong count, Long& problem);
+  Long WriteTarget(const void* source, LLong count);
+  Long WriteDisk(const void* source, LLong count);
+  Long WriteMemory(const void* source, LLong count);
+  Long WriteNetwork(const void* source, LLong count);
+  Long SeekTarget(LLong position);
+  Long SeekDisk(LLong position);
+  Long SeekNetwork(LLong position);
+  Long CloseTarget();
+  Long CloseDisk();
+  Long CloseNetwork();
+
+  Bool MeasureDisk();
+  Bool FlushDisk();
+  Bool MoveHandle(LLong position, HandleUse use);
+  LLong ReadHandle(void* destination, LLong position, LLong count, Long& problem);
+  LLong WriteHandle(const void* source, LLong position, LLong count);
+  Bool ReceiveBlock(Long& problem);
+  Bool GrowBlock(LLong limit);
+  Bool SendBlock();
+
+  Target target_ = Target::kNone;
+  HandleUse handleUse_ = HandleUse::kNone;
+  std::FILE* handle_ = nullptr;             // of a disk file
+  LLong handlePosition_ = 0;                // where the C stream stands
+  MemoryDescription* memory_ = nullptr;     // that a memory target writes to; not owned
+  NetworkConnection* connection_ = nullptr; // not owned
+  FileStream* stream_ = nullptr;            // not owned
 
   Filename name_;
   Long error_ = FILEERROR_NONE;
   Long order_ = kByteOrderBig;
   Long mode_ = kFileRead;
-  Bool memory_ = false;
-  LLong capacity_ = 0;      // a memory block's size, or the size of a network block buffer
+  LLong capacity_ = 0;      // a memory target's size, or the size of a network connection's block buffer
   LLong cachedLength_ = -1; // -1 until known
 
-  // The window is the part of the file that is in memory: the read-ahead or write-behind buffer of a disk file, or
-  // the whole of a memory block. `window_` is its first byte, at the file position `windowPosition_`; `cursor_` is the
-  // next byte. Without a window both pointers are null and `windowPosition_` is the position.
+  // The window is the part of the file that is in memory: the read-ahead or write-behind buffer of a disk file, the
+  // block in hand of a network connection, or the whole of a memory block. `window_` is its first byte, at the file
+  // position `windowPosition_`; `cursor_` is the next byte. Without a window both pointers are null and
+  // `windowPosition_` is the position.
   UChar* buffer_ = nullptr; // owned
-  LLong bufferSize_ = 0;
+  LLong bufferSize_ = 0;    // of a disk file's buffer
   UChar* window_ = nullptr;
   UChar* cursor_ = nullptr;
   LLong windowPosition_ = 0;
   LLong readLeft_ = 0;  // bytes ready behind the cursor
-  LLong writeLeft_ = 0; // room behind the cursor
-  LLong handlePosition_ = 0;
-
-  friend struct BaseFileTargets; // the opening, reading and writing of each kind of target, in base_file.cpp
+  LLong writeLeft_ = 0; // room behind the cursor; 0 for what is not a disk file with a buffer
 };
 
 // True when `name` is the path of an existing directory (`directory` set) or of an existing file (`directory` clear).
