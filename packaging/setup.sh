@@ -60,6 +60,9 @@ install_packages() {
     [[ -t 0 ]] || as_root+=(--non-interactive)
   fi
   local apt=("${as_root[@]}" env DEBIAN_FRONTEND=noninteractive apt-get --quiet --option DPkg::Lock::Timeout=600)
+  if ((EUID != 0)) && ! command -v sudo >/dev/null; then
+    fail "please install these packages: ${packages[*]}"
+  fi
   say "installing ${packages[*]}"
   if ! logged "${apt[@]}" update || ! logged "${apt[@]}" install --yes --no-install-recommends "${packages[@]}"; then
     fail "could not install; please install these packages: ${packages[*]}"
