@@ -13,7 +13,7 @@ enum StringEncoding : Long
 {
   STRINGENCODING_DEFAULT = 0, // the code page table, "_" for what it lacks; reading also takes "\uXXXX"
   STRINGENCODING_TABLE = 1,   // as STRINGENCODING_DEFAULT
-  STRINGENCODING_ASCII = 2,   // 7 bits, "_" for all others; reading takes each byte as it is, and "\uXXXX"
+  STRINGENCODING_ASCII = 2,   // 7 bits, "_" for all others (reading: from 127 on); reading also takes "\uXXXX"
   STRINGENCODING_ESCAPED = 3, // "\uXXXX" above 127
   STRINGENCODING_UTF8 = 4,    // one to three bytes a character
   STRINGENCODING_XML = 5,     // "&#xXXXX;" above 127
@@ -135,6 +135,8 @@ class String
         : string_(string), index_(index >= 0 && index < string.length_ ? index : -1)
     {}
     operator UniChar() const noexcept { return index_ < 0 ? UniChar{0} : string_.block_[index_]; }
+    CharRef(const CharRef&) noexcept = default;
+    CharRef& operator=(const CharRef& other) noexcept { return *this = static_cast<UniChar>(other); }
     CharRef& operator=(UniChar character) noexcept
     {
       if (index_ >= 0)
@@ -151,9 +153,9 @@ class String
 
   [[nodiscard]] static String FromLong(Long value) noexcept;
   [[nodiscard]] static String FromLLong(LLong value) noexcept;
-  // A number with `before` places in front of the point, padded with `fill`, and `behind` after it. A `before` of -1
-  // pads nothing; -2 also strips zeros at the end, and so does a `behind` below 0, which means 3 places. Stripping
-  // walks on past the point: 2.500 becomes "2.5", 100.000 becomes "1".
+  // A number with `before` places in front of the point, padded with `fill`, and `behind` after it (at most 10000
+  // each). A `before` of -1 pads nothing; -2 also strips zeros at the end, and so does a `behind` below 0, which means
+  // 3 places. Stripping walks on past the point: 2.500 becomes "2.5", 100.000 becomes "1"; of a zero, "0" remains.
   [[nodiscard]] static String FromReal(Real value, Long before = -1, Long behind = -1, Bool exponent = false,
                                        UniChar fill = u' ') noexcept;
 
@@ -162,8 +164,7 @@ class String
   static void SetShutdown(Bool shutdown) noexcept;
 
  private:
-  Bool Reserve(Long count, Bool keepText) noexcept;
-  Bool GrowTo(Long capacity, Bool keepText) noexcept;
+  Bool Reserve(LLong count, Bool keepText) noexcept;
   Bool OpenGap(Long position, Long count) noexcept;
   void Release() noexcept;
 

@@ -89,7 +89,8 @@ class GePagedRangeArray : public GeRangeRules<GePagedRangeArray>
   Long GetRangeCount() const noexcept { return count_; }
   // The n-th range; false for a number out of range. Walks the pages.
   Bool GetRange(Long n, GeRange& range) const noexcept;
-  // Page * 512 + position of the range last found; 0 when the last lookup found none and after a change.
+  // Page * 512 + position of the range last found; 0 when the last lookup found none and when
+  // ranges have moved since.
   Long GetCursor() const noexcept { return cursor_; }
 
  private:
@@ -109,6 +110,7 @@ class GePagedRangeArray : public GeRangeRules<GePagedRangeArray>
   Long InsertAt(Long place, GeRange range) noexcept;
   void RemoveAt(Long place) noexcept;
   Page* InsertPage(Long number) noexcept;
+  Bool SplitPage(Long& number, Long& position) noexcept;
 
   GeTempDynArray<Page*> pages_;
   Long count_ = 0;
