@@ -30,7 +30,14 @@ class GeAliasXLink : public GeTempPublicNode2D<GeAliasXLink>
 {
  public:
   explicit GeAliasXLink(void* linkOwner) : owner(linkOwner) {}
-  ~GeAliasXLink() override;
+  ~GeAliasXLink() override { Detach(); }
+
+  // Leaves its present trunk and enters another one at the end.
+  void Attach(AliasTrunk& target);
+  // Leaves its trunk, if it has one.
+  void Detach();
+  // The goal at the other end, or null.
+  GeAliasGoal* GetGoal() const;
 
   AliasTrunk* trunk = nullptr; // null when the target has gone
   void* owner;                 // what the link's owner gave
@@ -64,8 +71,8 @@ class GeAliasLink
   // A new link, filled by CopyLinkTo; null when memory is short.
   GeAliasLink* CloneLink(TransArray* translation) const;
   // With a translation array the copy is registered there and finds its target when the copy ends; without one it
-  // points at the same target at once. The label is copied. A null destination does nothing.
-  void CopyLinkTo(GeAliasLink* destination, TransArray* translation) const;
+  // points at the same target at once. The label is copied. A null destination does nothing. False when memory is short.
+  Bool CopyLinkTo(GeAliasLink* destination, TransArray* translation) const;
 
   // True when both reach the same goal, or both are empty.
   Bool IsEqual(const GeAliasLink& other) const { return GetLinkGoal() == other.GetLinkGoal(); }
@@ -74,19 +81,40 @@ class GeAliasLink
   Bool WriteLink(HyperFile& file) const;
   Bool ReadLink(HyperFile& file);
 
-  // Points at a goal directly, making its trunk if needed; null clears.
-  void SetLinkGoal(GeAliasGoal* goal);
+  // Points at a goal directly, making its trunk if needed; null clears. False when memory is short: the link is empty
+  // then.
+  Bool SetLinkGoal(GeAliasGoal* goal);
 
  private:
+  GeAliasID GetTargetId() const;
+  Bool ReadName(const UChar* bytes, LLong size);
+
   String* name_ = nullptr;        // owned
   GeAliasXLink* xlink_ = nullptr; // owned
   void* owner_ = nullptr;
 };
 
-// Walks the links of a goal.
-struct GoalIterator
+// Walks the links of a goal. It may outlive any of them, and the goal too: a link that goes while the iterator stands
+// before it is passed over, and the walk ends with the goal.
+class GoalIterator
 {
-  GeAliasXLink* next = nullptr;
+ public:
+  GoalIterator() = default;
+  ~GoalIterator() { Leave(); }
+  GoalIterator(const GoalIterator&) = delete;
+  GoalIterator& operator=(const GoalIterator&) = delete;
+
+ private:
+  friend class GeAliasGoal;
+  friend class GeAliasXLink;
+  friend struct AliasTrunk;
+
+  void Enter(AliasTrunk& trunk);
+  void Leave();
+
+  AliasTrunk* trunk_ = nullptr;     // null at the end of the walk
+  GeAliasXLink* next_ = nullptr;    // the link that comes next, null behind the last one
+  GoalIterator* sibling_ = nullptr; // the next iterator on the same trunk
 };
 
 // What a link points at: the handle of one node.
@@ -109,12 +137,16 @@ class GeAliasGoal : public GeMemory
   Bool HasLinks() const;
 
   // The first and next link of the goal. Mode 0 gives each link's owner, or the address of a shared empty object when
-  // it has none; any other mode gives the goal's node. Null at the end.
+  // it has none; any other mode gives the goal's node. Null at the end. The body of the loop may delete links and goals.
   void* FirstLinkOfGoal(GoalIterator& iterator, Long mode) const;
-  void* NextLinkOfGoal(GoalIterator& iterator, Long mode) const;
+  static void* NextLinkOfGoal(GoalIterator& iterator, Long mode);
 
-  // Moves every link of this goal to `destination`, in order.
+  // Moves every link of this goal to the end of the list of `destination`, in order. Needs no memory.
   void MoveLinksTo(GeAliasGoal& destination);
+  // Empties all links to this goal.
+  void DropLinks();
+  // The meeting point, made if there is none; null when memory is short.
+  AliasTrunk* NeedTrunk();
 
   // Registers this goal's copy under this goal's id; without an array does nothing. False when memory is short.
   Bool CopyGoalTo(GeAliasGoal& destination, TransArray* translation) const;
@@ -128,12 +160,16 @@ class GeAliasGoal : public GeMemory
   Bool resolvable = true;      // when false a link gives null for this goal, though it stays attached
 };
 
-// The meeting point of a goal and its links.
-struct AliasTrunk : public GeMemory
+// The meeting point of a goal and its links. It lives until its goal goes.
+struct AliasTrunk
 {
-  GeAliasGoal* goal = nullptr;
-  GeAliasID id = 0;
+  explicit AliasTrunk(GeAliasGoal& trunkGoal);
+  ~AliasTrunk();
+
+  GeAliasGoal* goal;
+  GeAliasID id;
   GeTempPublicList2D<GeAliasXLink> xlinks;
+  GoalIterator* iterators = nullptr; // those that stand on this trunk
 };
 
 // Carries ids across one read or one copy. Entries keep their place in memory, so links may sit on an entry's
@@ -142,7 +178,7 @@ class TransArray : public GeMemory
 {
  public:
   TransArray() = default;
-  ~TransArray(); // drops what is left, without resolving
+  ~TransArray() { Clear(); } // what is left unresolved becomes empty
   TransArray(const TransArray&) = delete;
   TransArray& operator=(const TransArray&) = delete;
 
@@ -160,12 +196,23 @@ class TransArray : public GeMemory
   LLong GetCount() const { return count_; }
 
  private:
-  TransEntry* FindOrInsert(GeAliasID id);
+  struct Slot
+  {
+    GeAliasID id;
+    TransEntry* entry; // null in a free slot
+  };
+  struct Block; // a run of entries, which never move
+
+  TransEntry* Find(GeAliasID id) const;
+  TransEntry* Insert(GeAliasID id, GeAliasGoal* goal);
+  TransEntry* NextPlace();
   Bool GrowTable();
-  TransEntry** SlotOf(GeAliasID id) const;
+  Slot& SlotOf(GeAliasID id) const;
+  LLong CollectUnresolved();
   void Clear();
 
-  TransEntry** table_ = nullptr; // open addressing, a power of two; owned with the entries
+  Slot* table_ = nullptr;   // open addressing, a power of two; the entries belong to the blocks
+  Block* blocks_ = nullptr; // the newest first
   LLong capacity_ = 0;
   LLong count_ = 0;
 };

@@ -1,0 +1,321 @@
+#include "torvane/alias.h"
+
+#include <atomic>
+#include <cstring>
+
+#include "torvane/hyper_file.h"
+#include "torvane/private_chunk.h"
+
+namespace _torvane_
+{
+
+namespace
+{
+
+// The two blocks that stand for links and goals in a file.
+constexpr char kLinkMark[] = {'a', 'l', 'i', 'a', 's', '2'};
+constexpr char kGoalMark[] = {'a', 'g', 'o', 'a', 'l', '1'};
+constexpr LLong kMarkSize = 6;
+constexpr LLong kRecordSize = kMarkSize + static_cast<LLong>(sizeof(GeAliasID));
+constexpr LLong kNameLengthSize = 4;
+
+std::atomic<GeAliasID> gNextTrunkId{1};
+
+// What FirstLinkOfGoal gives for a link without an owner.
+constexpr struct EmptyOwner
+{
+} kEmptyOwner;
+
+void PutRecord(UChar (&record)[kRecordSize], const char (&mark)[kMarkSize], GeAliasID id)
+{
+  std::memcpy(record, mark, kMarkSize);
+  std::memcpy(record + kMarkSize, &id, sizeof id); // in memory order, as readers take it
+}
+
+Bool GetRecord(const void* block, LLong size, const char (&mark)[kMarkSize], GeAliasID& id)
+{
+  if (size < kRecordSize || std::memcmp(block, mark, kMarkSize) != 0)
+    return false;
+  std::memcpy(&id, static_cast<const UChar*>(block) + kMarkSize, sizeof id);
+  return true;
+}
+
+// Gives `done` back; a failure is one of memory and becomes the file's error.
+Bool CheckMemory(HyperFile& file, Bool done)
+{
+  if (!done)
+    file.SetError(FILEERROR_MEMORY);
+  return done;
+}
+
+} // namespace
+
+// ---------------------------------------------------------------------------------------------------------------
+
+void GeAliasXLink::Attach(AliasTrunk& target)
+{
+  Detach();
+  target.xlinks.InsertLast(this);
+  trunk = &target;
+}
+
+void GeAliasXLink::Detach()
+{
+  if (!trunk)
+    return;
+  for (GoalIterator* iterator = trunk->iterators; iterator; iterator = iterator->sibling_) {
+    if (iterator->next_ == this)
+      iterator->next_ = GetNext();
+  }
+  Remove();
+  trunk = nullptr;
+}
+
+GeAliasGoal* GeAliasXLink::GetGoal() const { return trunk ? trunk->goal : nullptr; }
+
+AliasTrunk::AliasTrunk(GeAliasGoal& trunkGoal)
+    : goal(&trunkGoal), id(gNextTrunkId.fetch_add(1, std::memory_order_relaxed))
+{}
+
+AliasTrunk::~AliasTrunk()
+{
+  if (goal)
+    goal->trunk = nullptr;
+  while (iterators)
+    iterators->Leave();
+  while (GeAliasXLink* xlink = xlinks.GetFirst())
+    xlink->Detach();
+}
+
+void GoalIterator::Enter(AliasTrunk& trunk)
+{
+  trunk_ = &trunk;
+  next_ = trunk.xlinks.GetFirst();
+  sibling_ = trunk.iterators;
+  trunk.iterators = this;
+}
+
+void GoalIterator::Leave()
+{
+  if (trunk_) {
+    GoalIterator** place = &trunk_->iterators;
+    while (*place != this)
+      place = &(*place)->sibling_;
+    *place = sibling_;
+  }
+  trunk_ = nullptr;
+  next_ = nullptr;
+  sibling_ = nullptr;
+}
+
+// ---------------------------------------------------------------------------------------------------------------
+
+GeAliasLink::~GeAliasLink()
+{
+  DeleteObj(xlink_);
+  DeleteObj(name_);
+}
+
+void GeAliasLink::SetLink(GeListNode* node) { SetLinkGoal(node ? &node->GetGoal() : nullptr); }
+
+Bool GeAliasLink::SetLinkGoal(GeAliasGoal* goal)
+{
+  if (!goal) {
+    ClearLink();
+    return true;
+  }
+  AliasTrunk* trunk = goal->NeedTrunk();
+  if (trunk && !xlink_)
+    xlink_ = NewObj<GeAliasXLink>(owner_);
+  if (!trunk || !xlink_) {
+    ClearLink();
+    return false;
+  }
+  xlink_->Attach(*trunk);
+  return true;
+}
+
+GeListNode* GeAliasLink::GetLink() const
+{
+  GeAliasGoal* goal = GetLinkGoal();
+  return goal && goal->IsResolvable() ? goal->node : nullptr;
+}
+
+GeAliasGoal* GeAliasLink::GetLinkGoal() const { return xlink_ ? xlink_->GetGoal() : nullptr; }
+
+GeAliasID GeAliasLink::GetTargetId() const
+{
+  GeAliasGoal* goal = GetLinkGoal();
+  return goal ? goal->GetGoalId() : 0;
+}
+
+void GeAliasLink::ClearLink() { DeleteObj(xlink_); }
+
+void GeAliasLink::SetLinkOwner(void* owner)
+{
+  owner_ = owner;
+  if (xlink_)
+    xlink_->owner = owner;
+}
+
+void GeAliasLink::SetName(const String& name)
+{
+  String* copy = name.Content() ? NewObj<String>(name) : nullptr;
+  DeleteObj(name_);
+  name_ = copy;
+}
+
+GeAliasLink* GeAliasLink::CloneLink(TransArray* translation) const
+{
+  GeAliasLink* clone = NewObj<GeAliasLink>();
+  if (clone && !CopyLinkTo(clone, translation))
+    DeleteObj(clone);
+  return clone;
+}
+
+Bool GeAliasLink::CopyLinkTo(GeAliasLink* destination, TransArray* translation) const
+{
+  if (!destination || destination == this)
+    return true;
+  Bool done = translation ? translation->RegisterLink(GetTargetId(), *destination, GetLinkGoal())
+                          : destination->SetLinkGoal(GetLinkGoal());
+  Bool named = name_ && name_->Content();
+  destination->SetName(named ? *name_ : String());
+  return done && (!named || (destination->name_ && destination->name_->Content()));
+}
+
+Bool GeAliasLink::WriteLink(HyperFile& file) const
+{
+  UChar record[kRecordSize];
+  PutRecord(record, kLinkMark, GetTargetId());
+  Long room = name_ ? name_->GetCStringLen() : 0;
+  if (room <= 0)
+    return file.WriteMemory(record, kRecordSize);
+
+  constexpr LLong kNameOffset = kRecordSize + kNameLengthSize;
+  void* block = GeAllocNC(kNameOffset + room + 1);
+  if (!block)
+    return CheckMemory(file, false);
+  UChar* bytes = static_cast<UChar*>(block);
+  Long length = name_->GetCString(static_cast<char*>(block) + kNameOffset, room + 1);
+  std::memcpy(bytes, record, kRecordSize);
+  bytes::PutBig(bytes + kRecordSize, static_cast<ULong>(length));
+  Bool done = file.WriteMemory(block, kNameOffset + length);
+  GeFree(block);
+  return done;
+}
+
+// Takes the label out of the bytes behind the id. A length that reaches past them is cut to what is there.
+Bool GeAliasLink::ReadName(const UChar* bytes, LLong size)
+{
+  if (size < kNameLengthSize)
+    return true;
+  LLong length = bytes::GetBig<ULong>(bytes);
+  if (length > size - kNameLengthSize)
+    length = size - kNameLengthSize;
+  if (!name_)
+    name_ = NewObj<String>();
+  if (!name_)
+    return false;
+  name_->SetCString(reinterpret_cast<const char*>(bytes + kNameLengthSize), static_cast<Long>(length));
+  return length == 0 || name_->Content();
+}
+
+Bool GeAliasLink::ReadLink(HyperFile& file)
+{
+  void* block = nullptr;
+  LLong size = 0;
+  if (!file.ReadMemory(block, size) || !block)
+    return false;
+  Bool done = true;
+  GeAliasID id = 0;
+  if (GetRecord(block, size, kLinkMark, id)) {
+    TransArray* translation = file.GetTranslator();
+    done = ReadName(static_cast<const UChar*>(block) + kRecordSize, size - kRecordSize) &&
+           (!translation || translation->RegisterLink(id, *this, nullptr));
+  }
+  GeFree(block);
+  return CheckMemory(file, done);
+}
+
+// ---------------------------------------------------------------------------------------------------------------
+
+GeAliasGoal::~GeAliasGoal() { DropLinks(); }
+
+AliasTrunk* GeAliasGoal::NeedTrunk()
+{
+  if (!trunk)
+    trunk = NewObj<AliasTrunk>(*this);
+  return trunk;
+}
+
+void GeAliasGoal::DropLinks() { DeleteObj(trunk); }
+
+Bool GeAliasGoal::HasLinks() const { return trunk && !trunk->xlinks.IsEmpty(); }
+
+GeAliasID GeAliasGoal::GetGoalId() const { return HasLinks() ? trunk->id : 0; }
+
+void* GeAliasGoal::FirstLinkOfGoal(GoalIterator& iterator, Long mode) const
+{
+  iterator.Leave();
+  if (trunk)
+    iterator.Enter(*trunk);
+  return NextLinkOfGoal(iterator, mode);
+}
+
+void* GeAliasGoal::NextLinkOfGoal(GoalIterator& iterator, Long mode)
+{
+  GeAliasXLink* xlink = iterator.next_;
+  if (!xlink) {
+    iterator.Leave();
+    return nullptr;
+  }
+  iterator.next_ = xlink->GetNext();
+  if (mode != 0)
+    return xlink->trunk->goal->node;
+  return xlink->owner ? xlink->owner : const_cast<EmptyOwner*>(&kEmptyOwner);
+}
+
+void GeAliasGoal::MoveLinksTo(GeAliasGoal& destination)
+{
+  if (!trunk || &destination == this)
+    return;
+  // A destination that nothing points at yet takes over the whole trunk.
+  if (!destination.trunk) {
+    destination.trunk = trunk;
+    destination.trunk->goal = &destination;
+    trunk = nullptr;
+    return;
+  }
+  while (GeAliasXLink* xlink = trunk->xlinks.GetFirst())
+    xlink->Attach(*destination.trunk);
+  DropLinks();
+}
+
+Bool GeAliasGoal::CopyGoalTo(GeAliasGoal& destination, TransArray* translation) const
+{
+  return !translation || translation->RegisterGoal(GetGoalId(), destination);
+}
+
+Bool GeAliasGoal::WriteGoal(HyperFile& file) const
+{
+  UChar record[kRecordSize];
+  PutRecord(record, kGoalMark, GetGoalId());
+  return file.WriteMemory(record, kRecordSize);
+}
+
+Bool GeAliasGoal::ReadGoal(HyperFile& file)
+{
+  void* block = nullptr;
+  LLong size = 0;
+  if (!file.ReadMemory(block, size) || !block)
+    return false;
+  GeAliasID id = 0;
+  if (size == kRecordSize)
+    GetRecord(block, size, kGoalMark, id);
+  GeFree(block);
+  TransArray* translation = file.GetTranslator();
+  return !translation || CheckMemory(file, translation->RegisterGoal(id, *this));
+}
+
+} // namespace _torvane_
