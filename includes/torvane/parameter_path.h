@@ -91,10 +91,13 @@ class ParameterPath
   Bool Read(HyperFile& file);
 
  private:
+  const ParameterLevel* Levels() const { return heap_ ? heap_ : inline_; }
+  ParameterLevel* Levels() { return heap_ ? heap_ : inline_; }
   ParameterLevel* LevelsForWriting(Long count);
 
   // Paths are one to three levels deep nearly always: those need no memory of their own.
   static constexpr Long kInline = 3;
+  static constexpr Long kMaxLevels = 1 << 24;
   ParameterLevel inline_[kInline];
   ParameterLevel* heap_ = nullptr; // owned; null while the levels are inline
   Long count_ = 0;
