@@ -48,11 +48,12 @@ class BaseContainer
   const GeData& GetData(Long id) const;   // a nil value when absent
   GeData* FindData(Long id) const;        // null when absent
 
-  // Clears the destination and appends copies, the id included. False when memory is short.
+  // Replaces the destination's id and elements by copies; each element removed and each one added counts as a change
+  // there. False when memory is short: the destination is then unchanged.
   Bool CopyTo(BaseContainer& destination, ULong flags, TransArray* translation) const;
   // A new container that the caller owns; null when memory is short.
   BaseContainer* GetClone(ULong flags, TransArray* translation) const;
-  // Sets a copy of every element of `source` here.
+  // Sets a copy of every element of `source`, which doesn't lie inside of this container. False when memory is short.
   Bool MergeFrom(const BaseContainer& source);
 
   // A getter gives the default only when the id is absent.
@@ -81,7 +82,7 @@ class BaseContainer
   void SetLink(Long id, BaseList2D* target); // null sets an empty link
 
   BaseContainer* GetContainerInstance(Long id) const; // null when absent or of another type
-  // The target of the link of that id. With a document, a target that belongs to another document gives null.
+  // The target of the link of that id, or null. With a document, a target that belongs to another document gives null.
   BaseList2D* GetLink(Long id, const BaseDocument* document = nullptr) const;
   CustomData* GetCustomDataType(Long id, Long type) const;
 
@@ -119,17 +120,32 @@ class BaseContainer
   Bool SetParameter(const ParameterPath& path, const GeData& value);
 
  private:
+  struct Block;
+
   Element* NewElement(Long id);
+  Bool AddBlock(Long capacity);
   void Append(Element* element);
-  Element* Find(Long id) const;
   void Unlink(Element* element, Element* previous);
+  void Recycle(Element* element);
+  GeData* FillNew(Element* element, const GeData& value);
+  Element* Find(Long id) const;
+  Element* FindAt(Long index) const;
+  static Bool Visit(const Iterator& iterator, Long& id, GeData*& value);
+  void Swap(BaseContainer& other);
+  Bool AppendCopies(const BaseContainer& source, ULong flags, TransArray* translation);
+  BaseContainer* EnterGroup(Long id);
+  Bool SetComponent(Long id, Long componentId, Real value);
+  void FreeElements();
+  void DropElements(BaseContainer*& pending);
 
   Element* head_ = nullptr;
   Element* tail_ = nullptr;
+  Element* free_ = nullptr;          // places of removed elements, linked through `next`
+  Block* blocks_ = nullptr;          // where the elements lie, the newest first; owned
+  BaseContainer* pending_ = nullptr; // the next container in the list of those that wait to be freed
   Long id_;
   UWord dirty_ = 0;
   UWord savedDirty_ = 0;
-  void* reserved_ = nullptr;
 };
 
 } // namespace _torvane_

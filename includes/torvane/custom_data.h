@@ -42,6 +42,13 @@ struct CustomDataType
   CustomData* (*make)(const CustomDataType& type); // a new value; null when memory is short
 };
 
+// A value of class T for the table.
+template <class T>
+CustomData* MakeCustomData(const CustomDataType& type)
+{
+  return NewObj<T>(type);
+}
+
 // The row of a type id, or null for a type that the library doesn't know.
 const CustomDataType* FindCustomDataType(Long id);
 
@@ -60,6 +67,8 @@ class OpaqueCustomData : public CustomData
   void Write(HyperFile& file) const override;
 
  protected:
+  void DropBody();
+
   const CustomDataType& type_;
   Long level_;
   void* data_ = nullptr; // the body without its end tag; owned
@@ -85,6 +94,9 @@ class UnitScaleData : public OpaqueCustomData
 
   Real scale = 1.0;
   Long unit = 3;
+
+ private:
+  Bool TakeBody(Bool singlePrecision);
 };
 
 // Type 1009369: three numbers without a meaning of their own here.
@@ -105,6 +117,9 @@ class ThreeNumbersData : public CustomData
   Bool third = false;
 
  private:
+  template <class Visitor, class Numbers>
+  static void VisitBody(Visitor& visitor, Numbers& numbers);
+
   const CustomDataType& type_;
 };
 

@@ -26,6 +26,11 @@ struct UnknownRecord
   Long level = 0; // -1: the value was dropped and writes back as an empty chunk
   LLong size = 0;
   void* data = nullptr; // owned; with the chunk's end tag
+
+  UnknownRecord() = default;
+  ~UnknownRecord() { GeFree(data); }
+  UnknownRecord(const UnknownRecord&) = delete;
+  UnknownRecord& operator=(const UnknownRecord&) = delete;
 };
 
 // Owns its payload. A payload that can't be allocated leaves type 0 (nil). Getters never fail: on another type they
@@ -49,9 +54,14 @@ class GeData
   GeData(const GeAliasLink& value);                                           // NOLINT: a link on the same target
   // A custom value copied from `source`, which is of that type.
   GeData(Long type, const CustomData& source);
-  GeData(const GeData& other) { CopyFrom(other, 0, nullptr); }
+  // A copy of a link points at the same target.
+  GeData(const GeData& other) { Assign(other, 0, nullptr); }
   GeData(GeData&& other) noexcept : type_(other.type_), payload_(other.payload_) { other.type_ = kDataNil; }
-  GeData& operator=(const GeData& other);
+  GeData& operator=(const GeData& other)
+  {
+    Assign(other, 0, nullptr);
+    return *this;
+  }
   GeData& operator=(GeData&& other) noexcept;
   ~GeData() { Free(); }
 
@@ -60,15 +70,22 @@ class GeData
   // unknown custom type gives false and leaves nil; any other unknown id is kept without a payload and reported.
   Bool SetType(Long type);
   // Frees the payload and leaves nil.
-  void Free();
+  void Free()
+  {
+    if (OwnsPayload())
+      FreePayload();
+    type_ = kDataNil;
+  }
 
   // The type, with an unknown record shown as 0.
   Long GetType() const { return type_ == kDataUnknown ? kDataNil : type_; }
   // The type as it is stored.
   Long GetRawType() const { return type_; }
 
-  // Copies a value; a link is registered in `translation`, or points at the same target without one (reported unless
-  // that is meant: see GeAliasLink::CopyLinkTo). False when memory is short: the value is nil then.
+  // Copies a value, links through `translation`; a link without one is reported, and points at the same target.
+  // (Construction and assignment do the latter without a report.) A text, a Time, a Vector and a Matrix are stored in
+  // the object that holds such a value already; a container, a link and a custom value get a new one. `flags` are
+  // those of PrivateChunk::CopyTo. False when memory is short: the value is nil then.
   Bool CopyFrom(const GeData& source, ULong flags, TransArray* translation);
 
   // Equal type and value; a Long also equals a Real of the same value. A NaN equals nothing, and neither does a String:
@@ -96,10 +113,7 @@ class GeData
   // The custom object if the type is the one asked for, else null.
   CustomData* GetCustomDataType(Long type) const;
   // The custom object of whatever custom type this is, or null.
-  CustomData* GetCustom() const
-  {
-    return type_ >= kDataFirstCustom && type_ != kDataBoolAlias ? payload_.custom : nullptr;
-  }
+  CustomData* GetCustom() const { return type_ >= kDataFirstCustom ? payload_.custom : nullptr; }
 
  private:
   union Payload
@@ -120,9 +134,33 @@ class GeData
     CustomData* custom;
   };
 
+  friend class BaseContainer; // takes nested containers out and puts them in without a recursion
+
+  // False for the kinds that are stored in the value itself, the most frequent ones.
+  Bool OwnsPayload() const
+  {
+    constexpr ULong kInline = 1U << kDataNil | 1U << kDataPointer | 1U << kDataLong | 1U << kDataReal | 1U << kDataLLong;
+    return type_ < 0 || type_ > kDataLLong || ((kInline >> type_) & 1U) == 0;
+  }
   template <class T, class... Args>
   Bool Own(Long type, T* Payload::*member, Args&&... args);
+  template <class T>
+  const T& Get(Long type, T* Payload::*member, const T& neutral) const;
+  void FreePayload();
+  Bool Keep(Bool done);
+  void Take(GeData& other);
+  Bool Assign(const GeData& source, ULong flags, TransArray* translation);
+  Bool AssignInPlace(const GeData& source);
+  Bool Build(const GeData& source, ULong flags, TransArray* translation);
+  Bool BuildBlock(const void* block);
+  Bool BuildUnknown(const UnknownRecord& source);
+  Bool MakeCustom(Long type);
+  Bool ReadPayload(HyperFile& file);
   Bool ReadCustom(HyperFile& file, Long type);
+  Bool ReadUnknown(HyperFile& file, Long type, Long level);
+  Bool WritePayload(HyperFile& file) const;
+  Bool WriteUnknown(HyperFile& file) const;
+  void ReportWrongType() const;
 
   Long type_ = kDataNil;
   Payload payload_;
