@@ -4,6 +4,7 @@
 
 #include <cstdio>
 #include <cstring>
+#include <utility>
 
 #include "torvane/file_errors.h"
 #include "torvane/filename.h"
@@ -43,48 +44,54 @@ enum SeekMode : Long
 namespace bytes
 {
 
+// Byte `kIndex` of so many that stand in a file from the highest (or the lowest) on. Written out in full, not as a
+// loop, a number becomes one store or load and a swap.
+template <class Bits, std::size_t... kIndex>
+inline void PutBig(UChar* place, Bits value, std::index_sequence<kIndex...>)
+{
+  ((place[kIndex] = static_cast<UChar>(value >> (8 * (sizeof(Bits) - 1 - kIndex)))), ...);
+}
+
+template <class Bits, std::size_t... kIndex>
+inline Bits GetBig(const UChar* place, std::index_sequence<kIndex...>)
+{
+  return static_cast<Bits>(((static_cast<ULLong>(place[kIndex]) << (8 * (sizeof(Bits) - 1 - kIndex))) | ...));
+}
+
+template <class Bits, std::size_t... kIndex>
+inline void PutLittle(UChar* place, Bits value, std::index_sequence<kIndex...>)
+{
+  ((place[kIndex] = static_cast<UChar>(value >> (8 * kIndex))), ...);
+}
+
+template <class Bits, std::size_t... kIndex>
+inline Bits GetLittle(const UChar* place, std::index_sequence<kIndex...>)
+{
+  return static_cast<Bits>(((static_cast<ULLong>(place[kIndex]) << (8 * kIndex)) | ...));
+}
+
 template <class Bits>
 inline void PutBig(UChar* place, Bits value)
 {
-  for (std::size_t i = 0; i < sizeof(Bits); ++i)
-    place[i] = static_cast<UChar>(value >> (8 * (sizeof(Bits) - 1 - i)));
+  PutBig(place, value, std::make_index_sequence<sizeof(Bits)>());
 }
 
 template <class Bits>
 inline Bits GetBig(const UChar* place)
 {
-  Bits value = 0;
-  for (std::size_t i = 0; i < sizeof(Bits); ++i)
-    value = static_cast<Bits>(static_cast<Bits>(value << 8) | place[i]);
-  return value;
-}
-
-template <>
-inline UChar GetBig<UChar>(const UChar* place)
-{
-  return *place;
+  return GetBig<Bits>(place, std::make_index_sequence<sizeof(Bits)>());
 }
 
 template <class Bits>
 inline void PutLittle(UChar* place, Bits value)
 {
-  for (std::size_t i = 0; i < sizeof(Bits); ++i)
-    place[i] = static_cast<UChar>(value >> (8 * i));
+  PutLittle(place, value, std::make_index_sequence<sizeof(Bits)>());
 }
 
 template <class Bits>
 inline Bits GetLittle(const UChar* place)
 {
-  Bits value = 0;
-  for (std::size_t i = sizeof(Bits); i-- > 0;)
-    value = static_cast<Bits>(static_cast<Bits>(value << 8) | place[i]);
-  return value;
-}
-
-template <>
-inline UChar GetLittle<UChar>(const UChar* place)
-{
-  return *place;
+  return GetLittle<Bits>(place, std::make_index_sequence<sizeof(Bits)>());
 }
 
 // The bits of a float, with a NaN or an infinity turned into 0.0: no file holds either.

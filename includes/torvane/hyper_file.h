@@ -16,6 +16,7 @@ namespace _torvane_
 class BaseContainer;
 class BaseDocument;
 class Bitmap;
+class GeData;
 class TransArray;
 
 // Four characters as a 32-bit number, the first in the high byte.
@@ -268,13 +269,22 @@ class HyperFile : public GeMemory
   Bool GetBits(UChar tag, Value& bits);
   Bool PutSlow(UChar tag, ULLong bits, LLong size);
   Bool GetSlow(UChar tag, ULLong& bits, LLong size);
-  Bool PutReals(UChar tag, const Real* values, LLong count, Bool asFloats);
-  Bool GetReals(UChar tag, Real* values, LLong count, Bool asFloats);
+  template <LLong kCount>
+  Bool PutReals(UChar tag, const void* values, Bool asFloats);
+  template <LLong kCount>
+  Bool GetReals(UChar tag, void* values, Bool asFloats);
   Bool PutText(UChar tag, const String& text);
   Bool GetText(UChar tag, String& text);
-  Bool GetLength(UChar tag, LLong& length);
-  Bool FailFromFile();
-  Bool Fail(Long error);
+  // A tag, and the 32-bit length behind it.
+  Bool PutBlockHead(UChar tag, ULong length);
+  Bool GetBlockHead(UChar tag, LLong& length);
+  Bool ReadPlainLong(Long& value);
+  Bool SaveImage(Bitmap& image, Long format, BaseContainer* settings, Long flags);
+  Bool ReadHeaderSlow(UChar& tag);
+  // Both give false. `position` is where the value in hand begins.
+  Bool Fail(Long error, LLong position);
+  Bool FailFromFile(LLong position);
+  Bool FailFromFile() { return FailFromFile(file_.GetPosition()); }
   void TickWrite()
   {
     if (ticks_ == kWriteTicks)
@@ -289,13 +299,26 @@ class HyperFile : public GeMemory
   }
   void CallWriteHook();
   void CallReadHook();
+  // The ticks of `count` values at once. None but the last of them may be due for a hook that is set.
+  void TickMany(LLong count);
+  // How many of the coming `limit` values may go by before TickMany must be called.
+  LLong LimitToTick(LLong limit) const;
+  LLong GetTicksToDue() const;
+  LLong GetTickThreshold() const { return mode_ == kHyperFileWrite ? kWriteTicks : readTicks_; }
+  Bool HasHook() const { return mode_ == kHyperFileWrite ? writeHook_ != nullptr : readHook_ != nullptr; }
   Bool WriteHeader(ULong ident);
   Bool ReadHeader(ULong ident);
+  void EndTranslation();
+  Bool ReadElements(void* data, Long type, Long storedType, LLong stride, LLong count);
+  Bool ReadLegacyElements(LLong start, Long type, Long storedType, LLong count, void*& block);
   Bool ReadContainerChunk(BaseContainer& container, Bool flush);
   Bool ReadContainerLegacy(BaseContainer& container, Bool flush);
-  Bool Drop(LLong count);
-
-  friend class ArrayTransfer; // bulk conversion, in hyper_file_array.cpp
+  GeData* PlaceElement(BaseContainer& container, Bool flush, Long id);
+  Bool ReadLegacyEntry(BaseContainer& container, Bool flush, Long id, UChar type);
+  template <class Value>
+  Bool ReadLegacyValue(BaseContainer& container, Bool flush, Long id, Bool (HyperFile::*read)(Value&));
+  Bool ReadLegacyNested(BaseContainer& container, Bool flush, Long id);
+  Bool Drop(LLong count, LLong position);
 
   static constexpr LLong kWriteTicks = 50000;
 
@@ -330,6 +353,17 @@ inline Bool HyperFile::Put(UChar tag, Bits bits)
   bytes::PutBig(place + 1, bits);
   file_.CommitWrite(1 + kSize);
   TickWrite();
+  return true;
+}
+
+inline Bool HyperFile::ReadValueHeader(UChar& tag)
+{
+  const UChar* place = error_ == FILEERROR_NONE ? file_.ReadWindow(1) : nullptr;
+  if (!place)
+    return ReadHeaderSlow(tag);
+  tag = place[0];
+  file_.CommitRead(1);
+  chunkDepth_ += (tag == kTagChunkStart ? 1 : 0) - (tag == kTagChunkEnd ? 1 : 0);
   return true;
 }
 
