@@ -112,7 +112,6 @@ class StandaloneHost
 
  private:
   std::unique_ptr<HostState> state_;
-  HostState* previous_;
 };
 
 } // namespace host

@@ -153,6 +153,7 @@ inline constexpr AEGP_ObjectType AEGP_ObjectType_VECTOR = 4;
 inline constexpr AEGP_LayerFlags AEGP_LayerFlag_NONE = 0;
 inline constexpr AEGP_LayerFlags AEGP_LayerFlag_VIDEO_ACTIVE = 0x0001;
 inline constexpr AEGP_LayerFlags AEGP_LayerFlag_LOCKED = 0x0020;
+inline constexpr AEGP_LayerFlags AEGP_LayerFlag_LAYER_IS_3D = 0x0800;
 inline constexpr AEGP_LayerFlags AEGP_LayerFlag_LOOK_AT_POI = 0x2000;
 inline constexpr AEGP_LayerFlags AEGP_LayerFlag_NULL_LAYER = 0x10000;
 
