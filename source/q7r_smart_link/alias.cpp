@@ -79,8 +79,6 @@ AliasTrunk::AliasTrunk(GeAliasGoal& trunkGoal)
 
 AliasTrunk::~AliasTrunk()
 {
-  if (goal)
-    goal->trunk = nullptr;
   while (iterators)
     iterators->Leave();
   while (GeAliasXLink* xlink = xlinks.GetFirst())
@@ -249,7 +247,11 @@ AliasTrunk* GeAliasGoal::NeedTrunk()
   return trunk;
 }
 
-void GeAliasGoal::DropLinks() { DeleteObj(trunk); }
+void GeAliasGoal::DropLinks()
+{
+  AliasTrunk* old = std::exchange(trunk, nullptr);
+  DeleteObj(old);
+}
 
 Bool GeAliasGoal::HasLinks() const { return trunk && !trunk->xlinks.IsEmpty(); }
 

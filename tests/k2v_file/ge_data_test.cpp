@@ -1,0 +1,377 @@
+#include "torvane/ge_data.h"
+
+#include <cmath>
+#include <limits>
+
+#include <gtest/gtest.h>
+
+#include "support/byte_writer.h"
+#include "support/counting_memory.h"
+#include "support/memory_file.h"
+#include "torvane/alias.h"
+#include "torvane/assertion.h"
+#include "torvane/base_container.h"
+
+using namespace _torvane_;
+
+namespace
+{
+
+int gReports = 0;
+
+// Counts the reports to the assertion log, and checks that no block is left behind.
+class GeDataTest : public testing::Test
+{
+ protected:
+  GeDataTest() : previous_(SetAssertionLog([](const char*, Long, const char*) { ++gReports; })) { gReports = 0; }
+  ~GeDataTest() override { SetAssertionLog(previous_); }
+  int TakeReports() { return std::exchange(gReports, 0); }
+
+ private:
+  counting_memory::BalanceCheck balance_;
+  AssertionLog previous_;
+};
+
+GeData Custom(Long type)
+{
+  GeData value;
+  EXPECT_TRUE(value.SetType(type));
+  return value;
+}
+
+GeData ThreeNumbers(Long first, Long second, Bool third)
+{
+  GeData value = Custom(kCustomThreeNumbers);
+  auto* numbers = static_cast<ThreeNumbersData*>(value.GetCustom());
+  numbers->first = first;
+  numbers->second = second;
+  numbers->third = third;
+  return value;
+}
+
+BaseContainer SmallContainer()
+{
+  BaseContainer container(7);
+  container.InsertData(1, GeData(true));
+  container.InsertData(2, GeData(static_cast<void*>(&gReports))); // left out of the file
+  return container;
+}
+
+std::string Written(const GeData& value)
+{
+  return ToHex(WriteToMemory([&](HyperFile& file) { EXPECT_TRUE(value.Write(file)); }));
+}
+
+// Values of every kind with their bytes in a file.
+struct Form
+{
+  GeData value;
+  std::string hex;
+};
+
+std::vector<Form> Forms()
+{
+  const std::string identity = "00 00 00 00 00 00 00 00 ", zero = identity, one = "3F F0 00 00 00 00 00 00 ";
+  std::string matrix =
+      "0F 00 00 00 19 19 " + zero + zero + zero + one + zero + zero + zero + one + zero + zero + zero + one;
+  matrix.pop_back();
+  return {
+      {GeData(), "0F 00 00 00 00"},
+      {GeData(static_cast<void*>(nullptr)), "0F 00 00 00 0E"},
+      {GeData(-2), "0F 00 00 00 0F 0F FF FF FF FE"},
+      {GeData(true), "0F 00 00 00 0F 0F 00 00 00 01"},
+      {GeData(1.5), "0F 00 00 00 13 13 3F F8 00 00 00 00 00 00"},
+      {GeData(BaseTime(1.0, 25.0)), "0F 00 00 00 16 16 3F F0 00 00 00 00 00 00 40 39 00 00 00 00 00 00"},
+      {GeData(Vector(1, -2, 0.5)),
+       "0F 00 00 00 17 17 3F F0 00 00 00 00 00 00 C0 00 00 00 00 00 00 00 3F E0 00 00 00 00 00 00"},
+      {GeData(Matrix()), matrix},
+      {GeData(LLong{0x123456789A}), "0F 00 00 00 1A 11 00 00 00 12 34 56 78 9A"},
+      {GeData(String("A\xE9")), "0F 00 00 00 82 82 00 00 00 04 00 41 00 E9"},
+      {GeData(Filename("x")), "0F 00 00 00 83 83 00 00 00 02 00 78"},
+      {GeData(SmallContainer()),
+       "0F 00 00 00 84 01 00 00 00 84 00 00 00 01 0F 00 00 00 07 0F 00 00 00 01 0F 00 00 00 0F 0F 00 00 00 01 02"},
+      {GeData(GeAliasLink()), "0F 00 00 00 85 80 00 00 00 0E 61 6C 69 61 73 32 00 00 00 00 00 00 00 00"},
+      {Custom(kCustomUnitScale),
+       "0F 0B EB C3 13 01 00 00 00 00 00 00 00 00 13 3F F0 00 00 00 00 00 00 0F 00 00 00 03 02"},
+      {ThreeNumbers(1, 2, true), "0F 00 0F 66 D9 01 00 00 00 00 00 00 00 00 0F 00 00 00 02 0F 00 00 00 01 15 01 02"},
+      {Custom(1011153), "0F 00 0F 6D D1 01 00 00 00 00 00 00 00 07 02"},
+  };
+}
+
+TEST_F(GeDataTest, WritesEachKindAsItsTypeAndValueAndReadsItBack)
+{
+  for (const Form& form : Forms()) {
+    SCOPED_TRACE(form.value.GetType());
+    EXPECT_EQ(Written(form.value), form.hex);
+    ByteWriter bytes;
+    bytes.Header().Append(WriteToMemory([&](HyperFile& file) { form.value.Write(file); })).Long(99);
+    MemoryReadFile source(bytes.bytes);
+    GeData read(3);
+    ASSERT_TRUE(read.Read(source.file));
+    EXPECT_EQ(read.GetType(), form.value.GetType());
+    EXPECT_EQ(Written(read), form.hex);
+    Long next = 0;
+    EXPECT_TRUE(source.file.ReadLong(next));
+    EXPECT_EQ(next, 99);
+  }
+}
+
+TEST_F(GeDataTest, GivesEveryListedCustomTypeItsLevel)
+{
+  const std::pair<Long, Long> levels[] = {{1000481, 1},   {1000997, 0},   {1009060, 3},   {1009290, 2},
+                                          {1009369, 0},   {1009398, 0},   {1011131, 2},   {1011153, 7},
+                                          {1018397, 0},   {1019655, 1},   {1019660, 3},   {1024869, 0},
+                                          {100004811, 0}, {180000104, 0}, {200000275, 0}, {450000019, 0}};
+  for (auto [type, level] : levels)
+    EXPECT_EQ(Custom(type).GetCustom()->GetChunkLevel(), level) << type;
+  GeData value(1);
+  EXPECT_FALSE(value.SetType(1000480));
+  EXPECT_EQ(value.GetType(), kDataNil);
+}
+
+TEST_F(GeDataTest, TurnsOldTypesIntoCurrentOnesAndReportsTypesThatDoNotExist)
+{
+  const std::pair<Long, Long> types[] = {{3, 23}, {7, 130}, {12, 130}, {400006001, 15}, {25, 25}, {256, 256}, {0, 0}};
+  GeData value;
+  for (auto [asked, given] : types) {
+    EXPECT_TRUE(value.SetType(asked));
+    EXPECT_EQ(value.GetType(), given);
+  }
+  EXPECT_EQ(TakeReports(), 0);
+  value.SetType(42);
+  EXPECT_EQ(value.GetType(), 42);
+  EXPECT_EQ(TakeReports(), 1);
+  EXPECT_EQ(GeData(value).GetType(), 42);
+  value.SetType(kDataMatrix);
+  EXPECT_EQ(value.GetMatrix(), Matrix());
+}
+
+TEST_F(GeDataTest, GivesANeutralValueAndReportsItWhenAskedForAnotherType)
+{
+  const GeData text(String("a"));
+  EXPECT_EQ(text.GetLong(), 0);
+  EXPECT_EQ(text.GetReal(), 0.0);
+  EXPECT_EQ(text.GetLLong(), 0);
+  EXPECT_EQ(text.GetPointer(), nullptr);
+  EXPECT_EQ(text.GetVector(), Vector());
+  EXPECT_EQ(text.GetMatrix(), Matrix());
+  EXPECT_EQ(text.GetTime(), BaseTime());
+  EXPECT_FALSE(text.GetFilename().Content());
+  EXPECT_EQ(text.GetContainer(), nullptr);
+  EXPECT_FALSE(GeData(1).GetString().Content());
+  EXPECT_EQ(TakeReports(), 10);
+  EXPECT_EQ(GeData().GetLong(), 0);
+  EXPECT_FALSE(GeData().GetString().Content());
+  EXPECT_EQ(GeData(5).GetReal(), 5.0);
+  EXPECT_EQ(TakeReports(), 0);
+}
+
+TEST_F(GeDataTest, TruncatesARealTowardsZeroAndKeepsItWithinALong)
+{
+  const Real infinity = std::numeric_limits<Real>::infinity();
+  const std::pair<Real, Long> cases[] = {{2.9, 2},
+                                         {-2.9, -2},
+                                         {2147483647.5, 2147483647},
+                                         {3e9, 2147483647},
+                                         {-3e9, -2147483647 - 1},
+                                         {infinity, 2147483647},
+                                         {std::nan(""), 0},
+                                         {-2147483648.5, -2147483647 - 1}};
+  for (auto [real, whole] : cases)
+    EXPECT_EQ(GeData(real).GetLong(), whole) << real;
+}
+
+TEST_F(GeDataTest, ComparesByTypeAndValueWithItsOldExceptions)
+{
+  EXPECT_TRUE(GeData().IsEqual(GeData()));
+  EXPECT_TRUE(GeData(2).IsEqual(GeData(2.0)));
+  EXPECT_TRUE(GeData(2.0).IsEqual(GeData(2)));
+  EXPECT_FALSE(GeData(2).IsEqual(GeData(2.5)));
+  EXPECT_FALSE(GeData(2).IsEqual(GeData(LLong{2})));
+  EXPECT_FALSE(GeData(std::nan("")).IsEqual(GeData(std::nan(""))));
+  EXPECT_FALSE(GeData(String("a")).IsEqual(GeData(String("a"))));
+  EXPECT_TRUE(GeData(Filename("Abc")).IsEqual(GeData(Filename("aBC"))));
+  EXPECT_TRUE(GeData(BaseTime(1.0, 2.0)).IsEqual(GeData(BaseTime::Raw(2.0, 4.0))));
+  EXPECT_TRUE(GeData(SmallContainer()).IsEqual(GeData(SmallContainer())));
+  EXPECT_TRUE(ThreeNumbers(1, 2, true).IsEqual(ThreeNumbers(1, 2, true)));
+  EXPECT_FALSE(ThreeNumbers(1, 2, true).IsEqual(ThreeNumbers(1, 3, true)));
+  GeAliasGoal a, b;
+  GeAliasLink toA, alsoToA, toB;
+  toA.SetLinkGoal(&a);
+  alsoToA.SetLinkGoal(&a);
+  toB.SetLinkGoal(&b);
+  EXPECT_TRUE(GeData(toA).IsEqual(GeData(alsoToA)));
+  EXPECT_FALSE(GeData(toA).IsEqual(GeData(toB)));
+}
+
+TEST_F(GeDataTest, StoresACopyInTheObjectOfTheSameKindButReplacesContainers)
+{
+  GeData vector(Vector(1, 2, 3));
+  const Vector* place = &vector.GetVector();
+  vector.CopyFrom(GeData(Vector(4, 5, 6)), 0, nullptr);
+  EXPECT_EQ(&vector.GetVector(), place);
+  EXPECT_EQ(vector.GetVector(), Vector(4, 5, 6));
+  GeData container((BaseContainer(1)));
+  const BaseContainer* old = container.GetContainer();
+  container.CopyFrom(GeData(SmallContainer()), 0, nullptr);
+  EXPECT_NE(container.GetContainer(), old);
+  // A value may be copied and moved out of the container that it is to replace.
+  container = *container.GetContainer()->FindData(1);
+  EXPECT_EQ(container.GetLong(), 1);
+  container = GeData(SmallContainer());
+  container = std::move(*container.GetContainer()->FindData(1));
+  EXPECT_EQ(container.GetLong(), 1);
+}
+
+TEST_F(GeDataTest, ReportsALinkThatIsCopiedWithoutATranslation)
+{
+  GeAliasGoal goal;
+  GeAliasLink link;
+  link.SetLinkGoal(&goal);
+  GeData source(link), copy;
+  EXPECT_TRUE(copy.CopyFrom(source, 0, nullptr));
+  EXPECT_EQ(TakeReports(), 1);
+  EXPECT_EQ(copy.GetAliasLink()->GetLinkGoal(), &goal);
+  EXPECT_EQ(GeData(source).GetAliasLink()->GetLinkGoal(), &goal);
+  EXPECT_EQ(TakeReports(), 0);
+}
+
+// Reads one value out of a file of that version; gives what it writes back, or "failed".
+std::string ReadAndWrite(ByteWriter body, Long version)
+{
+  ByteWriter bytes;
+  bytes.Header("Q7R6", version).Append(body.bytes);
+  MemoryReadFile source(bytes.bytes);
+  GeData value;
+  if (!value.Read(source.file)) {
+    EXPECT_EQ(value.GetRawType(), kDataNil);
+    return "failed";
+  }
+  EXPECT_EQ(source.file.GetPosition(), source.file.GetLength());
+  return Written(value);
+}
+
+TEST_F(GeDataTest, KeepsAnUnknownCustomValueByteForByte)
+{
+  ByteWriter body;
+  body.Long(1000486).Start(0, 6).String(u"x").Start(5, 0).U8(140).U32(3).U8(1).U8(9).U8(8).End().Real(2.5).End();
+  EXPECT_EQ(ReadAndWrite(body, 13000), ToHex(body.bytes));
+  EXPECT_EQ(ReadAndWrite(body, 11599), ToHex(body.bytes)); // one of those that old files keep
+  ByteWriter bytes;
+  bytes.Header().Append(body.bytes);
+  MemoryReadFile source(bytes.bytes);
+  GeData value;
+  ASSERT_TRUE(value.Read(source.file));
+  EXPECT_EQ(value.GetType(), kDataNil);
+  GeData copy(value);
+  EXPECT_EQ(copy.GetUnknown()->type, 1000486);
+  EXPECT_EQ(Written(copy), ToHex(body.bytes));
+}
+
+TEST_F(GeDataTest, DropsOtherUnknownValuesOfOldFilesButTheirFrame)
+{
+  ByteWriter body, empty;
+  body.Long(1000487).Start(0, 6).Real(2.5).End();
+  empty.Long(1000487).Start(0, -1).End();
+  EXPECT_EQ(ReadAndWrite(body, 11599), ToHex(empty.bytes));
+  EXPECT_EQ(ReadAndWrite(body, 11600), ToHex(body.bytes));
+  EXPECT_EQ(ReadAndWrite(empty, 13000), ToHex(empty.bytes));
+}
+
+TEST_F(GeDataTest, KeepsTheBytesAndTheLevelOfAnOpaqueCustomValueInEveryVersion)
+{
+  for (Long type : {1011153, kCustomUnitScale}) {
+    ByteWriter body;
+    body.Long(type).Start(0, 9).Real(2.5).Long(1).Bool(true).End();
+    EXPECT_EQ(ReadAndWrite(body, 13000), ToHex(body.bytes));
+    EXPECT_EQ(ReadAndWrite(body, 7400), ToHex(body.bytes));
+  }
+  ByteWriter newer, known;
+  newer.Long(kCustomThreeNumbers).Start(0, 1).Long(5).Long(6).Bool(false).String(u"more").End();
+  known.Long(kCustomThreeNumbers).Start(0, 0).Long(5).Long(6).Bool(false).End();
+  EXPECT_EQ(ReadAndWrite(newer, 13000), ToHex(known.bytes));
+}
+
+TEST_F(GeDataTest, TakesTheUnitScaleOfASinglePrecisionFile)
+{
+  ByteWriter bytes;
+  bytes.Header("Q7R6", 13000, 1).Long(kCustomUnitScale).Start(0, 0).Real(0.25).Long(4).End();
+  MemoryReadFile source(bytes.bytes);
+  GeData value;
+  ASSERT_TRUE(value.Read(source.file));
+  auto* units = static_cast<UnitScaleData*>(value.GetCustomDataType(kCustomUnitScale));
+  EXPECT_EQ(units->scale, 0.25);
+  EXPECT_EQ(units->unit, 4);
+  EXPECT_EQ(value.GetCustomDataType(kCustomGradient), nullptr);
+}
+
+TEST_F(GeDataTest, PassesOverAnOldMemoryValueAndRefusesOtherTypes)
+{
+  ByteWriter memory;
+  memory.Long(128).Memory("12345");
+  EXPECT_EQ(ReadAndWrite(memory, 13000), "0F 00 00 00 00");
+  for (Long type : {3, 7, 16, 129, 134, 256, 257, 999999, -1})
+    EXPECT_EQ(ReadAndWrite(ByteWriter().Long(type).Long(1), 13000), "failed") << type;
+  EXPECT_EQ(ReadAndWrite(ByteWriter().Long(kDataReal).Long(1), 13000), "failed");
+  EXPECT_EQ(ReadAndWrite(ByteWriter().Long(kDataLink).Memory(""), 13000), "failed");
+}
+
+TEST_F(GeDataTest, FailsOnEveryCutOfAValueWithoutReadingPastIt)
+{
+  for (const Form& form : Forms()) {
+    std::vector<std::uint8_t> bytes = WriteToMemory([&](HyperFile& file) { form.value.Write(file); }, true);
+    if (form.value.GetType() >= kDataFirstCustom)
+      bytes.pop_back(); // a raw body ends with the file
+    for (std::size_t length = 13; length < bytes.size(); ++length) {
+      MemoryReadFile source({bytes.begin(), bytes.begin() + static_cast<std::ptrdiff_t>(length)});
+      GeData value;
+      if (form.value.GetType() < kDataFirstCustom)
+        EXPECT_FALSE(value.Read(source.file)) << form.value.GetType() << " cut at " << length;
+      else
+        value.Read(source.file);
+    }
+  }
+}
+
+// Runs `action` with the first, the second, ... allocation failing, until it comes through.
+void FailEachAllocation(const std::function<bool()>& action)
+{
+  for (LLong count = 0;; ++count) {
+    counting_memory::BalanceCheck balance;
+    ASSERT_LT(count, 1000);
+    counting_memory::FailAfter(count);
+    bool done = action();
+    counting_memory::FailNever();
+    if (done)
+      break;
+  }
+}
+
+TEST_F(GeDataTest, GivesNilOrAFailureWheneverMemoryRunsOut)
+{
+  std::vector<Form> forms = Forms();
+  BaseContainer all;
+  for (const Form& form : forms)
+    all.InsertData(all.GetCount(), form.value);
+  all.InsertData(100, GeData(all));
+  const GeData whole(all);
+  const std::string expected = Written(whole);
+  std::vector<std::uint8_t> bytes = WriteToMemory([&](HyperFile& file) { whole.Write(file); }, true);
+
+  FailEachAllocation([&] {
+    GeData copy(whole);
+    const bool done = copy.GetType() != kDataNil;
+    counting_memory::FailNever();
+    return done && Written(copy) == expected;
+  });
+  FailEachAllocation([&] {
+    MemoryReadFile source(bytes);
+    GeData read;
+    const bool done = source.opened && read.Read(source.file);
+    EXPECT_TRUE(done || read.GetType() == kDataNil);
+    counting_memory::FailNever();
+    return done && Written(read) == expected;
+  });
+}
+
+} // namespace
