@@ -103,27 +103,25 @@ DateTime FromJulianDay(Real value) noexcept
 
 Bool DateTimeToTime(const DateTime& date, std::time_t& seconds) noexcept
 {
-  constexpr Long kFirstYear = kEpochOfTm - 0x7FFFFFFF; // lower ones don't fit the broken-down time
+  constexpr Long kFirstYear = kEpochOfTm - 0x7FFFFFFF; // earlier ones don't fit the broken-down time
   std::tm broken{};
-  std::time_t result = -1;
-  if (date.year >= kFirstYear) {
+  broken.tm_wday = -1; // is filled in when the C library has such a date; -1 second is a valid result
+  if (date.year >= kFirstYear && date.month > -0x7FFFFFFF) {
     broken.tm_year = date.year - kEpochOfTm;
-    broken.tm_mon = date.month > -0x7FFFFFFF ? date.month - 1 : date.month;
+    broken.tm_mon = date.month - 1;
     broken.tm_mday = date.day;
     broken.tm_hour = date.hour;
     broken.tm_min = date.minute;
     broken.tm_sec = date.second;
     broken.tm_isdst = -1;
-    // The C library fills the day of the week in exactly when it succeeds; -1 is a valid time.
-    broken.tm_wday = -1;
-    result = std::mktime(&broken);
+    std::time_t result = std::mktime(&broken);
+    if (broken.tm_wday >= 0) {
+      seconds = result;
+      return true;
+    }
   }
-  if (result == -1 && broken.tm_wday < 0) {
-    ReportBaseTime(kLineOfDateToTime, "a date has no time in the C library");
-    return false;
-  }
-  seconds = result;
-  return true;
+  ReportBaseTime(kLineOfDateToTime, "a date has no time in the C library");
+  return false;
 }
 
 Bool DateTimeFromTime(std::time_t seconds, DateTime& date) noexcept

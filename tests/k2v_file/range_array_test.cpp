@@ -1,0 +1,176 @@
+#include <limits>
+#include <random>
+#include <utility>
+#include <vector>
+
+#include <gtest/gtest.h>
+
+#include "support/counting_memory.h"
+#include "torvane/range_array.h"
+
+using namespace _torvane_;
+
+namespace
+{
+
+using Ranges = std::vector<std::pair<Long, Long>>;
+
+constexpr Long kLowest = std::numeric_limits<Long>::min();
+constexpr Long kHighest = std::numeric_limits<Long>::max();
+
+template <class Set>
+Ranges RangesOf(const Set& set)
+{
+  Ranges ranges;
+  GeRange range{};
+  for (Long n = 0; set.GetRange(n, range); ++n)
+    ranges.emplace_back(range.first, range.last);
+  EXPECT_EQ(static_cast<std::size_t>(set.GetRangeCount()), ranges.size());
+  return ranges;
+}
+
+template <class Set>
+class RangeSet : public testing::Test
+{};
+using Forms = testing::Types<GeRangeArray, GePagedRangeArray>;
+TYPED_TEST_SUITE(RangeSet, Forms, );
+
+TYPED_TEST(RangeSet, MergesAndSplitsRanges)
+{
+  counting_memory::BalanceCheck balance;
+  TypeParam set;
+  for (Long n : {1, 2, 3, 4, 9, 8, 6, 7})
+    ASSERT_TRUE(set.AddIndex(n));
+  EXPECT_EQ(RangesOf(set), (Ranges{{1, 4}, {6, 9}}));
+  EXPECT_TRUE(set.AddIndex(5));
+  EXPECT_EQ(RangesOf(set), (Ranges{{1, 9}}));
+  EXPECT_EQ(set.GetCount(), 9);
+  EXPECT_TRUE(set.AddIndex(5));
+  EXPECT_EQ(set.GetCount(), 9);
+  EXPECT_TRUE(set.RemoveIndex(5));
+  EXPECT_EQ(RangesOf(set), (Ranges{{1, 4}, {6, 9}}));
+  EXPECT_EQ(set.GetCount(), 8);
+  for (Long n : {5, 1, 4, 0, 100})
+    EXPECT_TRUE(set.RemoveIndex(n));
+  EXPECT_EQ(RangesOf(set), (Ranges{{2, 3}, {6, 9}}));
+  EXPECT_TRUE(set.SetRange(0, 999999));
+  EXPECT_EQ(RangesOf(set), (Ranges{{0, 999999}}));
+  EXPECT_EQ(set.GetCount(), 1000000);
+  EXPECT_TRUE(set.SetRange(3, 2));
+  EXPECT_EQ(RangesOf(set), Ranges());
+}
+
+TYPED_TEST(RangeSet, ReachesTheEndsOfTheNumbers)
+{
+  TypeParam set;
+  for (Long n : {kHighest, kLowest, kHighest - 1, kLowest + 1, 0})
+    ASSERT_TRUE(set.AddIndex(n));
+  EXPECT_EQ(RangesOf(set), (Ranges{{kLowest, kLowest + 1}, {0, 0}, {kHighest - 1, kHighest}}));
+  for (Long n : {kHighest, kLowest, 0})
+    EXPECT_TRUE(set.RemoveIndex(n));
+  EXPECT_EQ(RangesOf(set), (Ranges{{kLowest + 1, kLowest + 1}, {kHighest - 1, kHighest - 1}}));
+  EXPECT_TRUE(set.SetRange(kLowest, kHighest));
+  EXPECT_EQ(set.GetCount(), LLong{1} << 32);
+}
+
+// Dense phases merge and split, sparse ones fill and empty many pages.
+TYPED_TEST(RangeSet, AgreesWithAPlainBitSet)
+{
+  counting_memory::BalanceCheck balance;
+  constexpr Long kNumbers = 6000;
+  std::mt19937 random(11);
+  TypeParam set;
+  std::vector<bool> bits(kNumbers);
+  LLong total = 0;
+  for (int step = 0; step < 60000; ++step) {
+    Long n = static_cast<Long>(random() % kNumbers);
+    if (step / 12000 % 2 == 0)
+      n = n / 2 * 2; // every other number: one range each
+    const bool add = random() % 8 < (step / 6000 % 2 == 0 ? 6u : 2u);
+    const auto place = static_cast<std::size_t>(n);
+    ASSERT_EQ(set.TestIndex(n), bits[place]);
+    ASSERT_TRUE(add ? set.AddIndex(n) : set.RemoveIndex(n));
+    total += static_cast<LLong>(add) - static_cast<LLong>(bits[place]);
+    bits[place] = add;
+    ASSERT_EQ(set.GetCount(), total);
+    if (step % 997 != 0)
+      continue;
+    Ranges expected;
+    for (Long i = 0; i < kNumbers; ++i) {
+      if (!bits[static_cast<std::size_t>(i)])
+        continue;
+      if (!expected.empty() && expected.back().second == i - 1)
+        expected.back().second = i;
+      else
+        expected.emplace_back(i, i);
+    }
+    ASSERT_EQ(RangesOf(set), expected) << "after step " << step;
+  }
+}
+
+TYPED_TEST(RangeSet, StaysAsItWasWhenMemoryRunsOut)
+{
+  counting_memory::BalanceCheck balance;
+  TypeParam set;
+  counting_memory::FailAfter(0);
+  EXPECT_FALSE(set.AddIndex(3));
+  EXPECT_FALSE(set.SetRange(1, 2));
+  counting_memory::FailNever();
+  EXPECT_EQ(set.GetCount(), 0);
+  // Up to where the next range needs memory, whichever form it is.
+  for (Long n = 0; n < 512; ++n)
+    ASSERT_TRUE(set.AddIndex(3 * n));
+  ASSERT_TRUE(set.AddIndex(1));
+  ASSERT_TRUE(set.AddIndex(2)); // (0, 4) joins two ranges
+  ASSERT_TRUE(set.AddIndex(4));
+  ASSERT_TRUE(set.AddIndex(5000));
+  const Ranges before = RangesOf(set);
+  ASSERT_EQ(before.size(), 512u);
+  counting_memory::FailAfter(0);
+  EXPECT_FALSE(set.AddIndex(4000));
+  EXPECT_FALSE(set.AddIndex(6000));
+  EXPECT_FALSE(set.RemoveIndex(2));
+  EXPECT_EQ(set.GetCount(), 516);
+  EXPECT_EQ(RangesOf(set), before);
+  for (Long n = 511; n > 0; --n)
+    EXPECT_TRUE(set.RemoveIndex(3 * n)); // shrinking needs none either
+  EXPECT_TRUE(set.SetRange(7, 9));
+  counting_memory::FailNever();
+  EXPECT_EQ(RangesOf(set), (Ranges{{7, 9}}));
+}
+
+TEST(RangeArray, DoublesAndHalvesItsBlock)
+{
+  GeRangeArray set;
+  const std::pair<Long, Long> grown[] = {{1, 4}, {4, 4}, {5, 8}, {9, 16}, {17, 32}};
+  for (const auto& [ranges, capacity] : grown) {
+    for (Long n = set.GetRangeCount(); n < ranges; ++n)
+      ASSERT_TRUE(set.AddIndex(2 * n));
+    EXPECT_EQ(set.GetCapacity(), capacity);
+  }
+  const std::pair<Long, Long> shrunk[] = {{17, 32}, {16, 16}, {9, 16}, {8, 8}, {4, 4}, {0, 4}};
+  for (const auto& [ranges, capacity] : shrunk) {
+    for (Long n = set.GetRangeCount(); n > ranges; --n)
+      ASSERT_TRUE(set.RemoveIndex(2 * n - 2));
+    EXPECT_EQ(set.GetCapacity(), capacity);
+  }
+}
+
+TEST(PagedRangeArray, KeepsItsCursorOnTheRangeLastFound)
+{
+  GePagedRangeArray set;
+  for (Long n = 0; n < 1000; ++n)
+    ASSERT_TRUE(set.AddIndex(2 * n));
+  EXPECT_TRUE(set.TestIndex(2 * 700));
+  EXPECT_EQ(set.GetCursor(), 700); // pages that are filled in order are full
+  EXPECT_FALSE(set.TestIndex(2 * 700 + 1));
+  EXPECT_EQ(set.GetCursor(), 0);
+  EXPECT_TRUE(set.TestIndex(2 * 512));
+  EXPECT_EQ(set.GetCursor(), 512);
+  EXPECT_TRUE(set.RemoveIndex(0));
+  EXPECT_EQ(set.GetCursor(), 0);
+  EXPECT_TRUE(set.TestIndex(2 * 512));
+  EXPECT_EQ(set.GetCursor(), 512); // the first page has 511 ranges now
+}
+
+} // namespace

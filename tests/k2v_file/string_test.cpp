@@ -1,0 +1,372 @@
+#include <functional>
+#include <string>
+#include <utility>
+#include <vector>
+
+#include <gtest/gtest.h>
+
+#include "support/counting_memory.h"
+#include "support/text.h"
+#include "torvane/ge_string.h"
+#include "torvane/hooks.h"
+#include "torvane/memory.h"
+
+using namespace _torvane_;
+
+namespace
+{
+
+String Repeat(Long count) { return String(count, u'x'); }
+
+TEST(String, KeepsCapacityAtMultiplesOf16AndReusesTheBlock)
+{
+  counting_memory::BalanceCheck balance;
+  String text;
+  EXPECT_EQ(text.GetCapacity(), 0);
+  EXPECT_EQ(text.Data(), nullptr);
+  struct Step
+  {
+    std::function<void()> act;
+    Long length, capacity;
+  };
+  const Step steps[] = {
+      {[&] { text.FillChars(1, u'a'); }, 1, 16},    {[&] { text.FillChars(16, u'b'); }, 16, 16},
+      {[&] { text.InsertChar(16, u'c'); }, 17, 32}, {[&] { text.Append(Repeat(15)); }, 32, 32},
+      {[&] { text.Delete(3, 100); }, 3, 32},        {[&] { text.Trim(); }, 3, 16},
+      {[&] { text.FillChars(0, u'a'); }, 0, 16},    {[&] { text.Trim(); }, 0, 0},
+  };
+  for (const Step& step : steps) {
+    step.act();
+    EXPECT_EQ(text.GetLength(), step.length);
+    EXPECT_EQ(text.GetCapacity(), step.capacity);
+  }
+}
+
+TEST(String, CopiesAndMovesItsCharacters)
+{
+  counting_memory::BalanceCheck balance;
+  String first("first");
+  String copy = first;
+  String moved = std::move(copy);
+  first[0] = u'F';
+  EXPECT_EQ(Utf8(moved), "first");
+  EXPECT_EQ(Utf8(first), "First");
+  const String& self = first;
+  first = self;
+  first.Append(first);
+  EXPECT_EQ(Utf8(first), "FirstFirst");
+  first = String();
+  EXPECT_FALSE(first.Content());
+  EXPECT_EQ(first, String()); // one of them holds a block
+  const UniChar terminated[] = {u'a', u'b', 0, u'c'};
+  EXPECT_EQ(Utf8(String(terminated) + String(terminated + 3, 1)), "abc");
+  EXPECT_EQ(Units(String(terminated, 4)), std::u16string(u"ab\0c", 4));
+}
+
+TEST(String, ComparesByTheFirstDifferenceThenByTheNextCharacter)
+{
+  struct Row
+  {
+    std::u16string a, b;
+    Long compare, lexCompare, similarity;
+  };
+  const Row rows[] = {
+      {u"", u"", 0, 0, 100000},
+      {u"", u"a", -97, -65, 0},
+      {u"b", u"", 98, 66, 0},
+      {u"ab", u"a", 98, 66, 110},
+      {u"abc", u"abd", -1, -1, 219}, // 110 + 109
+      {u"aBc", u"abx", -32, 'C' - 'X', 210},
+      {u"a", u"A", 32, 0, 100},
+      {u"\u00E4\u00F6\u00FC", u"\u00C4\u00D6\u00DC", 32, 0, 300},
+      {u"\u00E9", u"\u00C9", 32, 32, 0},                   // no case beyond the three umlauts
+      {u"abcdefghijklx", u"abcdefghijkl", 'x', 'X', 1257}, // the bonus falls from 10 to 1 and stays there
+  };
+  for (const Row& row : rows) {
+    String a = FromUnits(row.a);
+    String b = FromUnits(row.b);
+    EXPECT_EQ(a.Compare(b), row.compare) << Utf8(a) << " " << Utf8(b);
+    EXPECT_EQ(b.Compare(a), -row.compare);
+    EXPECT_EQ(a.LexCompare(b), row.lexCompare) << Utf8(a) << " " << Utf8(b);
+    EXPECT_EQ(a.Similarity(b), row.similarity) << Utf8(a) << " " << Utf8(b);
+    EXPECT_EQ(a < b, row.compare < 0);
+    EXPECT_EQ(a >= b, row.compare >= 0);
+  }
+  EXPECT_EQ(String("xxabc").ComparePart("abd", 2, 2), 0);
+  EXPECT_EQ(String("xxabc").ComparePart("abd", 3, 2), 'c' - 'd');
+  EXPECT_EQ(String("xxabc").ComparePart("abc", 9, 5), -'a');
+}
+
+TEST(String, FindsTheFirstAndTheLastPlace)
+{
+  const String text("abcAbcab");
+  struct Row
+  {
+    const char* pattern;
+    Long start, first, firstUpper, last, lastUpper;
+  };
+  const Row rows[] = {
+      {"ab", 0, 0, 0, 0, 0},      {"ab", 1, 6, 3, 0, 0},   {"ab", 7, -1, -1, 6, 6}, // no longer fits: from the end
+      {"abc", 1, -1, 3, 0, 0},    {"AB", 0, -1, 0, -1, 0}, {"", 0, -1, -1, -1, -1},
+      {"ab", -2, -1, -1, -1, -1}, {"b", 8, -1, -1, 7, 7},  {"abcabcabc", 0, -1, -1, -1, -1},
+      {"bc", 5, -1, -1, 4, 4},    {"C", 3, -1, 5, -1, 2},
+  };
+  for (const Row& row : rows) {
+    using Find = Bool (String::*)(const String&, Long&, Long) const;
+    const std::pair<Find, Long> finds[] = {{&String::FindFirst, row.first},
+                                           {&String::FindFirstUpper, row.firstUpper},
+                                           {&String::FindLast, row.last},
+                                           {&String::FindLastUpper, row.lastUpper}};
+    for (const auto& [find, expected] : finds) {
+      Long at = 0;
+      EXPECT_EQ((text.*find)(row.pattern, at, row.start), expected >= 0);
+      EXPECT_EQ(at, expected) << row.pattern << " from " << row.start;
+    }
+  }
+  Long at = 0;
+  EXPECT_TRUE(text.FindLast("ab", at));
+  EXPECT_EQ(at, 6);
+  EXPECT_TRUE(text.FindLast(u'A', at));
+  EXPECT_EQ(at, 3);
+  EXPECT_TRUE(text.FindLastUpper(u'a', at));
+  EXPECT_EQ(at, 6);
+  EXPECT_TRUE(text.FindFirstUpper(u'c', at, 3));
+  EXPECT_EQ(at, 5);
+}
+
+TEST(String, EditsWithinItsBounds)
+{
+  counting_memory::BalanceCheck balance;
+  struct Row
+  {
+    std::function<void(String&)> act;
+    const char* result;
+  };
+  const Row rows[] = {
+      {[](String& s) { s.Delete(1, 2); }, "adef"},
+      {[](String& s) { s.Delete(4, 9); }, "abcd"},
+      {[](String& s) { s.Delete(-1, 2); }, "abcdef"},
+      {[](String& s) { s.Delete(6, 1); }, "abcdef"},
+      {[](String& s) { s.Delete(0, 0); }, "abcdef"},
+      {[](String& s) { s.InsertChar(0, u'x'); }, "xabcdef"},
+      {[](String& s) { s.InsertChar(7, u'x'); }, "abcdef"},
+      {[](String& s) { s.Insert(2, "XYZ"); }, "abXYZcdef"},
+      {[](String& s) { s.Insert(6, "XYZ", 1); }, "abcdefYZ"},
+      {[](String& s) { s.Insert(0, "XYZ", 0, 1); }, "XYabcdef"},
+      {[](String& s) { s.Insert(0, "XYZ", 2, 99); }, "Zabcdef"},
+      {[](String& s) { s.Insert(0, "XYZ", 2, 1); }, "abcdef"},
+      {[](String& s) { s.Insert(7, "XYZ"); }, "abcdef"},
+      {[](String& s) { s.Insert(3, s); }, "abcabcdefdef"},
+      {[](String& s) { s = s.SubStr(4, 9); }, "ef"},
+      {[](String& s) { s = s.SubStr(-1, 3); }, ""},
+      {[](String& s) { s = s.SubStr(6, 1); }, ""},
+      {[](String& s) { s[2] = s[0]; }, "abadef"},
+      {[](String& s) { s[6] = u'x'; }, "abcdef"},
+      {[](String& s) { s[-1] = u'x'; }, "abcdef"},
+      {[](String& s) { s = s.ToUpper(); }, "ABCDEF"},
+  };
+  for (const Row& row : rows) {
+    String text("abcdef");
+    row.act(text);
+    EXPECT_EQ(Utf8(text), row.result);
+  }
+  const String text("ab");
+  EXPECT_EQ(text[2], 0);
+  EXPECT_EQ(text[-5], 0);
+  EXPECT_EQ(Units(FromUnits(u"A\u00C4\u00C9\u0391[").ToLower()), u"a\u00E4\u00C9\u0391[");
+}
+
+TEST(String, PutsTheTerminatorAtTheLastPlaceOfAFullBuffer)
+{
+  UniChar buffer[4] = {9, 9, 9, 9};
+  String("abc").GetUcBlock(buffer, 2);
+  EXPECT_EQ(std::u16string(buffer, buffer + 4), u"ab\t\t");
+  String("xyz").GetUcBlockNull(buffer, 3);
+  EXPECT_EQ(std::u16string(buffer, buffer + 4), std::u16string(u"xy\0\t", 4));
+  String("q").GetUcBlockNull(buffer, 4);
+  EXPECT_EQ(std::u16string(buffer, buffer + 2), std::u16string(u"q\0", 2));
+}
+
+TEST(StringEncoding, WritesEachCharacterInTheFormOfItsEncoding)
+{
+  counting_memory::BalanceCheck balance;
+  const String text = FromUnits(u"A\u00E9\u20AC\u4E2D");
+  struct Row
+  {
+    StringEncoding encoding;
+    std::string bytes;
+  };
+  const Row rows[] = {
+      {STRINGENCODING_DEFAULT, "A\xE9\x80_"},
+      {STRINGENCODING_TABLE, "A\xE9\x80_"},
+      {STRINGENCODING_ASCII, "A___"},
+      {STRINGENCODING_ESCAPED, "A\\u00E9\\u20AC\\u4E2D"},
+      {STRINGENCODING_UTF8, "A\xC3\xA9\xE2\x82\xAC\xE4\xB8\xAD"},
+      {STRINGENCODING_XML, "A&#x00E9;&#x20AC;&#x4E2D;"},
+  };
+  for (const Row& row : rows) {
+    EXPECT_EQ(text.GetCStringLen(row.encoding), static_cast<Long>(row.bytes.size()));
+    char* copy = text.GetCStringCopy(row.encoding);
+    ASSERT_NE(copy, nullptr);
+    EXPECT_EQ(std::string(copy), row.bytes);
+    GeFree(copy);
+  }
+  EXPECT_EQ(String().GetCStringCopy(), nullptr);
+  // Characters without a place in the table: 0, an unused byte of it, and 255, which it leaves out.
+  char buffer[4];
+  FromUnits(std::u16string(u"\0\u0081\u00FF", 3)).GetCString(buffer, 4);
+  EXPECT_STREQ(buffer, "___");
+}
+
+TEST(StringEncoding, NeverWritesPastATinyBuffer)
+{
+  struct Row
+  {
+    StringEncoding encoding;
+    std::u16string text;
+    Long size;
+    std::string bytes;
+  };
+  const Row rows[] = {
+      {STRINGENCODING_UTF8, u"\u00E9", 2, ""},       {STRINGENCODING_UTF8, u"\u00E9", 3, "\xC3\xA9"},
+      {STRINGENCODING_UTF8, u"\u00E9x", 2, "x"},     {STRINGENCODING_UTF8, u"\u4E2Dab", 3, "ab"},
+      {STRINGENCODING_ESCAPED, u"\u00E9b", 3, "_b"}, {STRINGENCODING_ESCAPED, u"\u00E9b", 7, "\\u00E9"},
+      {STRINGENCODING_XML, u"\u00E9", 8, "_"},       {STRINGENCODING_XML, u"\u00E9", 9, "&#x00E9;"},
+      {STRINGENCODING_DEFAULT, u"abcd", 3, "ab"},    {STRINGENCODING_DEFAULT, u"abcd", 1, ""},
+  };
+  for (const Row& row : rows) {
+    std::vector<char> buffer(static_cast<std::size_t>(row.size)); // exact, so that an overrun is seen
+    Long written = FromUnits(row.text).GetCString(buffer.data(), row.size, row.encoding);
+    EXPECT_EQ(std::string(buffer.data()), row.bytes);
+    EXPECT_EQ(written, static_cast<Long>(row.bytes.size()));
+  }
+  char untouched = 'u';
+  EXPECT_EQ(String("a").GetCString(&untouched, 0), 0);
+  EXPECT_EQ(untouched, 'u');
+}
+
+TEST(StringEncoding, ReadsBytesAsTheEncodingTells)
+{
+  struct Row
+  {
+    StringEncoding encoding;
+    std::string bytes;
+    std::u16string text;
+  };
+  using namespace std::string_literals;
+  const Row rows[] = {
+      {STRINGENCODING_DEFAULT, "a\\", u"a\\"},
+      {STRINGENCODING_DEFAULT, "\\u12", u"\\u12"},
+      {STRINGENCODING_DEFAULT, "\\u00G9", u"\\u00G9"},
+      {STRINGENCODING_DEFAULT, "\\u00e9x", u"\u00E9x"},
+      {STRINGENCODING_DEFAULT, "\\u0000", u"_"},
+      {STRINGENCODING_TABLE, "\x80\xE9\x9F", u"\u20AC\u00E9\u0178"},
+      {STRINGENCODING_DEFAULT,
+       "\x81"
+       "A",
+       u"\u0001A"}, // no pair begins with it
+      {STRINGENCODING_DEFAULT, "A\x81", u"A_"},
+      {STRINGENCODING_DEFAULT,
+       "\xFF"
+       "A",
+       u"\u0001A"},
+      {STRINGENCODING_DEFAULT, "\0A"s, u"A"}, // a pair with the value of A
+      {STRINGENCODING_ESCAPED, "\\u20AC\xE9", u"\u20AC\u00E9"},
+      {STRINGENCODING_ESCAPED, "&#x00E9;", u"&#x00E9;"},
+      {STRINGENCODING_ASCII, "~\x7F\xE9\\u00E9", u"~__\u00E9"},
+      {STRINGENCODING_XML, "&#x00E9;&#x20AC\\u4E2D", u"\u00E9&#x20AC\u4E2D"},
+      {STRINGENCODING_XML, "&#x00E9", u"&#x00E9"},
+      {STRINGENCODING_UTF8, "A\xC3\xA9\xE4\xB8\xAD\\u00E9", u"A\u00E9\u4E2D\\u00E9"},
+      {STRINGENCODING_UTF8, "\xE2\x80\x93\xE2\x80\x94", u"\n\u2014"},
+      {STRINGENCODING_UTF8, "\xF0\x9F\x98\x80x", u"_x"},
+      {STRINGENCODING_UTF8,
+       "\xF8...."
+       "x\xFC.....x\xFE......x",
+       u"_x_x_x"},
+      {STRINGENCODING_UTF8, "\xE2\x80", u"\u00E2\u0080"}, // cut short
+      {STRINGENCODING_UTF8, "\xF0\x9F", u"\u00F0\u009F"},
+      {STRINGENCODING_UTF8, "\xC3\x28", u"\u00E8"}, // the second byte is only masked
+      {STRINGENCODING_UTF8,
+       "\xC0\x80"
+       "a\0b"s,
+       u"_a_b"},
+  };
+  for (const Row& row : rows) {
+    String text;
+    text.SetCString(row.bytes.data(), static_cast<Long>(row.bytes.size()), row.encoding);
+    EXPECT_EQ(Units(text), row.text) << row.bytes << " in " << row.encoding;
+  }
+}
+
+TEST(String, FormatsNumbers)
+{
+  EXPECT_EQ(Utf8(String::FromLong(-2147483647 - 1)), "-2147483648");
+  EXPECT_EQ(Utf8(String::FromLLong(-9223372036854775807 - 1)), "-9223372036854775808");
+  struct Row
+  {
+    Real value;
+    Long before, behind;
+    Bool exponent;
+    UniChar fill;
+    const char* text;
+  };
+  const Row rows[] = {
+      {2.5, -1, -1, false, ' ', "2.5"},    {100.0, -1, -1, false, ' ', "1"}, // zeros before the point go too
+      {0.25, -1, -1, false, ' ', "0.25"},  {-0.0, -1, -1, false, ' ', "0"},
+      {0.0, -1, -1, false, ' ', "0"},      {-0.0, -1, 0, false, ' ', "0"},
+      {-7.25, -1, 1, false, ' ', "-7.2"},  {2.5, -2, 2, false, ' ', "2.5"},
+      {2.5, 4, 2, false, '0', "0002.50"},  {-2.5, 4, 2, false, '0', "-002.50"},
+      {-2.5, 4, 1, false, '*', "-**2.5"},  {7.0, 3, 0, false, ' ', "  7"},
+      {2.5, -1, 2, true, ' ', "2.50E+00"}, {1000.0, -2, 2, true, ' ', "1E+03"},
+      {0.0, -2, 2, true, ' ', "0E+00"},    {1e40, -1, 1, false, ' ', "10000000000000000303786028427003666890752.0"},
+  };
+  for (const Row& row : rows)
+    EXPECT_EQ(Utf8(String::FromReal(row.value, row.before, row.behind, row.exponent, row.fill)), row.text);
+  EXPECT_EQ(String::FromReal(1.0, 2000000000, 2000000000).GetLength(), 20001);
+}
+
+TEST(String, StaysEmptyWhenMemoryRunsOut)
+{
+  counting_memory::BalanceCheck balance;
+  const String source(40, u's');
+  const std::vector<std::function<void(String&)>> acts = {
+      [&](String& s) { s = source; },
+      [&](String& s) { s.Append(source); },
+      [&](String& s) { s = s.Concat(source); },
+      [&](String& s) { s.InsertChar(0, u'x'); },
+      [&](String& s) { s.Insert(3, source); },
+      [&](String& s) { s.FillChars(100, u'x'); },
+      [&](String& s) { s = source.ToUpper(); },
+      [&](String& s) { EXPECT_EQ(s.SetLengthNC(17), nullptr); },
+      [&](String& s) { s = String::FromReal(1.0, 100, 0); },
+      [&](String& s) { s.SetCString("seventeen letters", 17); },
+  };
+  for (const auto& act : acts) {
+    String text(16, u't');
+    counting_memory::FailAfter(0);
+    act(text);
+    counting_memory::FailNever();
+    EXPECT_EQ(text.GetLength(), 0);
+    EXPECT_EQ(text, String());
+  }
+  String text("cut");
+  EXPECT_EQ(text.SetLengthNC(0x7FFFFFFF), nullptr); // more than any block may have
+  EXPECT_EQ(text.SetLengthNC(-1), nullptr);
+  EXPECT_NE(text.SetLengthNC(0), nullptr);
+}
+
+TEST(String, KeepsItsBlockAfterShutdown)
+{
+  counting_memory::BalanceCheck balance;
+  const void* kept = nullptr;
+  {
+    String text("static");
+    kept = text.Data();
+    String::SetShutdown(true);
+  }
+  String::SetShutdown(false);
+  void* block = const_cast<void*>(kept);
+  MemFree(&block); // still there to be freed
+}
+
+} // namespace
