@@ -6,28 +6,21 @@
 
 #include <gtest/gtest.h>
 
+#include "support/assertion_counter.h"
 #include "support/byte_writer.h"
 #include "support/counting_memory.h"
 #include "support/memory_file.h"
-#include "torvane/assertion.h"
 
 using namespace _torvane_;
 
 namespace
 {
 
-int gReports = 0;
-
 class BaseContainerTest : public testing::Test
 {
  protected:
-  BaseContainerTest() : previous_(SetAssertionLog([](const char*, Long, const char*) { ++gReports; })) { gReports = 0; }
-  ~BaseContainerTest() override { SetAssertionLog(previous_); }
-  int TakeReports() { return std::exchange(gReports, 0); }
-
- private:
   counting_memory::BalanceCheck balance_;
-  AssertionLog previous_;
+  AssertionCounter reports_;
 };
 
 // "id:value id:value ..." of Longs, walked by the iterator.
@@ -144,7 +137,7 @@ TEST_F(BaseContainerTest, TakesValuesThatLieInItself)
   container.SetContainer(5, inner);
   GeData* stored = container.FindData(5);
   EXPECT_EQ(Changes(container, [&] { EXPECT_EQ(container.SetData(5, *stored), stored); }), 0);
-  EXPECT_EQ(TakeReports(), 1);
+  EXPECT_EQ(reports_.Take(), 1);
   container.InsertData(6, *stored);
   EXPECT_EQ(container.GetContainerInstance(6)->GetString(1), String("deep"));
   container.SetContainer(6, container); // a copy of the whole inside of itself
@@ -160,7 +153,7 @@ TEST_F(BaseContainerTest, TakesValuesThatLieInItself)
   container = std::move(*container.GetContainerInstance(6));
   EXPECT_EQ(container.GetId(), 3);
   EXPECT_EQ(container.GetString(1), String("deep"));
-  EXPECT_EQ(TakeReports(), 0);
+  EXPECT_EQ(reports_.Take(), 0);
 }
 
 TEST_F(BaseContainerTest, ComparesIdOrderTypesAndValues)
@@ -192,10 +185,10 @@ TEST_F(BaseContainerTest, GivesTheDefaultOnlyForAnAbsentId)
   EXPECT_EQ(container.GetLong(2, 8), 8);
   EXPECT_EQ(container.GetVector(2, Vector(1, 2, 3)), Vector(1, 2, 3));
   EXPECT_EQ(container.GetString(2, String("d")), String("d"));
-  EXPECT_EQ(TakeReports(), 0);
+  EXPECT_EQ(reports_.Take(), 0);
   EXPECT_EQ(container.GetLong(1, 8), 0);
   EXPECT_EQ(container.GetContainerInstance(1), nullptr);
-  EXPECT_EQ(TakeReports(), 2);
+  EXPECT_EQ(reports_.Take(), 2);
   EXPECT_EQ(container.GetData(2).GetType(), kDataNil);
 }
 

@@ -5,11 +5,11 @@
 
 #include <gtest/gtest.h>
 
+#include "support/assertion_counter.h"
 #include "support/byte_writer.h"
 #include "support/counting_memory.h"
 #include "support/memory_file.h"
 #include "torvane/alias.h"
-#include "torvane/assertion.h"
 #include "torvane/base_container.h"
 
 using namespace _torvane_;
@@ -17,19 +17,11 @@ using namespace _torvane_;
 namespace
 {
 
-int gReports = 0;
-
-// Counts the reports to the assertion log, and checks that no block is left behind.
 class GeDataTest : public testing::Test
 {
  protected:
-  GeDataTest() : previous_(SetAssertionLog([](const char*, Long, const char*) { ++gReports; })) { gReports = 0; }
-  ~GeDataTest() override { SetAssertionLog(previous_); }
-  int TakeReports() { return std::exchange(gReports, 0); }
-
- private:
   counting_memory::BalanceCheck balance_;
-  AssertionLog previous_;
+  AssertionCounter reports_;
 };
 
 GeData Custom(Long type)
@@ -53,7 +45,7 @@ BaseContainer SmallContainer()
 {
   BaseContainer container(7);
   container.InsertData(1, GeData(true));
-  container.InsertData(2, GeData(static_cast<void*>(&gReports))); // left out of the file
+  container.InsertData(2, GeData(static_cast<void*>(nullptr))); // left out of the file
   return container;
 }
 
@@ -137,10 +129,10 @@ TEST_F(GeDataTest, TurnsOldTypesIntoCurrentOnesAndReportsTypesThatDoNotExist)
     EXPECT_TRUE(value.SetType(asked));
     EXPECT_EQ(value.GetType(), given);
   }
-  EXPECT_EQ(TakeReports(), 0);
+  EXPECT_EQ(reports_.Take(), 0);
   value.SetType(42);
   EXPECT_EQ(value.GetType(), 42);
-  EXPECT_EQ(TakeReports(), 1);
+  EXPECT_EQ(reports_.Take(), 1);
   EXPECT_EQ(GeData(value).GetType(), 42);
   value.SetType(kDataMatrix);
   EXPECT_EQ(value.GetMatrix(), Matrix());
@@ -159,11 +151,11 @@ TEST_F(GeDataTest, GivesANeutralValueAndReportsItWhenAskedForAnotherType)
   EXPECT_FALSE(text.GetFilename().Content());
   EXPECT_EQ(text.GetContainer(), nullptr);
   EXPECT_FALSE(GeData(1).GetString().Content());
-  EXPECT_EQ(TakeReports(), 10);
+  EXPECT_EQ(reports_.Take(), 10);
   EXPECT_EQ(GeData().GetLong(), 0);
   EXPECT_FALSE(GeData().GetString().Content());
   EXPECT_EQ(GeData(5).GetReal(), 5.0);
-  EXPECT_EQ(TakeReports(), 0);
+  EXPECT_EQ(reports_.Take(), 0);
 }
 
 TEST_F(GeDataTest, TruncatesARealTowardsZeroAndKeepsItWithinALong)
@@ -230,10 +222,10 @@ TEST_F(GeDataTest, ReportsALinkThatIsCopiedWithoutATranslation)
   link.SetLinkGoal(&goal);
   GeData source(link), copy;
   EXPECT_TRUE(copy.CopyFrom(source, 0, nullptr));
-  EXPECT_EQ(TakeReports(), 1);
+  EXPECT_EQ(reports_.Take(), 1);
   EXPECT_EQ(copy.GetAliasLink()->GetLinkGoal(), &goal);
   EXPECT_EQ(GeData(source).GetAliasLink()->GetLinkGoal(), &goal);
-  EXPECT_EQ(TakeReports(), 0);
+  EXPECT_EQ(reports_.Take(), 0);
 }
 
 // Reads one value out of a file of that version; gives what it writes back, or "failed".

@@ -18,10 +18,17 @@ class AssertionCounter
     count_ = 0;
     return count;
   }
+  // The line that the last report gave.
+  _torvane_::Long GetLastLine() const { return lastLine_; }
 
  private:
-  static void CountOne(const char*, _torvane_::Long, const char*) { ++count_; }
+  static void CountOne(const char*, _torvane_::Long line, const char*)
+  {
+    ++count_;
+    lastLine_ = line;
+  }
 
   static inline int count_ = 0;
+  static inline _torvane_::Long lastLine_ = 0;
   _torvane_::AssertionLog previous_;
 };

@@ -1,0 +1,444 @@
+#include "torvane/alias.h"
+
+#include <algorithm>
+#include <cstring>
+#include <map>
+#include <memory>
+#include <optional>
+#include <random>
+#include <vector>
+
+#include <gtest/gtest.h>
+
+#include "support/assertion_counter.h"
+#include "support/byte_writer.h"
+#include "support/counting_memory.h"
+#include "support/memory_file.h"
+#include "torvane/base_container.h"
+
+using namespace _torvane_;
+
+namespace
+{
+
+class AliasTest : public testing::Test
+{
+ protected:
+  counting_memory::BalanceCheck balance_;
+  AssertionCounter reports_;
+};
+
+// A node's address, for goals whose node nobody looks into.
+GeListNode* FakeNode(std::uintptr_t number) { return reinterpret_cast<GeListNode*>(number * 64); }
+
+std::string BytesOf(GeAliasID id)
+{
+  std::uint8_t bytes[sizeof id];
+  std::memcpy(bytes, &id, sizeof id);
+  return ToHex(bytes, sizeof bytes);
+}
+
+// "alias2" or "agoal1" with an id.
+std::string Record(std::string_view mark, GeAliasID id)
+{
+  std::string record(mark);
+  record.append(reinterpret_cast<const char*>(&id), sizeof id);
+  return record;
+}
+
+std::vector<GeAliasLink*> OwnersOf(const GeAliasGoal& goal)
+{
+  std::vector<GeAliasLink*> owners;
+  GoalIterator iterator;
+  for (void* owner = goal.FirstLinkOfGoal(iterator, 0); owner; owner = goal.NextLinkOfGoal(iterator, 0))
+    owners.push_back(static_cast<GeAliasLink*>(owner));
+  return owners;
+}
+
+TEST_F(AliasTest, FollowsItsGoalUntilThatGoes)
+{
+  GeAliasLink link;
+  EXPECT_EQ(link.GetLink(), nullptr);
+  {
+    GeAliasGoal goal(FakeNode(1)), other(FakeNode(2));
+    EXPECT_EQ(goal.GetGoalId(), 0U);
+    link.SetLinkGoal(&other);
+    link.SetLinkGoal(&goal);
+    EXPECT_EQ(link.GetLink(), FakeNode(1));
+    EXPECT_NE(goal.GetGoalId(), 0U);
+    EXPECT_EQ(other.GetGoalId(), 0U);
+    goal.resolvable = false;
+    EXPECT_EQ(link.GetLink(), nullptr);
+    EXPECT_EQ(link.GetLinkGoal(), &goal);
+  }
+  EXPECT_EQ(link.GetLink(), nullptr);
+  EXPECT_EQ(link.GetLinkGoal(), nullptr);
+  GeAliasGoal later(FakeNode(3));
+  link.SetLinkGoal(&later);
+  EXPECT_EQ(link.GetLink(), FakeNode(3));
+  link.ClearLink();
+  EXPECT_FALSE(later.HasLinks());
+}
+
+TEST_F(AliasTest, CopiesTargetAndLabelWithoutATranslation)
+{
+  GeAliasGoal goal(FakeNode(1));
+  GeAliasLink source, copy;
+  copy.SetName(String("old"));
+  source.SetLinkGoal(&goal);
+  EXPECT_TRUE(source.CopyLinkTo(&copy, nullptr));
+  EXPECT_EQ(copy.GetName(), nullptr);
+  source.SetName(String("label"));
+  GeAliasLink* clone = source.CloneLink(nullptr);
+  EXPECT_EQ(*clone->GetName(), String("label"));
+  EXPECT_TRUE(clone->IsEqual(copy));
+  EXPECT_TRUE(clone->CopyLinkTo(clone, nullptr));
+  EXPECT_EQ(clone->GetLink(), FakeNode(1));
+  DeleteObj(clone);
+  EXPECT_TRUE(source.CopyLinkTo(nullptr, nullptr));
+  GeAliasLink().CopyLinkTo(&copy, nullptr);
+  EXPECT_EQ(copy.GetLinkGoal(), nullptr);
+}
+
+TEST_F(AliasTest, WalksTheOwnersOfTheLinksInTheOrderOfTheirCreation)
+{
+  GeAliasGoal goal(FakeNode(7)), empty;
+  GeAliasLink links[3];
+  for (GeAliasLink& link : links)
+    link.SetLinkGoal(&goal);
+  links[0].SetLinkOwner(&links[0]);
+  links[2].SetLinkOwner(&links[2]);
+  std::vector<GeAliasLink*> owners = OwnersOf(goal);
+  ASSERT_EQ(owners.size(), 3U);
+  EXPECT_EQ(owners[0], &links[0]);
+  EXPECT_EQ(owners[2], &links[2]);
+  EXPECT_NE(owners[1], nullptr); // the shared empty object
+  GoalIterator iterator;
+  EXPECT_EQ(goal.FirstLinkOfGoal(iterator, 1), goal.node);
+  EXPECT_EQ(empty.FirstLinkOfGoal(iterator, 0), nullptr);
+  GeAliasGoal other(FakeNode(8));
+  GeAliasLink before;
+  before.SetLinkOwner(&before);
+  before.SetLinkGoal(&other);
+  goal.MoveLinksTo(other);
+  EXPECT_EQ(OwnersOf(other).size(), 4U);
+  EXPECT_EQ(OwnersOf(other)[0], &before);
+  EXPECT_EQ(OwnersOf(other)[3], &links[2]);
+  EXPECT_TRUE(OwnersOf(goal).empty());
+}
+
+TEST_F(AliasTest, LetsLinksAndGoalsGoWhileTheyAreWalked)
+{
+  auto goal = std::make_unique<GeAliasGoal>(FakeNode(1));
+  std::optional<GeAliasLink> links[6];
+  for (auto& link : links) {
+    link.emplace();
+    link->SetLinkOwner(&link);
+    link->SetLinkGoal(goal.get());
+  }
+  GoalIterator first, second;
+  EXPECT_EQ(goal->FirstLinkOfGoal(first, 0), &links[0]);
+  EXPECT_EQ(goal->FirstLinkOfGoal(second, 0), &links[0]);
+  links[0].reset();
+  links[1].reset(); // the next of both
+  links[2]->ClearLink();
+  EXPECT_EQ(GeAliasGoal::NextLinkOfGoal(first, 0), &links[3]);
+  links[5].reset();
+  goal.reset();
+  EXPECT_EQ(GeAliasGoal::NextLinkOfGoal(first, 0), nullptr);
+  EXPECT_EQ(GeAliasGoal::NextLinkOfGoal(second, 0), nullptr);
+}
+
+TEST_F(AliasTest, WritesIdAndLabelInOneBlock)
+{
+  GeAliasGoal goal, lonely;
+  GeAliasLink link, labelled;
+  link.SetLinkGoal(&goal);
+  labelled.SetName(String("A\xE9"));
+  EXPECT_EQ(ToHex(WriteToMemory([&](HyperFile& file) { link.WriteLink(file); })),
+            "80 00 00 00 0E 61 6C 69 61 73 32 " + BytesOf(goal.GetGoalId()));
+  EXPECT_EQ(ToHex(WriteToMemory([&](HyperFile& file) { labelled.WriteLink(file); })),
+            "80 00 00 00 14 61 6C 69 61 73 32 00 00 00 00 00 00 00 00 00 00 00 02 41 E9");
+  EXPECT_EQ(ToHex(WriteToMemory([&](HyperFile& file) { goal.WriteGoal(file); })),
+            "80 00 00 00 0E 61 67 6F 61 6C 31 " + BytesOf(goal.GetGoalId()));
+  EXPECT_EQ(ToHex(WriteToMemory([&](HyperFile& file) { lonely.WriteGoal(file); })),
+            "80 00 00 00 0E 61 67 6F 61 6C 31 00 00 00 00 00 00 00 00");
+}
+
+TEST_F(AliasTest, ReadsLinksOfEveryFormAndIgnoresForeignBlocks)
+{
+  const std::string id5 = Record("alias2", 5), large(8, '\xFF');
+  struct Case
+  {
+    std::string block;
+    bool resolves;
+    const char* name; // null for none
+  } cases[] = {
+      {id5, true, nullptr},
+      {id5 + std::string("\0\0\0\2xy", 6), true, "xy"},
+      {id5 + std::string("\0\0\0\1xy", 6), true, "x"},
+      {id5 + std::string("\0\0\0\0", 4), true, ""},
+      {id5 + std::string("\xFF\xFF\xFF\xFFxy", 6), true, "xy"},
+      {id5 + std::string("\0\0\0", 3), true, nullptr},
+      {Record("alias2", 0) + std::string("\0\0\0\2xy", 6), false, "xy"},
+      {id5.substr(0, 13), false, nullptr},
+      {Record("alias1", 5), false, nullptr},
+      {Record("agoal1", 5), false, nullptr},
+      {"x", false, nullptr},
+  };
+  for (const Case& one : cases) {
+    for (bool large139 : {false, true}) {
+      ByteWriter bytes;
+      bytes.Header();
+      if (large139)
+        bytes.U8(139).I64(static_cast<std::int64_t>(one.block.size())).Raw(one.block);
+      else
+        bytes.Memory(one.block);
+      bytes.Memory(Record("agoal1", 5));
+      MemoryReadFile source(bytes.bytes);
+      GeAliasLink link;
+      GeAliasGoal goal(FakeNode(1));
+      EXPECT_TRUE(link.ReadLink(source.file));
+      EXPECT_TRUE(goal.ReadGoal(source.file));
+      EXPECT_EQ(link.GetLink(), one.resolves ? FakeNode(1) : nullptr) << ToHex(bytes.bytes);
+      ASSERT_EQ(link.GetName() != nullptr, one.name != nullptr) << ToHex(bytes.bytes);
+      if (one.name)
+        EXPECT_EQ(*link.GetName(), String(one.name));
+    }
+  }
+  MemoryReadFile source(ByteWriter().Header().Memory("").Memory("").bytes);
+  GeAliasLink link;
+  GeAliasGoal goal;
+  EXPECT_FALSE(link.ReadLink(source.file));
+  EXPECT_FALSE(goal.ReadGoal(source.file));
+}
+
+TEST_F(AliasTest, TakesAnIdOnlyFromAGoalBlockOfExactSize)
+{
+  for (const std::string& block : {Record("agoal1", 5) + "x", Record("agoal2", 5), Record("alias2", 5)}) {
+    MemoryReadFile source(ByteWriter().Header().Memory(Record("alias2", 5)).Memory(block).bytes);
+    GeAliasLink link, old;
+    GeAliasGoal goal(FakeNode(1));
+    old.SetLinkGoal(&goal);
+    EXPECT_TRUE(link.ReadLink(source.file));
+    EXPECT_TRUE(goal.ReadGoal(source.file));
+    EXPECT_EQ(link.GetLink(), nullptr);
+    EXPECT_EQ(old.GetLink(), nullptr); // a goal that is read loses the links that it had
+  }
+}
+
+// A link in a container is stored by copy while it sits on its placeholder, and the container may be copied then too.
+TEST_F(AliasTest, ResolvesAContainersLinkThatIsReadBeforeItsGoal)
+{
+  ByteWriter bytes;
+  bytes.Header().Start(132, 1).Long(-1).Long(9).Long(133).Memory(Record("alias2", 77)).End();
+  bytes.Memory(Record("agoal1", 77));
+  GeAliasGoal goal(FakeNode(4));
+  BaseContainer container, copy;
+  {
+    MemoryReadFile source(bytes.bytes);
+    ASSERT_TRUE(source.file.ReadContainer(container, true));
+    copy = container;
+    container.InsertData(10, *container.FindData(9));
+    ASSERT_TRUE(goal.ReadGoal(source.file));
+  }
+  EXPECT_EQ(container.GetData(9).GetLink(), FakeNode(4));
+  EXPECT_EQ(container.GetData(10).GetLink(), FakeNode(4));
+  EXPECT_EQ(copy.GetData(9).GetLink(), FakeNode(4));
+  EXPECT_EQ(OwnersOf(goal).size(), 3U);
+}
+
+// Registers goals and links in random order, lets some go in between, and compares with a plain map of ids.
+TEST_F(AliasTest, ResolvesLinksAndGoalsInAnyOrder)
+{
+  for (unsigned seed = 0; seed < 40; ++seed) {
+    std::mt19937 random(seed);
+    const std::size_t ids = 1 + random() % 60;
+    std::vector<std::unique_ptr<GeAliasGoal>> goals(ids);
+    std::vector<std::unique_ptr<GeAliasLink>> links(ids * 3);
+    std::vector<std::size_t> linkId(links.size());
+    std::vector<std::size_t> order(goals.size() + links.size());
+    for (std::size_t i = 0; i < order.size(); ++i)
+      order[i] = i;
+    std::shuffle(order.begin(), order.end(), random);
+    const auto idOf = [](std::size_t number) { return GeAliasID{number * 0x100000001ULL + 1}; };
+
+    TransArray translation;
+    std::map<std::size_t, GeAliasGoal*> expected;
+    for (std::size_t entry : order) {
+      if (entry < goals.size()) {
+        if (random() % 4 == 0)
+          continue; // a goal that never comes
+        goals[entry] = std::make_unique<GeAliasGoal>(FakeNode(entry + 1));
+        EXPECT_TRUE(translation.RegisterGoal(idOf(entry), *goals[entry]));
+        expected[entry] = goals[entry].get();
+      } else {
+        const std::size_t number = entry - goals.size();
+        links[number] = std::make_unique<GeAliasLink>();
+        linkId[number] = random() % ids;
+        EXPECT_TRUE(translation.RegisterLink(idOf(linkId[number]), *links[number], nullptr));
+      }
+      if (std::unique_ptr<GeAliasLink>& victim = links[random() % links.size()]; random() % 8 == 0)
+        victim.reset();
+    }
+    translation.FinishTranslation(false);
+    EXPECT_EQ(translation.GetCount(), 0);
+    for (std::size_t number = 0; number < links.size(); ++number) {
+      if (links[number])
+        EXPECT_EQ(links[number]->GetLinkGoal(), expected[linkId[number]]) << "seed " << seed;
+    }
+    for (const auto& goal : goals) { // only real links are left on them
+      const auto pointing = std::count_if(links.begin(), links.end(), [&](const auto& link) {
+        return link && goal && link->GetLinkGoal() == goal.get();
+      });
+      EXPECT_EQ(goal ? OwnersOf(*goal).size() : 0, static_cast<std::size_t>(pointing));
+    }
+    // Everything goes in random order.
+    std::shuffle(order.begin(), order.end(), random);
+    for (std::size_t entry : order) {
+      if (entry < goals.size())
+        goals[entry].reset();
+      else
+        links[entry - goals.size()].reset();
+      for (std::size_t number = 0; number < links.size(); ++number) {
+        if (links[number] && expected[linkId[number]] && !goals[linkId[number]])
+          EXPECT_EQ(links[number]->GetLinkGoal(), nullptr);
+      }
+    }
+  }
+}
+
+TEST_F(AliasTest, KeepsACopysLinksInsideTheCopyAndTheOthersAtTheirOldTarget)
+{
+  GeAliasGoal inside(FakeNode(1)), insideCopy(FakeNode(2)), outside(FakeNode(3));
+  auto gone = std::make_unique<GeAliasGoal>(FakeNode(4));
+  GeAliasLink toInside, toOutside, toGone, toNothing, copies[4];
+  toInside.SetLinkGoal(&inside);
+  toOutside.SetLinkGoal(&outside);
+  toGone.SetLinkGoal(gone.get());
+  for (bool keep : {true, false}) {
+    AliasTranslator translator;
+    ASSERT_TRUE(translator.MakeTranslator());
+    TransArray* array = translator.GetArray();
+    EXPECT_TRUE(toInside.CopyLinkTo(&copies[0], array));
+    EXPECT_TRUE(inside.CopyGoalTo(insideCopy, array));
+    EXPECT_TRUE(toOutside.CopyLinkTo(&copies[1], array));
+    EXPECT_TRUE(toGone.CopyLinkTo(&copies[2], array));
+    EXPECT_TRUE(toNothing.CopyLinkTo(&copies[3], array));
+    EXPECT_EQ(copies[1].GetLink(), nullptr); // not yet
+    gone.reset();
+    translator.Finish(keep);
+    EXPECT_EQ(copies[0].GetLink(), FakeNode(2));
+    EXPECT_EQ(copies[1].GetLink(), keep ? FakeNode(3) : nullptr);
+    EXPECT_EQ(copies[2].GetLink(), nullptr);
+    EXPECT_EQ(copies[3].GetLink(), nullptr);
+    EXPECT_EQ(toInside.GetLink(), FakeNode(1));
+  }
+  EXPECT_TRUE(inside.CopyGoalTo(insideCopy, nullptr)); // without an array nothing happens
+  EXPECT_EQ(copies[0].GetLink(), FakeNode(2));
+}
+
+TEST_F(AliasTest, GivesLinksBackToACommonTargetInTheOrderOfTheirIds)
+{
+  GeAliasGoal target(FakeNode(9));
+  GeAliasLink links[40];
+  TransArray translation;
+  for (std::size_t i = 0; i < std::size(links); ++i) {
+    links[i].SetLinkOwner(&links[i]);
+    translation.RegisterLink(1000 - i, links[i], &target);
+  }
+  translation.FinishTranslation(true);
+  std::vector<GeAliasLink*> owners = OwnersOf(target);
+  ASSERT_EQ(owners.size(), std::size(links));
+  for (std::size_t i = 0; i < owners.size(); ++i)
+    EXPECT_EQ(owners[i], &links[owners.size() - 1 - i]);
+}
+
+TEST_F(AliasTest, ReportsARegistrationForAGoalThatHasGone)
+{
+  TransArray translation;
+  GeAliasGoal again(FakeNode(2));
+  GeAliasLink link;
+  {
+    GeAliasGoal goal(FakeNode(1));
+    EXPECT_TRUE(translation.RegisterGoal(5, goal));
+  }
+  EXPECT_TRUE(translation.RegisterLink(5, link, nullptr));
+  EXPECT_EQ(reports_.GetLastLine(), 843);
+  EXPECT_TRUE(translation.RegisterGoal(5, again));
+  EXPECT_EQ(reports_.GetLastLine(), 794);
+  EXPECT_EQ(reports_.Take(), 2);
+  EXPECT_EQ(link.GetLink(), nullptr);
+  link.SetLinkGoal(&again);
+  EXPECT_TRUE(translation.RegisterLink(0, link, nullptr));
+  EXPECT_TRUE(translation.RegisterGoal(0, again));
+  EXPECT_EQ(link.GetLink(), nullptr);
+  translation.FinishTranslation(true);
+}
+
+TEST_F(AliasTest, HandsLinksOnWhenAnIdGetsASecondGoal)
+{
+  TransArray translation;
+  GeAliasGoal first(FakeNode(1)), second(FakeNode(2));
+  GeAliasLink link;
+  translation.RegisterGoal(5, first);
+  translation.RegisterLink(5, link, nullptr);
+  translation.RegisterGoal(5, second);
+  translation.FinishTranslation(false);
+  EXPECT_EQ(link.GetLink(), FakeNode(2));
+  EXPECT_FALSE(first.HasLinks());
+}
+
+TEST_F(AliasTest, LeavesLinksEmptyOrWholeWhenMemoryRunsOut)
+{
+  for (LLong count = 0; count < 400; ++count) {
+    GeAliasGoal goals[20];
+    GeAliasLink links[20], copies[20];
+    std::vector<Bool> goalDone, linkDone;
+    {
+      TransArray translation;
+      counting_memory::FailAfter(count);
+      for (std::size_t i = 0; i < 20; ++i) {
+        if (i % 2)
+          goalDone.push_back(translation.RegisterGoal(i + 1, goals[i]));
+        linkDone.push_back(translation.RegisterLink(i + 1, links[i], nullptr));
+        if (i % 2 == 0)
+          goalDone.push_back(translation.RegisterGoal(i + 1, goals[i]));
+      }
+      translation.FinishTranslation(false);
+    }
+    for (std::size_t i = 0; i < 20; ++i) {
+      EXPECT_EQ(links[i].GetLinkGoal(), goalDone[i] && linkDone[i] ? &goals[i] : nullptr) << count;
+      EXPECT_EQ(links[i].CopyLinkTo(&copies[i], nullptr), copies[i].GetLinkGoal() == links[i].GetLinkGoal());
+    }
+    counting_memory::FailNever();
+  }
+  EXPECT_EQ(reports_.Take(), 0);
+}
+
+TEST_F(AliasTest, NeedsLittleMemoryForARegistration)
+{
+  constexpr std::size_t kCount = 20000;
+  std::vector<GeAliasGoal> goals(kCount);
+  std::vector<GeAliasLink> links(kCount);
+  std::vector<std::size_t> order(kCount);
+  for (std::size_t i = 0; i < kCount; ++i)
+    order[i] = i;
+  std::shuffle(order.begin(), order.end(), std::mt19937(1));
+  TransArray translation;
+  counting_memory::ResetPeak();
+  const counting_memory::Counts before = counting_memory::Get();
+  for (std::size_t i : order) {
+    translation.RegisterLink(order[i] + 1, links[order[i]], nullptr);
+    translation.RegisterGoal(i + 1, goals[i]);
+  }
+  const counting_memory::Counts after = counting_memory::Get();
+  // A trunk and a link's place stay; the rest is the entry, in blocks, and its slot.
+  EXPECT_LT(after.allocations - before.allocations, static_cast<LLong>(kCount) * 21 / 10);
+  EXPECT_LT(after.peakBytes - before.bytes, static_cast<LLong>(kCount) * 350);
+  translation.FinishTranslation(false);
+  for (std::size_t i = 0; i < kCount; ++i)
+    EXPECT_EQ(links[i].GetLinkGoal(), &goals[i]);
+}
+
+} // namespace
