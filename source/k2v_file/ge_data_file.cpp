@@ -118,7 +118,7 @@ Bool GeData::ReadCustom(HyperFile& file, Long type)
 
 Bool GeData::ReadUnknown(HyperFile& file, Long type, Long level)
 {
-  if (!Own(kDataUnknown, &Payload::unknown)) {
+  if (!SetType(kDataUnknown)) {
     file.SetError(FILEERROR_MEMORY);
     return false;
   }
