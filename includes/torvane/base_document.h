@@ -89,7 +89,7 @@ class DocumentPref : public GeListNode
 
  private:
   template <class Visitor>
-  void VisitBody(Visitor& visitor);
+  Bool VisitBody(Visitor& visitor);
   void BringIntoRange(BaseTime& time) const;
 
   Long fps_ = 30;
@@ -171,9 +171,9 @@ class BaseDocument : public BaseList2D
 
  private:
   template <class Visitor>
-  void VisitFileInfo(Visitor& visitor);
+  Bool VisitFileInfo(Visitor& visitor);
   template <class Visitor>
-  void VisitState(Visitor& visitor);
+  Bool VisitState(Visitor& visitor);
   Bool ReadFileInfo(HyperFile& file, Long level);
   void WriteFileInfo(HyperFile& file);
   Bool ReadState(HyperFile& file, Long level);

@@ -138,7 +138,9 @@ class BaseList2D : public GeListNode
 
  private:
   template <class Visitor>
-  void VisitHeader(Visitor& visitor);
+  Bool VisitHeader(Visitor& visitor);
+  template <class Visitor>
+  Bool VisitMarker(Visitor& visitor);
   Bool ReadUniqueIds(HyperFile& file);
   void WriteUniqueIds(HyperFile& file);
 };

@@ -36,7 +36,7 @@ class LayerObject : public BaseList4D
 
  private:
   template <class Visitor>
-  void VisitBody(Visitor& visitor);
+  Bool VisitBody(Visitor& visitor);
   Bool MakeChildList();
 
   Bool flags_[kLayerFlagCount] = {false, true, true, true, false, true, true, true, true};

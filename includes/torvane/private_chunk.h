@@ -92,6 +92,10 @@ class GeListNode : public PrivateChunk
  protected:
   GeAliasGoal goal_;
   ULong nbits_[4] = {0, 0, 0, 0};
+
+private:
+  template <class Visitor>
+  Bool VisitNodeBits(Visitor& visitor);
 };
 
 // The behaviour of a node: what is particular to its type. Owned by the node.

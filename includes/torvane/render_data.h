@@ -80,7 +80,7 @@ class BaseVideoPost : public BaseList2D
 
  private:
   template <class Visitor>
-  void VisitHead(Visitor& visitor);
+  Bool VisitHead(Visitor& visitor);
 
   BaseContainer settings_;
   Long pluginId_ = 0;

@@ -1,0 +1,257 @@
+#include "torvane/root_list.h"
+
+#include "k2v_file/chunk_visitor.h"
+#include "q7r_file/nodes/member_makers.h"
+#include "torvane/base_object.h"
+#include "torvane/base_tag.h"
+#include "torvane/layer_object.h"
+#include "torvane/render_data.h"
+
+namespace _torvane_
+{
+
+RootList2D::~RootList2D()
+{
+  FreeAll();
+  owner_ = nullptr;
+}
+
+BaseList2D* RootList2D::GetFirst() const { return static_cast<BaseList2D*>(list_.GetFirst()); }
+
+BaseList2D* RootList2D::GetLast() const { return static_cast<BaseList2D*>(list_.GetLast()); }
+
+BaseDocument* RootList2D::GetDocument() const { return owner_ ? owner_->GetDocument() : document_; }
+
+void RootList2D::Append(BaseList2D* node, Bool setListHead)
+{
+  list_.InsertLast(node);
+  if (setListHead)
+    node->SetListHead(this);
+  node->SetDocument(GetDocument());
+}
+
+Bool RootList2D::InsertFirst(BaseList2D* node) { return InsertAfter(node, nullptr); }
+
+Bool RootList2D::InsertLast(BaseList2D* node)
+{
+  if (node)
+    Append(node, true);
+  return true;
+}
+
+Bool RootList2D::InsertAfter(BaseList2D* node, BaseList2D* reference)
+{
+  if (!node)
+    return true;
+  if (reference)
+    list_.InsertAfter(node, reference);
+  else
+    list_.InsertFirst(node);
+  node->SetListHead(this);
+  node->SetDocument(GetDocument());
+  return true;
+}
+
+Bool RootList2D::InsertBefore(BaseList2D* node, BaseList2D* reference)
+{
+  return InsertAfter(node, reference ? reference->GetPrev() : nullptr);
+}
+
+void RootList2D::RemoveMember(BaseList2D* node)
+{
+  if (node)
+    node->RemoveFromList();
+}
+
+void RootList2D::FreeAll()
+{
+  while (BaseList2D* member = GetFirst()) {
+    member->Remove();
+    DeleteObj(member);
+  }
+}
+
+LLong RootList2D::GetCount() const
+{
+  LLong count = 0;
+  for (const BaseList2D* member = GetFirst(); member; member = member->GetNext())
+    ++count;
+  return count;
+}
+
+Long RootList2D::GetMemberLabel(BaseList2D& member) const { return member.GetDiskType(); }
+
+void RootList2D::WriteChunks(HyperFile& file)
+{
+  if (IsEmpty() && !IsWrittenWhenEmpty())
+    return;
+  file.WriteChunkStart(kChunkList, 0);
+  for (BaseList2D* member = GetFirst(); member; member = member->GetNext())
+    member->WriteAsChunk(file, GetMemberLabel(*member));
+  file.WriteChunkEnd();
+}
+
+Bool RootList2D::ReadChunk(HyperFile& file, Long id, Long level)
+{
+  if (PrivateChunk::ReadChunk(file, id, level))
+    return true;
+  if (id != kChunkList)
+    return false;
+  FreeAll();
+  ReadChunkLoop(file, true);
+  return true;
+}
+
+Bool RootList2D::ReadMember(HyperFile& file, BaseList2D* member, Bool setListHead)
+{
+  if (!member)
+    return false;
+  member->SetDocument(GetDocument());
+  if (!member->ReadChunkLoop(file, true)) {
+    DeleteObj(member);
+    return false;
+  }
+  Append(member, setListHead);
+  return true;
+}
+
+Bool RootList2D::CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation)
+{
+  if (flags & kCopyNoBranches)
+    return true;
+  auto& target = static_cast<RootList2D&>(destination);
+  // Members of a copied list always take their children along.
+  flags &= ~kCopyNoChildren;
+  target.FreeAll();
+  for (BaseList2D* member = GetFirst(); member; member = member->GetNext()) {
+    auto* clone = static_cast<BaseList2D*>(member->MakeClone(flags, translation));
+    if (!clone) {
+      target.FreeAll();
+      return false;
+    }
+    target.Append(clone, true);
+  }
+  return true;
+}
+
+Bool RootObject::ReadChunk(HyperFile& file, Long id, Long level)
+{
+  if (RootList2D::ReadChunk(file, id, level))
+    return true;
+  if (id == kChunkNestedList) {
+    ReadChunks(file, false);
+    return true;
+  }
+  if (id == kChunkNodeBits)
+    return file.SkipToEndChunk();
+  return ReadMember(file, AllocMember(id), true);
+}
+
+BaseObject* RootObject::AllocMember(Long type)
+{
+  switch (type) {
+  case kObjectSpline:
+  case kObjectOldSpline: {
+    BaseObject* object = AllocObject(kObjectSpline);
+    if (object)
+      object->SetObjectData(MakePointObjectData());
+    return object;
+  }
+  case kObjectGeneric:
+    return new BaseObject(kObjectGeneric);
+  case kObjectPolygonLabel:
+    return AllocObject(kObjectPolygon);
+  default:
+    return AllocObject(type);
+  }
+}
+
+Bool RootTag::ReadChunk(HyperFile& file, Long id, Long level)
+{
+  if (RootList2D::ReadChunk(file, id, level))
+    return true;
+  if (id == kChunkNodeBits)
+    return file.SkipToEndChunk();
+  BaseTag* tag = MakeTag(id);
+  if (!tag) {
+    file.SetError(FILEERROR_MEMORY);
+    return false;
+  }
+  if (!ReadMember(file, tag, false))
+    return false;
+  tag->SetObject(tagOwner_);
+  return true;
+}
+
+Bool RootMaterial::ReadChunk(HyperFile& file, Long id, Long level)
+{
+  if (RootList2D::ReadChunk(file, id, level))
+    return true;
+  if (id != kMaterialStandard && id != kMaterialPlugin)
+    return false;
+  return ReadMember(file, AllocMember(id), false);
+}
+
+BaseList2D* RootMaterial::AllocMember(Long type) { return MakeMaterial(type); }
+
+Bool RootRenderData::ReadChunk(HyperFile& file, Long id, Long level)
+{
+  if (RootList2D::ReadChunk(file, id, level))
+    return true;
+  return id == kTypeRenderData && ReadMember(file, AllocMember(), true);
+}
+
+BaseList2D* RootRenderData::AllocMember() { return AllocRenderData(); }
+
+Bool RootLayer::ReadChunk(HyperFile& file, Long id, Long level)
+{
+  if (RootList2D::ReadChunk(file, id, level))
+    return true;
+  if (id == kChunkNodeBits)
+    return file.SkipToEndChunk();
+  return id == kTypeLayer && ReadMember(file, AllocMember(), true);
+}
+
+BaseList2D* RootLayer::AllocMember() { return AllocLayer(); }
+
+Bool RootViewPanel::ReadChunk(HyperFile& file, Long id, Long level)
+{
+  if (RootList2D::ReadChunk(file, id, level))
+    return true;
+  return id == kTypeViewPanel && ReadMember(file, MakeViewPanel(), false);
+}
+
+Bool RootBaseDraw::ReadChunk(HyperFile& file, Long id, Long level)
+{
+  if (RootList2D::ReadChunk(file, id, level))
+    return true;
+  return id == kTypeBaseDraw && ReadMember(file, MakeBaseDraw(), false);
+}
+
+Bool FixedLabelRoot::ReadChunk(HyperFile& file, Long id, Long level)
+{
+  if (RootList2D::ReadChunk(file, id, level))
+    return true;
+  if (id != label_)
+    return false;
+  BaseList2D* member = makeMember_();
+  if (!member)
+    return false;
+  member->SetDocument(GetDocument());
+  // The file's sticky error stops whatever follows a member that reads badly; the member itself stays.
+  member->ReadChunkLoop(file, true);
+  Append(member, true);
+  return true;
+}
+
+RootMultipass::RootMultipass() : FixedLabelRoot(kTypeMultipass, MakeMultipass) {}
+
+RootVideoPost::RootVideoPost() : FixedLabelRoot(kTypeVideoPost, MakeVideoPost) {}
+
+RootShader::RootShader() : FixedLabelRoot(kShaderLabel, MakeEmptyShader) {}
+
+RootCTrack::RootCTrack() : FixedLabelRoot(kLabelTrack, MakeEmptyTrack) {}
+
+RootCKey::RootCKey() : FixedLabelRoot(kLabelKey, MakeEmptyKey) {}
+
+} // namespace _torvane_
