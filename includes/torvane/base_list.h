@@ -29,18 +29,16 @@ struct UniqueIDEntry
 };
 
 // The extra identifiers of a node, sorted by application id. Owns the entries' bytes.
-class UniqueIDArray : public GeTempDynSortSearchArray<UniqueIDEntry, Long>
+class UniqueIDArray : public GeTempDynSortSearchArray<UniqueIDEntry, Long, GeMemberOrder<&UniqueIDEntry::appId>>
 {
  public:
-  ~UniqueIDArray() override;
-  // The entry of an application, or null.
-  UniqueIDEntry* FindEntry(Long appId);
+  ~UniqueIDArray() override { FreeEntries(); }
+
   // Replaces or adds an entry with a copy of the bytes. False when memory is short: the entry is then gone.
   Bool SetEntry(Long appId, const void* data, LLong size);
+  // Replaces or adds an entry with a block that the array then owns; on failure the block stays the caller's.
+  Bool AdoptEntry(Long appId, void* data, LLong size);
   void FreeEntries();
-
- protected:
-  Long CompareKey(const Long& key, const UniqueIDEntry& entry) const;
 };
 
 // A node with a name, parameters, tracks, shaders and identifiers.
@@ -121,6 +119,7 @@ class BaseList2D : public GeListNode
 
  protected:
   void SetType(Long type) { type_ = type; }
+  static void SetDocumentOfMembers(RootList2D& root, BaseDocument* document);
 
   String name_;
   GeAliasLink link_;
@@ -141,6 +140,7 @@ class BaseList2D : public GeListNode
   Bool VisitHeader(Visitor& visitor);
   template <class Visitor>
   Bool VisitMarker(Visitor& visitor);
+  static Bool SkipOneChunk(HyperFile& file);
   Bool ReadUniqueIds(HyperFile& file);
   void WriteUniqueIds(HyperFile& file);
 };

@@ -44,7 +44,7 @@ Bool RootList2D::InsertAfter(BaseList2D* node, BaseList2D* reference)
   if (!node)
     return true;
   if (reference)
-    list_.InsertAfter(node, reference);
+    node->GeToolNode2D::InsertAfter(reference);
   else
     list_.InsertFirst(node);
   node->SetListHead(this);

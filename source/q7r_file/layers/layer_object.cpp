@@ -1,0 +1,100 @@
+#include "torvane/layer_object.h"
+
+#include "k2v_file/chunk_visitor.h"
+#include "q7r_file/nodes/node_tools.h"
+#include "torvane/hooks.h"
+
+namespace _torvane_
+{
+
+LayerObject::LayerObject() : BaseList4D(kTypeLayer) { MakeChildList(); }
+
+Bool LayerObject::MakeChildList()
+{
+  if (!children_)
+    children_ = AllocRootLayer();
+  if (children_)
+    children_->SetOwner(this);
+  return children_ != nullptr;
+}
+
+// The first flag stands behind the colour: it came last.
+template <class Visitor>
+Bool LayerObject::VisitBody(Visitor& v)
+{
+  for (Long i = 1; i < kLayerFlagCount; ++i)
+    v.Bool(flags_[i]);
+  v.Vector(color_);
+  if (v.Level() >= 1)
+    v.Bool(flags_[0]);
+  return v.Good();
+}
+
+void LayerObject::WriteChunks(HyperFile& file)
+{
+  BaseList4D::WriteChunks(file);
+  if (children_ && !children_->IsEmpty())
+    children_->WriteAsChunk(file, kChunkList);
+  WriteChunk(file, kChunkLayer, kLevelLayer, [this](ChunkWriter& v) { return VisitBody(v); });
+}
+
+Bool LayerObject::ReadChunk(HyperFile& file, Long id, Long level)
+{
+  if (BaseList4D::ReadChunk(file, id, level))
+    return true;
+  if (id == kChunkLayer)
+    return ReadChunkBody(file, level, [this](ChunkReader& v) { return VisitBody(v); });
+  return id == kChunkList && MakeChildList() && children_->ReadChunks(file, false);
+}
+
+Bool LayerObject::CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation)
+{
+  auto& target = static_cast<LayerObject&>(destination);
+  if (!BaseList4D::CopyTo(destination, flags, translation))
+    return false;
+  for (Long i = 0; i < kLayerFlagCount; ++i)
+    target.flags_[i] = flags_[i];
+  target.color_ = color_;
+  if ((flags & kCopyNoChildren) || !children_)
+    return true;
+  for (LayerObject* child = GetDown(); child; child = child->GetNext()) {
+    auto* clone = static_cast<LayerObject*>(child->MakeClone(flags, translation));
+    if (!clone)
+      return false;
+    if (!target.MakeChildList()) {
+      DeleteObj(clone);
+      return false;
+    }
+    clone->InsertUnderLast(&target);
+  }
+  return true;
+}
+
+Bool LayerObject::GetParameter(const ParameterPath& path, GeData& value)
+{
+  Long id = path[0].id;
+  if (id >= kLayerFirstFlag && id < kLayerFirstFlag + kLayerFlagCount) {
+    value = GeData(flags_[id - kLayerFirstFlag]);
+    return true;
+  }
+  return id == kLayerColor ? GetVectorParameter(color_, path, value) : BaseList4D::GetParameter(path, value);
+}
+
+Bool LayerObject::SetParameter(const ParameterPath& path, const GeData& value)
+{
+  Long id = path[0].id;
+  if (id >= kLayerFirstFlag && id < kLayerFirstFlag + kLayerFlagCount) {
+    flags_[id - kLayerFirstFlag] = value.GetBool();
+    return true;
+  }
+  return id == kLayerColor ? SetVectorParameter(color_, path, value) : BaseList4D::SetParameter(path, value);
+}
+
+GeListNode* LayerObject::MakeClone(ULong flags, TransArray* translation)
+{
+  return CloneNode(*this, AllocLayer(), flags, translation);
+}
+
+LayerObject* AllocLayer() { return new LayerObject; }
+
+} // namespace _torvane_

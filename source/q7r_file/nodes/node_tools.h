@@ -1,0 +1,28 @@
+// Small things that the node classes share.
+#pragma once
+
+#include "torvane/ge_data.h"
+#include "torvane/private_chunk.h"
+
+namespace _torvane_
+{
+
+// Copies `source` into `clone`, a new node of its class. A failed copy deletes the clone and gives null; so does a
+// clone that could not be made.
+template <class Node>
+Node* CloneNode(PrivateChunk& source, Node* clone, ULong flags, TransArray* translation)
+{
+  if (clone && !source.CopyWithTranslation(*clone, flags, translation))
+    DeleteObj(clone);
+  return clone;
+}
+
+// A Vector parameter as a whole, or one component by the path's second level. A component of another number does
+// nothing. Always true.
+Bool GetVectorParameter(const Vector& vector, const ParameterPath& path, GeData& value);
+Bool SetVectorParameter(Vector& vector, const ParameterPath& path, const GeData& value);
+
+// The component of a Vector that a path level names, or null for another id.
+Real* ComponentOf(Vector& vector, Long id);
+
+} // namespace _torvane_
