@@ -33,6 +33,7 @@ class RenderData : public BaseList4D
   void WriteChunks(HyperFile& file) override;
   Bool CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation) override;
   GeListNode* MakeClone(ULong flags, TransArray* translation) override;
+  void SetDocument(BaseDocument* document) override;
 
   RenderData* GetNext() const { return static_cast<RenderData*>(BaseList4D::GetNext()); }
   RenderData* GetDown() const { return static_cast<RenderData*>(BaseList4D::GetDown()); }
