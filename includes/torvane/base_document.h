@@ -7,6 +7,7 @@
 #include "torvane/bitmap.h"
 #include "torvane/file_errors.h"
 #include "torvane/filename.h"
+#include "torvane/hyper_file.h"
 #include "torvane/layer_object.h"
 #include "torvane/render_data.h"
 
@@ -162,23 +163,25 @@ class BaseDocument : public BaseList2D
   Long GetActiveTool() const { return tool_; }
   // The version of the file that the document came from; the current one for a new document.
   Long GetLoadedVersion() const { return loadedVersion_; }
+  void SetLoadedVersion(Long version) { loadedVersion_ = version; }
   void SetDirectory(const Filename& directory) { directory_ = directory; }
   void SetFileName(const Filename& name) { fileName_ = name; }
   BaseContainer& GetSettings(Long index) { return settings_[index]; } // 0 to 5
 
-  // Writes the creating program and the present date into the container.
-  void StampCreation();
-
  private:
   template <class Visitor>
-  Bool VisitFileInfo(Visitor& visitor);
+  Bool VisitFileInfo(Visitor& visitor, Bool& hasPreview);
   template <class Visitor>
   Bool VisitState(Visitor& visitor);
+  template <class Visitor>
+  Bool VisitOldSettings(Visitor& visitor);
+  template <class Visitor>
+  Bool VisitEmptyNode(Visitor& visitor);
+  template <class Visitor>
+  Bool VisitNewerState(Visitor& visitor);
   Bool ReadFileInfo(HyperFile& file, Long level);
   void WriteFileInfo(HyperFile& file);
-  Bool ReadState(HyperFile& file, Long level);
   Bool ReadRoot(HyperFile& file, RootList2D* root, Bool wanted);
-  void StampWriter();
   void SetContainerDefaults();
   Bool GetOwnParameter(Long id, GeData& value) const;
   Bool GetBackColor(const ParameterPath& path, GeData& value) const;
@@ -210,9 +213,7 @@ class BaseDocument : public BaseList2D
   BaseContainer settings_[kSettingsCount];
   Long viewNumber_ = 1;
   Bool viewFlags_[kViewFlagCount] = {false, false, true, false, true, false, false, false, false, false, false, false};
-  Long loadedVersion_ = kCurrentDocumentVersion;
-
-  static constexpr Long kCurrentDocumentVersion = 13000;
+  Long loadedVersion_ = kCurrentFileVersion;
 };
 
 // A new document with its creation information; null when memory is short. The caller owns it.
@@ -225,8 +226,8 @@ BaseDocument* LoadDocument(const Filename& name, Long loadFlags, FileProblem* pr
 // cut short, which `problem` tells (its code is 0 after a whole write). The flags have no effect.
 Bool SaveDocument(BaseDocument* document, const Filename& name, Long flags, FileProblem* problem = nullptr);
 
-// Loads a file and moves its nodes behind those of `target`: materials and objects as the flags ask, render settings
-// and layers always. False for a null target or a failed load.
+// Loads a file and moves its nodes to the top of the lists of `target`, in their order: materials and objects as the
+// flags ask, render settings and layers always. False for a null target or a failed load.
 Bool MergeDocument(BaseDocument* target, const Filename& name, Long loadFlags, FileProblem* problem = nullptr);
 
 } // namespace _torvane_

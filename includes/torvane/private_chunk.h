@@ -93,7 +93,7 @@ class GeListNode : public PrivateChunk
   GeAliasGoal goal_;
   ULong nbits_[4] = {0, 0, 0, 0};
 
-private:
+ private:
   template <class Visitor>
   Bool VisitNodeBits(Visitor& visitor);
 };

@@ -290,10 +290,7 @@ void BaseList4D::SetDocument(BaseDocument* document)
     SetDocumentOfMembers(*children_, document);
 }
 
-BaseList4D* BaseList4D::GetUp() const
-{
-  return listHead_ ? static_cast<BaseList4D*>(listHead_->GetOwner()) : nullptr;
-}
+BaseList4D* BaseList4D::GetUp() const { return listHead_ ? static_cast<BaseList4D*>(listHead_->GetOwner()) : nullptr; }
 
 BaseList4D* BaseList4D::GetDown() const
 {

@@ -113,10 +113,7 @@ GeData ValueOf(const Setting& setting)
 }
 
 // The key of a dynamic parameter's path, or 0 for any other path.
-Long KeyOf(const ParameterPath& path)
-{
-  return path[0].Matches({kDynamicParameters, kDataGroup, 0}) ? path[1].id : 0;
-}
+Long KeyOf(const ParameterPath& path) { return path[0].Matches({kDynamicParameters, kDataGroup, 0}) ? path[1].id : 0; }
 
 } // namespace
 

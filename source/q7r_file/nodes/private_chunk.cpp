@@ -24,7 +24,7 @@ Bool EndsPartialLoad(const HyperFile& file, Long id, Long level)
 // Holds one level of nested reading open.
 class LoopScope
 {
-public:
+ public:
   explicit LoopScope(HyperFile& file) : file_(file), entered_(file.EnterLoop()) {}
   ~LoopScope()
   {
@@ -36,7 +36,7 @@ public:
 
   Bool Entered() const { return entered_; }
 
-private:
+ private:
   HyperFile& file_;
   Bool entered_;
 };

@@ -103,8 +103,7 @@ Bool MultipassObject::ReadChunk(HyperFile& file, Long id, Long level)
 Bool MultipassObject::CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation)
 {
   auto& target = static_cast<MultipassObject&>(destination);
-  return BaseList4D::CopyTo(destination, flags, translation) &&
-         settings_.CopyTo(target.settings_, flags, translation);
+  return BaseList4D::CopyTo(destination, flags, translation) && settings_.CopyTo(target.settings_, flags, translation);
 }
 
 GeListNode* MultipassObject::MakeClone(ULong flags, TransArray* translation)
@@ -156,8 +155,7 @@ Bool BaseVideoPost::CopyTo(PrivateChunk& destination, ULong flags, TransArray* t
 {
   auto& target = static_cast<BaseVideoPost&>(destination);
   target.pluginId_ = pluginId_;
-  return BaseList2D::CopyTo(destination, flags, translation) &&
-         settings_.CopyTo(target.settings_, flags, translation);
+  return BaseList2D::CopyTo(destination, flags, translation) && settings_.CopyTo(target.settings_, flags, translation);
 }
 
 GeListNode* BaseVideoPost::MakeClone(ULong flags, TransArray* translation)

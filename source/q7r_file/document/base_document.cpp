@@ -1,0 +1,348 @@
+#include "torvane/base_document.h"
+
+#include "q7r_file/document/document_info.h"
+#include "q7r_file/nodes/node_tools.h"
+#include "torvane/base_material.h"
+#include "torvane/custom_data.h"
+#include "torvane/hooks.h"
+
+namespace _torvane_
+{
+
+namespace
+{
+
+enum class Form
+{
+  kBool,
+  kLong,
+  kReal,
+  kVector,
+  kUnitScale, // one unit of kind 3
+};
+
+struct Default
+{
+  Long id;
+  Form form;
+  Real number;
+};
+
+constexpr Vector kDefaultBackColor(0.35, 0.38, 0.41);
+constexpr Vector kPlainBackColor(0.8, 0.8, 0.8);
+constexpr Long kBackColorMode = 2113; // 0 plain, 1 default
+
+constexpr Default kContainerDefaults[] = {
+    {10001, Form::kLong, 0},  {2101, Form::kLong, 0},   {2102, Form::kBool, 1},  {2117, Form::kUnitScale, 0},
+    {2113, Form::kLong, 1},   {2112, Form::kVector, 0}, {2114, Form::kLong, 1},  {2115, Form::kReal, 1.0},
+    {2116, Form::kReal, 1e5}, {50006, Form::kLong, 0},  {50008, Form::kBool, 0}, {465001520, Form::kLong, 0},
+};
+
+constexpr Default kSettingsDefaults[] = {
+    {10014, Form::kBool, 1},  {10015, Form::kBool, 1},   {10016, Form::kBool, 1}, {10018, Form::kBool, 1},
+    {10019, Form::kBool, 0},  {10020, Form::kBool, 0},   {10051, Form::kLong, 0}, {10052, Form::kBool, 1},
+    {10046, Form::kBool, 1},  {10034, Form::kLong, 1},   {10035, Form::kBool, 1}, {10036, Form::kBool, 1},
+    {10037, Form::kLong, -1}, {10039, Form::kReal, 0.0},
+};
+
+GeData ValueOf(const Default& row)
+{
+  switch (row.form) {
+  case Form::kBool:
+    return GeData(row.number != 0.0);
+  case Form::kLong:
+    return GeData(static_cast<Long>(row.number));
+  case Form::kReal:
+    return GeData(row.number);
+  case Form::kVector:
+    return GeData(kDefaultBackColor);
+  case Form::kUnitScale:
+    break;
+  }
+  GeData scale;
+  scale.SetType(kCustomUnitScale); // a new one has scale 1 and unit 3
+  return scale;
+}
+
+constexpr Long kFirstDocumentBit = 18;
+constexpr Long kLastDocumentBit = 21;
+
+// The tools that have a row of axis locks of their own, in order; the last row serves all others.
+constexpr Long kToolOfRow[] = {200000088, 200000089, 200000090};
+
+constexpr ULong kActiveRenderData = 2; // info bit
+
+} // namespace
+
+BaseDocument::BaseDocument()
+    : BaseList2D(kTypeDocument),
+      objects_(AllocRootObject()),
+      materials_(AllocRootMaterial()),
+      layers_(AllocRootLayer()),
+      renderData_(AllocRootRenderData()),
+      viewPanels_(new RootViewPanel)
+{
+  for (RootList2D* root :
+       {static_cast<RootList2D*>(objects_), static_cast<RootList2D*>(materials_), static_cast<RootList2D*>(layers_),
+        static_cast<RootList2D*>(renderData_), static_cast<RootList2D*>(viewPanels_)}) {
+    if (root)
+      root->SetDocument(this);
+  }
+  if (renderData_)
+    renderData_->InsertFirst(renderData_->AllocMember());
+  for (auto& row : axisLocks_) {
+    for (Long axis = 0; axis < 4; ++axis)
+      row[axis] = axis < 3;
+  }
+  SetContainerDefaults();
+  for (Long bit = kFirstDocumentBit; bit <= kLastDocumentBit; ++bit)
+    GeListNode::ChangeNBit(bit, 1);
+}
+
+BaseDocument::~BaseDocument()
+{
+  DeleteObj(viewPanels_);
+  DeleteObj(objects_);
+  DeleteObj(materials_);
+  DeleteObj(layers_);
+  DeleteObj(renderData_);
+}
+
+void BaseDocument::SetContainerDefaults()
+{
+  for (const Default& row : kContainerDefaults)
+    data_.InsertData(row.id, ValueOf(row));
+  for (const Default& row : kSettingsDefaults)
+    settings_[0].InsertData(row.id, ValueOf(row));
+}
+
+BaseDocument* BaseDocument::Alloc()
+{
+  auto* document = new BaseDocument;
+  if (document && !document->IsComplete())
+    DeleteObj(document);
+  return document;
+}
+
+Bool BaseDocument::IsComplete() const { return objects_ && materials_ && layers_ && renderData_ && viewPanels_; }
+
+BaseObject* BaseDocument::GetFirstObject() const
+{
+  return objects_ ? static_cast<BaseObject*>(objects_->GetFirst()) : nullptr;
+}
+
+BaseMaterial* BaseDocument::GetFirstMaterial() const
+{
+  return materials_ ? static_cast<BaseMaterial*>(materials_->GetFirst()) : nullptr;
+}
+
+LayerObject* BaseDocument::GetFirstLayer() const
+{
+  return layers_ ? static_cast<LayerObject*>(layers_->GetFirst()) : nullptr;
+}
+
+RenderData* BaseDocument::GetFirstRenderData() const
+{
+  return renderData_ ? static_cast<RenderData*>(renderData_->GetFirst()) : nullptr;
+}
+
+RenderData* BaseDocument::GetActiveRenderData() const
+{
+  for (RenderData* data = GetFirstRenderData(); data; data = data->GetNext()) {
+    if (data->GetBit(kActiveRenderData))
+      return data;
+  }
+  return GetFirstRenderData();
+}
+
+void BaseDocument::InsertObject(BaseObject* object, BaseObject* after) { objects_->InsertAfter(object, after); }
+
+void BaseDocument::InsertMaterial(BaseMaterial* material, BaseMaterial* after)
+{
+  materials_->InsertAfter(material, after);
+}
+
+void BaseDocument::InsertLayer(LayerObject* layer, LayerObject* after) { layers_->InsertAfter(layer, after); }
+
+void BaseDocument::InsertRenderData(RenderData* renderData, RenderData* after)
+{
+  renderData_->InsertAfter(renderData, after);
+}
+
+Long BaseDocument::AxisLockRow() const
+{
+  Long row = 0;
+  while (row < kAxisRows - 1 && kToolOfRow[row] != tool_)
+    ++row;
+  return row;
+}
+
+Bool BaseDocument::GetParameter(const ParameterPath& path, GeData& value)
+{
+  Long id = path[0].id;
+  if (id == kDocumentBackColor && GetBackColor(path, value))
+    return true;
+  return GetOwnParameter(id, value) || BaseList2D::GetParameter(path, value);
+}
+
+Bool BaseDocument::GetBackColor(const ParameterPath& path, GeData& value) const
+{
+  switch (data_.GetLong(kBackColorMode)) {
+  case 0:
+    return GetVectorParameter(kPlainBackColor, path, value);
+  case 1:
+    return GetVectorParameter(kDefaultBackColor, path, value);
+  default:
+    return false;
+  }
+}
+
+Bool BaseDocument::GetOwnParameter(Long id, GeData& value) const
+{
+  if (id >= kDocumentPrefFirstBool && id < kDocumentPrefFirstBool + 4) {
+    value = GeData(pref_.GetBool(id - kDocumentPrefFirstBool));
+    return true;
+  }
+  if (id >= kDocumentFirstAxisLock && id < kDocumentFirstAxisLock + 4) {
+    value = GeData(axisLocks_[AxisLockRow()][id - kDocumentFirstAxisLock]);
+    return true;
+  }
+  switch (id) {
+  case kDocumentTime:
+    value = GeData(time_);
+    return true;
+  case kDocumentFps:
+    value = GeData(pref_.GetFps());
+    return true;
+  case kDocumentMinTime:
+    value = GeData(pref_.GetMinTime());
+    return true;
+  case kDocumentMaxTime:
+    value = GeData(pref_.GetMaxTime());
+    return true;
+  case kDocumentLoopMin:
+    value = GeData(pref_.GetLoopMin());
+    return true;
+  case kDocumentLoopMax:
+    value = GeData(pref_.GetLoopMax());
+    return true;
+  case kDocumentPrefReal:
+    value = GeData(pref_.GetReal());
+    return true;
+  case kDocumentPrefLastBool:
+    value = GeData(pref_.GetLastBool());
+    return true;
+  case kDocumentPath:
+    value = GeData(directory_);
+    return true;
+  case kDocumentFile:
+    value = GeData(fileName_);
+    return true;
+  case kDocumentMode:
+    value = GeData(mode_);
+    return true;
+  case kDocumentTool:
+    value = GeData(tool_);
+    return true;
+  case kDocumentInverseSwitch:
+    value = GeData(!data_.GetBool(kSwitchedOff));
+    return true;
+  default:
+    return GetInfoText(data_, id, value);
+  }
+}
+
+Bool BaseDocument::SetParameter(const ParameterPath& path, const GeData& value)
+{
+  Long id = path[0].id;
+  if (id >= kDocumentPrefFirstBool && id < kDocumentPrefFirstBool + 4) {
+    pref_.SetBool(id - kDocumentPrefFirstBool, value.GetBool());
+    return true;
+  }
+  if (id >= kDocumentFirstAxisLock && id < kDocumentFirstAxisLock + 4) {
+    axisLocks_[AxisLockRow()][id - kDocumentFirstAxisLock] = value.GetBool();
+    return true;
+  }
+  switch (id) {
+  case kDocumentTime:
+    time_ = value.GetTime();
+    return true;
+  case kDocumentFps:
+    pref_.SetFps(value.GetLong());
+    return true;
+  case kDocumentMinTime:
+    pref_.SetMinTime(value.GetTime());
+    return true;
+  case kDocumentMaxTime:
+    pref_.SetMaxTime(value.GetTime());
+    return true;
+  case kDocumentLoopMin:
+    pref_.SetLoopMin(value.GetTime());
+    return true;
+  case kDocumentLoopMax:
+    pref_.SetLoopMax(value.GetTime());
+    return true;
+  case kDocumentPrefReal:
+    pref_.SetReal(value.GetReal());
+    return true;
+  case kDocumentPrefLastBool:
+    pref_.SetLastBool(value.GetBool());
+    return true;
+  case kDocumentPath:
+    directory_ = value.GetFilename();
+    return true;
+  case kDocumentFile:
+    fileName_ = value.GetFilename();
+    return true;
+  case kDocumentMode:
+    mode_ = value.GetLong();
+    return true;
+  case kDocumentTool:
+    tool_ = value.GetLong();
+    return true;
+  case kDocumentInverseSwitch:
+    data_.SetBool(kSwitchedOff, !value.GetBool());
+    return true;
+  default:
+    return !IsInfoText(id) && BaseList2D::SetParameter(path, value);
+  }
+}
+
+Bool BaseDocument::CopyTo(PrivateChunk& destination, ULong flags, TransArray*)
+{
+  auto& target = static_cast<BaseDocument&>(destination);
+  AliasTranslator translator;
+  if (!translator.MakeTranslator() || !BaseList2D::CopyTo(destination, flags, translator.GetArray()))
+    return false;
+  target.fileName_ = fileName_;
+  pref_.CopyTo(target.pref_, flags, translator.GetArray());
+  target.time_ = time_;
+  target.mode_ = mode_;
+  target.tool_ = tool_;
+  Bool copied = preview_.CopyTo(target.preview_);
+  for (Long i = 0; i < kSettingsCount && copied; ++i)
+    copied = settings_[i].CopyTo(target.settings_[i], flags, translator.GetArray());
+  if (!copied || !CopyRoots(target, flags, translator.GetArray())) {
+    target.materials_->FreeAll();
+    target.objects_->FreeAll();
+    target.layers_->FreeAll();
+    return false;
+  }
+  translator.Finish(true);
+  return true;
+}
+
+Bool BaseDocument::CopyRoots(BaseDocument& target, ULong flags, TransArray* translation)
+{
+  return renderData_->CopyTo(*target.renderData_, flags, translation) &&
+         viewPanels_->CopyTo(*target.viewPanels_, flags, translation) &&
+         materials_->CopyTo(*target.materials_, flags, translation) &&
+         objects_->CopyTo(*target.objects_, flags, translation) && layers_->CopyTo(*target.layers_, flags, translation);
+}
+
+GeListNode* BaseDocument::MakeClone(ULong flags, TransArray* translation)
+{
+  return CloneNode(*this, Alloc(), flags, translation);
+}
+
+} // namespace _torvane_

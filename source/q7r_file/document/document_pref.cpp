@@ -1,0 +1,119 @@
+#include "k2v_file/chunk_visitor.h"
+#include "torvane/base_document.h"
+
+namespace _torvane_
+{
+
+namespace
+{
+
+constexpr Long kMinFps = 1;
+constexpr Long kMaxFps = 1000;
+constexpr Long kLongDefaultFps = 30; // the rate at which a new document is three seconds long, not four
+
+const BaseTime& EarliestTime()
+{
+  static const BaseTime time(-600.0, 1.0);
+  return time;
+}
+
+} // namespace
+
+DocumentPref::DocumentPref()
+{
+  maxTime_ = BaseTime(fps_ == kLongDefaultFps ? 3.0 : 4.0, 1.0);
+  loopMin_ = minTime_;
+  loopMax_ = maxTime_;
+}
+
+template <class Visitor>
+Bool DocumentPref::VisitBody(Visitor& v)
+{
+  v.ConstantLong(0);
+  v.Long(fps_);
+  v.Time(minTime_);
+  v.Time(maxTime_);
+  v.Time(loopMin_);
+  v.Time(loopMax_);
+  for (Bool& flag : bools_)
+    v.Bool(flag);
+  if (v.Level() >= 1)
+    v.Real(real_);
+  if (v.Level() >= 2)
+    v.Bool(lastBool_);
+  if (v.Level() >= 3)
+    v.ConstantBool(false);
+  if (v.Level() >= 4)
+    v.ConstantBool(false);
+  return v.Good();
+}
+
+void DocumentPref::WriteChunks(HyperFile& file)
+{
+  WriteChunk(file, kChunkDocumentPref, kLevelDocumentPref, [this](ChunkWriter& v) { return VisitBody(v); });
+}
+
+Bool DocumentPref::ReadChunk(HyperFile& file, Long id, Long level)
+{
+  if (id != kChunkDocumentPref)
+    return false;
+  Bool read = ReadChunkBody(file, level, [this](ChunkReader& v) { return VisitBody(v); });
+  if (minTime_ < EarliestTime())
+    minTime_ = EarliestTime();
+  return read;
+}
+
+Bool DocumentPref::CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation)
+{
+  auto& target = static_cast<DocumentPref&>(destination);
+  target.fps_ = fps_;
+  target.minTime_ = minTime_;
+  target.maxTime_ = maxTime_;
+  target.loopMin_ = loopMin_;
+  target.loopMax_ = loopMax_;
+  for (Long i = 0; i < 4; ++i)
+    target.bools_[i] = bools_[i];
+  target.real_ = real_;
+  target.lastBool_ = lastBool_;
+  return GeListNode::CopyTo(destination, flags, translation);
+}
+
+void DocumentPref::SetFps(Long fps) { fps_ = fps < kMinFps ? kMinFps : fps > kMaxFps ? kMaxFps : fps; }
+
+void DocumentPref::BringIntoRange(BaseTime& time) const
+{
+  if (time < minTime_)
+    time = minTime_;
+  else if (time > maxTime_)
+    time = maxTime_;
+}
+
+void DocumentPref::SetMinTime(const BaseTime& time)
+{
+  minTime_ = time < EarliestTime() ? EarliestTime() : time;
+  if (maxTime_ < minTime_)
+    maxTime_ = minTime_;
+  BringIntoRange(loopMin_);
+  BringIntoRange(loopMax_);
+}
+
+void DocumentPref::SetMaxTime(const BaseTime& time)
+{
+  maxTime_ = time < minTime_ ? minTime_ : time;
+  BringIntoRange(loopMin_);
+  BringIntoRange(loopMax_);
+}
+
+void DocumentPref::SetLoopMin(const BaseTime& time)
+{
+  loopMin_ = time;
+  BringIntoRange(loopMin_);
+}
+
+void DocumentPref::SetLoopMax(const BaseTime& time)
+{
+  loopMax_ = time;
+  BringIntoRange(loopMax_);
+}
+
+} // namespace _torvane_
