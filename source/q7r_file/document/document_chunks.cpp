@@ -51,6 +51,7 @@ Long CurrentTool(Long tool)
 }
 
 constexpr Long kRequiredVersion = 12600;
+constexpr Long kImageFormatJpeg = 1104;
 
 } // namespace
 
@@ -78,9 +79,9 @@ Bool BaseDocument::VisitFileInfo(Visitor& v, Bool& hasPreview)
 void BaseDocument::WriteFileInfo(HyperFile& file)
 {
   WriteChunk(file, kChunkFileInfo, kLevelFileInfo, [this](ChunkWriter& v) {
-    Bool hasPreview = preview_.GetWidth() >= 1;
+    Bool hasPreview = preview_.GetBw() >= 1 || preview_.GetEncodedSize() > 0;
     VisitFileInfo(v, hasPreview);
-    return !hasPreview || v.Note(v.Good() && v.File().WriteImage(&preview_, kBitmapJpeg, nullptr, 0));
+    return !hasPreview || v.Note(v.Good() && v.File().WriteImage(&preview_, kImageFormatJpeg, nullptr, 0));
   });
 }
 
@@ -93,10 +94,6 @@ Bool BaseDocument::ReadFileInfo(HyperFile& file, Long level)
   if (hasPreview) {
     if (!file.ReadImage(preview_))
       return false;
-    if (preview_.Decode(kBitmapJpeg, kBitmapNoFrame) != kImageOk) {
-      file.SetError(FILEERROR_WRONG_VALUE);
-      return false;
-    }
   }
   // Whoever only wants the picture need not read another byte.
   return (loadFlags_ & LoadPreviewOnly) || file.SkipToEndChunk();

@@ -22,6 +22,10 @@ Node* CloneNode(PrivateChunk& source, Node* clone, ULong flags, TransArray* tran
 Bool GetVectorParameter(const Vector& vector, const ParameterPath& path, GeData& value);
 Bool SetVectorParameter(Vector& vector, const ParameterPath& path, const GeData& value);
 
+// Reads what a chunk holds for `inner`: nothing (an end tag alone) or one chunk, which is handed to its ReadChunk; then
+// passes over the rest. Any other value there is FILEERROR_WRONG_VALUE.
+Bool ReadInnerChunk(HyperFile& file, PrivateChunk& inner);
+
 // The component of a Vector that a path level names, or null for another id.
 Real* ComponentOf(Vector& vector, Long id);
 
