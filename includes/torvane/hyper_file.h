@@ -198,6 +198,8 @@ class HyperFile : public GeMemory
   Bool ReadFilename(Filename& value);
   // A new block that the caller owns and its size; size 0 gives a null block and true.
   Bool ReadMemory(void*& data, LLong& size);
+  // The first `capacity` bytes of a Memory value into a buffer; `size` is the value's whole size.
+  Bool ReadMemoryInto(void* buffer, LLong capacity, LLong& size);
 
   // Writes the picture's encoded bytes if it keeps any, else saves it in the saver format `format` (see bitmap.h);
   // null and an empty picture write length 0. A saver that fails leaves the value without a length: the file is then

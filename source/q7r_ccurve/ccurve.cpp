@@ -1,0 +1,157 @@
+#include "torvane/ccurve.h"
+
+#include "k2v_file/chunk_visitor.h"
+#include "q7r_file/nodes/node_tools.h"
+#include "torvane/animation_ids.h"
+
+namespace _torvane_
+{
+
+namespace
+{
+
+constexpr Real kKeyTimeLimit = 10000.0; // seconds, either way
+
+Bool IsKeyTime(const BaseTime& time)
+{
+  return time.Compare(BaseTime::Raw(-kKeyTimeLimit, 1.0)) >= 0 && time.Compare(BaseTime::Raw(kKeyTimeLimit, 1.0)) <= 0;
+}
+
+} // namespace
+
+void CCurve::WriteChunks(HyperFile& file)
+{
+  BaseList2D::WriteChunks(file);
+  if (keys_.GetCount() > 0)
+    keyRoot_.WriteAsChunk(file, kChunkKeys);
+}
+
+Bool CCurve::ReadChunk(HyperFile& file, Long id, Long level)
+{
+  if (BaseList2D::ReadChunk(file, id, level))
+    return true;
+  if (id != kChunkKeys)
+    return false;
+  keys_.Reset();
+  return ReadInnerChunk(file, keyRoot_) && RebuildIndex();
+}
+
+Bool CCurve::CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation)
+{
+  auto& target = static_cast<CCurve&>(destination);
+  target.keys_.Reset();
+  return BaseList2D::CopyTo(destination, flags, translation) &&
+         keyRoot_.CopyTo(target.keyRoot_, flags, translation) && target.RebuildIndex();
+}
+
+GeListNode* CCurve::MakeClone(ULong flags, TransArray* translation)
+{
+  return CloneNode(*this, new CCurve, flags, translation);
+}
+
+// Keys beyond the range of times stay in the list, but not in the index.
+Bool CCurve::RebuildIndex()
+{
+  keys_.Reset();
+  for (auto* key = static_cast<CKey*>(keyRoot_.GetFirst()); key; key = key->GetNext()) {
+    if (IsKeyTime(key->GetTime()) && !keys_.Append(key))
+      return false;
+  }
+  return true;
+}
+
+CKey* CCurve::AddKey(const BaseTime& time, Long* index)
+{
+  if (index)
+    *index = -1;
+  if (!IsKeyTime(time))
+    return nullptr;
+  auto* key = new CKey;
+  if (!key)
+    return nullptr;
+  key->SetTime(time);
+  CKey* kept = InsertKey(key, index);
+  if (kept != key)
+    DeleteObj(key);
+  return kept;
+}
+
+CKey* CCurve::InsertKey(CKey* key, Long* index)
+{
+  Long place = PlaceOf(key->GetTime());
+  CKey* present = GetKey(place);
+  if (present && present->GetTime() == key->GetTime()) {
+    present->Reset();
+    if (index)
+      *index = place;
+    return present;
+  }
+  if (!keys_.Insert(place, key)) {
+    if (index)
+      *index = -1;
+    return nullptr;
+  }
+  keyRoot_.InsertAfter(key, GetKey(place - 1));
+  if (index)
+    *index = place;
+  return key;
+}
+
+// The index of the first key that isn't before `time`. Keys mostly come in order, so the ends are looked at first.
+Long CCurve::PlaceOf(const BaseTime& time) const
+{
+  Long low = 0;
+  Long high = keys_.GetCount();
+  if (high == 0 || GetKey(high - 1)->GetTime() < time)
+    return high;
+  if (GetKey(0)->GetTime() >= time)
+    return 0;
+  while (low < high) {
+    Long middle = low + (high - low) / 2;
+    if (GetKey(middle)->GetTime() < time)
+      low = middle + 1;
+    else
+      high = middle;
+  }
+  return low;
+}
+
+CKey* CCurve::FindKey(const BaseTime& time, Long* index, Long mode) const
+{
+  Long place = PlaceOf(time);
+  CKey* key = GetKey(place);
+  if (!key || !(key->GetTime() == time)) {
+    if (mode == kFindBefore)
+      key = GetKey(--place);
+    else if (mode != kFindAfter)
+      key = nullptr;
+  }
+  if (index)
+    *index = key ? place : -1;
+  return key;
+}
+
+CKey* CCurve::GetKey(Long index) const
+{
+  return index >= 0 && index < keys_.GetCount() ? static_cast<CKey*>(keys_[index]) : nullptr;
+}
+
+Bool CCurve::DelKey(Long index)
+{
+  CKey* key = GetKey(index);
+  if (!key)
+    return false;
+  keys_.Remove(index);
+  DeleteObj(key);
+  return true;
+}
+
+void CCurve::CutTail(Long count) { keys_.SetCount(count); }
+
+void CCurve::FreeKeys()
+{
+  keys_.Flush();
+  keyRoot_.FreeAll();
+}
+
+} // namespace _torvane_

@@ -1,0 +1,203 @@
+#include "torvane/ckey.h"
+
+#include "k2v_file/chunk_visitor.h"
+#include "q7r_file/nodes/member_makers.h"
+#include "q7r_file/nodes/node_tools.h"
+#include "torvane/animation_ids.h"
+
+namespace _torvane_
+{
+
+namespace
+{
+
+// The switches of a key: a parameter and the node bit behind it.
+struct KeySwitch
+{
+  Long parameter;
+  Long bit;
+};
+
+constexpr KeySwitch kSwitches[] = {{902, 40}, {915, 42}, {917, 44}, {918, 45}, {919, 46}, {921, 48},
+                                   {922, 49}, {923, 41}, {925, 38}, {926, 39}, {1234, 54}};
+
+// Bits whose changes carry a mark of their own in the mode.
+constexpr Long kMarkedBits[] = {38, 39, 40, 41, 42, 44, 45, 46, 48, 49};
+constexpr Long kModeMark = 240;
+
+const KeySwitch* FindSwitch(Long parameter)
+{
+  for (const KeySwitch& row : kSwitches) {
+    if (row.parameter == parameter)
+      return &row;
+  }
+  return nullptr;
+}
+
+} // namespace
+
+CKey::CKey() : BaseList2D(kLabelKey) {}
+
+template <class Visitor>
+Bool CKey::VisitBody(Visitor& v)
+{
+  v.Time(time_);
+  v.Time(leftTime_);
+  v.Time(rightTime_);
+  v.Real(value_);
+  v.Real(leftValue_);
+  v.Real(rightValue_);
+  v.Long(interpolation_);
+  if constexpr (Visitor::kReading)
+    return v.Note(v.Good() && keyData_.Read(v.File()));
+  else
+    return v.Note(v.Good() && keyData_.Write(v.File()));
+}
+
+void CKey::WriteChunks(HyperFile& file)
+{
+  BaseList2D::WriteChunks(file);
+  WriteChunk(file, kChunkKey, 0, [this](ChunkWriter& v) { return VisitBody(v); });
+}
+
+Bool CKey::ReadChunk(HyperFile& file, Long id, Long level)
+{
+  if (BaseList2D::ReadChunk(file, id, level))
+    return true;
+  return id == kChunkKey && ReadChunkBody(file, level, [this](ChunkReader& v) { return VisitBody(v); });
+}
+
+Bool CKey::CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation)
+{
+  auto& target = static_cast<CKey&>(destination);
+  target.time_ = time_;
+  target.value_ = value_;
+  target.leftValue_ = leftValue_;
+  target.rightValue_ = rightValue_;
+  target.leftTime_ = leftTime_;
+  target.rightTime_ = rightTime_;
+  target.interpolation_ = interpolation_;
+  return target.keyData_.CopyFrom(keyData_, flags, translation) &&
+         BaseList2D::CopyTo(destination, flags, translation);
+}
+
+GeListNode* CKey::MakeClone(ULong flags, TransArray* translation)
+{
+  return CloneNode(*this, new CKey, flags, translation);
+}
+
+Bool CKey::GetParameter(const ParameterPath& path, GeData& value)
+{
+  Long id = path[0].id;
+  if (const KeySwitch* row = FindSwitch(id)) {
+    value = GeData(GetNBit(row->bit) != 0);
+    return true;
+  }
+  switch (id) {
+  case kKeyTime:
+    value = GeData(time_);
+    return true;
+  case kKeyLeftTime:
+    value = GeData(leftTime_);
+    return true;
+  case kKeyRightTime:
+    value = GeData(rightTime_);
+    return true;
+  case kKeyLeftValue:
+    value = GeData(leftValue_);
+    return true;
+  case kKeyRightValue:
+    value = GeData(rightValue_);
+    return true;
+  case kKeyInterpolation:
+    value = GeData(interpolation_);
+    return true;
+  default:
+    return BaseList2D::GetParameter(path, value);
+  }
+}
+
+Bool CKey::SetParameter(const ParameterPath& path, const GeData& value)
+{
+  Long id = path[0].id;
+  if (const KeySwitch* row = FindSwitch(id)) {
+    ChangeNBit(row->bit, value.GetBool() ? 1 : 2);
+    return true;
+  }
+  switch (id) {
+  case kKeyTime:
+    time_ = value.GetTime();
+    return true;
+  case kKeyLeftTime:
+    leftTime_ = value.GetTime();
+    return true;
+  case kKeyRightTime:
+    rightTime_ = value.GetTime();
+    return true;
+  case kKeyLeftValue:
+    leftValue_ = value.GetReal();
+    return true;
+  case kKeyRightValue:
+    rightValue_ = value.GetReal();
+    return true;
+  case kKeyInterpolation:
+    interpolation_ = value.GetLong();
+    return true;
+  default:
+    return BaseList2D::SetParameter(path, value);
+  }
+}
+
+Bool CKey::ChangeNBit(Long bit, Long mode)
+{
+  for (Long marked : kMarkedBits) {
+    if (bit == marked)
+      return BaseList2D::ChangeNBit(bit, mode | kModeMark);
+  }
+  return BaseList2D::ChangeNBit(bit, mode);
+}
+
+void CKey::SetValue(CCurve*, Real value)
+{
+  if (value_ != value)
+    value_ = value;
+}
+
+void CKey::SetGeData(CCurve*, const GeData& data)
+{
+  if (keyData_.GetRawType() != data.GetRawType() || !keyData_.IsEqual(data))
+    keyData_ = data;
+}
+
+void CKey::SetInterpolation(CCurve*, Long type) { interpolation_ = type; }
+
+void CKey::SetLeft(const BaseTime& time, Real value)
+{
+  leftTime_ = time;
+  leftValue_ = value;
+}
+
+void CKey::SetRight(const BaseTime& time, Real value)
+{
+  rightTime_ = time;
+  rightValue_ = value;
+}
+
+void CKey::Reset()
+{
+  value_ = leftValue_ = rightValue_ = 0.0;
+  leftTime_ = rightTime_ = BaseTime();
+  interpolation_ = kInterpolationSpline;
+  keyData_.Free();
+}
+
+Bool CKey::IsEqual(const CKey& other) const
+{
+  return time_ == other.time_ && value_ == other.value_ && leftValue_ == other.leftValue_ &&
+         rightValue_ == other.rightValue_ && leftTime_ == other.leftTime_ && rightTime_ == other.rightTime_ &&
+         interpolation_ == other.interpolation_ && keyData_.IsEqual(other.keyData_);
+}
+
+BaseList2D* MakeEmptyKey() { return new CKey; }
+
+} // namespace _torvane_

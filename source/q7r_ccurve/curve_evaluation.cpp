@@ -1,0 +1,165 @@
+// Tangents and values of a curve.
+#include <cmath>
+
+#include "torvane/ccurve.h"
+
+namespace _torvane_
+{
+
+namespace
+{
+
+constexpr Real kClampTolerance = 1e-6;
+constexpr Real kAutomaticPart = 0.25; // of the way to the neighbours
+
+// One end's tangent, its time counted into the interval of length `span`: a longer one is shortened along its own
+// direction, one that points out of the interval becomes zero.
+void Shorten(Real& time, Real& value, Real span)
+{
+  if (time < 0.0) {
+    time = value = 0.0;
+  } else if (time > span) {
+    value *= span / time;
+    time = span;
+  }
+}
+
+Real Bezier(Real a, Real b, Real c, Real d, Real s)
+{
+  Real r = 1.0 - s;
+  return r * r * r * a + 3.0 * r * r * s * b + 3.0 * r * s * s * c + s * s * s * d;
+}
+
+// The parameter at which the Bezier 0, b, c, 1 reaches x. It rises from 0 to 1 since b and c lie between them.
+Real SolveBezier(Real b, Real c, Real x)
+{
+  Real low = 0.0;
+  Real high = 1.0;
+  for (int i = 0; i < 60 && high - low > 1e-15; ++i) {
+    Real middle = 0.5 * (low + high);
+    if (Bezier(0.0, b, c, 1.0, middle) < x)
+      low = middle;
+    else
+      high = middle;
+  }
+  return 0.5 * (low + high);
+}
+
+// A cubic Bezier whose inner control points are the key plus its right tangent and the next key plus its left one.
+Real SplineValue(const CKey& a, const CKey& b, KeyTangents right, KeyTangents left, Real u)
+{
+  Real span = b.GetTime().Get() - a.GetTime().Get();
+  Real leftTime = -left.leftTime;
+  Shorten(right.rightTime, right.rightValue, span);
+  Shorten(leftTime, left.leftValue, span);
+  Real s = SolveBezier(right.rightTime / span, 1.0 - leftTime / span, u);
+  return Bezier(a.GetValue(), a.GetValue() + right.rightValue, b.GetValue() + left.leftValue, b.GetValue(), s);
+}
+
+// Automatic tangents are kept in steps of a thousandth of a second.
+Real InMilliseconds(Real seconds) { return BaseTime(seconds).Get(); }
+
+struct Step
+{
+  Real time;
+  Real value;
+};
+
+Step StepBetween(const CKey& from, const CKey& to)
+{
+  return {to.GetTime().Get() - from.GetTime().Get(), to.GetValue() - from.GetValue()};
+}
+
+} // namespace
+
+KeyTangents CCurve::AutomaticTangents(Long index) const
+{
+  const CKey* key = GetKey(index);
+  const CKey* before = GetKey(index - 1);
+  const CKey* behind = GetKey(index + 1);
+  if (!key || (!before && !behind))
+    return {};
+  Step step = behind ? StepBetween(*key, *behind) : StepBetween(*before, *key);
+  if (before && behind) {
+    Step back = StepBetween(*before, *key);
+    Real span = back.time + step.time;
+    Real weight = span == 0.0 ? 0.0 : back.time / span;
+    step.time = step.time * weight + back.time * (1.0 - weight);
+    step.value = step.value * weight + back.value * (1.0 - weight);
+  }
+  return {InMilliseconds(-step.time * kAutomaticPart), -step.value * kAutomaticPart,
+          InMilliseconds(step.time * kAutomaticPart), step.value * kAutomaticPart};
+}
+
+// A key at an end, at a turning point, or beside an equal value.
+Bool CCurve::IsClamped(Long index) const
+{
+  const CKey* before = GetKey(index - 1);
+  const CKey* behind = GetKey(index + 1);
+  if (!before || !behind)
+    return true;
+  Real down = before->GetValue() - GetKey(index)->GetValue();
+  Real up = behind->GetValue() - GetKey(index)->GetValue();
+  return (down > 0.0 && up > 0.0) || (down < 0.0 && up < 0.0) || std::fabs(down) < kClampTolerance ||
+         std::fabs(up) < kClampTolerance;
+}
+
+KeyTangents CCurve::GetTangents(Long index) const
+{
+  const CKey* key = GetKey(index);
+  if (!key)
+    return {};
+  KeyTangents tangents = {key->GetLeftTime().Get(), key->GetLeftValue(), key->GetRightTime().Get(),
+                          key->GetRightValue()};
+  ULong mask = key->GetNBit(-2);
+  Bool flat = false;
+  if (mask & kKeyMaskAutomatic) {
+    tangents = AutomaticTangents(index);
+    flat = index == 0 || index == GetKeyCount() - 1;
+  } else {
+    if (mask & kKeyMaskZero)
+      tangents = {};
+    flat = (mask & kKeyMaskZeroValue) != 0;
+  }
+  if (mask & kKeyMaskClamp)
+    flat = flat || IsClamped(index);
+  if (flat)
+    tangents.leftValue = tangents.rightValue = 0.0;
+  return tangents;
+}
+
+Real CCurve::GetValue(Real time) const
+{
+  if (GetKeyCount() == 0)
+    return 0.0;
+  // The last key that isn't behind the time.
+  Long low = 0;
+  Long high = GetKeyCount();
+  while (low < high) {
+    Long middle = low + (high - low) / 2;
+    if (GetKey(middle)->GetTime().Get() <= time)
+      low = middle + 1;
+    else
+      high = middle;
+  }
+  Long index = low - 1;
+  if (index < 0)
+    return GetKey(0)->GetValue();
+  const CKey& a = *GetKey(index);
+  const CKey* b = GetKey(index + 1);
+  Real start = a.GetTime().Get();
+  if (!b || time <= start)
+    return a.GetValue();
+  Real span = b->GetTime().Get() - start;
+  Real u = (time - start) / span;
+  switch (a.GetInterpolation()) {
+  case kInterpolationSpline:
+    return SplineValue(a, *b, GetTangents(index), GetTangents(index + 1), u);
+  case kInterpolationLinear:
+    return a.GetValue() + (b->GetValue() - a.GetValue()) * u;
+  default:
+    return a.GetValue();
+  }
+}
+
+} // namespace _torvane_
