@@ -71,7 +71,8 @@ class GeAliasLink
   // A new link, filled by CopyLinkTo; null when memory is short.
   GeAliasLink* CloneLink(TransArray* translation) const;
   // With a translation array the copy is registered there and finds its target when the copy ends; without one it
-  // points at the same target at once. The label is copied. A null destination does nothing. False when memory is short.
+  // points at the same target at once. The label is copied. A null destination does nothing. False when memory is
+  // short.
   Bool CopyLinkTo(GeAliasLink* destination, TransArray* translation) const;
 
   // True when both reach the same goal, or both are empty.
@@ -137,7 +138,8 @@ class GeAliasGoal : public GeMemory
   Bool HasLinks() const;
 
   // The first and next link of the goal. Mode 0 gives each link's owner, or the address of a shared empty object when
-  // it has none; any other mode gives the goal's node. Null at the end. The body of the loop may delete links and goals.
+  // it has none; any other mode gives the goal's node. Null at the end. The body of the loop may delete links and
+  // goals.
   void* FirstLinkOfGoal(GoalIterator& iterator, Long mode) const;
   static void* NextLinkOfGoal(GoalIterator& iterator, Long mode);
 

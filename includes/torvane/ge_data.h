@@ -139,7 +139,8 @@ class GeData
   // False for the kinds that are stored in the value itself, the most frequent ones.
   Bool OwnsPayload() const
   {
-    constexpr ULong kInline = 1U << kDataNil | 1U << kDataPointer | 1U << kDataLong | 1U << kDataReal | 1U << kDataLLong;
+    constexpr ULong kInline =
+        1U << kDataNil | 1U << kDataPointer | 1U << kDataLong | 1U << kDataReal | 1U << kDataLLong;
     return type_ < 0 || type_ > kDataLLong || ((kInline >> type_) & 1U) == 0;
   }
   template <class T, class... Args>

@@ -313,6 +313,7 @@ class HyperFile : public GeMemory
   void EndTranslation();
   Bool ReadElements(void* data, Long type, Long storedType, LLong stride, LLong count);
   Bool ReadLegacyElements(LLong start, Long type, Long storedType, LLong count, void*& block);
+  Bool GetMemoryLength(LLong& length);
   Bool ReadContainerChunk(BaseContainer& container, Bool flush);
   Bool ReadContainerLegacy(BaseContainer& container, Bool flush);
   GeData* PlaceElement(BaseContainer& container, Bool flush, Long id);

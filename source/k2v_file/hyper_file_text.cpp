@@ -171,15 +171,13 @@ Bool HyperFile::WriteMemory(const void* data, LLong size)
   return true;
 }
 
-Bool HyperFile::ReadMemory(void*& data, LLong& size)
+// The length of a Memory value of either tag.
+Bool HyperFile::GetMemoryLength(LLong& length)
 {
-  data = nullptr;
-  size = 0;
   LLong start = file_.GetPosition();
   UChar tag = 0;
   if (!ReadValueHeader(tag))
     return false;
-  LLong length = 0;
   ULong shortLength = 0;
   if (tag != kTagMemory && tag != kTagLargeMemory)
     return Fail(FILEERROR_WRONG_VALUE, start);
@@ -187,7 +185,34 @@ Bool HyperFile::ReadMemory(void*& data, LLong& size)
     return FailFromFile(start);
   if (tag == kTagMemory)
     length = shortLength;
-  if (!ReadBlock(data, length))
+  return true;
+}
+
+Bool HyperFile::ReadMemory(void*& data, LLong& size)
+{
+  data = nullptr;
+  size = 0;
+  LLong length = 0;
+  if (!GetMemoryLength(length) || !ReadBlock(data, length))
+    return false;
+  size = length;
+  TickRead();
+  return true;
+}
+
+Bool HyperFile::ReadMemoryInto(void* buffer, LLong capacity, LLong& size)
+{
+  LLong start = file_.GetPosition();
+  size = 0;
+  LLong length = 0;
+  if (!GetMemoryLength(length))
+    return false;
+  if (length < 0)
+    return Fail(FILEERROR_WRONG_VALUE, start);
+  LLong wanted = length < capacity ? length : capacity;
+  if (wanted > 0 && file_.ReadBytes(buffer, wanted) != wanted)
+    return FailFromFile(start);
+  if (length > wanted && !Drop(length - wanted, start))
     return false;
   size = length;
   TickRead();

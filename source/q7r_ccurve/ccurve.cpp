@@ -40,8 +40,8 @@ Bool CCurve::CopyTo(PrivateChunk& destination, ULong flags, TransArray* translat
 {
   auto& target = static_cast<CCurve&>(destination);
   target.keys_.Reset();
-  return BaseList2D::CopyTo(destination, flags, translation) &&
-         keyRoot_.CopyTo(target.keyRoot_, flags, translation) && target.RebuildIndex();
+  return BaseList2D::CopyTo(destination, flags, translation) && keyRoot_.CopyTo(target.keyRoot_, flags, translation) &&
+         target.RebuildIndex();
 }
 
 GeListNode* CCurve::MakeClone(ULong flags, TransArray* translation)

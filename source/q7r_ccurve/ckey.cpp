@@ -77,8 +77,7 @@ Bool CKey::CopyTo(PrivateChunk& destination, ULong flags, TransArray* translatio
   target.leftTime_ = leftTime_;
   target.rightTime_ = rightTime_;
   target.interpolation_ = interpolation_;
-  return target.keyData_.CopyFrom(keyData_, flags, translation) &&
-         BaseList2D::CopyTo(destination, flags, translation);
+  return target.keyData_.CopyFrom(keyData_, flags, translation) && BaseList2D::CopyTo(destination, flags, translation);
 }
 
 GeListNode* CKey::MakeClone(ULong flags, TransArray* translation)
