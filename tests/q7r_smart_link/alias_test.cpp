@@ -202,8 +202,9 @@ TEST_F(AliasTest, ReadsLinksOfEveryFormAndIgnoresForeignBlocks)
       EXPECT_TRUE(goal.ReadGoal(source.file));
       EXPECT_EQ(link.GetLink(), one.resolves ? FakeNode(1) : nullptr) << ToHex(bytes.bytes);
       ASSERT_EQ(link.GetName() != nullptr, one.name != nullptr) << ToHex(bytes.bytes);
-      if (one.name)
+      if (one.name) {
         EXPECT_EQ(*link.GetName(), String(one.name));
+      }
     }
   }
   MemoryReadFile source(ByteWriter().Header().Memory("").Memory("").bytes);
@@ -284,8 +285,9 @@ TEST_F(AliasTest, ResolvesLinksAndGoalsInAnyOrder)
     translation.FinishTranslation(false);
     EXPECT_EQ(translation.GetCount(), 0);
     for (std::size_t number = 0; number < links.size(); ++number) {
-      if (links[number])
+      if (links[number]) {
         EXPECT_EQ(links[number]->GetLinkGoal(), expected[linkId[number]]) << "seed " << seed;
+      }
     }
     for (const auto& goal : goals) { // only real links are left on them
       const auto pointing = std::count_if(links.begin(), links.end(), [&](const auto& link) {
@@ -301,8 +303,9 @@ TEST_F(AliasTest, ResolvesLinksAndGoalsInAnyOrder)
       else
         links[entry - goals.size()].reset();
       for (std::size_t number = 0; number < links.size(); ++number) {
-        if (links[number] && expected[linkId[number]] && !goals[linkId[number]])
+        if (links[number] && expected[linkId[number]] && !goals[linkId[number]]) {
           EXPECT_EQ(links[number]->GetLinkGoal(), nullptr);
+        }
       }
     }
   }
@@ -409,7 +412,8 @@ TEST_F(AliasTest, LeavesLinksEmptyOrWholeWhenMemoryRunsOut)
     }
     for (std::size_t i = 0; i < 20; ++i) {
       EXPECT_EQ(links[i].GetLinkGoal(), goalDone[i] && linkDone[i] ? &goals[i] : nullptr) << count;
-      EXPECT_EQ(links[i].CopyLinkTo(&copies[i], nullptr), copies[i].GetLinkGoal() == links[i].GetLinkGoal());
+      const Bool copied = links[i].CopyLinkTo(&copies[i], nullptr);
+      EXPECT_EQ(copied, copies[i].GetLinkGoal() == links[i].GetLinkGoal());
     }
     counting_memory::FailNever();
   }
