@@ -356,7 +356,8 @@ TEST_F(BaseFileTest, ModesDecideWhatMayBeDone)
 
 TEST_F(BaseFileTest, WhatCannotBeOpenedIsAnOpenFailure)
 {
-  const UniChar kWithZero[] = {'/', 't', 'm', 'p', 0, 'x'};
+  String withZero((folder / "zero?x").c_str());
+  withZero[withZero.GetLength() - 2] = 0;
   Filename noMemory;
   noMemory.SetMemoryRead(nullptr, 10);
   Filename readOnlyMemory;
@@ -371,7 +372,7 @@ TEST_F(BaseFileTest, WhatCannotBeOpenedIsAnOpenFailure)
       {Filename(folder.Path().c_str()), kFileRead},
       {Filename(folder.Path().c_str()), kFileWrite},
       {Filename(folder.Path().c_str()), kFileReadWrite},
-      {Filename(String(kWithZero, 6)), kFileWrite},
+      {Filename(withZero), kFileWrite},
       {noMemory, kFileRead},
       {readOnlyMemory, kFileWrite},
   };
@@ -380,8 +381,11 @@ TEST_F(BaseFileTest, WhatCannotBeOpenedIsAnOpenFailure)
     EXPECT_FALSE(file.Open(each.name, each.mode)) << &each - kCases;
     EXPECT_EQ(file.GetError(), FILEERROR_OPEN);
   }
-  const Filename name = NameOf("disk", {'a'});
+  const Filename name = NameOf("disk", Bytes(100));
   BaseFile file;
+  const LLong before = counting_memory::Get().bytes;
+  EXPECT_TRUE(file.Open(name, kFileRead));
+  EXPECT_LT(counting_memory::Get().bytes - before, 1000) << "a short file takes a short buffer";
   counting_memory::FailAfter(1); // the copy of the name has its memory
   EXPECT_FALSE(file.Open(name, kFileRead));
   counting_memory::FailNever();
@@ -554,7 +558,7 @@ TEST_F(BaseFileTest, PathsReachTheSystemAsUtf8)
       {u"\u00E9\u20AC", "\xC3\xA9\xE2\x82\xAC"},
       {u"a\U0001F600b", "a\xF0\x9F\x98\x80"
                         "b"},
-      {u"\xD83D", "\xED\xA0\xBD"},                   // the first half of a pair alone
+      {u"\xD83D\u00E9", "\xED\xA0\xBD\xC3\xA9"},     // the first half of a pair alone
       {u"\xDE00\xD83D", "\xED\xB8\x80\xED\xA0\xBD"}, // halves in the wrong order
   };
   for (const auto& each : kCases) {
