@@ -9,9 +9,7 @@
 
 #include <cmath>
 #include <fstream>
-#include <iterator>
 #include <optional>
-#include <system_error>
 #include <unordered_map>
 
 namespace host
@@ -371,10 +369,12 @@ Project LoadCompositionText(std::string_view text, const std::string& name, cons
 Project LoadComposition(const std::filesystem::path& file)
 {
   const std::string name = PathToUtf8(file.filename());
-  std::error_code error;
   std::ifstream stream(file, std::ios::binary);
-  const std::string text{std::istreambuf_iterator<char>(stream), {}};
-  if (!stream || std::filesystem::is_directory(file, error))
+  std::string text;
+  std::vector<char> piece(65536);
+  while (stream.read(piece.data(), static_cast<std::streamsize>(piece.size())) || stream.gcount() > 0)
+    text.append(piece.data(), static_cast<std::size_t>(stream.gcount()));
+  if (!stream.is_open() || stream.bad()) // a folder opens, but is bad to read
     throw CompositionError(OneLine(name) + ": cannot be read");
   return LoadCompositionText(text, name, std::filesystem::absolute(file).parent_path());
 }

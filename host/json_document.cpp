@@ -5,6 +5,7 @@
 
 #include <algorithm>
 #include <cmath>
+#include <cstdlib>
 #include <vector>
 
 namespace host
@@ -41,10 +42,11 @@ class Builder : public nlohmann::json_sax<Json>
     return true;
   }
 
-  bool parse_error(std::size_t position, const std::string&, const nlohmann::detail::exception& error) override
+  bool parse_error(std::size_t position, const std::string& token, const nlohmann::detail::exception&) override
   {
     errorByte_ = position;
-    isOutOfRange_ = dynamic_cast<const nlohmann::detail::out_of_range*>(&error) != nullptr;
+    const bool isNumber = token.find_first_not_of("0123456789+-.eE") == std::string::npos;
+    isOutOfRange_ = isNumber && std::isinf(std::strtod(token.c_str(), nullptr));
     return false;
   }
 

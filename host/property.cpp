@@ -83,9 +83,7 @@ Value Property::KeyedAt(double frame) const
   if (from.isHold)
     return from.value;
   const double x = (frame - from.time) / (to.time - from.time);
-  const auto eased = [&](std::size_t c) {
-    return from.easing.empty() ? x : Ease(from.easing[std::min(c, from.easing.size() - 1)], x);
-  };
+  const auto eased = [&](std::size_t c) { return from.easing.empty() ? x : Ease(from.easing[c], x); };
   double y = eased(0);
   if (from.path)
     return from.path->At(y);

@@ -72,11 +72,10 @@ std::vector<Easing> PropertyReader::EasingOf(const Json& json) const
     return {};
   const Json* const numbers[4] = {&document_.Require(*out, "x"), &document_.Require(*out, "y"),
                                   &document_.Require(*in, "x"), &document_.Require(*in, "y")};
-  std::size_t count = 1;
-  for (const Json* number : numbers)
-    count = std::max(count, number->is_array() ? number->size() : 1);
+  const bool isOneForAll = std::none_of(std::begin(numbers), std::end(numbers),
+                                        [](const Json* n) { return n->is_array() && n->size() > 1; });
   std::vector<Easing> easing;
-  for (std::size_t c = 0; c < std::min(count, dimensions_); ++c)
+  for (std::size_t c = 0; c < (isOneForAll ? 1 : dimensions_); ++c)
     easing.push_back({Entry(*numbers[0], c), Entry(*numbers[1], c), Entry(*numbers[2], c), Entry(*numbers[3], c)});
   return easing;
 }
