@@ -2,6 +2,8 @@
 #pragma once
 
 #include "torvane/base_list.h"
+#include "torvane/ge_math.h"
+#include "torvane/raw_chunk_body.h"
 #include "torvane/vector.h"
 
 namespace _torvane_
@@ -79,9 +81,9 @@ class BaseObject : public BaseList4D
   void SetObjectData(NodeData* data);
 
   // The payload of an object whose type the client doesn't know.
-  const void* GetRawData() const { return rawData_; }
-  LLong GetRawSize() const { return rawSize_; }
-  Long GetRawLevel() const { return rawLevel_; }
+  const void* GetRawData() const { return raw_.GetData(); }
+  LLong GetRawSize() const { return raw_.GetSize(); }
+  Long GetRawLevel() const { return raw_.GetLevel(); }
 
   // Relative: what a user and the animation work with. Absolute: in the parent's system, frozen part included. Angles
   // in radians, in the object's rotation order.
@@ -132,9 +134,7 @@ class BaseObject : public BaseList4D
  protected:
   Matrix matrixCache_;
   Bool matrixDirty_ = true;
-  void* rawData_ = nullptr; // owned
-  LLong rawSize_ = 0;
-  Long rawLevel_ = 0;
+  RawChunkBody raw_; // of the chunk kChunkNodeData, when there is no object data
   Vector relPos_;
   Vector relRot_;
   Vector relScale_ = Vector(1.0, 1.0, 1.0);
@@ -147,7 +147,7 @@ class BaseObject : public BaseList4D
   Matrix frozenMatrix_;
   Matrix frozenInverse_;
   ULong frozenFlags_ = 0;
-  Long rotationOrder_ = 6;
+  Long rotationOrder_ = kRotationOrderScene;
   Matrix rotationMatrix_;
   Matrix storedMatrix_; // kept and handed on
   RootTag tags_;
@@ -162,6 +162,44 @@ class BaseObject : public BaseList4D
   RootObject* legacyListA_ = nullptr; // read from old files only; owned
   RootObject* legacyListB_ = nullptr;
   NodeData* objectData_ = nullptr; // owned
+
+ private:
+  struct LongParameter;
+  struct VectorParameter;
+  static const LongParameter kLongParameters[];
+  static const VectorParameter kVectorParameters[];
+
+  Bool IsProtected() const { return GetTag(kTagProtection) != nullptr; }
+  Bool HasFrozenTransform() const { return (frozenFlags_ & (kFrozenPos | kFrozenRot | kFrozenScale)) != 0; }
+  Matrix GetRotation() const;
+  Vector DerivedAbsPos() const;
+  Vector DerivedAbsRot() const;
+  Vector DerivedAbsScale() const;
+  void TakeRelAsAbs();
+  void SetFrozenFlag(ULong flag, Bool set) { frozenFlags_ = set ? frozenFlags_ | flag : frozenFlags_ & ~flag; }
+  Vector GetGlobalAngles();
+  void SetGlobalPos(const Vector& value);
+  void SetGlobalAngles(const Vector& value);
+  Vector TakeDisplayColor();
+  template <class Visitor>
+  Bool VisitTransform(Visitor& v);
+  template <class Visitor>
+  void VisitDisplay(Visitor& v);
+  template <class Visitor>
+  void VisitFrozen(Visitor& v);
+  template <class Visitor>
+  void VisitMirroring(Visitor& v);
+  template <class Visitor>
+  void VisitLegacyList(Visitor& v, RootObject*& list);
+  Bool ReadTransform(HyperFile& file, Long level);
+  Bool ReadChildren(HyperFile& file);
+  Bool ReadObjectData(HyperFile& file, Long id, Long level);
+  void StoreModelCheckSum();
+  Bool KeepsChunksBesideTransform() const;
+  void WriteObjectData(HyperFile& file);
+  Bool CopyObjectData(BaseObject& destination, ULong flags, TransArray* translation) const;
+  void CopyTransform(BaseObject& destination) const;
+  Bool CloneChildren(BaseObject& destination, ULong flags, TransArray* translation) const;
 };
 
 // A new object of a type with its object data; null for a type that can't be made and when memory is short. The caller

@@ -3,6 +3,7 @@
 #pragma once
 
 #include "torvane/base_list.h"
+#include "torvane/raw_chunk_body.h"
 
 namespace _torvane_
 {
@@ -41,17 +42,20 @@ class BaseTag : public BaseList2D
   void SetNodeData(NodeData* data);
 
   // The kept bytes of a plug-in tag without a NodeData.
-  const void* GetRawData() const { return rawData_; }
-  LLong GetRawSize() const { return rawSize_; }
-  Long GetRawLevel() const { return rawLevel_; }
+  const void* GetRawData() const { return raw_.GetData(); }
+  LLong GetRawSize() const { return raw_.GetSize(); }
+  Long GetRawLevel() const { return raw_.GetLevel(); }
+
+  // The entries of a value tag as one block of bytes; null and 0 for every other tag.
+  virtual const void* GetEntryBytes(LLong& size) const;
 
  protected:
   // Copies what a class adds beyond its container.
   virtual Bool CopyTagData(BaseTag& destination, ULong flags, TransArray* translation);
 
-  void* rawData_ = nullptr; // owned
-  LLong rawSize_ = 0;
-  Long rawLevel_ = 0;
+  Bool CopyPluginData(BaseTag& destination, ULong flags, TransArray* translation);
+
+  RawChunkBody raw_; // of the chunk kChunkNodeData of a plug-in tag, when there is no behaviour object
   Long pluginId_ = -1;
   NodeData* nodeData_ = nullptr; // owned
   BaseObject* object_ = nullptr; // the object that holds the tag; not owned

@@ -28,6 +28,9 @@ inline constexpr Long kObjectGeneric = 5154; // the label of most objects in a f
 inline constexpr Long kObjectPoint = 5156;   // the label of point objects
 inline constexpr Long kObjectPlane = 5168;
 inline constexpr Long kObjectPolygonLabel = 1001091; // the label of polygon objects in a file
+inline constexpr Long kObjectSky = 1011146;
+inline constexpr Long kObjectCloudGroup = 1011194;
+inline constexpr Long kObjectCloud = 1011196;
 inline constexpr Long kObjectJoint = 1019362;
 inline constexpr Long kObjectSkin = 1019363;
 

@@ -1,0 +1,28 @@
+// What a container does with the nodes that its links point at.
+#include "torvane/base_container.h"
+
+#include "torvane/alias.h"
+#include "torvane/base_list.h"
+
+namespace _torvane_
+{
+
+void BaseContainer::SetLink(Long id, BaseList2D* target)
+{
+  GeAliasLink link;
+  link.SetLink(target);
+  SetData(id, GeData(link));
+}
+
+BaseList2D* BaseContainer::GetLink(Long id, const BaseDocument* document) const
+{
+  GeListNode* target = GetData(id).GetLink();
+  // A file may point a link at a thing that has a goal but is no named node, such as the document's preferences.
+  if (!target || !target->GoalIsWrittenElsewhere())
+    return nullptr;
+  auto* node = static_cast<BaseList2D*>(target);
+  const BaseDocument* owner = node->GetDocument();
+  return document && owner && owner != document ? nullptr : node;
+}
+
+} // namespace _torvane_

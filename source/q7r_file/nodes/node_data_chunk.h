@@ -1,0 +1,47 @@
+// The chunk that holds what is particular to a node's type, for objects and tags alike: the type, a constant, the
+// node's name, and then the values of its NodeData or the bytes that were kept for want of one.
+#pragma once
+
+#include "torvane/private_chunk.h"
+#include "torvane/raw_chunk_body.h"
+
+namespace _torvane_
+{
+
+class BaseList2D;
+class String;
+
+// The values that open the chunk.
+template <class Visitor>
+Bool VisitNodeDataHead(Visitor& v, Long& type, String& name)
+{
+  v.Long(type);
+  v.ConstantLong(0);
+  v.String(name);
+  return v.Good();
+}
+
+// Where a node keeps the content of the chunk: a NodeData, which the node owns, or else the bytes.
+struct NodeDataSlot
+{
+  BaseList2D& node;
+  NodeData*& data;
+  RawChunkBody& raw;
+};
+
+// Reads the rest of the chunk behind its opening values, the end tag included, into a NodeData of `type` that the
+// client makes, or as bytes if the client doesn't know the type. What was there before goes. False when a NodeData
+// can't be made or doesn't take the content: the stream then stands inside the chunk, for the caller to skip.
+Bool ReadNodeDataBody(HyperFile& file, Long id, Long level, Long type, NodeDataSlot slot);
+
+// Writes what stands behind the opening values.
+void WriteNodeDataBody(HyperFile& file, NodeData* data, const RawChunkBody& raw);
+
+// The level at which the chunk is to be written.
+Long NodeDataLevel(const NodeData* data, const RawChunkBody& raw);
+
+// Puts `data` (may be null) into the slot in place of what was there and runs its Init. A data object that Init
+// refuses is deleted: false.
+Bool AttachNodeData(NodeData* data, NodeDataSlot slot);
+
+} // namespace _torvane_

@@ -1,0 +1,418 @@
+#include "torvane/base_object.h"
+
+#include "k2v_file/chunk_visitor.h"
+#include "q7r_file/nodes/node_data_chunk.h"
+#include "torvane/assertion.h"
+#include "torvane/base_tag.h"
+#include "torvane/crc.h"
+#include "torvane/hooks.h"
+
+namespace _torvane_
+{
+
+namespace
+{
+
+// From this version on the transform chunk holds all its values whatever its level, and no matrices of old.
+constexpr Long kVersionFullTransform = 11600;
+// Below this version the transform chunk also holds the node's container and name.
+constexpr Long kVersionNodeHeader = 7500;
+// In matrices of old files an axis below this is a mirrored one.
+constexpr Real kMirroredBelow = -0.9;
+
+} // namespace
+
+BaseObject::BaseObject(Long type) : BaseList4D(type), tags_(this)
+{
+  tags_.SetOwner(this);
+  children_ = AllocRootObject();
+  if (children_)
+    children_->SetOwner(this);
+}
+
+BaseObject::~BaseObject()
+{
+  DeleteObj(legacyListA_);
+  DeleteObj(legacyListB_);
+  DeleteObj(objectData_);
+  RemoveFromList();
+  tags_.FreeAll();
+}
+
+Bool BaseObject::IsInstanceOf(Long type) const { return type == GetType() || BaseList4D::IsInstanceOf(type); }
+
+Long BaseObject::GetDiskType() const { return objectData_ ? objectData_->GetDiskType() : kObjectGeneric; }
+
+Bool BaseObject::Execute() { return objectData_ && objectData_->Execute(); }
+
+void BaseObject::SetDocument(BaseDocument* document)
+{
+  if (document == GetDocument())
+    return;
+  BaseList4D::SetDocument(document);
+  SetDocumentOfMembers(tags_, document);
+  for (RootObject* list : {legacyListA_, legacyListB_})
+    if (list)
+      SetDocumentOfMembers(*list, document);
+}
+
+BaseTag* BaseObject::GetFirstTag() const { return static_cast<BaseTag*>(tags_.GetFirst()); }
+
+BaseTag* BaseObject::GetTag(Long type) const
+{
+  BaseTag* tag = GetFirstTag();
+  while (tag && tag->GetType() != type)
+    tag = tag->GetNext();
+  return tag;
+}
+
+void BaseObject::InsertTag(BaseTag* tag, BaseTag* after)
+{
+  if (!tag)
+    return;
+  tags_.InsertAfter(tag, after);
+  tag->SetObject(this);
+}
+
+BaseTag* BaseObject::MakeTag(Long type)
+{
+  BaseTag* tag = _torvane_::MakeTag(type);
+  InsertTag(tag);
+  return tag;
+}
+
+void BaseObject::SetObjectData(NodeData* data)
+{
+  if (data == objectData_)
+    return;
+  DeleteObj(objectData_);
+  objectData_ = data;
+  if (data)
+    data->SetNode(this);
+}
+
+// The transform chunk. Files from kVersionFullTransform on hold every value; in older ones the level tells how far the
+// values reach.
+template <class Visitor>
+Bool BaseObject::VisitTransform(Visitor& v)
+{
+  const Bool old = v.VersionBelow(kVersionFullTransform);
+  const Bool oldest = v.VersionBelow(kVersionNodeHeader);
+  if (oldest)
+    v.Container(data_);
+  v.Vector(relPos_);
+  v.Vector(relScale_);
+  v.Vector(relRot_);
+  if (old)
+    VisitMirroring(v);
+  if (oldest)
+    v.String(name_);
+  if (!oldest || v.Level() >= 1) {
+    v.Long(editorMode_);
+    v.Long(renderMode_);
+    v.Long(disabled_);
+  }
+  if (oldest)
+    return v.Good();
+  VisitDisplay(v);
+  if (!old || v.Level() >= 6)
+    VisitFrozen(v);
+  if (old)
+    return v.Good();
+  if (v.Level() == 8)
+    v.template Skip<Long>(); // an order that only later levels mean
+  if (v.Level() >= 9)
+    v.Long(rotationOrder_);
+  return v.Good();
+}
+
+// What two old matrices tell of mirrored axes: the scale of old files has no sign. The z axis is looked for in the
+// second one.
+template <class Visitor>
+void BaseObject::VisitMirroring(Visitor& v)
+{
+  if constexpr (Visitor::kReading) {
+    Matrix local;
+    Matrix axes;
+    v.Matrix(local);
+    v.Matrix(axes);
+    if (axes.v1.x < kMirroredBelow)
+      relScale_.x = -relScale_.x;
+    if (axes.v2.y < kMirroredBelow)
+      relScale_.y = -relScale_.y;
+    if (axes.v2.z < kMirroredBelow)
+      relScale_.z = -relScale_.z;
+  }
+}
+
+template <class Visitor>
+void BaseObject::VisitDisplay(Visitor& v)
+{
+  const Bool old = v.VersionBelow(kVersionFullTransform);
+  auto holds = [&](Long level) { return !old || v.Level() >= level; };
+  if (holds(1)) {
+    v.Bool(displayFlag_);
+    if (old)
+      v.template Skip<Bool>();
+    v.Vector(displayColor_);
+  }
+  if (holds(2))
+    v.Long(colorMode_);
+  if (holds(3)) {
+    v.Vector(storedVector_);
+    v.Long(storedMode_);
+  }
+  if (holds(4))
+    v.Matrix(storedMatrix_);
+  if (holds(5)) {
+    VisitLegacyList(v, legacyListA_);
+    VisitLegacyList(v, legacyListB_);
+  }
+}
+
+// A list of objects that old files may hold here. It is never written.
+template <class Visitor>
+void BaseObject::VisitLegacyList(Visitor& v, RootObject*& list)
+{
+  if constexpr (Visitor::kReading) {
+    Bool present = false;
+    v.Bool(present);
+    if (!present)
+      return;
+    if (!list)
+      list = AllocRootObject();
+    if (!list) {
+      v.File().SetError(FILEERROR_MEMORY);
+      v.Note(false);
+      return;
+    }
+    list->SetOwner(this);
+    v.Note(list->ReadChunks(v.File(), true));
+  } else {
+    v.ConstantBool(false);
+  }
+}
+
+template <class Visitor>
+void BaseObject::VisitFrozen(Visitor& v)
+{
+  v.ULong(frozenFlags_);
+  if (!HasFrozenTransform())
+    return;
+  v.Vector(frozenPos_);
+  v.Vector(frozenScale_);
+  v.Vector(frozenRot_);
+  v.Vector(absPos_);
+  v.Vector(absScale_);
+  v.Vector(absRot_);
+}
+
+Bool BaseObject::ReadTransform(HyperFile& file, Long level)
+{
+  ReadChunkBody(file, level, [this](ChunkReader& v) { return VisitTransform(v); });
+  const Bool hasOrder = file.GetFileVersion() >= kVersionFullTransform && level >= 8;
+  const Long order = hasOrder ? rotationOrder_ : kRotationOrderScene;
+  rotationMatrix_ = AnglesToMatrix(relRot_, order);
+  if (HasFrozenTransform()) {
+    frozenMatrix_ = AnglesToMatrix(frozenRot_, order);
+    frozenInverse_ = Invert(frozenMatrix_);
+  } else {
+    frozenMatrix_ = Matrix();
+    frozenInverse_ = Matrix();
+    TakeRelAsAbs();
+  }
+  matrixDirty_ = true;
+  return true;
+}
+
+Bool BaseObject::ReadChildren(HyperFile& file)
+{
+  if (!children_)
+    children_ = AllocRootObject();
+  if (!children_)
+    return true;
+  children_->SetOwner(this);
+  return children_->ReadChunks(file, false);
+}
+
+Bool BaseObject::ReadObjectData(HyperFile& file, Long id, Long level)
+{
+  Long type = 0;
+  String name;
+  ChunkReader reader(file, level);
+  if (!VisitNodeDataHead(reader, type, name))
+    return false;
+  SetType(type);
+  if (!name_.Content())
+    name_ = name;
+  return ReadNodeDataBody(file, id, level, type, {*this, objectData_, raw_});
+}
+
+Bool BaseObject::ReadChunk(HyperFile& file, Long id, Long level)
+{
+  if (BaseList4D::ReadChunk(file, id, level))
+    return true;
+  switch (id) {
+  case kChunkList:
+    return ReadChildren(file);
+  case kChunkTags:
+    return tags_.ReadChunks(file, false);
+  case kChunkTransform:
+    return ReadTransform(file, level);
+  case kChunkNodeData:
+    return ReadObjectData(file, id, level);
+  default:
+    break;
+  }
+  // Polygon objects keep their own chunks beside the others.
+  if (!objectData_ || objectData_->GetDiskType() != kObjectPolygonLabel)
+    return false;
+  if (GetType() == kObjectPolygon)
+    return objectData_->ReadData(file, id, level);
+  return GetType() == kObjectJoint && file.SkipToEndChunk();
+}
+
+// Polygon data stand behind the transform chunk; those of a joint, though under the same label, where all others do.
+Bool BaseObject::KeepsChunksBesideTransform() const
+{
+  return objectData_ && objectData_->GetDiskType() == kObjectPolygonLabel && GetType() != kObjectJoint;
+}
+
+// The sum stands in the container, which was written before: a file holds the sum of the write before its own.
+void BaseObject::StoreModelCheckSum()
+{
+  Crc32 sum;
+  if (GetType() == kObjectPolygon) {
+    for (Long type : {kTagPoint, kTagPolygon}) {
+      if (const BaseTag* tag = GetTag(type)) {
+        LLong size = 0;
+        const void* entries = tag->GetEntryBytes(size);
+        sum.Update(entries, size);
+      }
+    }
+  }
+  data_.SetLong(kKeyModelCheckSum, static_cast<Long>(sum.GetCrc()));
+}
+
+// A spline's own chunks stand straight among the object's; bytes that nobody understands can't.
+void BaseObject::WriteObjectData(HyperFile& file)
+{
+  const Bool enclosed = GetDiskType() != kObjectSpline || (!objectData_ && raw_.GetSize() > 0);
+  if (enclosed) {
+    Long type = GetType();
+    const Long level = NodeDataLevel(objectData_, raw_);
+    file.WriteChunkStart(kChunkNodeData, level);
+    ChunkWriter writer(file, level);
+    VisitNodeDataHead(writer, type, name_);
+  }
+  if (!KeepsChunksBesideTransform())
+    WriteNodeDataBody(file, objectData_, raw_);
+  if (enclosed)
+    file.WriteChunkEnd();
+}
+
+void BaseObject::WriteChunks(HyperFile& file)
+{
+  BaseList4D::WriteChunks(file);
+  StoreModelCheckSum();
+  WriteObjectData(file);
+  if (children_ && !children_->IsEmpty())
+    children_->WriteAsChunk(file, kChunkList);
+  if (!tags_.IsEmpty())
+    tags_.WriteAsChunk(file, kChunkTags);
+  WriteChunk(file, kChunkTransform, kLevelTransform, [this](ChunkWriter& v) { return VisitTransform(v); });
+  if (KeepsChunksBesideTransform())
+    objectData_->WriteChunks(file);
+}
+
+Bool BaseObject::CopyObjectData(BaseObject& destination, ULong flags, TransArray* translation) const
+{
+  if (!objectData_) {
+    // What the destination was made with would be written in place of the bytes.
+    DeleteObj(destination.objectData_);
+    return raw_.CopyTo(destination.raw_);
+  }
+  destination.SetType(GetType());
+  Bool known = false;
+  NodeData* data = AllocObjectDataOfType(GetType(), known);
+  if (known && !data)
+    return false;
+  if (!AttachNodeData(data, {destination, destination.objectData_, destination.raw_}))
+    return false;
+  if (data)
+    objectData_->CopyTo(*data, flags, translation);
+  return true;
+}
+
+void BaseObject::CopyTransform(BaseObject& destination) const
+{
+  destination.displayColor_ = displayColor_;
+  destination.colorMode_ = colorMode_;
+  destination.displayFlag_ = displayFlag_;
+  destination.storedVector_ = storedVector_;
+  destination.storedMode_ = storedMode_;
+  destination.editorMode_ = editorMode_;
+  destination.renderMode_ = renderMode_;
+  destination.disabled_ = disabled_;
+  destination.storedMatrix_ = storedMatrix_;
+  destination.frozenFlags_ = frozenFlags_;
+  destination.rotationMatrix_ = rotationMatrix_;
+  destination.frozenMatrix_ = frozenMatrix_;
+  destination.frozenInverse_ = frozenInverse_;
+  destination.relPos_ = relPos_;
+  destination.relRot_ = relRot_;
+  destination.relScale_ = relScale_;
+  destination.frozenPos_ = frozenPos_;
+  destination.frozenRot_ = frozenRot_;
+  destination.frozenScale_ = frozenScale_;
+  destination.absPos_ = absPos_;
+  destination.absRot_ = absRot_;
+  destination.absScale_ = absScale_;
+  destination.rotationOrder_ = rotationOrder_;
+  destination.matrixDirty_ = true;
+}
+
+Bool BaseObject::CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation)
+{
+  auto& target = static_cast<BaseObject&>(destination);
+  if (!CopyObjectData(target, flags, translation))
+    return false;
+  if (!BaseList2D::CopyTo(target, flags, translation) || !tags_.CopyWithTranslation(target.tags_, flags, translation))
+    return false;
+  for (BaseTag* tag = target.GetFirstTag(); tag; tag = tag->GetNext())
+    tag->SetObject(&target);
+  if (GetType() != target.GetType() && !(flags & kCopyNoBranches))
+    ReportAssertion("q7r_file", __LINE__, "an object was copied onto an object of another type");
+  CopyTransform(target);
+  return true;
+}
+
+Bool BaseObject::CloneChildren(BaseObject& destination, ULong flags, TransArray* translation) const
+{
+  BaseObject* last = nullptr;
+  for (BaseObject* child = GetDown(); child; child = child->GetNext()) {
+    auto* clone = destination.children_ ? static_cast<BaseObject*>(child->MakeClone(flags, translation)) : nullptr;
+    if (!clone)
+      return false;
+    if (last)
+      clone->InsertAfter(last);
+    else
+      clone->InsertUnder(&destination);
+    last = clone;
+  }
+  return true;
+}
+
+GeListNode* BaseObject::MakeClone(ULong flags, TransArray* translation)
+{
+  BaseObject* clone = AllocObject(GetType());
+  if (!clone)
+    return nullptr;
+  clone->tags_.FreeAll();
+  if (!CopyWithTranslation(*clone, flags, translation) ||
+      (!(flags & kCopyNoChildren) && !CloneChildren(*clone, flags, translation)))
+    DeleteObj(clone);
+  return clone;
+}
+
+} // namespace _torvane_

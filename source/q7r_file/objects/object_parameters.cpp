@@ -1,0 +1,130 @@
+// The parameters of every scene object.
+#include "torvane/base_object.h"
+
+#include "q7r_file/nodes/node_tools.h"
+#include "torvane/ge_data.h"
+
+namespace _torvane_
+{
+
+struct BaseObject::LongParameter
+{
+  Long id;
+  Long (*get)(const BaseObject&);
+  void (*set)(BaseObject&, Long);
+};
+
+struct BaseObject::VectorParameter
+{
+  Long id;
+  Vector (*get)(BaseObject&);
+  void (*set)(BaseObject&, const Vector&);
+};
+
+namespace
+{
+
+template <class Row, std::size_t count>
+const Row* FindRow(const Row (&rows)[count], Long id)
+{
+  for (const Row& row : rows)
+    if (row.id == id)
+      return &row;
+  return nullptr;
+}
+
+// The second level of a path to a vector: 0 for all of it, or a component. Any other does nothing.
+Bool NamesVectorPart(Long id) { return id == 0 || (id >= kVectorX && id <= kVectorZ); }
+
+Real Clamp01(Real value) { return value < 0.0 ? 0.0 : value > 1.0 ? 1.0 : value; }
+
+} // namespace
+
+// The colour as it is stored; from then on its components lie between 0 and 1.
+Vector BaseObject::TakeDisplayColor()
+{
+  Vector color = displayColor_;
+  displayColor_ = {Clamp01(color.x), Clamp01(color.y), Clamp01(color.z)};
+  return color;
+}
+
+constinit const BaseObject::LongParameter BaseObject::kLongParameters[] = {
+    {kObjectEditorMode, [](const BaseObject& o) { return o.editorMode_; },
+     [](BaseObject& o, Long value) { o.editorMode_ = value; }},
+    {kObjectRenderMode, [](const BaseObject& o) { return o.renderMode_; },
+     [](BaseObject& o, Long value) { o.renderMode_ = value; }},
+    {kObjectEnabled, [](const BaseObject& o) -> Long { return o.disabled_ == 0; },
+     [](BaseObject& o, Long value) { o.disabled_ = value == 0; }},
+    {kObjectColorMode, [](const BaseObject& o) { return o.colorMode_; },
+     [](BaseObject& o, Long value) { o.colorMode_ = value; }},
+    {kObjectDisplayFlag, [](const BaseObject& o) -> Long { return o.displayFlag_; },
+     [](BaseObject& o, Long value) { o.displayFlag_ = value != 0; }},
+    {kObjectStoredMode, [](const BaseObject& o) { return o.storedMode_; },
+     [](BaseObject& o, Long value) { o.storedMode_ = value; }},
+    {kObjectRotationOrder, [](const BaseObject& o) { return o.rotationOrder_; },
+     [](BaseObject& o, Long value) { o.SetRotationOrder(value); }},
+};
+
+constinit const BaseObject::VectorParameter BaseObject::kVectorParameters[] = {
+    {kObjectRelPos, [](BaseObject& o) { return o.relPos_; },
+     [](BaseObject& o, const Vector& value) { o.SetRelPos(value); }},
+    {kObjectRelRot, [](BaseObject& o) { return o.relRot_; },
+     [](BaseObject& o, const Vector& value) { o.SetRelRot(value); }},
+    {kObjectRelScale, [](BaseObject& o) { return o.relScale_; },
+     [](BaseObject& o, const Vector& value) { o.SetRelScale(value); }},
+    {kObjectDisplayColor, [](BaseObject& o) { return o.TakeDisplayColor(); },
+     [](BaseObject& o, const Vector& value) { o.displayColor_ = value; }},
+    {kObjectGlobalPos, [](BaseObject& o) { return o.GetGlobalMatrix().off; },
+     [](BaseObject& o, const Vector& value) { o.SetGlobalPos(value); }},
+    {kObjectGlobalRot, [](BaseObject& o) { return o.GetGlobalAngles(); },
+     [](BaseObject& o, const Vector& value) { o.SetGlobalAngles(value); }},
+    {kObjectStoredVector, [](BaseObject& o) { return o.storedVector_; },
+     [](BaseObject& o, const Vector& value) { o.storedVector_ = value; }},
+    {kObjectFrozenPos, [](BaseObject& o) { return o.frozenPos_; },
+     [](BaseObject& o, const Vector& value) { o.SetFrozenPos(value); }},
+    {kObjectFrozenRot, [](BaseObject& o) { return o.frozenRot_; },
+     [](BaseObject& o, const Vector& value) { o.SetFrozenRot(value); }},
+    {kObjectFrozenScale, [](BaseObject& o) { return o.frozenScale_; },
+     [](BaseObject& o, const Vector& value) { o.SetFrozenScale(value); }},
+    {kObjectAbsPos, [](BaseObject& o) { return o.absPos_; },
+     [](BaseObject& o, const Vector& value) { o.SetAbsPos(value); }},
+    {kObjectAbsRot, [](BaseObject& o) { return o.absRot_; },
+     [](BaseObject& o, const Vector& value) { o.SetAbsRot(value); }},
+    {kObjectAbsScale, [](BaseObject& o) { return o.absScale_; },
+     [](BaseObject& o, const Vector& value) { o.SetAbsScale(value); }},
+};
+
+Bool BaseObject::GetParameter(const ParameterPath& path, GeData& value)
+{
+  if (objectData_ && objectData_->GetParameter(path, value))
+    return true;
+  if (const LongParameter* row = FindRow(kLongParameters, path[0].id)) {
+    value = GeData(row->get(*this));
+    return true;
+  }
+  const VectorParameter* row = FindRow(kVectorParameters, path[0].id);
+  if (!row)
+    return BaseList2D::GetParameter(path, value);
+  return !NamesVectorPart(path[1].id) || GetVectorParameter(row->get(*this), path, value);
+}
+
+Bool BaseObject::SetParameter(const ParameterPath& path, const GeData& value)
+{
+  if (objectData_ && objectData_->SetParameter(path, value))
+    return true;
+  if (const LongParameter* row = FindRow(kLongParameters, path[0].id)) {
+    row->set(*this, value.GetLong());
+    return true;
+  }
+  const VectorParameter* row = FindRow(kVectorParameters, path[0].id);
+  if (!row)
+    return BaseList2D::SetParameter(path, value);
+  if (!NamesVectorPart(path[1].id))
+    return true;
+  Vector whole = row->get(*this);
+  SetVectorParameter(whole, path, value);
+  row->set(*this, whole);
+  return true;
+}
+
+} // namespace _torvane_

@@ -1,0 +1,323 @@
+// The transform model of the scene object: a relative transform on top of an optional frozen one. The relative values
+// are what users and animation work with; the absolute ones, from which the local matrix is made, follow from both.
+#include "torvane/base_object.h"
+
+#include "torvane/base_tag.h"
+
+namespace _torvane_
+{
+
+namespace
+{
+
+constexpr Vector kNoScale(1.0, 1.0, 1.0);
+
+Vector MultiplyEach(const Vector& a, const Vector& b) { return {a.x * b.x, a.y * b.y, a.z * b.z}; }
+
+// A quotient by 0 is 0.
+Vector DivideEach(const Vector& a, const Vector& b)
+{
+  return {b.x == 0.0 ? 0.0 : a.x / b.x, b.y == 0.0 ? 0.0 : a.y / b.y, b.z == 0.0 ? 0.0 : a.z / b.z};
+}
+
+void ScaleAxes(Matrix& matrix, const Vector& scale)
+{
+  matrix.v1 *= scale.x;
+  matrix.v2 *= scale.y;
+  matrix.v3 *= scale.z;
+}
+
+// A scale of 0 leaves the axis as it is.
+void UnscaleAxis(Vector& axis, Real scale)
+{
+  if (scale != 0.0)
+    axis = {axis.x / scale, axis.y / scale, axis.z / scale};
+}
+
+Vector NearestAngles(const Vector& reference, const Matrix& matrix, Long order)
+{
+  return ClosestAngles(reference, MatrixToAngles(matrix, order), order);
+}
+
+void Mirror(Vector& axis, Real& length)
+{
+  axis = -axis;
+  length = -length;
+}
+
+} // namespace
+
+Vector BaseObject::DerivedAbsPos() const
+{
+  return HasFrozenTransform() ? frozenMatrix_ * relPos_ + frozenPos_ : relPos_;
+}
+
+Vector BaseObject::DerivedAbsScale() const { return MultiplyEach(relScale_, frozenScale_); }
+
+Vector BaseObject::DerivedAbsRot() const
+{
+  return NearestAngles(relRot_, Multiply(frozenMatrix_, rotationMatrix_), rotationOrder_);
+}
+
+void BaseObject::TakeRelAsAbs()
+{
+  absPos_ = relPos_;
+  absRot_ = relRot_;
+  absScale_ = relScale_;
+}
+
+// The rotation from the object to its parent, frozen part included, without scale and offset.
+Matrix BaseObject::GetRotation() const
+{
+  return (frozenFlags_ & kFrozenRot) ? Multiply(frozenMatrix_, rotationMatrix_) : rotationMatrix_;
+}
+
+const Matrix& BaseObject::GetLocalMatrix()
+{
+  if (matrixDirty_) {
+    matrixCache_ = GetRotation();
+    ScaleAxes(matrixCache_, absScale_);
+    matrixCache_.off = absPos_;
+    matrixDirty_ = false;
+  }
+  return matrixCache_;
+}
+
+Matrix BaseObject::GetGlobalMatrix()
+{
+  Matrix matrix = GetLocalMatrix();
+  for (BaseObject* up = GetUp(); up; up = up->GetUp())
+    matrix = Multiply(up->GetLocalMatrix(), matrix);
+  return matrix;
+}
+
+Matrix BaseObject::GetUpGlobalMatrix() const
+{
+  BaseObject* up = GetUp();
+  return up ? up->GetGlobalMatrix() : Matrix();
+}
+
+Matrix BaseObject::GetNormalizedLocalMatrix() const
+{
+  Matrix matrix = GetRotation();
+  matrix.off = absPos_;
+  return matrix;
+}
+
+Matrix BaseObject::GetNormalizedGlobalMatrix()
+{
+  Matrix matrix = GetNormalizedLocalMatrix();
+  for (BaseObject* up = GetUp(); up; up = up->GetUp())
+    matrix = Multiply(up->GetNormalizedLocalMatrix(), matrix);
+  matrix.off = GetGlobalMatrix().off;
+  return matrix;
+}
+
+Matrix BaseObject::GetRelativeMatrix() const
+{
+  Matrix matrix = GetRelativeNormalizedMatrix();
+  ScaleAxes(matrix, relScale_);
+  return matrix;
+}
+
+Matrix BaseObject::GetRelativeNormalizedMatrix() const
+{
+  Matrix matrix = rotationMatrix_;
+  matrix.off = relPos_;
+  return matrix;
+}
+
+Matrix BaseObject::GetFrozenTransformMatrix() const
+{
+  if (!HasFrozenTransform())
+    return Matrix();
+  Matrix matrix = frozenMatrix_;
+  matrix.off = frozenPos_;
+  return matrix;
+}
+
+void BaseObject::SetRelPos(const Vector& value)
+{
+  if (value == relPos_ || IsProtected())
+    return;
+  relPos_ = value;
+  absPos_ = DerivedAbsPos();
+  matrixDirty_ = true;
+}
+
+void BaseObject::SetRelScale(const Vector& value)
+{
+  if (IsProtected())
+    return;
+  relScale_ = value;
+  absScale_ = (frozenFlags_ & kFrozenScale) ? DerivedAbsScale() : relScale_;
+  matrixDirty_ = true;
+}
+
+void BaseObject::SetRelRot(const Vector& value)
+{
+  if (value == relRot_ || IsProtected())
+    return;
+  relRot_ = value;
+  rotationMatrix_ = AnglesToMatrix(relRot_, rotationOrder_);
+  absRot_ = (frozenFlags_ & kFrozenRot) ? DerivedAbsRot() : relRot_;
+  matrixDirty_ = true;
+}
+
+// The setters of absolute values go through the relative ones and then store the value itself: the way there and back
+// would leave it slightly off.
+
+void BaseObject::SetAbsPos(const Vector& value)
+{
+  if (value == absPos_ || IsProtected())
+    return;
+  if (!HasFrozenTransform()) {
+    SetRelPos(value);
+    return;
+  }
+  SetRelPos(frozenInverse_ * (value - frozenPos_));
+  absPos_ = value;
+  matrixDirty_ = true;
+}
+
+void BaseObject::SetAbsScale(const Vector& value)
+{
+  if (IsProtected())
+    return;
+  if (!(frozenFlags_ & kFrozenScale)) {
+    SetRelScale(value);
+    return;
+  }
+  SetRelScale(DivideEach(value, frozenScale_));
+  absScale_ = value;
+  matrixDirty_ = true;
+}
+
+void BaseObject::SetAbsRot(const Vector& value)
+{
+  if (value == absRot_ || IsProtected())
+    return;
+  if (!HasFrozenTransform()) {
+    SetRelRot(value);
+    return;
+  }
+  Matrix relative = Multiply(frozenInverse_, AnglesToMatrix(value, rotationOrder_));
+  Vector angles = NearestAngles(value, relative, rotationOrder_);
+  SetRelRot(angles);
+  if (angles == relRot_)
+    absRot_ = value;
+}
+
+void BaseObject::SetFrozenPos(const Vector& value)
+{
+  if (value == frozenPos_ || IsProtected())
+    return;
+  frozenPos_ = value;
+  SetFrozenFlag(kFrozenPos, value != Vector());
+  absPos_ = DerivedAbsPos();
+  matrixDirty_ = true;
+}
+
+void BaseObject::SetFrozenScale(const Vector& value)
+{
+  if (value == frozenScale_ || IsProtected())
+    return;
+  frozenScale_ = value;
+  SetFrozenFlag(kFrozenScale, value != kNoScale);
+  absScale_ = HasFrozenTransform() ? DerivedAbsScale() : relScale_;
+  matrixDirty_ = true;
+}
+
+void BaseObject::SetFrozenRot(const Vector& value)
+{
+  if (value == frozenRot_ || IsProtected())
+    return;
+  frozenRot_ = value;
+  frozenMatrix_ = AnglesToMatrix(frozenRot_, rotationOrder_);
+  Bool turned = frozenMatrix_ != Matrix();
+  frozenInverse_ = turned ? Invert(frozenMatrix_) : Matrix();
+  SetFrozenFlag(kFrozenRot, turned);
+  absPos_ = DerivedAbsPos();
+  absRot_ = HasFrozenTransform() ? DerivedAbsRot() : relRot_;
+  matrixDirty_ = true;
+}
+
+void BaseObject::SetRotationOrder(Long order)
+{
+  if (order == rotationOrder_ || IsProtected())
+    return;
+  rotationOrder_ = order;
+  relRot_ = MatrixToAngles(rotationMatrix_, order);
+  rotationMatrix_ = AnglesToMatrix(relRot_, order);
+  absRot_ = (frozenFlags_ & kFrozenRot) ? DerivedAbsRot() : relRot_;
+  matrixDirty_ = true;
+}
+
+// A matrix tells mirroring only by its handedness. Which axes are the mirrored ones is taken from the scale that the
+// object had: z and x keep their sign, and y follows from the handedness.
+void BaseObject::SetRelativeMatrix(const Matrix& matrix)
+{
+  if (matrix == GetRelativeMatrix() || IsProtected())
+    return;
+  Matrix axes(Vector(), matrix.v1, matrix.v2, matrix.v3);
+  Vector scale(Length(axes.v1), Length(axes.v2), Length(axes.v3));
+  Vector angles;
+  if (relScale_ != Vector()) {
+    if (relScale_.z < 0.0)
+      Mirror(axes.v3, scale.z);
+    if (relScale_.x < 0.0)
+      Mirror(axes.v1, scale.x);
+    if (Dot(Cross(axes.v1, axes.v2), axes.v3) < 0.0)
+      Mirror(axes.v2, scale.y);
+    axes = Matrix(Vector(), Normalize(axes.v1), Normalize(axes.v2), Normalize(axes.v3));
+    angles = NearestAngles(relRot_, axes, rotationOrder_);
+  }
+  relPos_ = matrix.off;
+  relRot_ = angles;
+  relScale_ = scale;
+  rotationMatrix_ = relScale_ != Vector() ? AnglesToMatrix(relRot_, rotationOrder_) : Matrix();
+  matrixDirty_ = true;
+  TakeRelAsAbs();
+  if (HasFrozenTransform()) {
+    absPos_ = DerivedAbsPos();
+    absRot_ = DerivedAbsRot();
+    absScale_ = DerivedAbsScale();
+  }
+}
+
+void BaseObject::SetLocalMatrix(const Matrix& matrix)
+{
+  if (matrix == GetLocalMatrix() || IsProtected())
+    return;
+  if (!HasFrozenTransform()) {
+    SetRelativeMatrix(matrix);
+    return;
+  }
+  Matrix relative = matrix;
+  relative.off -= frozenPos_;
+  relative = Multiply(frozenInverse_, relative);
+  UnscaleAxis(relative.v1, frozenScale_.x);
+  UnscaleAxis(relative.v2, frozenScale_.y);
+  UnscaleAxis(relative.v3, frozenScale_.z);
+  SetRelativeMatrix(relative);
+}
+
+void BaseObject::SetGlobalMatrix(const Matrix& matrix)
+{
+  if (matrix == GetGlobalMatrix() || IsProtected())
+    return;
+  BaseObject* up = GetUp();
+  SetLocalMatrix(up ? Multiply(Invert(up->GetGlobalMatrix()), matrix) : matrix);
+}
+
+Vector BaseObject::GetGlobalAngles() { return NearestAngles(relRot_, GetGlobalMatrix(), rotationOrder_); }
+
+void BaseObject::SetGlobalPos(const Vector& value) { SetAbsPos(Invert(GetUpGlobalMatrix()) * value); }
+
+void BaseObject::SetGlobalAngles(const Vector& value)
+{
+  Matrix local = Multiply(Invert(GetUpGlobalMatrix()), AnglesToMatrix(value, rotationOrder_));
+  SetAbsRot(MatrixToAngles(local, rotationOrder_));
+}
+
+} // namespace _torvane_

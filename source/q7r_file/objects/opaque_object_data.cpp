@@ -1,0 +1,25 @@
+#include "q7r_file/objects/opaque_object_data.h"
+
+#include "torvane/hyper_file.h"
+#include "torvane/ids.h"
+
+namespace _torvane_
+{
+
+Bool OpaqueObjectData::CopyTo(PrivateChunk& destination, ULong, TransArray*)
+{
+  return destination.IsInstanceOf(type_) && body_.CopyTo(static_cast<OpaqueObjectData&>(destination).body_);
+}
+
+Bool OpaqueObjectData::ReadData(HyperFile& file, Long id, Long level)
+{
+  if (id != kChunkNodeData || !body_.Read(file, level))
+    return false;
+  // The end tag was read with the body; who reads a node's data goes on to the end of the chunk and wants to find it.
+  if (file.GetFile().Seek(-1, kSeekRelative))
+    return true;
+  file.SetError(FILEERROR_SEEK);
+  return false;
+}
+
+} // namespace _torvane_

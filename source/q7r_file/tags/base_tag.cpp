@@ -1,0 +1,123 @@
+#include "torvane/base_tag.h"
+
+#include "k2v_file/chunk_visitor.h"
+#include "q7r_file/nodes/node_data_chunk.h"
+#include "q7r_file/tags/tag_makers.h"
+#include "torvane/hooks.h"
+
+namespace _torvane_
+{
+
+BaseTag::BaseTag(Long type, Long pluginId) : BaseList2D(type), pluginId_(pluginId)
+{
+  if (type != kTagTarget)
+    return;
+  data_.SetLink(kTargetLink, nullptr);
+  data_.SetLink(kTargetUpLink, nullptr);
+  data_.SetBool(kTargetFlag, true);
+}
+
+BaseTag::~BaseTag() { DeleteObj(nodeData_); }
+
+const void* BaseTag::GetEntryBytes(LLong& size) const
+{
+  size = 0;
+  return nullptr;
+}
+
+void BaseTag::SetNodeData(NodeData* data)
+{
+  if (data == nodeData_)
+    return;
+  DeleteObj(nodeData_);
+  nodeData_ = data;
+  if (data)
+    data->SetNode(this);
+}
+
+Bool BaseTag::ReadChunk(HyperFile& file, Long id, Long level)
+{
+  if (BaseList2D::ReadChunk(file, id, level))
+    return true;
+  if (id != kChunkNodeData)
+    return false;
+  String name;
+  ChunkReader reader(file, level);
+  if (!VisitNodeDataHead(reader, pluginId_, name))
+    return false;
+  if (!name_.Content())
+    name_ = name;
+  return ReadNodeDataBody(file, id, level, pluginId_, {*this, nodeData_, raw_});
+}
+
+void BaseTag::WriteChunks(HyperFile& file)
+{
+  BaseList2D::WriteChunks(file);
+  if (GetDiskType() != kTagPlugin)
+    return;
+  WriteChunk(file, kChunkNodeData, NodeDataLevel(nodeData_, raw_), [&](ChunkWriter& v) {
+    if (VisitNodeDataHead(v, pluginId_, name_))
+      WriteNodeDataBody(file, nodeData_, raw_);
+  });
+}
+
+Bool BaseTag::CopyTagData(BaseTag&, ULong, TransArray*) { return true; }
+
+// The destination's behaviour object comes from the client, or from the library for a type that the client leaves to
+// it.
+Bool BaseTag::CopyPluginData(BaseTag& destination, ULong flags, TransArray* translation)
+{
+  destination.pluginId_ = pluginId_;
+  if (!nodeData_) {
+    // What the destination was made with would be written in place of the bytes.
+    DeleteObj(destination.nodeData_);
+    return raw_.CopyTo(destination.raw_);
+  }
+  Bool known = false;
+  NodeData* data = AllocNodeData(pluginId_, known);
+  if (!known && !data)
+    data = AllocTagDataOfType(pluginId_, known);
+  if (known && !data)
+    return false;
+  if (!AttachNodeData(data, {destination, destination.nodeData_, destination.raw_}))
+    return false;
+  return !data || !known || nodeData_->CopyTo(*data, flags, translation);
+}
+
+Bool BaseTag::CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation)
+{
+  auto& target = static_cast<BaseTag&>(destination);
+  if (!BaseList2D::CopyTo(target, flags, translation))
+    return false;
+  // A plug-in tag may bear the number of another class.
+  if (GetType() != target.GetType() || GetDiskType() != target.GetDiskType())
+    return false;
+  if (!CopyTagData(target, flags, translation))
+    return false;
+  return GetDiskType() != kTagPlugin || CopyPluginData(target, flags, translation);
+}
+
+Bool BaseTag::GetParameter(const ParameterPath& path, GeData& value)
+{
+  return (nodeData_ && nodeData_->GetParameter(path, value)) || BaseList2D::GetParameter(path, value);
+}
+
+Bool BaseTag::SetParameter(const ParameterPath& path, const GeData& value)
+{
+  return (nodeData_ && nodeData_->SetParameter(path, value)) || BaseList2D::SetParameter(path, value);
+}
+
+GeListNode* BaseTag::MakeClone(ULong flags, TransArray* translation)
+{
+  BaseTag* clone = MakeTag(GetType());
+  if (clone && clone->GetDiskType() != GetDiskType()) {
+    // A plug-in's type that the factory doesn't list: the copy is of the same kind all the same.
+    DeleteObj(clone);
+    clone = NewObj<BaseTag>(GetDiskType(), GetPluginId());
+  }
+  if (clone && !CopyWithTranslation(*clone, flags, translation))
+    DeleteObj(clone);
+  return clone;
+}
+
+} // namespace _torvane_
