@@ -34,7 +34,8 @@ Vector MatrixToAngles(const Matrix& matrix, Long order) noexcept;
 Vector ClosestAngles(const Vector& reference, const Vector& angles, Long order) noexcept;
 // Heading and pitch that point the third axis along a direction.
 Vector VectorToAngles(const Vector& direction) noexcept;
-// The axis has length 1; (0, 1, 0) with an angle of 0 when the frame has no axis.
+// The axis has length 1 and the sense that turns the frame back: AxisAngleToMatrix of it gives the inverse rotation.
+// (0, 1, 0) with an angle of 0 when the frame has no axis.
 void MatrixToAxisAngle(const Matrix& matrix, Vector& axis, Real& angle) noexcept;
 // The identity for an axis without length or an angle of 0.
 Matrix AxisAngleToMatrix(const Vector& axis, Real angle) noexcept;
