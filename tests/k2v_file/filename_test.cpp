@@ -155,6 +155,8 @@ TEST(Filename, LeavesWrittenBlocksToTheDescription)
   counting_memory::BalanceCheck balance;
   MemoryDescription description;
   EXPECT_EQ(description.flags, kMemoryOwnsBlock);
+  description.flags = kMemoryMayRead;
+  description.data = "not its own";
   std::vector<UChar> bytes(160000);
   for (std::size_t i = 0; i < bytes.size(); ++i)
     bytes[i] = static_cast<UChar>(i * 7 >> 3);
@@ -162,6 +164,7 @@ TEST(Filename, LeavesWrittenBlocksToTheDescription)
     Filename name;
     name.SetMemoryWrite(&description);
     EXPECT_EQ(description.flags, 6);
+    EXPECT_EQ(description.data, nullptr); // what it does not own it must not free
     Filename copy = name;
     EXPECT_TRUE(copy.GetMemoryDescription()->writer.Write(bytes.data(), 160000));
   }

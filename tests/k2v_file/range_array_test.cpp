@@ -156,6 +156,42 @@ TEST(RangeArray, DoublesAndHalvesItsBlock)
   }
 }
 
+// The ranges 0, 4, 8, ... with one more in front of the n-th.
+TEST(PagedRangeArray, SplitsAFullPageAtAnyPlace)
+{
+  counting_memory::BalanceCheck balance;
+  for (Long n = 0; n <= GePagedRangeArray::kPageEntries; ++n) {
+    GePagedRangeArray set;
+    Ranges expected;
+    for (Long i = 0; i < GePagedRangeArray::kPageEntries; ++i) {
+      ASSERT_TRUE(set.AddIndex(4 * i));
+      expected.emplace_back(4 * i, 4 * i);
+    }
+    ASSERT_TRUE(set.AddIndex(4 * n - 2));
+    expected.insert(expected.begin() + n, {4 * n - 2, 4 * n - 2});
+    ASSERT_EQ(RangesOf(set), expected) << n;
+  }
+}
+
+TEST(PagedRangeArray, GivesEmptyPagesBack)
+{
+  counting_memory::BalanceCheck balance;
+  GePagedRangeArray set;
+  for (Long n = 0; n < 3 * GePagedRangeArray::kPageEntries; ++n)
+    ASSERT_TRUE(set.AddIndex(2 * n));
+  const LLong blocks = counting_memory::Get().blocks;
+  for (Long n = 512; n < 1024; ++n)
+    ASSERT_TRUE(set.RemoveIndex(2 * n));
+  EXPECT_EQ(counting_memory::Get().blocks, blocks - 1);
+  GeRange range{};
+  ASSERT_TRUE(set.GetRange(512, range));
+  EXPECT_EQ(range.first, 2048);
+  EXPECT_FALSE(set.TestIndex(1024));
+  EXPECT_TRUE(set.AddIndex(1500));
+  EXPECT_TRUE(set.SetRange(1, 0));
+  EXPECT_EQ(set.GetRangeCount(), 0);
+}
+
 TEST(PagedRangeArray, KeepsItsCursorOnTheRangeLastFound)
 {
   GePagedRangeArray set;

@@ -30,10 +30,30 @@ TEST(String, KeepsCapacityAtMultiplesOf16AndReusesTheBlock)
     Long length, capacity;
   };
   const Step steps[] = {
-      {[&] { text.FillChars(1, u'a'); }, 1, 16},    {[&] { text.FillChars(16, u'b'); }, 16, 16},
-      {[&] { text.InsertChar(16, u'c'); }, 17, 32}, {[&] { text.Append(Repeat(15)); }, 32, 32},
-      {[&] { text.Delete(3, 100); }, 3, 32},        {[&] { text.Trim(); }, 3, 16},
-      {[&] { text.FillChars(0, u'a'); }, 0, 16},    {[&] { text.Trim(); }, 0, 0},
+      {[&] { text.FillChars(1, u'a'); }, 1, 16},
+      {[&] { text.FillChars(16, u'b'); }, 16, 16},
+      {[&] { text.InsertChar(16, u'c'); }, 17, 32},
+      {[&] { text.Append(Repeat(15)); }, 32, 32},
+      {[&] {
+         text.Delete(16, 9);
+         text.Trim();
+       },
+       23, 32},
+      {[&] {
+         text.Delete(16, 7);
+         text.Trim();
+       },
+       16, 32},
+      {[&] {
+         text.Delete(15, 1);
+         text.Trim();
+       },
+       15, 16},
+      {[&] { text.FillChars(40, u'd'); }, 40, 48},
+      {[&] { text.Delete(3, 100); }, 3, 48},
+      {[&] { text.Trim(); }, 3, 16},
+      {[&] { text.FillChars(0, u'a'); }, 0, 16},
+      {[&] { text.Trim(); }, 0, 0},
   };
   for (const Step& step : steps) {
     step.act();
