@@ -35,7 +35,7 @@ const Suite* Acquire(host::StandaloneHost& host, const char* name, std::int32_t 
 
 struct Stage
 {
-  explicit Stage(const std::string& layers, const std::string& more = "") : host(Load(layers, more)) {}
+  explicit Stage(const std::string& layerList, const std::string& more = "") : host(Load(layerList, more)) {}
   explicit Stage(host::Project project) : host(std::move(project)) {}
 
   host::StandaloneHost host;
