@@ -8,6 +8,7 @@
 #include "q7r_file/objects/opaque_object_data.h"
 #include "support/assertion_counter.h"
 #include "support/counting_memory.h"
+#include "torvane/base_document.h"
 #include "torvane/base_object.h"
 #include "torvane/base_tag.h"
 #include "torvane/ge_data.h"
@@ -55,11 +56,12 @@ Bytes NodeDataChunk(Long type, Long level, const Bytes& body)
 // A body of values and nested chunks that nobody knows.
 const Bytes kStrangeBody = ByteWriter().Long(42).Start(7, 1).String(u"inner").End().Real(0.5).bytes;
 
-// Polygon data, as a client's class would be: it keeps what it is asked to read.
+// Polygon or point data, as a client's class would be: it keeps what it is asked to read.
 class PolygonLikeData : public NodeData
 {
  public:
-  Long GetDiskType() const override { return kObjectPolygonLabel; }
+  explicit PolygonLikeData(Long diskType = kObjectPolygonLabel) : diskType_(diskType) {}
+  Long GetDiskType() const override { return diskType_; }
   void WriteChunks(HyperFile& file) override
   {
     file.WriteChunkStart(110119, 3);
@@ -73,6 +75,16 @@ class PolygonLikeData : public NodeData
   }
   Long readId = 0;
   Long readLevel = 0;
+
+ private:
+  Long diskType_;
+};
+
+class SplineLikeObject : public BaseObject
+{
+ public:
+  SplineLikeObject() : BaseObject(kObjectSpline) {}
+  Long GetDiskType() const override { return kObjectSpline; }
 };
 
 class EntriesTag : public BaseTag
@@ -112,8 +124,8 @@ TEST(BaseObject, SumsThePointsAndPolygonsOfPolygonObjectsAlone)
 {
   for (Long type : {kObjectPolygon, kObjectNull}) {
     BaseObject object(type);
-    object.InsertTag(NewObj<EntriesTag>(kTagPolygon, "6789"));
     object.InsertTag(NewObj<EntriesTag>(kTagPoint, "12345"));
+    object.InsertTag(NewObj<EntriesTag>(kTagPolygon, "6789"));
     BytesOf(object);
     EXPECT_EQ(static_cast<ULong>(object.GetDataInstance().GetLong(kKeyModelCheckSum, 1)),
               type == kObjectPolygon ? 0xCBF43926u : 0u);
@@ -136,7 +148,7 @@ TEST(BaseObject, ReadsEveryFormOfTheTransformChunk)
           w.Start(132, 1).Long(-1).Long(77).Long(15).Long(5).End();
         w.Vector(1, 2, 3).Vector(2, 3, 4).Vector(0.1, 0.2, 0.3);
         if (old) // the second matrix mirrors x, and z by the number beside its diagonal
-          w.IdentityMatrix().Matrix({0, 0, 0, -1, 0, 0, 0, 1, -1, 0, 0, -1});
+          w.IdentityMatrix().Matrix({0, 0, 0, -1, 0, 0, 0, 1, -1, 0, 0, 1});
         if (oldest)
           w.String(u"old name");
         if (!oldest || level >= 1)
@@ -298,6 +310,33 @@ TEST(BaseObject, PolygonChunksStandBesideTheTransformAndReachTheData)
     EXPECT_EQ(data->readId, row.beside ? 110119 : 0);
     EXPECT_EQ(data->readLevel, row.beside ? 3 : 0);
   }
+}
+
+TEST(BaseObject, ASplineWritesItsChunksWithoutAChunkAroundThem)
+{
+  const std::string start = "01 00 01 AD F0"; // chunk 110064
+  SplineLikeObject object;
+  EXPECT_EQ(ToHex(BytesOf(object)).find(start), std::string::npos);
+  object.SetObjectData(NewObj<PolygonLikeData>(kObjectPoint));
+  const std::string hex = ToHex(BytesOf(object));
+  EXPECT_EQ(hex.find(start), std::string::npos);
+  EXPECT_LT(hex.find("01 00 01 AE 27 00 00 00 03 02"), hex.find("01 00 01 AD E4")); // 110119, then 110052
+  // Values that nobody knows can't stand among an object's chunks: they keep theirs.
+  const Bytes unknown = NodeDataChunk(kUnknownType, 2, kStrangeBody);
+  ASSERT_TRUE(ReadInto(object, unknown));
+  EXPECT_NE(ToHex(BytesOf(object)).find(ToHex(unknown)), std::string::npos);
+}
+
+TEST(BaseObject, HandsItsDocumentToAllThatItHolds)
+{
+  BaseDocument document;
+  BaseObject* object = MakeNamed("object");
+  object->MakeTag(kTagProtection);
+  MakeNamed("child", object)->MakeTag(kTagTarget);
+  document.InsertObject(object);
+  EXPECT_EQ(object->GetFirstTag()->GetDocument(), &document);
+  EXPECT_EQ(object->GetDown()->GetFirstTag()->GetDocument(), &document);
+  EXPECT_EQ(object->MakeTag(kTagTarget)->GetDocument(), &document);
 }
 
 TEST(BaseObject, MakesTheTypesOfItsTable)

@@ -90,6 +90,12 @@ TEST(ObjectTransform, AbsoluteValuesAreBroughtUnderTheFrozenPartAndKeptExactly)
   EXPECT_EQ(object.GetAbsPos(), Vector(7, 22, 31));
   EXPECT_EQ(object.GetAbsScale(), Vector(10, 24, 56));
   EXPECT_EQ(object.GetAbsRot(), Vector(kPiValue, 0, 0));
+  for (const Vector& value : {Vector(0.3, 0.2, 0.1), Vector(-2.1, 1.3, 0.7)}) { // not lost on the way there and back
+    object.SetAbsPos(value);
+    object.SetAbsRot(value);
+    EXPECT_EQ(object.GetAbsPos(), value);
+    EXPECT_EQ(object.GetAbsRot(), value);
+  }
   object.SetFrozenScale({2, 0, 8});
   object.SetAbsScale({4, 5, 16});
   EXPECT_EQ(object.GetRelScale(), Vector(2, 0, 2)) << "a quotient by 0 is 0";
