@@ -24,8 +24,8 @@ struct BaseObject::VectorParameter
 namespace
 {
 
-template <class Row, std::size_t count>
-const Row* FindRow(const Row (&rows)[count], Long id)
+template <class Row, std::size_t Count>
+const Row* FindRow(const Row (&rows)[Count], Long id)
 {
   for (const Row& row : rows)
     if (row.id == id)

@@ -8,10 +8,10 @@ namespace _torvane_
 namespace
 {
 
-template <BaseTag* (*make)()>
+template <BaseTag* (*Make)()>
 BaseTag* MakeOf(Long)
 {
-  return make();
+  return Make();
 }
 
 BaseTag* MakePluginTag(Long type) { return NewObj<BaseTag>(kTagPlugin, type); }
