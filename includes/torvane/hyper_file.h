@@ -277,6 +277,28 @@ class HyperFile : public GeMemory
   Bool GetReals(UChar tag, void* values, Bool asFloats);
   Bool PutText(UChar tag, const String& text);
   Bool GetText(UChar tag, String& text);
+  // Room for `count` bytes: in the file's buffer, or else `spare`. FinishRoom hands them to the file.
+  UChar* TakeRoom(UChar* spare, LLong count)
+  {
+    UChar* place = file_.WriteWindow(count);
+    return place ? place : spare;
+  }
+  Bool FinishRoom(const UChar* place, const UChar* spare, LLong count)
+  {
+    if (place == spare)
+      return file_.WriteBytes(spare, count);
+    file_.CommitWrite(count);
+    return true;
+  }
+  // The next `count` bytes: in the file's buffer, or else read to `spare`. Null on failure.
+  const UChar* TakeBytes(UChar* spare, LLong count)
+  {
+    const UChar* place = file_.ReadWindow(count);
+    if (!place)
+      return file_.ReadBytes(spare, count) == count ? spare : nullptr;
+    file_.CommitRead(count);
+    return place;
+  }
   // A tag, and the 32-bit length behind it.
   Bool PutBlockHead(UChar tag, ULong length);
   Bool GetBlockHead(UChar tag, LLong& length);

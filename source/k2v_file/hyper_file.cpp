@@ -270,26 +270,27 @@ Bool HyperFile::GetSlow(UChar tag, ULLong& bits, LLong size)
 Bool HyperFile::ReadPlainLong(Long& value)
 {
   LLong start = file_.GetPosition();
-  return file_.ReadLong(value) || FailFromFile(start);
+  UChar raw[4];
+  const UChar* place = TakeBytes(raw, sizeof raw);
+  if (!place)
+    return FailFromFile(start);
+  value = static_cast<Long>(bytes::GetBig<ULong>(place));
+  return true;
 }
 
 template <LLong kCount>
 Bool HyperFile::PutReals(UChar tag, const void* values, Bool asFloats)
 {
-  LLong size = 1 + kCount * (asFloats ? 4 : 8);
   if (error_ != FILEERROR_NONE)
     return false;
-  if (UChar* place = file_.WriteWindow(size)) {
-    place[0] = tag;
-    PackReals<kCount>(place + 1, values, asFloats);
-    file_.CommitWrite(size);
-  } else {
-    LLong start = file_.GetPosition();
-    UChar raw[1 + kCount * 8] = {tag};
-    PackReals<kCount>(raw + 1, values, asFloats);
-    if (!file_.WriteBytes(raw, size))
-      return FailFromFile(start);
-  }
+  LLong start = file_.GetPosition();
+  LLong size = 1 + kCount * (asFloats ? 4 : 8);
+  UChar raw[1 + kCount * 8];
+  UChar* place = TakeRoom(raw, size);
+  place[0] = tag;
+  PackReals<kCount>(place + 1, values, asFloats);
+  if (!FinishRoom(place, raw, size))
+    return FailFromFile(start);
   TickWrite();
   return true;
 }
@@ -297,19 +298,14 @@ Bool HyperFile::PutReals(UChar tag, const void* values, Bool asFloats)
 template <LLong kCount>
 Bool HyperFile::GetReals(UChar tag, void* values, Bool asFloats)
 {
-  LLong size = kCount * (asFloats ? 4 : 8);
   LLong start = file_.GetPosition();
   if (!ExpectTag(tag))
     return false;
-  if (const UChar* place = file_.ReadWindow(size)) {
-    UnpackReals<kCount>(place, values, asFloats);
-    file_.CommitRead(size);
-  } else {
-    UChar raw[kCount * 8];
-    if (file_.ReadBytes(raw, size) != size)
-      return FailFromFile(start);
-    UnpackReals<kCount>(raw, values, asFloats);
-  }
+  UChar raw[kCount * 8];
+  const UChar* place = TakeBytes(raw, kCount * (asFloats ? 4 : 8));
+  if (!place)
+    return FailFromFile(start);
+  UnpackReals<kCount>(place, values, asFloats);
   TickRead();
   return true;
 }

@@ -36,14 +36,10 @@ Bool HyperFile::WriteArray(const void* data, Long type, LLong stride, LLong coun
   while (count > 0) {
     UChar buffer[kPieceSize];
     LLong now = LimitToTick(count < kPieceSize / size ? count : kPieceSize / size);
-    if (UChar* place = file_.WriteWindow(now * size)) {
-      pack(place, memory, stride, now);
-      file_.CommitWrite(now * size);
-    } else {
-      pack(buffer, memory, stride, now);
-      if (!file_.WriteBytes(buffer, now * size))
-        return FailFromFile(start);
-    }
+    UChar* place = TakeRoom(buffer, now * size);
+    pack(place, memory, stride, now);
+    if (!FinishRoom(place, buffer, now * size))
+      return FailFromFile(start);
     memory += now * stride;
     count -= now;
     TickMany(now);
@@ -91,15 +87,10 @@ Bool HyperFile::ReadElements(void* data, Long type, Long storedType, LLong strid
   while (count > 0) {
     UChar buffer[kPieceSize];
     LLong now = LimitToTick(count < kPieceSize / size ? count : kPieceSize / size);
-    if (const UChar* place = file_.ReadWindow(now * size)) {
-      unpack(memory, place, stride, now);
-      file_.CommitRead(now * size);
-    } else {
-      UChar* landing = inPlace ? memory : buffer;
-      if (file_.ReadBytes(landing, now * size) != now * size)
-        return FailFromFile(start);
-      unpack(memory, landing, stride, now);
-    }
+    const UChar* place = TakeBytes(inPlace ? memory : buffer, now * size);
+    if (!place)
+      return FailFromFile(start);
+    unpack(memory, place, stride, now);
     memory += now * stride;
     count -= now;
     TickMany(now);

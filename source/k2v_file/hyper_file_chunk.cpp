@@ -60,10 +60,12 @@ Bool HyperFile::WriteChunkStart(Long id, Long level)
   if (error_ != FILEERROR_NONE)
     return false;
   LLong start = file_.GetPosition();
-  UChar raw[9] = {kTagChunkStart};
-  bytes::PutBig(raw + 1, static_cast<ULong>(id));
-  bytes::PutBig(raw + 5, static_cast<ULong>(level));
-  if (!file_.WriteBytes(raw, sizeof raw))
+  UChar raw[9];
+  UChar* place = TakeRoom(raw, sizeof raw);
+  place[0] = kTagChunkStart;
+  bytes::PutBig(place + 1, static_cast<ULong>(id));
+  bytes::PutBig(place + 5, static_cast<ULong>(level));
+  if (!FinishRoom(place, raw, sizeof raw))
     return FailFromFile(start);
   TickWrite();
   return true;
@@ -74,7 +76,10 @@ Bool HyperFile::WriteChunkEnd()
   if (error_ != FILEERROR_NONE)
     return false;
   LLong start = file_.GetPosition();
-  if (!file_.WriteUChar(kTagChunkEnd))
+  UChar raw[1];
+  UChar* place = TakeRoom(raw, sizeof raw);
+  place[0] = kTagChunkEnd;
+  if (!FinishRoom(place, raw, sizeof raw))
     return FailFromFile(start);
   TickWrite();
   return true;
@@ -124,10 +129,10 @@ Bool HyperFile::SkipValue(UChar tag)
       return Fail(FILEERROR_WRONG_VALUE, start);
   } else if (tag <= kTagArray) {
     // All of them by a 32-bit length, so that a memory block with a 64-bit length can't be passed over.
-    ULong length = 0;
-    if (!file_.ReadULong(length))
-      return FailFromFile(start);
-    count = length;
+    Long length = 0;
+    if (!ReadPlainLong(length))
+      return false;
+    count = static_cast<ULong>(length);
     if (version_ < kTrueLegacyLengths && !singlePrecision_ && tag == kTagLegacyPointArray)
       count *= 2;
     if (version_ < kTrueLegacyLengths && !singlePrecision_ && tag == kTagLegacyArray)

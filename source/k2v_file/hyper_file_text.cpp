@@ -33,18 +33,19 @@ Bool HyperFile::PutBlockHead(UChar tag, ULong length)
   if (error_ != FILEERROR_NONE)
     return false;
   LLong start = file_.GetPosition();
-  return (file_.WriteUChar(tag) && file_.WriteULong(length)) || FailFromFile(start);
+  UChar raw[5];
+  UChar* place = TakeRoom(raw, sizeof raw);
+  place[0] = tag;
+  bytes::PutBig(place + 1, length);
+  return FinishRoom(place, raw, sizeof raw) || FailFromFile(start);
 }
 
 Bool HyperFile::GetBlockHead(UChar tag, LLong& length)
 {
-  LLong start = file_.GetPosition();
-  ULong stored = 0;
-  if (!ExpectTag(tag))
+  Long stored = 0;
+  if (!ExpectTag(tag) || !ReadPlainLong(stored))
     return false;
-  if (!file_.ReadULong(stored))
-    return FailFromFile(start);
-  length = stored;
+  length = static_cast<ULong>(stored);
   return true;
 }
 

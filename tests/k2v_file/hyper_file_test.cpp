@@ -3,6 +3,7 @@
 #include <cmath>
 #include <cstring>
 #include <limits>
+#include <thread>
 
 #include <gtest/gtest.h>
 
@@ -11,6 +12,7 @@
 #include "support/counting_memory.h"
 #include "support/temp_folder.h"
 #include "torvane/bitmap.h"
+#include "torvane/network_connection.h"
 
 using namespace _torvane_;
 using namespace hyper_file_bytes;
@@ -344,6 +346,40 @@ TEST(HyperFile, TakesNoMemoryForALengthThatTheFileCannotHold)
   EXPECT_TRUE(read.file.HasRoomFor(2, 5));
   EXPECT_FALSE(read.file.HasRoomFor(3, 5));
   EXPECT_FALSE(MemoryReadFile(ByteWriter().Header().Long(1).bytes).file.HasRoomFor(-1, 1));
+}
+
+TEST(HyperFile, TakesMemoryAsBytesComeWhereTheLengthIsUnknown)
+{
+  AssertionCounter quiet;
+  counting_memory::BalanceCheck balance;
+  const std::string block(400000, 'n');
+  ByteWriter writer;
+  writer.Header().Memory(block).String(std::u16string(50000, u'x')).U8(130).U32(0xFFFFFFF0).Raw(block);
+  NetworkListener listener;
+  NetworkConnection near;
+  NetworkConnection far;
+  ASSERT_TRUE(listener.Listen() && near.Connect("127.0.0.1", listener.GetPort()) && listener.Accept(far));
+  near.SetTimeout(5000);
+  far.SetTimeout(5000);
+  std::thread sender([&] {
+    Filename name;
+    name.SetIpConnection(&far);
+    BaseFile file;
+    file.Open(name, kFileWrite);
+    file.WriteBytes(writer.bytes.data(), static_cast<LLong>(writer.bytes.size()));
+    file.Close();
+  });
+  Filename name;
+  name.SetIpConnection(&near);
+  HyperFile file;
+  String text;
+  ASSERT_TRUE(file.Open(kSceneIdent, name, kHyperFileRead));
+  EXPECT_TRUE(ReadsMemory(file, block) && file.ReadString(text) && text == String(50000, u'x'));
+  counting_memory::ResetPeak();
+  EXPECT_FALSE(file.ReadString(text));
+  EXPECT_EQ(file.GetError(), FILEERROR_READ);
+  EXPECT_LT(counting_memory::Get().peakBytes, 4'000'000);
+  sender.join();
 }
 
 TEST(HyperFile, KeepsStepAcrossTheBorderOfTheDiskBuffer)
