@@ -203,15 +203,15 @@ TEST(HyperFileArray, CountsEveryElementForTheProgressHooks)
   std::vector<Long> positions;
   Bytes bytes = WriteToMemory(
       [&](HyperFile& file) {
-        file.WriteArray(elements.data(), kArrayByte, 1, 49999); // counted, though nobody listens yet
+        file.WriteArray(elements.data(), kArrayByte, 1, 120000); // counted, though nobody listens yet
         file.SetWriteProgress(Record, &positions);
         file.WriteChar(1);
         file.WriteArray(elements.data(), kArrayByte, 1, 120000);
       },
       true);
-  // 50000 values are past: the next one calls, and then every 50000th.
-  const Long first = 13 + 6 + 49999 + 2 + 6;
-  EXPECT_EQ(positions, (std::vector<Long>{first + 1, first + 50001, first + 100001}));
+  // Of 50001, 100001, 150001, ... values in all, two were due before anybody listened.
+  const Long first = 13 + 6 + 120000 + 2 + 6;
+  EXPECT_EQ(positions, (std::vector<Long>{first + 30000, first + 80000}));
 
   // By the rule, value by value: a call when the counter has reached the threshold, from where it goes on at 1.
   std::vector<Long> expected;
@@ -225,15 +225,15 @@ TEST(HyperFileArray, CountsEveryElementForTheProgressHooks)
     }
     ++counter;
   };
-  for (Long i = 1; i <= 49999; ++i)
+  for (Long i = 1; i <= 120000; ++i)
     tick(19 + i, false);
-  tick(19 + 49999 + 2, true);
+  tick(19 + 120000 + 2, true);
   for (Long i = 1; i <= 120000; ++i)
     tick(first + i, true);
   MemoryReadFile read(bytes);
   std::vector<Long> percents;
   Char one = 0;
-  ASSERT_TRUE(read.file.ReadArray(elements.data(), kArrayByte, 1, 49999));
+  ASSERT_TRUE(read.file.ReadArray(elements.data(), kArrayByte, 1, 120000));
   read.file.SetReadProgress(Record, &percents);
   ASSERT_TRUE(read.file.ReadChar(one) && read.file.ReadArray(elements.data(), kArrayByte, 1, 120000));
   EXPECT_EQ(percents, expected);
