@@ -1,0 +1,43 @@
+// q7r: scene files from compositions, and tools for scene files.
+#include <cstdio>
+#include <exception>
+
+#include "torvane/assertion.h"
+#include "verbs.h"
+
+namespace
+{
+
+constexpr const char* kDescription = R"(Exports compositions into .q7r scene files and works on such files.
+
+Results go to standard output, messages to standard error. Exit status: 0 done;
+1 done, but problems were reported; 2 not done.)";
+
+int Run(int argc, char** argv)
+{
+  CLI::App program(kDescription, "q7r");
+  program.set_version_flag("--version", "q7r 1.0.0 (scene file version 13000)");
+  program.require_subcommand(1);
+  int status = q7r::kDone;
+  q7r::AddExport(program, status);
+  try {
+    program.parse(argc, argv);
+  } catch (const CLI::ParseError& error) {
+    return program.exit(error) == 0 ? q7r::kDone : q7r::kNotDone;
+  }
+  return status;
+}
+
+} // namespace
+
+int main(int argc, char** argv)
+{
+  // The library's own reports are for its developers; what matters to a user comes as an error.
+  _torvane_::SetAssertionLog(nullptr);
+  try {
+    return Run(argc, argv);
+  } catch (const std::exception& error) {
+    std::fprintf(stderr, "q7r: %s\n", error.what());
+    return q7r::kNotDone;
+  }
+}

@@ -1,0 +1,26 @@
+// The verbs of the command line. Each adds itself to the program; when it was chosen it runs inside the parse.
+#pragma once
+
+#include <CLI/CLI.hpp>
+
+namespace q7r
+{
+
+// What the program ends with.
+enum ExitStatus : int
+{
+  kDone = 0,
+  kProblems = 1, // done, but with problems that were told
+  kNotDone = 2,
+};
+
+// A verb that can't do its work throws this; main prints the message as one line and ends with kNotDone.
+class Failure : public std::runtime_error
+{
+ public:
+  using std::runtime_error::runtime_error;
+};
+
+void AddExport(CLI::App& program, int& status);
+
+} // namespace q7r
