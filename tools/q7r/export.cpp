@@ -22,7 +22,7 @@ lights and image planes. docs/composition.md tells which keys are read.
 Example: q7r export shot.json shot.q7r --composition "Main")";
 
 constexpr const char* kMenuEntry = "KORVEX Exporter...";
-constexpr const char* kSuffix = ".q7r";
+constexpr const char* kSuffix = "q7r";
 
 struct Options
 {
@@ -36,8 +36,10 @@ struct Options
 // brought to that form at once: then the question about an existing file is about the file that is written.
 std::string WithSuffix(const std::string& path)
 {
-  std::filesystem::path output(path);
-  return output.extension() == kSuffix ? path : output.replace_extension(kSuffix).string();
+  _torvane_::Filename output = ToFilename(path);
+  if (!output.CheckSuffix(kSuffix))
+    output.SetSuffix(kSuffix);
+  return ToUtf8(output.GetString());
 }
 
 // What must hold before the exporter is asked, since it answers all of it with a number.
