@@ -22,5 +22,11 @@ class Failure : public std::runtime_error
 };
 
 void AddExport(CLI::App& program, int& status);
+void AddInfo(CLI::App& program, int& status);
+void AddTree(CLI::App& program, int& status);
+void AddDump(CLI::App& program, int& status);
+void AddCheck(CLI::App& program, int& status);
+void AddResave(CLI::App& program, int& status);
+void AddMerge(CLI::App& program, int& status);
 
 } // namespace q7r
