@@ -53,8 +53,9 @@ bool IsTerminal()
 
 Filename ToFilename(const std::string& path)
 {
-  // UTF-8 to UTF-16 by code points: the library's own decoder knows characters of the basic plane alone.
-  std::u16string wide = std::filesystem::path(path).u16string();
+  // UTF-8 to UTF-16 by code points: the library's own decoder knows characters of the basic plane alone. The path is
+  // made absolute because one that begins with "?" could stand for a connection or a stream.
+  std::u16string wide = std::filesystem::absolute(std::filesystem::path(path)).u16string();
   Filename name;
   name.SetString(String(reinterpret_cast<const UniChar*>(wide.data()), static_cast<Long>(wide.size())));
   return name;
