@@ -1,0 +1,59 @@
+// The classes that stand behind the library's nodes in this program. Each is its base with at most one field more.
+#pragma once
+
+#include "torvane/base_object.h"
+#include "torvane/layer_object.h"
+#include "torvane/render_data.h"
+#include "torvane/root_list.h"
+
+namespace exporter
+{
+
+using _torvane_::BaseList2D;
+using _torvane_::BaseObject;
+using _torvane_::Bool;
+using _torvane_::Long;
+
+class AlienLayer : public _torvane_::LayerObject
+{
+ public:
+  Bool Execute() override { return true; }
+};
+
+class AlienRenderData : public _torvane_::RenderData
+{};
+
+// Planes: all that the exporter knows of them is in their container.
+class AlienPrimitiveObjectData : public _torvane_::NodeData
+{
+ public:
+  explicit AlienPrimitiveObjectData(Long type) : type_(type) {}
+  Long GetPrimitiveType() const { return type_; }
+  Bool Execute() override { return true; }
+
+ private:
+  Long type_;
+};
+
+class AlienRootObject : public _torvane_::RootObject
+{
+ public:
+  BaseObject* AllocMember(Long type) override;
+};
+
+class AlienRootMaterial : public _torvane_::RootMaterial
+{};
+
+class AlienRootLayer : public _torvane_::RootLayer
+{
+ public:
+  BaseList2D* AllocMember() override;
+};
+
+class AlienRootRenderData : public _torvane_::RootRenderData
+{
+ public:
+  BaseList2D* AllocMember() override;
+};
+
+} // namespace exporter

@@ -1,0 +1,11 @@
+// Writes the active composition to a scene file.
+#pragma once
+
+namespace exporter
+{
+
+// `path` is UTF-8. False when the document can't be made or the file can't be opened, and for a null path. An empty
+// path gives true and writes nothing. A write that fails later is not seen here: the result is still true.
+bool WriteSceneFile(const char* path);
+
+} // namespace exporter

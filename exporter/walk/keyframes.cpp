@@ -1,0 +1,237 @@
+#include "exporter/walk/keyframes.h"
+
+#include <algorithm>
+#include <array>
+#include <cmath>
+
+#include "exporter/walk/layer_sample.h"
+
+namespace exporter
+{
+
+using namespace _torvane_;
+
+namespace
+{
+
+constexpr Real kThinTolerance = 1e-6;
+constexpr std::int64_t kLastKeySecond = 10000; // curves take no keys beyond
+
+// The frames from 0 to this one are sampled, unless keys end before.
+Long LastFrame(const ExportContext& context)
+{
+  const std::int64_t lastKey = kLastKeySecond * std::max(context.framesPerSecond, 1);
+  return static_cast<Long>(std::min<std::int64_t>(context.frameCount, lastKey));
+}
+
+// Counted from the start of the composition, not of the work area.
+A_Time FrameTime(const ExportContext& context, Long frame)
+{
+  const std::int64_t value = std::int64_t{frame} * context.frameDuration.value;
+  return {static_cast<A_long>(value), context.frameDuration.scale};
+}
+
+ParameterPath ComponentPath(Long parameter, Long component)
+{
+  return {ParameterLevel{parameter, kDataVector, 0}, ParameterLevel{kVectorX + component, kDataReal, 0}};
+}
+
+// A stream's value in the terms of its tracks.
+class ValueConverter
+{
+ public:
+  ValueConverter(const ExportContext& context, const StreamSampling& sampling)
+      : sampling_(sampling), pixelAspect_(context.pixelAspect)
+  {}
+
+  std::array<Real, 3> Convert(const AEGP_StreamVal2& value, const AEGP_StreamVal2& second);
+
+ private:
+  const StreamSampling& sampling_;
+  Real pixelAspect_;
+  Real lastEnumerator_ = 0.0;
+};
+
+std::array<Real, 3> ValueConverter::Convert(const AEGP_StreamVal2& value, const AEGP_StreamVal2& second)
+{
+  const AEGP_ThreeDVal& v = value.three_d;
+  switch (sampling_.mode) {
+  case SampleMode::kPosition: {
+    const Vector place = FlipY(ToVector(v)) + sampling_.parentShift;
+    return {place.x, place.y, place.z};
+  }
+  case SampleMode::kValue:
+    return {v.x / sampling_.divisor, v.y / sampling_.divisor, v.z / sampling_.divisor};
+  case SampleMode::kFieldOfView:
+    return {FieldOfView(value.one_d, sampling_.width, pixelAspect_)};
+  case SampleMode::kAngle:
+    return {DegreesToRadians(value.one_d)};
+  case SampleMode::kCone:
+    return {DegreesToRadians(value.one_d), InnerAngle(value.one_d, second.one_d)};
+  case SampleMode::kEnumeration:
+    if (value.one_d == 2.0)
+      lastEnumerator_ = 8.0;
+    else if (value.one_d == 3.0)
+      lastEnumerator_ = 10.0;
+    return {lastEnumerator_};
+  case SampleMode::kColor:
+    return {value.color.redF, value.color.greenF, value.color.blueF};
+  }
+  return {};
+}
+
+} // namespace
+
+SampledTrack::SampledTrack(ExportContext& context, BaseObject* object, const ParameterPath& path, const String& name,
+                           Content content)
+    : context_(context),
+      object_(object),
+      track_(CTrack::Alloc(object, path, name)),
+      content_(content),
+      comparesData_(track_ && track_->GetKind() != kTrackValue)
+{}
+
+bool SampledTrack::IsSame(Real a, Real b) const
+{
+  // Numbers in a track that compares data, and the other way round, all look the same.
+  if (comparesData_ != (content_ == Content::kData))
+    return true;
+  return comparesData_ ? a == b : std::abs(a - b) < kThinTolerance;
+}
+
+void SampledTrack::Add(Long frame, Real value)
+{
+  if (!track_)
+    return;
+  if (isEmpty_) {
+    isEmpty_ = false;
+    AddSampledKey(frame, value);
+    previous_ = value;
+    return;
+  }
+  if (hasPending_) {
+    if (!IsSame(previous_, pending_) || !IsSame(value, pending_))
+      AddSampledKey(pendingFrame_, pending_);
+    previous_ = pending_;
+  }
+  hasPending_ = true;
+  pendingFrame_ = frame;
+  pending_ = value;
+}
+
+void SampledTrack::AddSampledKey(Long frame, Real value)
+{
+  CCurve* curve = track_->GetCurve(1, 1);
+  CKey* key = curve ? curve->AddKey(KeyTime(context_, frame)) : nullptr;
+  if (!key)
+    return;
+  constexpr Long kSet = 1;
+  key->ChangeNBit(kKeyBitAutomatic, kSet);
+  key->ChangeNBit(kKeyBitClamp, kSet);
+  if (content_ == Content::kData)
+    key->SetGeData(curve, static_cast<Long>(value));
+  else
+    key->SetValue(curve, value);
+}
+
+bool SampledTrack::IsConstant()
+{
+  CCurve* curve = track_->GetCurve(1, 1);
+  if (!curve || curve->GetKeyCount() != 2)
+    return !curve || curve->GetKeyCount() < 2;
+  const CKey& first = *curve->GetKey(0);
+  const CKey& last = *curve->GetKey(1);
+  return comparesData_ ? first.GetGeData().IsEqual(last.GetGeData()) : first.GetValue() == last.GetValue();
+}
+
+void SampledTrack::Finish()
+{
+  if (!track_)
+    return;
+  if (hasPending_)
+    AddSampledKey(pendingFrame_, pending_);
+  if (IsConstant())
+    track_.reset();
+  Insert();
+}
+
+void SampledTrack::Insert()
+{
+  if (track_)
+    object_->InsertTrackLast(track_.release());
+}
+
+VectorTracks::VectorTracks(ExportContext& context, BaseObject* object, Long parameter, const char* const (&names)[3])
+    : tracks_{{context, object, ComponentPath(parameter, 0), names[0]},
+              {context, object, ComponentPath(parameter, 1), names[1]},
+              {context, object, ComponentPath(parameter, 2), names[2]}}
+{}
+
+void VectorTracks::Add(Long frame, const Vector& value)
+{
+  tracks_[0].Add(frame, value.x);
+  tracks_[1].Add(frame, value.y);
+  tracks_[2].Add(frame, value.z);
+}
+
+void VectorTracks::Finish()
+{
+  for (SampledTrack& track : tracks_)
+    track.Finish();
+}
+
+void VectorTracks::Insert()
+{
+  for (SampledTrack& track : tracks_)
+    track.Insert();
+}
+
+bool SampleStream(ExportContext& context, HostCalls& host, AEGP_StreamRefH stream, std::span<SampledTrack> tracks,
+                  const StreamSampling& sampling)
+{
+  if (!stream || tracks.empty() || !tracks[0])
+    return false;
+  ValueConverter converter(context, sampling);
+  AEGP_StreamVal2 value = {};
+  AEGP_StreamVal2 second = {};
+  const Long lastFrame = LastFrame(context);
+  for (Long frame = 0; frame <= lastFrame; ++frame) {
+    const A_Time time = FrameTime(context, frame);
+    ReadStream(host, stream, time, value);
+    if (sampling.secondStream)
+      ReadStream(host, sampling.secondStream, time, second);
+    if (!host.Good())
+      break;
+    const std::array<Real, 3> values = converter.Convert(value, second);
+    for (std::size_t i = 0; i < tracks.size() && i < values.size(); ++i)
+      tracks[i].Add(frame, values[i]);
+  }
+  for (SampledTrack& track : tracks)
+    track.Finish();
+  return host.Good();
+}
+
+bool SampleTransform(ExportContext& context, HostCalls& host, const HostStream& anchorStream,
+                     const HostStream& scaleStream, TransformTracks& tracks, const TransformRules& rules)
+{
+  if (!context.positionStream || !context.rotateXStream || !context.rotateYStream || !context.rotateZStream ||
+      !context.orientationStream)
+    return false;
+  LayerSample sample;
+  Vector previousRotation;
+  const Long lastFrame = LastFrame(context);
+  for (Long frame = 0; frame <= lastFrame; ++frame) {
+    if (!ReadLayerSample(host, context, anchorStream, scaleStream, FrameTime(context, frame), sample))
+      break;
+    const SceneTransform transform = ConvertTransform(sample, rules, frame > 0 ? &previousRotation : nullptr);
+    previousRotation = transform.rotation;
+    tracks.position.Add(frame, transform.position);
+    tracks.rotation.Add(frame, transform.rotation);
+    tracks.scale.Add(frame, transform.scale);
+  }
+  for (VectorTracks* vector : {&tracks.position, &tracks.rotation, &tracks.scale})
+    vector->Finish();
+  return host.Good();
+}
+
+} // namespace exporter

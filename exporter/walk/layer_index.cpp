@@ -1,0 +1,59 @@
+#include "exporter/walk/layer_index.h"
+
+namespace exporter
+{
+
+using namespace _torvane_;
+
+namespace
+{
+
+// The object behind this one, depth first; null at the end.
+BaseObject* NextDepthFirst(BaseObject* object)
+{
+  if (BaseObject* child = object->GetDown())
+    return child;
+  while (object && !object->GetNext())
+    object = object->GetUp();
+  return object ? object->GetNext() : nullptr;
+}
+
+} // namespace
+
+Long GetLayerId(const BaseObject& object) { return object.GetDataInstance().GetLong(kLayerIdKey, kNoLayerId); }
+
+BaseObject* FindLayerObject(BaseObject* first, Long layerId)
+{
+  if (layerId == kNoLayerId)
+    return nullptr;
+  for (BaseObject* object = first; object; object = NextDepthFirst(object)) {
+    if (GetLayerId(*object) == layerId)
+      return object;
+  }
+  return nullptr;
+}
+
+void LayerIndex::Add(Long layerId, BaseObject* object)
+{
+  Entry& entry = entries_[layerId];
+  if (entry.copies > 0 && (entry.number >= firstOfUse_ || entry.composition != composition_))
+    trusted_ = false;
+  entry = {object, composition_, count_, entry.copies + 1};
+  ++count_;
+}
+
+BaseObject* LayerIndex::Find(BaseObject* first, Long layerId)
+{
+  if (!complete_)
+    return FindLayerObject(first, layerId);
+  auto found = entries_.find(layerId);
+  if (found == entries_.end() || layerId == kNoLayerId)
+    return nullptr;
+  const Entry& entry = found->second;
+  if (entry.copies == 1 || (trusted_ && entry.number >= firstOfUse_))
+    return entry.newest;
+  trusted_ = false;
+  return FindLayerObject(first, layerId);
+}
+
+} // namespace exporter
