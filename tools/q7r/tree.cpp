@@ -40,7 +40,8 @@ std::string Quoted(const String& text) { return "\"" + ToUtf8(text) + "\""; }
 std::string Numbers(const Vector& v, Real factor = 1.0)
 {
   char buffer[120];
-  std::snprintf(buffer, sizeof buffer, "(%.6g, %.6g, %.6g)", v.x * factor, v.y * factor, v.z * factor);
+  std::snprintf(buffer, sizeof buffer, "(%.6g, %.6g, %.6g)", v.x * factor + 0.0, v.y * factor + 0.0,
+                v.z * factor + 0.0); // no "-0"
   return buffer;
 }
 
