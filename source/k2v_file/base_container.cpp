@@ -71,6 +71,8 @@ BaseContainer::BaseContainer(BaseContainer&& other) noexcept : id_(other.id_)
   savedDirty_ = other.savedDirty_;
 }
 
+// CopyTo leaves a container that is copied to itself alone.
+// NOLINTNEXTLINE(bugprone-unhandled-self-assignment)
 BaseContainer& BaseContainer::operator=(const BaseContainer& other)
 {
   if (!other.CopyTo(*this, 0, nullptr))

@@ -84,7 +84,9 @@ Bool BaseContainer::SetParameter(const ParameterPath& path, const GeData& value)
   if (last <= 0)
     return SetData(path[0].id, value) != nullptr;
 
-  const GeData copy(value); // making a group may remove the element that `value` lies in
+  // Making a group may remove the element that `value` lies in.
+  // NOLINTNEXTLINE(performance-unnecessary-copy-initialization)
+  const GeData copy(value);
   BaseContainer* container = this;
   MarkDirty();
   for (Long i = 0; i < last; ++i) {
