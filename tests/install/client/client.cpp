@@ -1,15 +1,18 @@
-// A program of the library's user: it has its own hooks and uses nothing but the installed package.
+// A program of the library's user: it has its own hooks and uses nothing but the installed package. Saves a document
+// with one object under the name that it is given, loads it again and looks whether the object is there.
+#include <cstdio>
 #include <cstdlib>
 
+#include "torvane/base_document.h"
+#include "torvane/ge_string.h"
 #include "torvane/hooks.h"
 #include "torvane/memory.h"
-
-using namespace _torvane_;
+#include "torvane/root_list.h"
 
 namespace
 {
 
-long gBlocks = 0;
+long gBlocks = 0; // allocated and not yet freed
 
 void* Counted(void* block)
 {
@@ -40,12 +43,66 @@ void MemFree(void** block)
   *block = nullptr;
 }
 
+void GetWriterInfo(Long& id, String& name)
+{
+  id = 0;
+  name = "client";
+}
+
+NodeData* AllocNodeData(Long, Bool& known)
+{
+  known = false;
+  return nullptr;
+}
+
+RootObject* AllocRootObject() { return NewObj<RootObject>(); }
+RootMaterial* AllocRootMaterial() { return NewObj<RootMaterial>(); }
+RootLayer* AllocRootLayer() { return NewObj<RootLayer>(); }
+RootRenderData* AllocRootRenderData() { return NewObj<RootRenderData>(); }
+
+Bool BaseDocument::BuildScene(Long) { return true; }
+
 } // namespace _torvane_
 
-int main()
+namespace
 {
-  void* block = GeAlloc(16);
-  bool taken = gBlocks == 1;
-  GeFree(block);
-  return taken && gBlocks == 0 ? EXIT_SUCCESS : EXIT_FAILURE;
+
+using namespace _torvane_;
+
+const char* const kName = "from a client";
+
+bool Save(const char* path)
+{
+  BaseDocument* document = CreateDocument();
+  BaseObject* object = AllocObject(kObjectNull);
+  bool saved = document && object;
+  if (saved) {
+    object->SetName(kName);
+    document->InsertObject(object);
+    FileProblem problem;
+    saved = SaveDocument(document, path, 0, &problem) && problem.code == FILEERROR_NONE;
+  }
+  BaseDocument::Free(document);
+  return saved;
+}
+
+bool Load(const char* path)
+{
+  BaseDocument* document = LoadDocument(path, LoadObjects | LoadMaterials);
+  const BaseObject* object = document ? document->GetFirstObject() : nullptr;
+  bool found = object && object->GetName() == kName;
+  BaseDocument::Free(document);
+  return found;
+}
+
+} // namespace
+
+int main(int argc, char** argv)
+{
+  if (argc != 2)
+    return EXIT_FAILURE;
+  bool saved = Save(argv[1]);
+  bool loaded = saved && Load(argv[1]);
+  std::printf("saved: %d, loaded: %d, blocks left: %ld\n", saved, loaded, gBlocks);
+  return loaded && gBlocks == 0 ? EXIT_SUCCESS : EXIT_FAILURE;
 }
