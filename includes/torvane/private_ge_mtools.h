@@ -223,8 +223,7 @@ class GeTempDynArray : public GeMemory
   // Room for `capacity` elements in all, exactly.
   Bool Reserve(Long capacity) noexcept
   {
-    return capacity <= capacity_ ||
-           detail::SetArrayCapacity(block_, capacity_, count_, capacity, static_cast<LLong>(sizeof(T)));
+    return capacity <= capacity_ || detail::SetArrayCapacity(block_, capacity_, count_, capacity, kElementSize);
   }
   // Cuts the array, or lengthens it with elements of zero bytes.
   Bool SetCount(Long count) noexcept;
@@ -239,16 +238,17 @@ class GeTempDynArray : public GeMemory
   // Replaces the destination's elements and its way to grow. On failure it holds what still fitted.
   Bool CopyTo(GeTempDynArray& destination) const noexcept;
 
-  void Sort(GeSortAndSearch& order) noexcept { order.Sort(block_, count_, static_cast<Long>(sizeof(T))); }
+  void Sort(GeSortAndSearch& order) noexcept { order.Sort(block_, count_, static_cast<Long>(kElementSize)); }
 
  private:
+  static constexpr LLong kElementSize = sizeof(T); // NOLINT(bugprone-sizeof-expression): T may be a pointer
+
   Bool Grow() noexcept
   {
-    return count_ < capacity_ ||
-           detail::GrowArray(block_, capacity_, count_, firstCapacity_, increment_, static_cast<LLong>(sizeof(T)));
+    return count_ < capacity_ || detail::GrowArray(block_, capacity_, count_, firstCapacity_, increment_, kElementSize);
   }
   Bool Holds(Long position) const noexcept { return position >= 0 && position < count_; }
-  static std::size_t Bytes(Long count) noexcept { return static_cast<std::size_t>(count) * sizeof(T); }
+  static std::size_t Bytes(Long count) noexcept { return static_cast<std::size_t>(count * kElementSize); }
 
   void* block_ = nullptr;
   Long count_ = 0;

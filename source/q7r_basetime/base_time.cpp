@@ -91,9 +91,10 @@ void BaseTime::ReduceLarge() noexcept
   }
   if (y < 1.0)
     y = denominator_ = 1.0;
-  for (Real rest = std::fmod(x, y); rest >= 0.5; rest = std::fmod(x, y)) {
-    x = y;
-    y = rest;
+  Real rest = std::fmod(x, y);
+  while (rest >= 0.5) {
+    x = std::exchange(y, rest);
+    rest = std::fmod(x, y);
   }
   numerator_ /= y;
   denominator_ /= y;

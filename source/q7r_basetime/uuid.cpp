@@ -47,7 +47,7 @@ struct Stock
 };
 
 std::atomic<unsigned> gProcess{0};
-[[maybe_unused]] const int gForkWatch =
+[[maybe_unused]] const int kForkWatch =
     pthread_atfork(nullptr, nullptr, [] { gProcess.fetch_add(1, std::memory_order_relaxed); });
 
 Bool TakeRandom(UChar* bytes)
