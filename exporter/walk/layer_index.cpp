@@ -50,9 +50,10 @@ BaseObject* LayerIndex::Find(BaseObject* first, Long layerId)
   if (found == entries_.end() || layerId == kNoLayerId)
     return nullptr;
   const Entry& entry = found->second;
-  if (entry.copies == 1 || (trusted_ && entry.number >= firstOfUse_))
+  // Moving an object of another use would mix the two.
+  trusted_ = trusted_ && entry.number >= firstOfUse_ && entry.composition == composition_;
+  if (trusted_ || entry.copies == 1)
     return entry.newest;
-  trusted_ = false;
   return FindLayerObject(first, layerId);
 }
 

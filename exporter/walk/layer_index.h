@@ -25,9 +25,9 @@ _torvane_::BaseObject* FindLayerObject(_torvane_::BaseObject* first, _torvane_::
 //
 // An id that one object carries needs no more than a table. A composition that is used several times repeats its ids,
 // and then the search finds the newest copy: objects are made at the top of the document, the layers of one use are
-// linked before the next use is walked, and linking moves them only below objects that are no newer than their own
-// composition's plane or that belong to the same use. Where this does not hold (an id made twice in one use, or by two
-// compositions; an id of which this use has no copy) the index falls back on the search, for good.
+// linked before the next use is walked, and linking moves them only below objects of the same use or below the plane
+// that the use stands for. Where this does not hold (an id made twice in one use, or by two compositions; an id of
+// which this use has no copy) the index falls back on the search, for good.
 class LayerIndex
 {
  public:
@@ -55,6 +55,9 @@ class LayerIndex
     AEGP_CompH outerComposition_;
   };
 
+  // True while the newest copy of every id is known to be the first in the document.
+  bool IsTrusted() const { return trusted_; }
+
   // Makes every search a walk: for a document that holds objects which were not entered here.
   void Distrust() { complete_ = false; }
 
@@ -78,7 +81,7 @@ class LayerIndex
   std::uint64_t firstOfUse_ = 0;
   AEGP_CompH composition_ = nullptr;
   bool complete_ = true; // every object with an id was entered
-  bool trusted_ = true;  // the newest copy of an id is the first in the document
+  bool trusted_ = true;
 };
 
 } // namespace exporter

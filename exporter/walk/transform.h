@@ -35,13 +35,13 @@ constexpr Vector FlipY(const Vector& v) { return {v.x, -v.y, v.z}; }
 // The transform streams of a layer at one time, as the host gives them.
 struct LayerSample
 {
-  Vector position;
-  Vector anchor; // the point of interest of a camera or light
+  Vector position = Vector();
+  Vector anchor = Vector(); // the point of interest of a camera or light
   Real rotateX = 0.0;
   Real rotateY = 0.0;
   Real rotateZ = 0.0;
-  Vector orientation; // like the rotations in degrees
-  Vector scale;       // percent
+  Vector orientation = Vector(); // like the rotations in degrees
+  Vector scale = Vector();       // percent
 };
 
 // How the samples of one object are to be taken.
@@ -49,17 +49,17 @@ struct TransformRules
 {
   Real width = 0.0; // pixels of the layer's source; 0 for cameras and lights
   Real height = 0.0;
-  Vector parentShift;        // added to every position, see ParentShift
-  bool useAnchor = false;    // the object's axis stands at the centre of its plane, away from the layer's anchor
-  bool lookAtTarget = false; // the rotation begins with the look from the position to the point of interest
+  Vector parentShift = Vector(); // added to every position, see ParentShift
+  bool useAnchor = false;        // the object's axis stands at the centre of its plane, away from the layer's anchor
+  bool lookAtTarget = false;     // the rotation begins with the look from the position to the point of interest
   bool useRotation = false;
   bool useScale = false;
 };
 
 struct SceneTransform
 {
-  Vector position;
-  Vector rotation; // radians, in kExportRotationOrder; zero without useRotation
+  Vector position = Vector();
+  Vector rotation = Vector(); // radians, in kExportRotationOrder; zero without useRotation
   Vector scale = Vector(1.0, 1.0, 1.0);
 };
 

@@ -1,0 +1,270 @@
+#include <gtest/gtest.h>
+
+#include <filesystem>
+#include <fstream>
+
+#include "export_fixture.h"
+#include "exporter/entry/dialog_scripts.h"
+#include "exporter/entry/message_table.h"
+#include "exporter/entry/plugin_state.h"
+#include "exporter/entry/scene_writer.h"
+#include "support/counting_memory.h"
+
+namespace
+{
+
+namespace fs = std::filesystem;
+using namespace export_test;
+using exporter::ExportCommand;
+
+constexpr const char* kProblems = "Q7RExporter: Problems encountered during file export.";
+
+TEST(Entry, RegistersMenuEntryNameAndHooks)
+{
+  host::StandaloneHost host(host::LoadCompositionText(Composition(""), "test.json", "/"));
+  ASSERT_EQ(host.Start(EntryPointFunc), 0);
+  ASSERT_EQ(host.MenuEntries().size(), 1u);
+  EXPECT_EQ(host.MenuEntries()[0].name, "KORVEX Exporter...");
+  EXPECT_EQ(host.MenuEntries()[0].menu, 13);
+  EXPECT_EQ(host.MenuEntries()[0].afterItem, -2);
+  EXPECT_EQ(host.PluginName(), "KORVEX Exporter...");
+  EXPECT_EQ(exporter::PluginId, host.RegisteredPlugin());
+  EXPECT_EQ(host.CallMenuHook(), 0);
+  EXPECT_TRUE(host.IsCommandEnabled(ExportCommand));
+  EXPECT_EQ(host.Balance(), host::HostBalance());
+}
+
+TEST(Entry, GivesTheFirstErrorOfARegistrationAndSaysSo)
+{
+  for (std::uint64_t n = 1; n <= 5; ++n) {
+    host::StandaloneHost host(host::LoadCompositionText(Composition(""), "test.json", "/"));
+    host.FailCall(n, 40);
+    EXPECT_EQ(host.Start(EntryPointFunc), 40) << n;
+    EXPECT_EQ(host.Reports(), std::vector<std::string>{kProblems}) << n;
+    EXPECT_EQ(host.CallCount(), n + 1) << "no call but the message follows a failure";
+    EXPECT_EQ(host.MenuEntries().size(), n > 2 ? 1u : 0u) << n;
+  }
+}
+
+TEST(Entry, DoesNothingWithoutACommand)
+{
+  host::StandaloneHost host(host::LoadCompositionText(Composition(""), "test.json", "/"));
+  host.WithholdCommand();
+  EXPECT_EQ(host.Start(EntryPointFunc), 0);
+  EXPECT_TRUE(host.MenuEntries().empty());
+  EXPECT_TRUE(host.Reports().empty());
+  EXPECT_EQ(host.CallCount(), 1u);
+}
+
+TEST(Entry, ShowsTheDialogsAsOneLineOfScript)
+{
+  const std::string t19(19, '\t');
+  EXPECT_EQ(exporter::kOpenSaveDialogScript,
+            "function openSaveDialog() {" + t19 + R"(var f = File.saveDialog("Q7R Exporter", "*.q7r");)" + t19 +
+                R"(if (f == null) return "";)" + t19 + "return f.fsName;" + t19 + "}" + t19 + "openSaveDialog();");
+  EXPECT_EQ(exporter::kAskOverwriteScript,
+            std::string("function askOverwrite() {\t\t\t") +
+                R"(var foo = confirm("This file already exists. Would you like to replace it?", false, )" +
+                R"("Confirm Save As");)" + "\t\t\t" + R"(return foo ? "true" : "false";)" +
+                "\t\t\t}\t\t\taskOverwrite();");
+}
+
+// A host with the plug-in started, and a folder to write to.
+class CommandHook : public testing::Test
+{
+ protected:
+  void SetUp() override
+  {
+    fs::remove_all(folder_);
+    fs::create_directories(folder_);
+    host_.Start(EntryPointFunc);
+  }
+  void TearDown() override { fs::remove_all(folder_); }
+
+  void Touch(const std::string& name) { std::ofstream(folder_ / name) << "old"; }
+  bool IsScene(const std::string& name) const
+  {
+    char magic[4] = {};
+    std::ifstream(folder_ / name, std::ios::binary).read(magic, 4);
+    return std::string(magic, 4) == "QQ7R";
+  }
+  host::CommandResult Run(const std::string& name)
+  {
+    host_.SetOutputPath(name.empty() ? "" : (folder_ / name).string());
+    return host_.CallCommandHook(ExportCommand);
+  }
+
+  fs::path folder_ = fs::path(TEST_BINARY_DIR) / "command_hook";
+  host::StandaloneHost host_{host::LoadCompositionText(Composition(Solid("A")), "test.json", "/")};
+};
+
+TEST_F(CommandHook, LeavesOtherCommandsAndHandledOnesAlone)
+{
+  const std::uint64_t calls = host_.CallCount();
+  for (auto [command, alreadyHandled] : {std::pair(ExportCommand + 1, false), {ExportCommand, true}}) {
+    host::CommandResult result = host_.CallCommandHook(command, alreadyHandled);
+    EXPECT_EQ(result.error, 0);
+    EXPECT_FALSE(result.isHandled && !alreadyHandled);
+  }
+  EXPECT_EQ(host_.CallCount(), calls);
+}
+
+TEST_F(CommandHook, WritesTheSceneFile)
+{
+  host::CommandResult result = Run("scene.q7r");
+  EXPECT_EQ(result.error, 0);
+  EXPECT_TRUE(result.isHandled);
+  EXPECT_TRUE(IsScene("scene.q7r"));
+  EXPECT_TRUE(host_.Reports().empty());
+  EXPECT_EQ(host_.Balance(), host::HostBalance());
+}
+
+TEST_F(CommandHook, KeepsTheTextOfACancelledDialogLocked)
+{
+  host::CommandResult result = Run("");
+  EXPECT_EQ(result.error, 0);
+  EXPECT_TRUE(result.isHandled);
+  EXPECT_TRUE(host_.Reports().empty());
+  EXPECT_EQ(host_.Balance(), (host::HostBalance{.memoryHandles = 1, .memoryLocks = 1}));
+}
+
+TEST_F(CommandHook, AsksBeforeItReplacesTheFileThatWasNamed)
+{
+  int questions = 0;
+  bool answer = false;
+  host_.OnAskOverwrite([&] { return ++questions, answer; });
+  Touch("scene.q7r");
+  EXPECT_EQ(Run("scene.q7r").error, 0);
+  EXPECT_FALSE(IsScene("scene.q7r"));
+  answer = true;
+  EXPECT_EQ(Run("scene.q7r").error, 0);
+  EXPECT_TRUE(IsScene("scene.q7r"));
+  EXPECT_EQ(questions, 2);
+  EXPECT_EQ(host_.Balance(), host::HostBalance());
+}
+
+TEST_F(CommandHook, ForcesTheSuffixWithoutAskingForTheNewName)
+{
+  struct Case
+  {
+    const char* typed;
+    const char* existing;
+    int questions;
+    const char* written;
+  };
+  const Case cases[] = {
+      {"plain", "plain.q7r", 0, "plain.q7r"},
+      {"a.txt", "a.txt", 1, "a.q7r"},
+      {"b.Q7R", "none", 0, "b.Q7R"},
+      {"c.tar.gz", "none", 0, "c.tar.q7r"},
+      {"d.suffix7", "none", 0, "d.suffix7.q7r"},
+      {"\xC3\xA9t\xC3\xA9", "none", 0, "\xC3\xA9t\xC3\xA9.q7r"},
+  };
+  for (const Case& c : cases) {
+    int questions = 0;
+    host_.OnAskOverwrite([&] { return ++questions, true; });
+    Touch(c.existing);
+    host::CommandResult result = Run(c.typed);
+    EXPECT_EQ(result.error, 0) << c.typed;
+    EXPECT_EQ(questions, c.questions) << c.typed;
+    EXPECT_TRUE(IsScene(c.written)) << c.typed;
+  }
+}
+
+TEST_F(CommandHook, GivesTwoForAFileThatCannotBeOpened)
+{
+  host::CommandResult result = Run("missing/scene.q7r");
+  EXPECT_EQ(result.error, 2);
+  EXPECT_TRUE(result.isHandled);
+  EXPECT_TRUE(host_.Reports().empty());
+  EXPECT_EQ(host_.Balance(), (host::HostBalance{.memoryHandles = 1, .memoryLocks = 1}));
+}
+
+TEST_F(CommandHook, GivesTheErrorOfADialogAndWritesNothing)
+{
+  Touch("scene.q7r");
+  for (std::uint64_t n : {1, 3}) { // the save dialog; the question behind the locking of its answer
+    host_.FailCall(host_.CallCount() + n, 40);
+    host::CommandResult result = Run("scene.q7r");
+    EXPECT_EQ(result.error, 40);
+    EXPECT_TRUE(result.isHandled);
+    EXPECT_NE(host_.LastError().find("AEGP_ExecuteScript"), std::string::npos);
+    EXPECT_FALSE(IsScene("scene.q7r"));
+    EXPECT_EQ(host_.Balance(), host::HostBalance());
+  }
+}
+
+TEST(SceneWriter, TellsAMissingPathFromAnEmptyOne)
+{
+  EXPECT_FALSE(exporter::WriteSceneFile(nullptr));
+  EXPECT_TRUE(exporter::WriteSceneFile(""));
+}
+
+// Every kind of layer, animated and not, nested, locked, parented.
+const std::string kEverything = Composition(
+    Layer(13, "Camera", R"("p":)" + Ramp("[500,250,-1000]", "[500,250,-900]") + R"(,"a":)" + Property("[500,250,0]"),
+          R"("pe":{"k":1000})") +
+        "," + Layer(14, "Spot", R"("a":{"k":[0,0,9]})", R"("light":{"type":"spot"})") + "," +
+        Layer(14, "Ambient", "", R"("light":{"type":"ambient"})") + "," +
+        Solid("Locked", R"("rx":)" + Ramp("[0]", "[90]"), R"("ae":{"locked":true},"parent":9)") + "," +
+        Layer(3, "Null", "", R"("ind":9)") + "," + Layer(2, "", "", R"("refId":"still")") + "," +
+        Layer(0, "Nested", "", R"("refId":"inner")"),
+    R"("ae":{"workArea":[0,2]},"assets":[{"id":"still","p":"a.png","w":8,"h":8},{"id":"inner","nm":"Inner","w":300,"h":200,"layers":[)" +
+        Solid("Inside", R"("s":)" + Ramp("[100,100,100]", "[50,50,50]")) + "," + Layer(5, "Title", "") + "]}]");
+
+// Nothing is said when there is no active composition to be found (three calls), and where a setting keeps its default
+// (six calls).
+constexpr std::uint64_t kSilentCalls = 9;
+
+TEST(Failures, AnyHostCallMayFailAndTheFileIsWrittenAllTheSame)
+{
+  const fs::path file = fs::path(TEST_BINARY_DIR) / "failures.q7r";
+  std::uint64_t started = 0;
+  for (std::uint64_t n = 0;; ++n) { // 0: nothing fails
+    host::StandaloneHost host(host::LoadCompositionText(kEverything, "test.json", "/footage"));
+    ASSERT_EQ(host.Start(EntryPointFunc), 0);
+    started = host.CallCount() + 2; // behind the dialog and the locking of its answer
+    fs::remove(file);
+    host.SetOutputPath(file.string());
+    host.FailCall(n == 0 ? 0 : started + n);
+    const host::CommandResult result = host.CallCommandHook(ExportCommand);
+    ASSERT_EQ(host.Balance(), host::HostBalance()) << n;
+    ASSERT_TRUE(fs::exists(file)) << n;
+    BaseDocument* document = LoadDocument(Filename(file.string().c_str()), LoadObjects | LoadMaterials);
+    ASSERT_NE(document, nullptr) << n;
+    BaseDocument::Free(document);
+    if (n != 0 && started + n > host.CallCount())
+      break; // every call has had its turn
+    const bool isHandle = host.LastError().find("MemHandle") != std::string::npos;
+    if (n <= kSilentCalls) {
+      ASSERT_TRUE(host.Reports().empty()) << n << host.LastError();
+    } else if (!isHandle) {
+      ASSERT_EQ(host.Reports(), std::vector<std::string>{kProblems}) << n << host.LastError();
+    }
+    ASSERT_TRUE(result.isHandled);
+  }
+  fs::remove(file);
+}
+
+TEST(Failures, ARefusedSuiteLeavesAsAnExceptionAndEverythingIsGivenBack)
+{
+  const std::pair<const char*, std::int32_t> suites[] = {
+      {kAEGPUtilitySuite, 11}, {kAEGPMemorySuite, 1}, {kAEGPItemSuite, 13},  {kAEGPCompSuite, 15},
+      {kAEGPLayerSuite, 13},   {kAEGPStreamSuite, 9}, {kAEGPStreamSuite, 7}, {kAEGPKeyframeSuite, 4},
+      {kAEGPFootageSuite, 11}, {kAEGPCameraSuite, 2}, {kAEGPLightSuite, 2},
+  };
+  const fs::path file = fs::path(TEST_BINARY_DIR) / "refused.q7r";
+  for (auto [name, version] : suites) {
+    counting_memory::BalanceCheck balance;
+    host::StandaloneHost host(host::LoadCompositionText(kEverything, "test.json", "/footage"));
+    ASSERT_EQ(host.Start(EntryPointFunc), 0);
+    host.SetOutputPath(file.string());
+    host.RefuseSuite(name, version);
+    fs::remove(file);
+    EXPECT_EQ(host.CallCommandHook(ExportCommand).error, 516) << name << version;
+    EXPECT_EQ(host.Balance(), host::HostBalance()) << name << version;
+  }
+  fs::remove(file);
+}
+
+} // namespace
