@@ -44,30 +44,30 @@ enum SeekMode : Long
 namespace bytes
 {
 
-// Byte `kIndex` of so many that stand in a file from the highest (or the lowest) on. Written out in full, not as a
+// Byte `Index` of so many that stand in a file from the highest (or the lowest) on. Written out in full, not as a
 // loop, a number becomes one store or load and a swap.
-template <class Bits, std::size_t... kIndex>
-inline void PutBig(UChar* place, Bits value, std::index_sequence<kIndex...>)
+template <class Bits, std::size_t... Index>
+inline void PutBig(UChar* place, Bits value, std::index_sequence<Index...>)
 {
-  ((place[kIndex] = static_cast<UChar>(value >> (8 * (sizeof(Bits) - 1 - kIndex)))), ...);
+  ((place[Index] = static_cast<UChar>(value >> (8 * (sizeof(Bits) - 1 - Index)))), ...);
 }
 
-template <class Bits, std::size_t... kIndex>
-inline Bits GetBig(const UChar* place, std::index_sequence<kIndex...>)
+template <class Bits, std::size_t... Index>
+inline Bits GetBig(const UChar* place, std::index_sequence<Index...>)
 {
-  return static_cast<Bits>(((static_cast<ULLong>(place[kIndex]) << (8 * (sizeof(Bits) - 1 - kIndex))) | ...));
+  return static_cast<Bits>(((static_cast<ULLong>(place[Index]) << (8 * (sizeof(Bits) - 1 - Index))) | ...));
 }
 
-template <class Bits, std::size_t... kIndex>
-inline void PutLittle(UChar* place, Bits value, std::index_sequence<kIndex...>)
+template <class Bits, std::size_t... Index>
+inline void PutLittle(UChar* place, Bits value, std::index_sequence<Index...>)
 {
-  ((place[kIndex] = static_cast<UChar>(value >> (8 * kIndex))), ...);
+  ((place[Index] = static_cast<UChar>(value >> (8 * Index))), ...);
 }
 
-template <class Bits, std::size_t... kIndex>
-inline Bits GetLittle(const UChar* place, std::index_sequence<kIndex...>)
+template <class Bits, std::size_t... Index>
+inline Bits GetLittle(const UChar* place, std::index_sequence<Index...>)
 {
-  return static_cast<Bits>(((static_cast<ULLong>(place[kIndex]) << (8 * kIndex)) | ...));
+  return static_cast<Bits>(((static_cast<ULLong>(place[Index]) << (8 * Index)) | ...));
 }
 
 template <class Bits>

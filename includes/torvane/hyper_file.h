@@ -271,9 +271,9 @@ class HyperFile : public GeMemory
   Bool GetBits(UChar tag, Value& bits);
   Bool PutSlow(UChar tag, ULLong bits, LLong size);
   Bool GetSlow(UChar tag, ULLong& bits, LLong size);
-  template <LLong kCount>
+  template <LLong Count>
   Bool PutReals(UChar tag, const void* values, Bool asFloats);
-  template <LLong kCount>
+  template <LLong Count>
   Bool GetReals(UChar tag, void* values, Bool asFloats);
   Bool PutText(UChar tag, const String& text);
   Bool GetText(UChar tag, String& text);

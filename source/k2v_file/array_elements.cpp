@@ -11,10 +11,10 @@ namespace _torvane_
 namespace
 {
 
-template <std::size_t kSize>
+template <std::size_t Size>
 using BitsOfSize =
-    std::conditional_t<kSize == 1, UChar,
-                       std::conditional_t<kSize == 2, UWord, std::conditional_t<kSize == 4, ULong, ULLong>>>;
+    std::conditional_t<Size == 1, UChar,
+                       std::conditional_t<Size == 2, UWord, std::conditional_t<Size == 4, ULong, ULLong>>>;
 
 template <class Value>
 void PackOne(UChar* packed, const UChar* memory)

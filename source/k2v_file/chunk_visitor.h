@@ -15,9 +15,9 @@
 //   WriteChunk(file, kChunkLayerSet, 1, [&](auto& v) { return VisitBody(v); });
 //   ReadChunkBody(file, level, [&](auto& v) { return VisitBody(v); });
 //
-// Every operation gives Good(): true until the first failure, after which nothing is read or written any more and the
-// destinations keep their values. The operations have the names of the values; so the value types are written with
-// their namespace here.
+// Every operation gives Good(): true until the first failure, after which nothing is read or written any more; what was
+// not reached keeps its value. The operations have the names of the values; so the value types are written with their
+// namespace here.
 #pragma once
 
 #include <type_traits>
@@ -182,6 +182,7 @@ class ChunkReader
   bool VersionBelow(_torvane_::Long version) const { return file_.GetFileVersion() < version; }
   bool Good() const { return good_; }
   HyperFile& File() { return file_; }
+  // As above, for the caller's own reading.
   bool Note(bool done) { return good_ = good_ && done; }
 
   bool Char(_torvane_::Char& value) { return Get(value); }

@@ -14,29 +14,29 @@ namespace
 {
 
 // Numbers in a row, each in 4 or 8 bytes, cleaned. `source` and `destination` hold them as Reals of memory.
-template <LLong kCount>
+template <LLong Count>
 void PackReals(UChar* place, const void* source, Bool asFloats)
 {
-  Real numbers[kCount];
+  Real numbers[Count];
   std::memcpy(numbers, source, sizeof numbers);
   if (asFloats) {
-    for (LLong i = 0; i < kCount; ++i)
+    for (LLong i = 0; i < Count; ++i)
       bytes::PutBig(place + i * 4, bytes::CleanBits(static_cast<SReal>(numbers[i])));
   } else {
-    for (LLong i = 0; i < kCount; ++i)
+    for (LLong i = 0; i < Count; ++i)
       bytes::PutBig(place + i * 8, bytes::CleanBits(numbers[i]));
   }
 }
 
-template <LLong kCount>
+template <LLong Count>
 void UnpackReals(const UChar* place, void* destination, Bool asFloats)
 {
-  Real numbers[kCount];
+  Real numbers[Count];
   if (asFloats) {
-    for (LLong i = 0; i < kCount; ++i)
+    for (LLong i = 0; i < Count; ++i)
       numbers[i] = static_cast<Real>(bytes::CleanReal(bytes::GetBig<ULong>(place + i * 4)));
   } else {
-    for (LLong i = 0; i < kCount; ++i)
+    for (LLong i = 0; i < Count; ++i)
       numbers[i] = bytes::CleanReal(bytes::GetBig<ULLong>(place + i * 8));
   }
   std::memcpy(destination, numbers, sizeof numbers);
@@ -278,34 +278,34 @@ Bool HyperFile::ReadPlainLong(Long& value)
   return true;
 }
 
-template <LLong kCount>
+template <LLong Count>
 Bool HyperFile::PutReals(UChar tag, const void* values, Bool asFloats)
 {
   if (error_ != FILEERROR_NONE)
     return false;
   LLong start = file_.GetPosition();
-  LLong size = 1 + kCount * (asFloats ? 4 : 8);
-  UChar raw[1 + kCount * 8];
+  LLong size = 1 + Count * (asFloats ? 4 : 8);
+  UChar raw[1 + Count * 8];
   UChar* place = TakeRoom(raw, size);
   place[0] = tag;
-  PackReals<kCount>(place + 1, values, asFloats);
+  PackReals<Count>(place + 1, values, asFloats);
   if (!FinishRoom(place, raw, size))
     return FailFromFile(start);
   TickWrite();
   return true;
 }
 
-template <LLong kCount>
+template <LLong Count>
 Bool HyperFile::GetReals(UChar tag, void* values, Bool asFloats)
 {
   LLong start = file_.GetPosition();
   if (!ExpectTag(tag))
     return false;
-  UChar raw[kCount * 8];
-  const UChar* place = TakeBytes(raw, kCount * (asFloats ? 4 : 8));
+  UChar raw[Count * 8];
+  const UChar* place = TakeBytes(raw, Count * (asFloats ? 4 : 8));
   if (!place)
     return FailFromFile(start);
-  UnpackReals<kCount>(place, values, asFloats);
+  UnpackReals<Count>(place, values, asFloats);
   TickRead();
   return true;
 }
