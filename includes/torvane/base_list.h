@@ -61,6 +61,9 @@ class BaseList2D : public GeListNode
   Bool GoalIsWrittenElsewhere() const override { return true; }
   void RemoveFromList() override;
 
+  // This node if it is a shader, else null: what a link names may be a node of any class.
+  virtual BaseShader* AsShader() { return nullptr; }
+
   const String& GetName() const { return name_; }
   void SetName(const String& name) { name_ = name; }
   BaseContainer& GetDataInstance() { return data_; }

@@ -10,7 +10,6 @@ namespace _torvane_
 class BaseList2D;
 class NodeData;
 
-BaseList2D* MakeMaterial(Long type);
 BaseList2D* MakeViewPanel();
 BaseList2D* MakeBaseDraw();
 BaseList2D* MakeMultipass();

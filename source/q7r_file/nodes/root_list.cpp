@@ -2,6 +2,7 @@
 
 #include "k2v_file/chunk_visitor.h"
 #include "q7r_file/nodes/member_makers.h"
+#include "torvane/base_material.h"
 #include "torvane/base_object.h"
 #include "torvane/base_tag.h"
 #include "torvane/layer_object.h"
