@@ -3,6 +3,7 @@
 
 #include "torvane/base_object.h"
 #include "torvane/layer_object.h"
+#include "torvane/material.h"
 #include "torvane/render_data.h"
 #include "torvane/root_list.h"
 
@@ -18,6 +19,30 @@ class AlienLayer : public _torvane_::LayerObject
 {
  public:
   Bool Execute() override { return true; }
+};
+
+// A material of a type that only its own program interprets.
+class AlienBaseMaterial : public _torvane_::BaseMaterial
+{
+ public:
+  AlienBaseMaterial() : BaseMaterial(-1, -1) { SetType(_torvane_::kMaterialPlugin); }
+
+  Long GetMaterialNumber() const { return materialNumber_; }
+
+ private:
+  Long materialNumber_ = 0; // never drawn
+};
+
+// Gets the next number of the process when it runs.
+class AlienMaterial : public _torvane_::Material
+{
+ public:
+  Bool Execute() override;
+
+  Long GetMaterialNumber() const { return materialNumber_; }
+
+ private:
+  Long materialNumber_ = 0;
 };
 
 class AlienRenderData : public _torvane_::RenderData
@@ -42,7 +67,10 @@ class AlienRootObject : public _torvane_::RootObject
 };
 
 class AlienRootMaterial : public _torvane_::RootMaterial
-{};
+{
+ public:
+  BaseList2D* AllocMember(Long type) override;
+};
 
 class AlienRootLayer : public _torvane_::RootLayer
 {

@@ -14,12 +14,27 @@ namespace
 constexpr Long kWriterId = 1027408;
 constexpr const char* kWriterName = "Krokior";
 
+Long MaterialCounter = 0; // the number of the next material that runs
+
 } // namespace
 
 // Polygon objects stand under a label of their own in a file.
 BaseObject* AlienRootObject::AllocMember(Long type)
 {
   return AllocObject(type == kObjectPolygonLabel ? kObjectPolygon : type);
+}
+
+Bool AlienMaterial::Execute()
+{
+  materialNumber_ = MaterialCounter++;
+  return true;
+}
+
+BaseList2D* AlienRootMaterial::AllocMember(Long type)
+{
+  if (type == kMaterialPlugin)
+    return NewObj<AlienBaseMaterial>();
+  return NewObj<AlienMaterial>();
 }
 
 BaseList2D* AlienRootLayer::AllocMember() { return NewObj<AlienLayer>(); }
