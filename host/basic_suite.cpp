@@ -17,10 +17,10 @@ struct SuiteEntry
 };
 
 // A table made once, for the life of the process.
-template <auto kMake>
+template <auto Make>
 const void* Table()
 {
-  static const auto table = kMake();
+  static const auto table = Make();
   return &table;
 }
 

@@ -85,14 +85,14 @@ enum class CallKind
 
 // Runs the body of a suite operation: counts it, fails it when it is its turn, and keeps exceptions from the caller.
 // The body takes the state and gives an Outcome.
-template <CallKind kKind = CallKind::kUse, class Body>
+template <CallKind Kind = CallKind::kUse, class Body>
 A_Err Operation(const char* name, Body&& body)
 {
   HostState* state = HostState::Current();
   if (!state)
     return kErrorParameter;
   const bool isToFail = ++state->calls == state->failAt;
-  if (isToFail && kKind == CallKind::kUse)
+  if (isToFail && Kind == CallKind::kUse)
     return state->Fail(name, "told to fail", state->failWith);
   try {
     const Outcome outcome = body(*state);
