@@ -1,0 +1,261 @@
+// Named nodes: their chunks in every form, their bits, identifiers, parameters and copies.
+#include <algorithm>
+#include <cstring>
+#include <functional>
+
+#include <gtest/gtest.h>
+
+#include "q7r_file/node_bytes.h"
+#include "support/assertion_counter.h"
+#include "support/counting_memory.h"
+#include "torvane/base_list.h"
+#include "torvane/ge_data.h"
+#include "torvane/layer_object.h"
+
+namespace
+{
+
+using namespace _torvane_;
+
+// A node header of a level, up to the name, with one entry 5 = 7 in its container.
+ByteWriter HeaderStart(Long level)
+{
+  ByteWriter w;
+  w.Start(110050, level).Long(3).Long(0).Start(132, 1).Long(-1).Long(5).Long(15).Long(7).End().UChar(0).String(u"N");
+  return w;
+}
+
+// A chunk (110069, 2) that sets the first word: what follows in step is seen by it.
+void AppendWitness(ByteWriter& w) { w.Start(110069, 2).Long(4).Long(99).Long(0).Long(0).Long(0).UChar(0).End(); }
+
+TEST(Node, WritesItsHeaderAndBitsByteForByte)
+{
+  BaseList2D node(1);
+  node.SetName("A");
+  node.SetInfo(5);
+  node.ChangeNBit(33, 1);
+  SetCountingMarker(node);
+  EXPECT_EQ(
+      ToHex(BytesOf(node)),
+      ToHex(FromHex("01 0001ADE2 00000007  0F 00000005  0F 00000000  01 00000084 00000001 0F FFFFFFFF 02"
+                    "0C 00  82 00000002 0041  0F 00000000  0F 00000001 0F 00000000"
+                    "80 0000000E 616C69617332 0000000000000000"
+                    "0C 01 80 00000010 000102030405060708090A0B0C0D0E0F  15 00  02"
+                    "01 0001ADF5 00000002  0F 00000004  0F 00000000 0F 00000002 0F 00000000 0F 00000000  0C 00 02")));
+}
+
+TEST(Node, ReadsHeadersOfEveryLevelAndStaysInStep)
+{
+  struct Case
+  {
+    const char* name;
+    Long level;
+    Long version;
+    std::function<void(ByteWriter&)> tail; // behind the name
+    bool hasMarker;
+  };
+  const Bytes marker(16, 0xAB);
+  const ByteWriter link = ByteWriter().Memory(std::string_view("alias2\0\0\0\0\0\0\0\0", 14));
+  const Case cases[] = {
+      {"level 0 of today", 0, 13000, [](ByteWriter&) {}, false},
+      {"level 1: no dynamic parameters", 1, 13000, [](ByteWriter& w) { w.Long(0); }, false},
+      {"level 2 with an old list of two chunks", 2, 13000,
+       [](ByteWriter& w) { w.Long(0).Long(1).Long(2).Start(9, 9).Long(1).End().Start(8, 8).End(); }, false},
+      {"level 2 with another list number", 2, 13000, [](ByteWriter& w) { w.Long(0).Long(7); }, false},
+      {"level 4 below 11600 has old numbers", 4, 11599,
+       [](ByteWriter& w) { w.Long(0).Long(1).Long(0).Long(44).Long(2).Long(1).Long(2); }, false},
+      {"level 3 of 11600 has none", 3, 11600, [](ByteWriter& w) { w.Long(0).Long(1).Long(0); }, false},
+      {"level 6 with a marker", 6, 13000,
+       [&](ByteWriter& w) { w.Long(0).Long(1).Long(0).Append(link.bytes).UChar(1).Memory(marker); }, true},
+      {"level 9 with values of a newer program", 9, 13000,
+       [&](ByteWriter& w) {
+         w.Long(0).Long(1).Long(0).Append(link.bytes).UChar(1).Memory(marker).Bool(true).Real(1).Start(4, 4).End();
+       },
+       true},
+  };
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.name);
+    ByteWriter w = HeaderStart(c.level);
+    c.tail(w);
+    w.End();
+    AppendWitness(w);
+    BaseList2D node;
+    ASSERT_TRUE(ReadInto(node, w.bytes, c.version));
+    EXPECT_EQ(node.GetInfo(), 3u);
+    EXPECT_EQ(node.GetDataInstance().GetLong(5), 7);
+    EXPECT_TRUE(node.GetName() == String("N"));
+    EXPECT_EQ(node.GetNBit(-1), 99u);
+    EXPECT_EQ(node.GetMarker().bytes[3] == 0xAB && node.GetMarker().bytes[15] == 0xAB, c.hasMarker);
+  }
+}
+
+TEST(Node, FilesBelow7500LeaveNameAndDataUnread)
+{
+  ByteWriter w;
+  w.Start(110050, 0).Long(3).Long(0).String(u"whatever stands here").End();
+  AppendWitness(w);
+  BaseList2D node;
+  ASSERT_TRUE(ReadInto(node, w.bytes, 7499));
+  EXPECT_FALSE(node.GetName().Content());
+  EXPECT_EQ(node.GetNBit(-1), 99u);
+}
+
+TEST(Node, ReadsMoreWordsOfBitsThanItKeeps)
+{
+  BaseList2D node;
+  ASSERT_TRUE(ReadInto(
+      node, ByteWriter().Start(110069, 0).Long(6).Long(1).Long(2).Long(3).Long(4).Long(5).Long(6).End().bytes));
+  for (Long word = 1; word <= 4; ++word)
+    EXPECT_EQ(node.GetNBit(-word), static_cast<ULong>(word));
+}
+
+TEST(Node, BitOperationsTellWhatChanged)
+{
+  BaseList2D node;
+  EXPECT_TRUE(node.ChangeNBit(127, 1));
+  EXPECT_FALSE(node.ChangeNBit(127, 0x11)); // the high half of a mode is ignored
+  EXPECT_EQ(node.GetNBit(-4), 0x80000000u);
+  EXPECT_TRUE(node.ChangeNBit(127, 2));
+  EXPECT_FALSE(node.ChangeNBit(127, 2));
+  EXPECT_TRUE(node.ChangeNBit(3, 3));
+  EXPECT_TRUE(node.ChangeNBit(3, 3));
+  EXPECT_FALSE(node.ChangeNBit(3, 4));
+  EXPECT_TRUE(node.ChangeNBit(130, 1)); // lands in the last word
+  EXPECT_EQ(node.GetNBit(-4), 4u);
+  AssertionCounter reports;
+  EXPECT_EQ(node.GetNBit(-5), 0u);
+  EXPECT_EQ(reports.Take(), 1);
+}
+
+TEST(Node, KeepsExtraIdentifiersThroughAFile)
+{
+  counting_memory::BalanceCheck balance;
+  const std::uint8_t bytes[] = {1, 2, 3};
+  BaseList2D node(1);
+  EXPECT_EQ(node.GetUniqueIDCount(), 1);
+  EXPECT_FALSE(node.AddUniqueID(kMarkerAppId, bytes, 3));
+  EXPECT_TRUE(node.AddUniqueID(20, bytes, 3));
+  EXPECT_TRUE(node.AddUniqueID(10, bytes, 2));
+  EXPECT_TRUE(node.AddUniqueID(20, bytes, 1)); // replaces, with another size
+  ASSERT_EQ(node.GetUniqueIDCount(), 3);
+  Bytes written = BytesOf(node);
+  const Bytes chunk =
+      FromHex("01 0001ADF4 00000001 0F 00000002 0F 0000000A 80 00000002 0102 0F 00000014 80 00000001 01 02");
+  EXPECT_NE(std::search(written.begin(), written.end(), chunk.begin(), chunk.end()), written.end());
+  BaseList2D back(1);
+  ASSERT_TRUE(ReadInto(back, written));
+  Long appId = 0;
+  const void* data = nullptr;
+  LLong size = 0;
+  ASSERT_TRUE(back.GetUniqueIDByIndex(2, appId, data, size));
+  EXPECT_EQ(appId, 20);
+  EXPECT_EQ(size, 1);
+  EXPECT_FALSE(back.GetUniqueIDByIndex(3, appId, data, size));
+  EXPECT_EQ(std::memcmp(back.GetMarker().bytes, node.GetMarker().bytes, 16), 0);
+}
+
+TEST(Node, CopiesWithAMarkerOfItsOwn)
+{
+  LayerObject* source = AllocLayer();
+  source->SetName("L");
+  source->SetInfo(9);
+  source->GetDataInstance().SetLong(1, 2);
+  source->ChangeNBit(40, 1);
+  auto* copy = static_cast<LayerObject*>(source->MakeClone(kCopyNoInfo, nullptr));
+  ASSERT_NE(copy, nullptr);
+  EXPECT_TRUE(copy->GetName() == String("L"));
+  EXPECT_EQ(copy->GetDataInstance().GetLong(1), 2);
+  EXPECT_EQ(copy->GetNBit(40), 1u);
+  EXPECT_EQ(copy->GetInfo(), 0u);
+  EXPECT_NE(std::memcmp(copy->GetMarker().bytes, source->GetMarker().bytes, 16), 0);
+  DeleteObj(copy);
+  DeleteObj(source);
+}
+
+ParameterPath Path(ParameterLevel a, ParameterLevel b) { return {a, b}; }
+
+TEST(NodeParameters, WalkGroupsAndVectorComponents)
+{
+  BaseList2D node;
+  GeData value;
+  EXPECT_FALSE(node.GetParameter(ParameterPath(12), value));
+  EXPECT_TRUE(node.SetParameter(ParameterPath(12), GeData(4)));
+  ASSERT_TRUE(node.GetParameter(ParameterPath(12), value));
+  EXPECT_EQ(value.GetLong(), 4);
+
+  EXPECT_TRUE(node.SetParameter(Path({700, kDataGroup, 0}, {3, kDataReal, 0}), GeData(0.5)));
+  ASSERT_NE(node.GetDataInstance().GetContainerInstance(700), nullptr);
+  ASSERT_TRUE(node.GetParameter(Path({700, kDataGroup, 0}, {3, kDataReal, 0}), value));
+  EXPECT_EQ(value.GetReal(), 0.5);
+  ASSERT_TRUE(node.GetParameter(Path({701, kDataGroup, 0}, {3, kDataReal, 0}), value)); // missing: nil, but true
+  EXPECT_EQ(value.GetType(), kDataNil);
+
+  node.GetDataInstance().SetVector(20, Vector(1, 2, 3));
+  EXPECT_TRUE(node.SetParameter(Path({20, kDataVector, 0}, {kVectorY, kDataReal, 0}), GeData(9.0)));
+  EXPECT_TRUE(node.GetDataInstance().GetVector(20) == Vector(1, 9, 3));
+  EXPECT_EQ(node.GetDataInstance().GetReal(kVectorY), 9.0); // the walk goes on to the component's level
+  ASSERT_TRUE(node.GetParameter(Path({20, kDataVector, 0}, {kVectorZ, kDataReal, 0}), value));
+  EXPECT_EQ(value.GetReal(), 3.0);
+  // Below a group the Vector is still that of the top container.
+  ASSERT_TRUE(node.GetParameter({{700, kDataGroup, 0}, {20, kDataVector, 0}, {kVectorX, kDataReal, 0}}, value));
+  EXPECT_EQ(value.GetReal(), 1.0);
+  EXPECT_TRUE(node.SetParameter(Path({20, kDataLong, 0}, {1, 0, 0}), GeData(5))); // any other type: nothing
+  EXPECT_TRUE(node.GetDataInstance().GetVector(20) == Vector(1, 9, 3));
+}
+
+TEST(NodeParameters, DynamicOnesTakeTheSmallestFreeKey)
+{
+  BaseList2D node;
+  BaseContainer real = MakeDynamicSettings(kDataReal, "Speed");
+  EXPECT_EQ(real.GetReal(5), -1e20);
+  EXPECT_EQ(real.GetLong(12), 0x66726561);
+  EXPECT_TRUE(real.GetString(1) == String("Speed") && real.GetString(2) == String("Speed"));
+  EXPECT_EQ(MakeDynamicSettings(kDataLong, "").GetLong(5), -2147483647);
+  EXPECT_NE(MakeDynamicSettings(kDataLink, "").GetContainerInstance(17), nullptr);
+  ParameterPath first = node.AddDynamicParameter(real);
+  ParameterPath second = node.AddDynamicParameter(MakeDynamicSettings(kDataLong, "Count"));
+  EXPECT_TRUE(first.IsExactly(Path({700, 5, 0}, {1, kDataReal, 0})));
+  EXPECT_TRUE(second.IsExactly(Path({700, 5, 0}, {2, kDataLong, 0})));
+  EXPECT_TRUE(node.RemoveDynamicParameter(first));
+  EXPECT_EQ(node.FindDynamicParameter(first), nullptr);
+  EXPECT_EQ(node.AddDynamicParameter(real)[1].id, 1);
+  EXPECT_FALSE(node.RemoveDynamicParameter(Path({701, 5, 0}, {2, 0, 0})));
+  // They stand in the header behind the name.
+  BaseList2D back;
+  ASSERT_TRUE(ReadInto(back, BytesOf(node)));
+  ASSERT_NE(back.FindDynamicParameter(second), nullptr);
+  EXPECT_TRUE(back.FindDynamicParameter(second)->GetString(1) == String("Count"));
+}
+
+TEST(Layer, WritesItsSwitchesWithTheFirstOneLast)
+{
+  LayerObject layer;
+  Bytes written = BytesOf(layer);
+  const Bytes chunk = FromHex("01 0001AEE9 00000001 15 01 15 01 15 01 15 00 15 01 15 01 15 01 15 01"
+                              "17 3FF0000000000000 3FF0000000000000 3FF0000000000000 15 00 02");
+  ASSERT_GE(written.size(), chunk.size());
+  EXPECT_EQ(ToHex(Bytes(written.end() - static_cast<long>(chunk.size()), written.end())), ToHex(chunk));
+}
+
+TEST(Layer, ReadsLevelZeroAndTakesParameters)
+{
+  ByteWriter w;
+  w.Start(110313, 0);
+  for (int i = 0; i < 8; ++i)
+    w.Bool(i == 3);
+  LayerObject layer;
+  layer.SetFlag(0, true);
+  ASSERT_TRUE(ReadInto(layer, w.Vector(0.25, 0.5, 0.75).End().bytes));
+  EXPECT_TRUE(layer.GetFlag(0)); // not reached by this level
+  EXPECT_FALSE(layer.GetFlag(1));
+  EXPECT_TRUE(layer.GetFlag(4));
+  GeData value;
+  ASSERT_TRUE(layer.GetParameter(Path({1009, kDataVector, 0}, {kVectorZ, 0, 0}), value));
+  EXPECT_EQ(value.GetReal(), 0.75);
+  EXPECT_TRUE(layer.SetParameter(Path({1009, kDataVector, 0}, {kVectorX, 0, 0}), GeData(1.0)));
+  EXPECT_TRUE(layer.GetColor() == Vector(1.0, 0.5, 0.75));
+  EXPECT_TRUE(layer.SetParameterById(1000, GeData(false)));
+  EXPECT_FALSE(layer.GetFlag(0));
+}
+
+} // namespace
