@@ -183,7 +183,7 @@ TEST_F(CommandHook, GivesTwoForAFileThatCannotBeOpened)
 TEST_F(CommandHook, GivesTheErrorOfADialogAndWritesNothing)
 {
   Touch("scene.q7r");
-  for (std::uint64_t n : {1, 3}) { // the save dialog; the question behind the locking of its answer
+  for (std::uint64_t n : {1U, 3U}) { // the save dialog; the question behind the locking of its answer
     host_.FailCall(host_.CallCount() + n, 40);
     host::CommandResult result = Run("scene.q7r");
     EXPECT_EQ(result.error, 40);

@@ -278,7 +278,7 @@ TEST(DocumentState, EveryLevelKeepsTheStreamInStep)
   for (Long level = 0; level <= 13; ++level) {
     SCOPED_TRACE(level);
     ByteWriter w;
-    w.Header().Start(110059, 0).Append(StateStart(level, 4, 12110).bytes);
+    w.Header().Start(110059, 0).Append(StateStart(level, 4, 12111).bytes);
     AddStateLevels(w, level);
     if (level == 13)
       w.Long(1).Start(1, 1).Real(2).End(); // a newer program's values
@@ -287,7 +287,7 @@ TEST(DocumentState, EveryLevelKeepsTheStreamInStep)
     DocumentPtr document = LoadFromBytes(w.bytes);
     ASSERT_NE(document, nullptr);
     EXPECT_EQ(document->GetMode(), 4);
-    EXPECT_EQ(document->GetActiveTool(), level >= 8 ? 200000089 : 200000089); // 12110 is the old name of that tool
+    EXPECT_EQ(document->GetActiveTool(), level >= 8 ? 200000089 : 200000090); // level 8 tells the tool anew
     for (Long i : {0, 1, 2, 3})
       EXPECT_EQ(document->GetSettings(i).GetLong(70 + i), 100 + i);
     EXPECT_EQ(document->GetSettings(4).GetLong(75), 105); // the one before it is dropped
