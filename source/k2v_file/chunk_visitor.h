@@ -149,7 +149,7 @@ class ChunkWriter
   bool ConstantString(const _torvane_::String& value) { return Put(value); }
   bool EmptyString() { return Put(_torvane_::String()); }
   bool EmptyFilename() { return Put(_torvane_::Filename()); }
-  bool EmptyContainer() { return Put(BaseContainer()); }
+  bool EmptyContainer() { return Put(BaseContainer(0)); }
   bool EmptyLink() { return Put(GeAliasLink()); }
 
   // Values that only older files hold.

@@ -9,6 +9,7 @@
 #include "exporter/entry/plugin_state.h"
 #include "exporter/entry/scene_writer.h"
 #include "support/counting_memory.h"
+#include "support/temp_folder.h"
 
 namespace
 {
@@ -73,28 +74,22 @@ TEST(Entry, ShowsTheDialogsAsOneLineOfScript)
 class CommandHook : public testing::Test
 {
  protected:
-  void SetUp() override
-  {
-    fs::remove_all(folder_);
-    fs::create_directories(folder_);
-    host_.Start(EntryPointFunc);
-  }
-  void TearDown() override { fs::remove_all(folder_); }
+  void SetUp() override { host_.Start(EntryPointFunc); }
 
-  void Touch(const std::string& name) { std::ofstream(folder_ / name) << "old"; }
+  void Touch(const std::string& name) { std::ofstream(folder_.Path() / name) << "old"; }
   bool IsScene(const std::string& name) const
   {
     char magic[4] = {};
-    std::ifstream(folder_ / name, std::ios::binary).read(magic, 4);
+    std::ifstream(folder_.Path() / name, std::ios::binary).read(magic, 4);
     return std::string(magic, 4) == "QQ7R";
   }
   host::CommandResult Run(const std::string& name)
   {
-    host_.SetOutputPath(name.empty() ? "" : (folder_ / name).string());
+    host_.SetOutputPath(name.empty() ? "" : folder_ / name);
     return host_.CallCommandHook(ExportCommand);
   }
 
-  fs::path folder_ = fs::path(TEST_BINARY_DIR) / "command_hook";
+  TempFolder folder_;
   host::StandaloneHost host_{host::LoadCompositionText(Composition(Solid("A")), "test.json", "/")};
 };
 
@@ -218,7 +213,8 @@ constexpr std::uint64_t kSilentCalls = 9;
 
 TEST(Failures, AnyHostCallMayFailAndTheFileIsWrittenAllTheSame)
 {
-  const fs::path file = fs::path(TEST_BINARY_DIR) / "failures.q7r";
+  const TempFolder folder;
+  const fs::path file = folder / "failures.q7r";
   std::uint64_t started = 0;
   for (std::uint64_t n = 0;; ++n) { // 0: nothing fails
     host::StandaloneHost host(host::LoadCompositionText(kEverything, "test.json", "/footage"));
@@ -243,7 +239,6 @@ TEST(Failures, AnyHostCallMayFailAndTheFileIsWrittenAllTheSame)
     }
     ASSERT_TRUE(result.isHandled);
   }
-  fs::remove(file);
 }
 
 TEST(Failures, ARefusedSuiteLeavesAsAnExceptionAndEverythingIsGivenBack)
@@ -253,7 +248,8 @@ TEST(Failures, ARefusedSuiteLeavesAsAnExceptionAndEverythingIsGivenBack)
       {kAEGPLayerSuite, 13},   {kAEGPStreamSuite, 9}, {kAEGPStreamSuite, 7}, {kAEGPKeyframeSuite, 4},
       {kAEGPFootageSuite, 11}, {kAEGPCameraSuite, 2}, {kAEGPLightSuite, 2},
   };
-  const fs::path file = fs::path(TEST_BINARY_DIR) / "refused.q7r";
+  const TempFolder folder;
+  const fs::path file = folder / "refused.q7r";
   for (auto [name, version] : suites) {
     counting_memory::BalanceCheck balance;
     host::StandaloneHost host(host::LoadCompositionText(kEverything, "test.json", "/footage"));
@@ -264,7 +260,6 @@ TEST(Failures, ARefusedSuiteLeavesAsAnExceptionAndEverythingIsGivenBack)
     EXPECT_EQ(host.CallCommandHook(ExportCommand).error, 516) << name << version;
     EXPECT_EQ(host.Balance(), host::HostBalance()) << name << version;
   }
-  fs::remove(file);
 }
 
 } // namespace

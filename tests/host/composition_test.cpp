@@ -3,6 +3,8 @@
 
 #include <filesystem>
 
+#include "support/temp_folder.h"
+
 namespace
 {
 
@@ -434,9 +436,8 @@ TEST(LoadComposition, FindsParentsAndNestedLayersOfAUsersFile)
 
 TEST(LoadComposition, NamesTheFileThatItCannotRead)
 {
-  const std::filesystem::path folder = std::filesystem::path(TEST_BINARY_DIR) / "unreadable.json";
-  std::filesystem::create_directories(folder);
-  for (const auto& file : {folder, folder / "missing.json"}) {
+  const TempFolder folder;
+  for (const std::filesystem::path& file : {folder.Path(), folder.Path() / "missing.json"}) {
     try {
       host::LoadComposition(file);
       ADD_FAILURE() << file;

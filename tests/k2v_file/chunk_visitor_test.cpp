@@ -78,7 +78,7 @@ ByteWriter FirstLevel(bool old)
 {
   ByteWriter writer;
   writer.Long(5).Bool(true).Bool(true).Long(40000).Real(1).Real(2.5).Vector(1, 2, 3).IdentityMatrix();
-  writer.Time(1, 30).String(u"n").Start(132, 1).Long(-1).End().Start(132, 1).Long(8).Long(1).Long(15).Long(3).End();
+  writer.Time(1, 30).String(u"n").Start(132, 1).Long(0).End().Start(132, 1).Long(8).Long(1).Long(15).Long(3).End();
   if (old)
     writer.Real(7).Vector(7, 7, 7).Start(132, 1).Long(7).End();
   return writer.UChar(0);

@@ -193,7 +193,7 @@ TEST(DocumentFile, RefusesWhatIsNoSceneFile)
   const Case cases[] = {
       {"nothing", {}, 3, FILEERROR_WRONG_VALUE},
       {"another ident", ByteWriter().Header("Q7R5").Start(110059, 0).End().bytes, 3, FILEERROR_WRONG_VALUE},
-      {"the header alone", header, 3, FILEERROR_PREMATURE_END},
+      {"the header alone", header, 3, FILEERROR_READ},
       {"a value before the frame", ByteWriter().Header().Long(1).bytes, 3, FILEERROR_WRONG_VALUE},
       {"a value inside the frame", ByteWriter().Header().Start(110059, 0).Long(1).bytes, 3, FILEERROR_CHUNK_STRUCTURE},
       {"an old version where a current one is asked for",
@@ -225,7 +225,7 @@ TEST(DocumentFile, PartialLoadsReadNoMoreThanTheyNeed)
   const Bytes pref = ByteWriter().Start(110015, 4).bytes;
   auto place = std::search(whole.begin(), whole.end(), pref.begin(), pref.end());
   ASSERT_NE(place, whole.end());
-  Bytes untilState(whole.begin(), place + 106);
+  Bytes untilState(whole.begin(), place + 111);
   DocumentPtr prefs = LoadFromBytes(untilState, LoadPrefsOnly);
   ASSERT_NE(prefs, nullptr);
   EXPECT_EQ(prefs->GetPref().GetFps(), 25);
