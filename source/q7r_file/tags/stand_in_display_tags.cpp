@@ -1,4 +1,4 @@
-// Plain tags in the place of the texture, compositing, display and selection tags.
+// Plain tags in the place of the compositing, display and selection tags.
 #include "q7r_file/tags/tag_makers.h"
 #include "torvane/base_tag.h"
 
@@ -6,7 +6,6 @@ namespace _torvane_
 {
 
 BaseTag* MakeDisplayTag() { return NewObj<BaseTag>(kTagDisplay); }
-BaseTag* MakeTextureTag() { return NewObj<BaseTag>(kTagTexture); }
 BaseTag* MakeCompositingTag() { return NewObj<BaseTag>(kTagCompositing); }
 BaseTag* MakeSelectionTag(Long type) { return NewObj<BaseTag>(type); }
 

@@ -1,17 +1,11 @@
-// Plain tags in the place of those that hold arrays.
+// A plain behaviour object in the place of the joint weights, and a plain tag in that of the texture tag.
 #include "q7r_file/tags/tag_makers.h"
 #include "torvane/base_tag.h"
 
 namespace _torvane_
 {
 
-BaseTag* MakePointTag() { return NewObj<BaseTag>(kTagPoint); }
-BaseTag* MakePolygonTag() { return NewObj<BaseTag>(kTagPolygon); }
-BaseTag* MakeTangentTag() { return NewObj<BaseTag>(kTagTangent); }
-BaseTag* MakeUVWTag() { return NewObj<BaseTag>(kTagUVW); }
-BaseTag* MakeSegmentTag() { return NewObj<BaseTag>(kTagSegment); }
-BaseTag* MakeVertexMapTag() { return NewObj<BaseTag>(kTagVertexMap); }
-BaseTag* MakeNormalTag() { return NewObj<BaseTag>(kTagNormal); }
+BaseTag* MakeTextureTag() { return NewObj<BaseTag>(kTagTexture); }
 NodeData* MakeWeightTagData() { return NewObj<NodeData>(); }
 
 } // namespace _torvane_
