@@ -43,11 +43,6 @@ class CCurve : public BaseList2D
   CKey* GetKey(Long index) const; // null out of range
   // Removes and frees a key; false out of range.
   Bool DelKey(Long index);
-  // Removes and frees every key for which `drop` holds, in one pass. `drop` is called once for each key in ascending
-  // order with its index among the keys as they were; what it has dropped is gone from the curve only afterwards.
-  template <class Drop>
-  void DelKeysIf(Drop&& drop);
-  void FreeKeys();
 
   // The tangents that the key's bits ask for: stored, automatic, clamped or zero.
   KeyTangents GetTangents(Long index) const;
@@ -60,28 +55,11 @@ class CCurve : public BaseList2D
   Long PlaceOf(const BaseTime& time) const;
   KeyTangents AutomaticTangents(Long index) const;
   Bool IsClamped(Long index) const;
-  void CutTail(Long count);
 
-  // The keys in order, and the list that owns the same keys in the same order.
+  // The keys in order, and the list that owns the same keys in the same order. Keys beyond the range of times that a
+  // file held are in the list alone.
   GeToolDynArray keys_;
   RootCKey keyRoot_;
 };
-
-template <class Drop>
-void CCurve::DelKeysIf(Drop&& drop)
-{
-  Long kept = 0;
-  Long count = keys_.GetCount();
-  for (Long i = 0; i < count; ++i) {
-    auto* key = static_cast<CKey*>(keys_[i]);
-    if (drop(i)) {
-      keys_[i] = nullptr;
-      DeleteObj(key);
-    } else {
-      keys_[kept++] = key;
-    }
-  }
-  CutTail(kept);
-}
 
 } // namespace _torvane_

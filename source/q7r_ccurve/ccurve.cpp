@@ -22,7 +22,7 @@ Bool IsKeyTime(const BaseTime& time)
 void CCurve::WriteChunks(HyperFile& file)
 {
   BaseList2D::WriteChunks(file);
-  if (keys_.GetCount() > 0)
+  if (!keyRoot_.IsEmpty())
     keyRoot_.WriteAsChunk(file, kChunkKeys);
 }
 
@@ -33,7 +33,11 @@ Bool CCurve::ReadChunk(HyperFile& file, Long id, Long level)
   if (id != kChunkKeys)
     return false;
   keys_.Reset();
-  return ReadInnerChunk(file, keyRoot_) && RebuildIndex();
+  if (!ReadInnerChunk(file, keyRoot_))
+    return false;
+  if (!RebuildIndex())
+    file.SetError(FILEERROR_MEMORY);
+  return file.GetError() == FILEERROR_NONE;
 }
 
 Bool CCurve::CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation)
@@ -144,14 +148,6 @@ Bool CCurve::DelKey(Long index)
   keys_.Remove(index);
   DeleteObj(key);
   return true;
-}
-
-void CCurve::CutTail(Long count) { keys_.SetCount(count); }
-
-void CCurve::FreeKeys()
-{
-  keys_.Flush();
-  keyRoot_.FreeAll();
 }
 
 } // namespace _torvane_

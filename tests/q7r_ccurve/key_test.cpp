@@ -1,0 +1,135 @@
+#include <functional>
+#include <memory>
+
+#include <gtest/gtest.h>
+
+#include "animation_bytes.h"
+#include "torvane/ckey.h"
+
+namespace
+{
+
+using namespace animation_test;
+using namespace _torvane_;
+
+// A key whose every field differs from its default and from every other field.
+void Fill(CKey& key)
+{
+  key.SetTime(BaseTime(3, 2));
+  key.SetLeft(BaseTime(-1, 4), -5);
+  key.SetRight(BaseTime(1, 8), 6);
+  key.SetValue(nullptr, 1.5);
+  key.SetInterpolation(nullptr, kInterpolationStep);
+  key.SetGeData(nullptr, Long{7});
+}
+
+TEST(Key, WritesItsBytes)
+{
+  CKey key;
+  Fill(key);
+  key.ChangeNBit(46, 1);
+  key.ChangeNBit(41, 1);
+  SetCountingMarker(key);
+  EXPECT_EQ(ToHex(BytesOf(key)),
+            ToHex(FromHex("01 0001ADE2 00000007 0F 00000000 0F 00000000 01 00000084 00000001 0F FFFFFFFF 02 0C 00"
+                          "82 00000000 0F 00000000 0F 00000001 0F 00000000 80 0000000E 616C69617332 0000000000000000"
+                          "0C 01 80 00000010 000102030405060708090A0B0C0D0E0F 15 00 02"
+                          "01 0001ADF5 00000002 0F 00000004 0F 00000000 0F 00004200 0F 00000000 0F 00000000 0C 00 02"
+                          "01 0001AF50 00000000"
+                          "16 4008000000000000 4000000000000000"                        // 3 / 2
+                          "16 BFF0000000000000 4010000000000000"                        // -1 / 4
+                          "16 3FF0000000000000 4020000000000000"                        // 1 / 8
+                          "13 3FF8000000000000 13 C014000000000000 13 4018000000000000" // 1.5, -5, 6
+                          "0F 00000003 0F 0000000F 0F 00000007 02")));
+}
+
+TEST(Key, ReadsItsChunkAtAnyLevel)
+{
+  for (Long level : {0, 5}) {
+    ByteWriter w;
+    w.Start(110416, level).Time(3, 2).Time(-1, 4).Time(1, 8).Real(1.5).Real(-5).Real(6).Long(3).Long(15).Long(7);
+    if (level > 0)
+      w.String(u"of a newer program").Start(1, 1).End();
+    CKey key;
+    CKey expected;
+    Fill(expected);
+    EXPECT_TRUE(ReadInto(key, w.End().bytes));
+    EXPECT_TRUE(key.IsEqual(expected)) << level;
+  }
+}
+
+TEST(Key, ParametersReachFieldsAndBits)
+{
+  CKey key;
+  Fill(key);
+  GeData value;
+  const std::pair<Long, BaseTime> times[] = {{901, {3, 2}}, {911, {-1, 4}}, {912, {1, 8}}};
+  for (const auto& [id, time] : times) {
+    EXPECT_TRUE(key.GetParameterById(id, value));
+    EXPECT_EQ(value.GetTime(), time) << id;
+    EXPECT_TRUE(key.SetParameterById(id, BaseTime(id, 1)));
+  }
+  EXPECT_TRUE(key.SetParameterById(913, 13.0) && key.SetParameterById(914, 14.0));
+  EXPECT_TRUE(key.SetParameterById(924, Long{2}));
+  EXPECT_EQ(key.GetTime(), BaseTime(901, 1));
+  EXPECT_EQ(key.GetLeftTime(), BaseTime(911, 1));
+  EXPECT_EQ(key.GetRightTime(), BaseTime(912, 1));
+  EXPECT_EQ(key.GetLeftValue(), 13.0);
+  EXPECT_EQ(key.GetRightValue(), 14.0);
+  EXPECT_EQ(key.GetInterpolation(), kInterpolationLinear);
+  EXPECT_FALSE(key.GetParameterById(910, value) && value.GetRawType() != kDataNil);
+
+  const std::pair<Long, ULong> switches[] = {{902, 0x100},  {915, 0x400},   {917, 0x1000},   {918, 0x2000},
+                                             {919, 0x4000}, {921, 0x10000}, {922, 0x20000},  {923, 0x200},
+                                             {925, 0x40},   {926, 0x80},    {1234, 0x400000}};
+  for (auto [id, mask] : switches) {
+    for (bool on : {true, false}) {
+      EXPECT_TRUE(key.SetParameterById(id, on));
+      EXPECT_EQ(key.GetNBit(-2), on ? mask : 0u) << id;
+      EXPECT_TRUE(key.GetParameterById(id, value));
+      EXPECT_EQ(value.GetBool(), on) << id;
+    }
+  }
+}
+
+TEST(Key, EqualityLooksAtEveryFieldAndResetLeavesTheTime)
+{
+  const std::function<void(CKey&)> changes[] = {
+      [](CKey& key) { key.SetTime(BaseTime(9, 1)); },
+      [](CKey& key) { key.SetValue(nullptr, 9); },
+      [](CKey& key) { key.SetLeft(BaseTime(9, 1), -5); },
+      [](CKey& key) { key.SetLeft(BaseTime(-1, 4), 9); },
+      [](CKey& key) { key.SetRight(BaseTime(9, 1), 6); },
+      [](CKey& key) { key.SetRight(BaseTime(1, 8), 9); },
+      [](CKey& key) { key.SetInterpolation(nullptr, kInterpolationLinear); },
+      [](CKey& key) { key.SetGeData(nullptr, Long{9}); },
+  };
+  CKey key;
+  Fill(key);
+  key.SetGeData(nullptr, 7.0);
+  EXPECT_EQ(key.GetGeData().GetRawType(), kDataReal); // the same number of another type is stored
+  for (const auto& change : changes) {
+    CKey other;
+    Fill(other);
+    EXPECT_TRUE(key.IsEqual(other));
+    change(other);
+    EXPECT_FALSE(key.IsEqual(other)) << &change - changes;
+  }
+  CKey fresh;
+  fresh.SetTime(key.GetTime());
+  key.Reset();
+  EXPECT_TRUE(key.IsEqual(fresh));
+}
+
+TEST(Key, ClonesWithAllItHolds)
+{
+  CKey key;
+  Fill(key);
+  key.SetName("K");
+  key.ChangeNBit(38, 1);
+  std::unique_ptr<CKey> clone(static_cast<CKey*>(key.MakeClone(0, nullptr)));
+  ASSERT_NE(clone, nullptr);
+  EXPECT_EQ(ToHex(WithoutMarkers(BytesOf(*clone))), ToHex(WithoutMarkers(BytesOf(key))));
+}
+
+} // namespace
