@@ -1,7 +1,5 @@
 #include "q7r_file/nodes/node_tools.h"
 
-#include "torvane/hyper_file.h"
-
 namespace _torvane_
 {
 
@@ -17,27 +15,6 @@ Real* ComponentOf(Vector& vector, Long id)
   default:
     return nullptr;
   }
-}
-
-Bool ReadInnerChunk(HyperFile& file, PrivateChunk& inner)
-{
-  UChar tag = 0;
-  if (!file.ReadValueHeader(tag))
-    return false;
-  if (tag == kTagChunkEnd)
-    return true;
-  if (tag != kTagChunkStart) {
-    file.SetError(FILEERROR_WRONG_VALUE);
-    return false;
-  }
-  Long id = 0;
-  Long level = 0;
-  if (!file.ReadChunkStart(id, level))
-    return false;
-  // What nobody takes is passed over with the rest of the inner chunk.
-  if (!inner.ReadChunk(file, id, level) && !file.SkipToEndChunk())
-    return false;
-  return file.SkipToEndChunk();
 }
 
 Bool GetVectorParameter(const Vector& vector, const ParameterPath& path, GeData& value)

@@ -2,6 +2,7 @@
 #pragma once
 
 #include "torvane/ge_data.h"
+#include "torvane/hyper_file.h"
 #include "torvane/private_chunk.h"
 
 namespace _torvane_
@@ -24,7 +25,27 @@ Bool SetVectorParameter(Vector& vector, const ParameterPath& path, const GeData&
 
 // Reads what a chunk holds for `inner`: nothing (an end tag alone) or one chunk, which is handed to its ReadChunk; then
 // passes over the rest. Any other value there is FILEERROR_WRONG_VALUE.
-Bool ReadInnerChunk(HyperFile& file, PrivateChunk& inner);
+template <class Inner>
+Bool ReadInnerChunk(HyperFile& file, Inner& inner)
+{
+  UChar tag = 0;
+  if (!file.ReadValueHeader(tag))
+    return false;
+  if (tag == kTagChunkEnd)
+    return true;
+  if (tag != kTagChunkStart) {
+    file.SetError(FILEERROR_WRONG_VALUE);
+    return false;
+  }
+  Long id = 0;
+  Long level = 0;
+  if (!file.ReadChunkStart(id, level))
+    return false;
+  // What nobody takes is passed over with the rest of the inner chunk.
+  if (!inner.ReadChunk(file, id, level) && !file.SkipToEndChunk())
+    return false;
+  return file.SkipToEndChunk();
+}
 
 // The component of a Vector that a path level names, or null for another id.
 Real* ComponentOf(Vector& vector, Long id);
