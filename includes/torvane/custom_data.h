@@ -2,6 +2,7 @@
 #pragma once
 
 #include "torvane/memory.h"
+#include "torvane/raw_chunk_body.h"
 #include "torvane/types.h"
 
 namespace _torvane_
@@ -56,23 +57,18 @@ const CustomDataType* FindCustomDataType(Long id);
 class OpaqueCustomData : public CustomData
 {
  public:
-  explicit OpaqueCustomData(const CustomDataType& type) : type_(type), level_(type.level) {}
-  ~OpaqueCustomData() override;
+  explicit OpaqueCustomData(const CustomDataType& type) : type_(type) { body_.SetLevel(type.level); }
 
   Long GetTypeId() const override { return type_.id; }
-  Long GetChunkLevel() const override { return level_; }
+  Long GetChunkLevel() const override { return body_.GetLevel(); }
   Bool IsEqual(const CustomData& other) const override;
   Bool CopyTo(CustomData& destination, TransArray* translation) const override;
   Bool Read(HyperFile& file, Long level) override;
   void Write(HyperFile& file) const override;
 
  protected:
-  void DropBody();
-
   const CustomDataType& type_;
-  Long level_;
-  void* data_ = nullptr; // the body without its end tag; owned
-  LLong size_ = 0;
+  RawChunkBody body_;
 };
 
 inline constexpr Long kCustomGradient = 1000481;
@@ -96,7 +92,7 @@ class UnitScaleData : public OpaqueCustomData
   Long unit = 3;
 
  private:
-  Bool TakeBody(Bool singlePrecision);
+  Bool TakeBody();
 };
 
 // Type 1009369: three numbers without a meaning of their own here.

@@ -19,7 +19,8 @@ class GeListNode;
 class HyperFile;
 class TransArray;
 
-// A custom value of a type that the reader didn't know, kept byte for byte.
+// A custom value of a type that the reader didn't know, kept byte for byte (Reals of single-precision files: see
+// RawChunkBody).
 struct UnknownRecord
 {
   Long type = 0;

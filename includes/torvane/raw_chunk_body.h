@@ -9,7 +9,9 @@ namespace _torvane_
 
 class HyperFile;
 
-// Owns its bytes: values and nested chunks with their tags, without the end tag of the chunk itself.
+// Owns its bytes: values and nested chunks with their tags, without the end tag of the chunk itself. The bytes are
+// those of the file, but Reals of a single-precision file are widened: no file is written in that precision, and a body
+// that kept it would throw every later value out of step.
 class RawChunkBody
 {
  public:

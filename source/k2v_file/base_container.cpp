@@ -75,7 +75,7 @@ BaseContainer::BaseContainer(BaseContainer&& other) noexcept : id_(other.id_)
 // NOLINTNEXTLINE(bugprone-unhandled-self-assignment)
 BaseContainer& BaseContainer::operator=(const BaseContainer& other)
 {
-  if (!other.CopyTo(*this, 0, nullptr))
+  if (this != &other && !other.CopyTo(*this, 0, nullptr))
     Flush();
   return *this;
 }

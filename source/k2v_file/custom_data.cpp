@@ -14,50 +14,22 @@ Bool CustomData::SetParameter(const ParameterPath&, const GeData&) { return fals
 
 // ---------------------------------------------------------------------------------------------------------------
 
-OpaqueCustomData::~OpaqueCustomData() { DropBody(); }
-
-void OpaqueCustomData::DropBody()
-{
-  GeFree(data_);
-  size_ = 0;
-}
-
 Bool OpaqueCustomData::IsEqual(const CustomData& other) const
 {
-  const auto& opaque = static_cast<const OpaqueCustomData&>(other);
-  return level_ == opaque.level_ && size_ == opaque.size_ &&
-         (size_ == 0 || std::memcmp(data_, opaque.data_, static_cast<std::size_t>(size_)) == 0);
+  const RawChunkBody& body = static_cast<const OpaqueCustomData&>(other).body_;
+  return body_.GetLevel() == body.GetLevel() && body_.GetSize() == body.GetSize() &&
+         (body_.GetSize() == 0 ||
+          std::memcmp(body_.GetData(), body.GetData(), static_cast<std::size_t>(body_.GetSize())) == 0);
 }
 
 Bool OpaqueCustomData::CopyTo(CustomData& destination, TransArray*) const
 {
-  auto& opaque = static_cast<OpaqueCustomData&>(destination);
-  if (&opaque == this)
-    return true;
-  opaque.DropBody();
-  opaque.level_ = level_;
-  if (size_ == 0)
-    return true;
-  opaque.data_ = GeAllocNC(size_);
-  if (!opaque.data_)
-    return false;
-  GeCopyMem(opaque.data_, data_, size_);
-  opaque.size_ = size_;
-  return true;
+  return body_.CopyTo(static_cast<OpaqueCustomData&>(destination).body_);
 }
 
-Bool OpaqueCustomData::Read(HyperFile& file, Long level)
-{
-  DropBody();
-  level_ = level;
-  return file.ReadRawChunk(data_, size_, true);
-}
+Bool OpaqueCustomData::Read(HyperFile& file, Long level) { return body_.Read(file, level); }
 
-void OpaqueCustomData::Write(HyperFile& file) const
-{
-  if (data_)
-    file.WriteRawChunk(data_, size_, true);
-}
+void OpaqueCustomData::Write(HyperFile& file) const { body_.Write(file); }
 
 // ---------------------------------------------------------------------------------------------------------------
 
@@ -81,30 +53,30 @@ Bool UnitScaleData::Read(HyperFile& file, Long level)
   unit = 3;
   if (!OpaqueCustomData::Read(file, level))
     return false;
-  if (TakeBody(file.IsSinglePrecision())) {
-    DropBody();
-    level_ = type_.level;
+  if (TakeBody()) {
+    body_.Free();
+    body_.SetLevel(type_.level);
   }
   return true;
 }
 
 // Takes scale and unit out of the body if these two values are all that it holds.
-Bool UnitScaleData::TakeBody(Bool singlePrecision)
+Bool UnitScaleData::TakeBody()
 {
-  const LLong realSize = singlePrecision ? 4 : 8;
-  const LLong unitOffset = 1 + realSize;
-  const UChar* body = static_cast<const UChar*>(data_);
-  if (size_ != unitOffset + 5 || body[0] != kTagReal || body[unitOffset] != kTagLong)
+  constexpr LLong kRealOffset = 1;
+  constexpr LLong kUnitOffset = kRealOffset + 8;
+  constexpr LLong kBodySize = kUnitOffset + 5;
+  const UChar* body = static_cast<const UChar*>(body_.GetData());
+  if (body_.GetSize() != kBodySize || body[0] != kTagReal || body[kUnitOffset] != kTagLong)
     return false;
-  scale = singlePrecision ? bytes::CleanReal(bytes::GetBig<ULong>(body + 1))
-                          : bytes::CleanReal(bytes::GetBig<ULLong>(body + 1));
-  unit = static_cast<Long>(bytes::GetBig<ULong>(body + unitOffset + 1));
+  scale = bytes::CleanReal(bytes::GetBig<ULLong>(body + kRealOffset));
+  unit = static_cast<Long>(bytes::GetBig<ULong>(body + kUnitOffset + 1));
   return true;
 }
 
 void UnitScaleData::Write(HyperFile& file) const
 {
-  if (data_) {
+  if (body_.GetData()) {
     OpaqueCustomData::Write(file);
     return;
   }

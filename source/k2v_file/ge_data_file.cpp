@@ -1,4 +1,5 @@
 // The file form of a GeData: the type as a Long, then the value.
+#include "k2v_file/raw_values.h"
 #include "torvane/alias.h"
 #include "torvane/base_container.h"
 #include "torvane/ge_data.h"
@@ -129,7 +130,12 @@ Bool GeData::ReadUnknown(HyperFile& file, Long type, Long level)
     return file.SkipToEndChunk();
   }
   record.level = level;
-  return file.ReadRawChunk(record.data, record.size, false);
+  if (!file.ReadRawChunk(record.data, record.size, false))
+    return false;
+  if (!file.IsSinglePrecision() || WidenReals(record.data, record.size))
+    return true;
+  file.SetError(FILEERROR_MEMORY);
+  return false;
 }
 
 Bool GeData::Write(HyperFile& file) const

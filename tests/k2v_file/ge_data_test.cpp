@@ -297,6 +297,23 @@ TEST_F(GeDataTest, TakesTheUnitScaleOfASinglePrecisionFile)
   EXPECT_EQ(value.GetCustomDataType(kCustomGradient), nullptr);
 }
 
+// Such a body, kept as it is, would throw the double-precision file that it is written to out of step.
+TEST_F(GeDataTest, WidensTheRealsOfBodiesThatAreKeptFromASinglePrecisionFile)
+{
+  for (Long type : {1011153, 1000486}) {
+    const auto compose = [&](bool single) {
+      ByteWriter body;
+      body.Header("Q7R6", 13000, single ? 1 : 0).Long(type).Start(0, 3).Long(7).Real(0.5).Time(1, 25);
+      body.Vector(1, 2, 3).Start(9, 0).IdentityMatrix().String(u"x").SReal(2.5F).LReal(3.5).End().Memory("ab").End();
+      return body.bytes;
+    };
+    MemoryReadFile source(compose(true));
+    GeData value;
+    ASSERT_TRUE(value.Read(source.file));
+    EXPECT_EQ(ToHex(WriteToMemory([&](HyperFile& file) { value.Write(file); }, true)), ToHex(compose(false)));
+  }
+}
+
 TEST_F(GeDataTest, PassesOverAnOldMemoryValueAndRefusesOtherTypes)
 {
   ByteWriter memory;

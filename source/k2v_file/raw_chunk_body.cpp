@@ -1,5 +1,6 @@
 #include "torvane/raw_chunk_body.h"
 
+#include "k2v_file/raw_values.h"
 #include "torvane/hyper_file.h"
 
 namespace _torvane_
@@ -16,7 +17,12 @@ Bool RawChunkBody::Read(HyperFile& file, Long level)
 {
   Free();
   level_ = level;
-  return file.ReadRawChunk(data_, size_, true);
+  if (!file.ReadRawChunk(data_, size_, true))
+    return false;
+  if (!file.IsSinglePrecision() || WidenReals(data_, size_))
+    return true;
+  file.SetError(FILEERROR_MEMORY);
+  return false;
 }
 
 void RawChunkBody::Write(HyperFile& file) const { file.WriteRawChunk(data_, size_, true); }
