@@ -48,8 +48,10 @@ LLong Convert(const UChar* source, LLong size, UChar* target)
     }
     copy(1);
     for (const LLong end = position + narrow; position < end; position += 4, written += 8) {
-      if (target)
-        bytes::PutBig(target + written, bytes::CleanBits(bytes::CleanReal(bytes::GetBig<ULong>(source + position))));
+      if (target) {
+        const Real number = bytes::CleanReal(bytes::GetBig<ULong>(source + position));
+        bytes::PutBig(target + written, bytes::CleanBits(number));
+      }
     }
   }
   return written;
