@@ -155,7 +155,10 @@ class BaseDocument : public BaseList2D
 
   DocumentPref& GetPref() { return pref_; }
   const DocumentPref& GetPref() const { return pref_; }
+  // The preview picture; its pixels are what a file is given, as JPEG.
   Bitmap& GetPreview() { return preview_; }
+  // The preview of a loaded document as its file held it: encoded, and not touched by changes of the preview.
+  const Bitmap& GetStoredPreview() const { return storedPreview_; }
   Long GetLoadFlags() const { return loadFlags_; }
   void SetLoadFlags(Long flags) { loadFlags_ = flags; }
   const BaseTime& GetTime() const { return time_; }
@@ -179,6 +182,7 @@ class BaseDocument : public BaseList2D
   Bool VisitEmptyNode(Visitor& visitor);
   template <class Visitor>
   Bool VisitNewerState(Visitor& visitor);
+  Bool ReadPreview(HyperFile& file);
   Bool ReadFileInfo(HyperFile& file, Long level);
   void WriteFileInfo(HyperFile& file);
   Bool ReadRoot(HyperFile& file, RootList2D* root, Bool wanted);
@@ -199,6 +203,7 @@ class BaseDocument : public BaseList2D
   RootViewPanel* viewPanels_ = nullptr;
   Bool legacyFlag_ = false;
   Bitmap preview_;
+  Bitmap storedPreview_;
   Long loadFlags_ = LoadObjects | LoadMaterials;
   BaseTime time_;
   Long mode_ = 11;

@@ -3,6 +3,7 @@
 #include "q7r_file/document/document_info.h"
 #include "torvane/base_document.h"
 #include "torvane/base_material.h"
+#include "torvane/bitmap_filters.h"
 
 namespace _torvane_
 {
@@ -51,7 +52,6 @@ Long CurrentTool(Long tool)
 }
 
 constexpr Long kRequiredVersion = 12600;
-constexpr Long kImageFormatJpeg = 1104;
 
 } // namespace
 
@@ -79,10 +79,28 @@ Bool BaseDocument::VisitFileInfo(Visitor& v, Bool& hasPreview)
 void BaseDocument::WriteFileInfo(HyperFile& file)
 {
   WriteChunk(file, kChunkFileInfo, kLevelFileInfo, [this](ChunkWriter& v) {
-    Bool hasPreview = preview_.GetBw() >= 1 || preview_.GetEncodedSize() > 0;
+    Bool hasPreview = preview_.GetBw() >= 1;
     VisitFileInfo(v, hasPreview);
     return !hasPreview || v.Note(v.Good() && v.File().WriteImage(&preview_, kImageFormatJpeg, nullptr, 0));
   });
+}
+
+// A picture that can't be decoded fails the whole load. Only the first of a file counts: decoding thousands of them
+// could take hours.
+Bool BaseDocument::ReadPreview(HyperFile& file)
+{
+  if (storedPreview_.GetEncodedSize() > 0) {
+    Bitmap dropped;
+    return file.ReadImage(dropped);
+  }
+  if (!file.ReadImage(storedPreview_))
+    return false;
+  Filename source;
+  source.SetMemoryRead(storedPreview_.GetEncoded(), storedPreview_.GetEncodedSize());
+  if (JpgLoader().Load(source, preview_, kFirstFrame) == IMAGERESULT_OK)
+    return true;
+  file.SetError(FILEERROR_WRONG_VALUE);
+  return false;
 }
 
 Bool BaseDocument::ReadFileInfo(HyperFile& file, Long level)
@@ -91,10 +109,8 @@ Bool BaseDocument::ReadFileInfo(HyperFile& file, Long level)
   Bool hasPreview = false;
   if (!VisitFileInfo(v, hasPreview))
     return false;
-  if (hasPreview) {
-    if (!file.ReadImage(preview_))
-      return false;
-  }
+  if (hasPreview && !ReadPreview(file))
+    return false;
   // Whoever only wants the picture need not read another byte.
   return (loadFlags_ & LoadPreviewOnly) || file.SkipToEndChunk();
 }

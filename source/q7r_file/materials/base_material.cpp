@@ -16,8 +16,6 @@ constexpr Long kChunkPreview = 110012;
 constexpr Long kLevelPreview = 2;
 constexpr Long kLevelPluginData = 5;
 
-constexpr Long kPreviewFormat = 1104; // JPEG
-constexpr Long kPreviewQualityId = 10021;
 constexpr Long kPreviewQuality = 95;
 
 // Materials of the 3D application that bear a label of their own in a file. Readers don't look at it.
@@ -55,9 +53,9 @@ Bool BaseMaterial::VisitPreview(Visitor& v)
     v.Note(v.Good() && v.File().ReadImage(preview_) && v.File().ReadImage(dropped) && v.File().ReadImage(dropped));
   } else {
     BaseContainer settings;
-    settings.SetLong(kPreviewQualityId, kPreviewQuality);
+    settings.SetLong(kImageJpegQuality, kPreviewQuality);
     for (Bitmap* image : {&preview_, static_cast<Bitmap*>(nullptr), static_cast<Bitmap*>(nullptr)})
-      v.Note(v.Good() && v.File().WriteImage(image, kPreviewFormat, &settings, 0));
+      v.Note(v.Good() && v.File().WriteImage(image, kImageFormatJpeg, &settings, 0));
   }
   if (v.Level() >= 1 && v.VersionBelow(7500))
     v.template Skip<BaseContainer>();
