@@ -1,0 +1,28 @@
+#include "torvane/selection_tag.h"
+
+#include "q7r_file/tags/tag_makers.h"
+
+namespace _torvane_
+{
+
+BaseTag* MakeSelectionTag(Long type) { return NewObj<SelectionTag>(type); }
+
+Bool SelectionTag::ReadChunk(HyperFile& file, Long id, Long level)
+{
+  if (BaseTag::ReadChunk(file, id, level))
+    return true;
+  return id == kChunkSelect && (level < 0 || select_.ReadChunk(file, id, level));
+}
+
+void SelectionTag::WriteChunks(HyperFile& file)
+{
+  BaseTag::WriteChunks(file);
+  select_.WriteChunks(file);
+}
+
+Bool SelectionTag::CopyTagData(BaseTag& destination, ULong, TransArray*)
+{
+  return select_.CopySelect(static_cast<SelectionTag&>(destination).select_);
+}
+
+} // namespace _torvane_
