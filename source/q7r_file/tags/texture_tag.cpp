@@ -1,0 +1,351 @@
+#include "torvane/texture_tag.h"
+
+#include <cmath>
+
+#include "k2v_file/chunk_visitor.h"
+#include "q7r_file/tags/tag_makers.h"
+#include "torvane/base_material.h"
+#include "torvane/ge_math.h"
+
+namespace _torvane_
+{
+
+namespace
+{
+
+enum class Form : UChar
+{
+  kBool,
+  kLong,
+  kReal,
+  kVector, // the number in all three components
+  kLink,   // an empty one
+};
+
+struct Default
+{
+  Long id;
+  Form form;
+  Real number;
+};
+
+// In the order in which a file holds them.
+constexpr Default kDefaults[] = {
+    {kTextureOffsetX, Form::kReal, 0.0},
+    {kTextureOffsetY, Form::kReal, 0.0},
+    {kTextureLengthX, Form::kReal, 1.0},
+    {kTextureLengthY, Form::kReal, 1.0},
+    {kTextureMode1, Form::kLong, 0.0},
+    {kTextureMode2, Form::kLong, 0.0},
+    {kTextureSwitch1, Form::kBool, 1.0},
+    {kTextureSwitch2, Form::kBool, 0.0},
+    {kTextureSwitch3, Form::kBool, 0.0},
+    {kTextureMaterial, Form::kLink, 0.0},
+    {kTextureSize, Form::kVector, 100.0},
+    {kTextureSecondLink, Form::kLink, 0.0},
+    {kTextureFilmAspect, Form::kReal, 1.3333333333},
+    {kTexturePixelAspect, Form::kReal, 1.0},
+    {kTextureSwitch4, Form::kBool, 1.0},
+    {kTextureReal1, Form::kReal, 0.0},
+    {kTextureReal2, Form::kReal, 0.0},
+};
+
+void SetDefault(BaseContainer& container, const Default& row)
+{
+  switch (row.form) {
+  case Form::kBool:
+    return container.SetBool(row.id, row.number != 0.0);
+  case Form::kLong:
+    return container.SetLong(row.id, static_cast<Long>(row.number));
+  case Form::kReal:
+    return container.SetReal(row.id, row.number);
+  case Form::kVector:
+    return container.SetVector(row.id, {row.number, row.number, row.number});
+  case Form::kLink:
+    return container.SetLink(row.id, nullptr);
+  }
+}
+
+// An aspect: the number that is looked for, and the one that is stored. They are not always the same.
+struct Aspect
+{
+  Real searched;
+  Real given;
+};
+
+constexpr Long kAspectCount = 7;
+
+struct AspectList
+{
+  Long preset; // the parameter that names a position in the list
+  Long entry;  // where the aspect is stored
+  Aspect rows[kAspectCount];
+};
+
+constexpr AspectList kAspectLists[] = {
+    {kTextureFilmAspectPreset,
+     kTextureFilmAspect,
+     {{1.0, 1.0},
+      {1.3333333333333333, 1.3333333333333333},
+      {1.7777777777777777, 1.7777777777777777},
+      {1.5, 1.5},
+      {1.5555555555555556, 1.5555555555555556},
+      {1.85185, 1.85185},
+      {2.3888888, 2.38888888}}},
+    {kTexturePixelAspectPreset,
+     kTexturePixelAspect,
+     {{1.0, 1.0},
+      {0.9, 0.9},
+      {1.0666666666666, 1.066666666666},
+      {1.2, 1.2},
+      {1.3333333333333, 1.3333333333333},
+      {1.42222222222222, 1.422222222222},
+      {2.0, 2.0}}},
+};
+
+constexpr Real kAspectTolerance = 0.001;
+constexpr Real kLeastLength = 1e-7; // shorter ones have no tiles
+
+const AspectList* FindAspectList(Long preset)
+{
+  for (const AspectList& list : kAspectLists)
+    if (list.preset == preset)
+      return &list;
+  return nullptr;
+}
+
+Long FindAspect(const AspectList& list, Real aspect)
+{
+  for (Long i = 0; i < kAspectCount; ++i)
+    if (std::abs(list.rows[i].searched - aspect) < kAspectTolerance)
+      return i + 1;
+  return 0;
+}
+
+// The length that belongs to a number of tiles; 0 for a parameter of another kind.
+Long LengthOfTiles(Long id)
+{
+  return id == kTextureTilesX ? kTextureLengthX : id == kTextureTilesY ? kTextureLengthY : 0;
+}
+
+Bool IsPlace(Long id) { return id == kTexturePosition || id == kTextureSize || id == kTextureRotation; }
+
+// What an old chunk holds behind the place.
+struct OldEntry
+{
+  Long id;
+  Form form;
+};
+
+constexpr OldEntry kOldEntries[] = {
+    {kTextureOffsetX, Form::kReal}, {kTextureOffsetY, Form::kReal}, {kTextureLengthX, Form::kReal},
+    {kTextureLengthY, Form::kReal}, {kTextureSwitch1, Form::kBool}, {kTextureSwitch2, Form::kBool},
+    {kTextureSwitch3, Form::kBool}, {kTextureMode1, Form::kLong},   {kTextureMode2, Form::kLong},
+};
+
+// Files below this version hold values that were dropped then.
+constexpr Long kShorterVersion = 11600;
+
+template <class Value>
+Bool ReadEntry(HyperFile& file, BaseContainer& container, Long id)
+{
+  Value value{};
+  if (!ReadValue(file, value))
+    return false;
+  container.SetData(id, GeData(value));
+  return true;
+}
+
+Bool ReadOldEntry(HyperFile& file, BaseContainer& container, const OldEntry& entry)
+{
+  if (entry.form == Form::kReal)
+    return ReadEntry<Real>(file, container, entry.id);
+  return entry.form == Form::kBool ? ReadEntry<Bool>(file, container, entry.id)
+                                   : ReadEntry<Long>(file, container, entry.id);
+}
+
+Real QuotientOrOne(Real a, Real b) { return b != 0.0 ? a / b : 1.0; }
+
+} // namespace
+
+TextureTag::TextureTag() : BaseTag(kTagTexture)
+{
+  for (const Default& row : kDefaults)
+    SetDefault(data_, row);
+}
+
+BaseTag* MakeTextureTag() { return NewObj<TextureTag>(); }
+
+Bool TextureTag::CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation)
+{
+  auto& target = static_cast<TextureTag&>(destination);
+  target.matrixValid_ = false;
+  target.textureMatrix_ = Matrix();
+  return BaseTag::CopyTo(destination, flags, translation);
+}
+
+Bool TextureTag::CopyTextureCache(TextureTag& destination, ULong, TransArray*)
+{
+  destination.matrixValid_ = matrixValid_;
+  destination.textureMatrix_ = textureMatrix_;
+  return true;
+}
+
+BaseList2D* TextureTag::GetMaterial(const BaseDocument* document) const
+{
+  return data_.GetLink(kTextureMaterial, document);
+}
+
+void TextureTag::SetMaterial(BaseMaterial* material) { data_.SetLink(kTextureMaterial, material); }
+
+// ---------------------------------------------------------------------------------------------------------------
+
+Real TextureTag::GetTiles(Long id) const
+{
+  const Real length = data_.GetReal(LengthOfTiles(id));
+  return std::abs(length) > kLeastLength ? 1.0 / length : 0.0;
+}
+
+Bool TextureTag::GetParameter(const ParameterPath& path, GeData& value)
+{
+  const Long id = path[0].id;
+  if (LengthOfTiles(id) != 0) {
+    value = GeData(GetTiles(id));
+    return true;
+  }
+  const AspectList* list = FindAspectList(id);
+  if (!list)
+    return BaseTag::GetParameter(path, value);
+  value = GeData(FindAspect(*list, data_.GetReal(list->entry)));
+  return true;
+}
+
+Bool TextureTag::SetParameter(const ParameterPath& path, const GeData& value)
+{
+  const Long id = path[0].id;
+  if (const Long length = LengthOfTiles(id); length != 0) {
+    const Real tiles = value.GetReal();
+    if (tiles == 0.0)
+      return true;
+    data_.SetReal(length, 1.0 / tiles);
+  } else if (IsPlace(id)) {
+    matrixValid_ = false;
+  } else {
+    SetPreset(id, value);
+  }
+  return BaseTag::SetParameter(path, value);
+}
+
+void TextureTag::SetPreset(Long id, const GeData& value)
+{
+  const AspectList* list = FindAspectList(id);
+  const Long position = list ? value.GetLong() : 0;
+  if (position < 1 || position > kAspectCount)
+    return;
+  const Real aspect = list->rows[position - 1].given;
+  if (aspect != data_.GetReal(list->entry))
+    SetParameterById(list->entry, GeData(aspect));
+}
+
+// ---------------------------------------------------------------------------------------------------------------
+
+void TextureTag::SetPlace(Long id, const Vector& value)
+{
+  data_.SetVector(id, value);
+  matrixValid_ = false;
+}
+
+const Matrix& TextureTag::TextureMatrix()
+{
+  if (matrixValid_)
+    return textureMatrix_;
+  const Vector rotation = Rotation();
+  const Vector size = Size();
+  textureMatrix_ = AnglesToMatrix(rotation, kRotationOrderScene);
+  textureMatrix_.v1 *= size.x;
+  textureMatrix_.v2 *= size.y;
+  textureMatrix_.v3 *= size.z;
+  textureMatrix_.off = Position();
+  matrixValid_ = true;
+  return textureMatrix_;
+}
+
+void TextureTag::SetTextureMatrix(const Matrix& matrix)
+{
+  const Vector size(Length(matrix.v1), Length(matrix.v2), Length(matrix.v3));
+  Vector rotation;
+  SetPosition(matrix.off);
+  SetSize(size);
+  if (size != Vector()) {
+    const Matrix axes({}, Normalize(matrix.v1), Normalize(matrix.v2), Normalize(matrix.v3));
+    rotation = ClosestAngles(Rotation(), MatrixToAngles(axes, kRotationOrderScene), kRotationOrderScene);
+  }
+  SetRotation(rotation);
+}
+
+// ---------------------------------------------------------------------------------------------------------------
+
+Bool TextureTag::ReadChunk(HyperFile& file, Long id, Long level)
+{
+  if (BaseTag::ReadChunk(file, id, level)) {
+    if (id == kChunkNodeHeader && !name_.Content())
+      name_ = "Texture";
+    return true;
+  }
+  return id == kChunkOldTexture && (level < 0 || ReadOldChunk(file, level)) && file.SkipToEndChunk();
+}
+
+Bool TextureTag::ReadOldChunk(HyperFile& file, Long level)
+{
+  ChunkReader v(file, level);
+  const Bool old = v.VersionBelow(kShorterVersion);
+  for (Long id : {kTexturePosition, kTextureSize, kTextureRotation}) {
+    Vector part;
+    if (!v.Vector(part))
+      return false;
+    SetPlace(id, part);
+  }
+  if (old)
+    v.Skip<Matrix, Matrix>();
+  for (const OldEntry& entry : kOldEntries)
+    v.Note(v.Good() && ReadOldEntry(file, data_, entry));
+  if (old)
+    v.Skip<Long, Long>();
+  if (level >= 1)
+    v.Note(v.Good() && ReadEntry<String>(file, data_, kTextureOldName));
+  if (level >= 2 && old)
+    v.Skip<Bool>();
+  if (level >= 3)
+    v.Note(v.Good() && ReadLinkEntry(file, kTextureMaterial));
+  if (level >= 4)
+    v.Note(v.Good() && ReadLinkEntry(file, kTextureSecondLink));
+  if (level >= 5) {
+    Long film[2] = {0, 0};
+    Real pixel[2] = {0.0, 0.0};
+    if (!v.Long(film[0]) || !v.Long(film[1]) || !v.Real(pixel[0]) || !v.Real(pixel[1]))
+      return false;
+    data_.SetReal(kTextureFilmAspect, QuotientOrOne(film[0], film[1]));
+    data_.SetReal(kTexturePixelAspect, QuotientOrOne(pixel[0], pixel[1]));
+  }
+  if (level >= 6)
+    v.Note(v.Good() && ReadEntry<Bool>(file, data_, kTextureSwitch4));
+  return v.Good();
+}
+
+// Into the link of that entry; a file may have put something else there, or nothing.
+Bool TextureTag::ReadLinkEntry(HyperFile& file, Long id)
+{
+  GeData* entry = data_.FindData(id);
+  if (!entry || !entry->GetAliasLink()) {
+    data_.SetLink(id, nullptr);
+    entry = data_.FindData(id);
+  }
+  GeAliasLink* link = entry ? entry->GetAliasLink() : nullptr;
+  if (!link) {
+    file.SetError(FILEERROR_MEMORY);
+    return false;
+  }
+  return link->ReadLink(file);
+}
+
+} // namespace _torvane_
