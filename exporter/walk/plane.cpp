@@ -2,6 +2,9 @@
 
 #include "exporter/walk/layer_transform.h"
 #include "exporter/walk/scene_parameters.h"
+#include "torvane/base_shader.h"
+#include "torvane/base_tag.h"
+#include "torvane/material.h"
 
 namespace exporter
 {
@@ -10,6 +13,57 @@ using namespace _torvane_;
 
 namespace
 {
+
+constexpr const char* kMovieSuffixes[] = {"avi", "mov", "mpg"};
+
+bool IsMovie(const Filename& file)
+{
+  for (const char* suffix : kMovieSuffixes) {
+    if (file.CheckSuffix(suffix))
+      return true;
+  }
+  return false;
+}
+
+// A material named like the object, which a texture tag of the object lays on it. Null when memory is short.
+Material* MakeMaterialOf(ExportContext& context, BaseObject& object)
+{
+  Material* material = AllocMaterial();
+  if (!material)
+    return nullptr;
+  material->SetName(object.GetName());
+  context.document->InsertMaterial(material);
+  BaseTag* tag = object.MakeTag(kTagTexture);
+  if (!tag)
+    return nullptr;
+  tag->SetParameterById(kTextureProjection, kTextureProjectionUVW);
+  tag->GetDataInstance().SetLink(kTextureMaterialLink, material);
+  return material;
+}
+
+void SetSolidColor(HostCalls& host, AEGP_ItemH item, Material& material)
+{
+  constexpr A_Boolean kNotTheProxy = 0;
+  AEGP_ColorVal color = {};
+  if (host(&AEGP_FootageSuite11::AEGP_GetSolidFootageColor, item, kNotTheProxy, &color))
+    material.SetParameterById(kMaterialColor, Vector(color.redF, color.greenF, color.blueF));
+}
+
+// A bitmap shader on the footage's first file, which counts on through the files of a sequence or the frames of a
+// movie.
+void SetFootageBitmap(ExportContext& context, HostCalls& host, AEGP_FootageH footage, Material& material)
+{
+  HostText path(host);
+  A_long files = 0;
+  A_long filesPerFrame = 0;
+  host(&AEGP_FootageSuite11::AEGP_GetFootagePath, footage, 0, 0, path.Out());
+  host(&AEGP_FootageSuite11::AEGP_GetFootageNumFiles, footage, &files, &filesPerFrame);
+  const Filename file(path.Take16());
+  if (!host.Good())
+    return;
+  if (BaseShader* shader = SetMaterialBitmap(&material, kMaterialColorShader, file))
+    shader->SetParameterById(kBitmapLastFrame, (IsMovie(file) ? context.frameCount : files) - 1);
+}
 
 void SetPlaneParameters(BaseObject& plane, Real width, Real height)
 {
@@ -22,7 +76,8 @@ void SetPlaneParameters(BaseObject& plane, Real width, Real height)
 
 } // namespace
 
-BaseObject* ExportPlane(ExportContext& context, AEGP_ItemH item, AEGP_FootageH, bool isSolid, bool)
+BaseObject* ExportPlane(ExportContext& context, AEGP_ItemH item, AEGP_FootageH footage, bool isSolid,
+                        bool isComposition)
 {
   if (!item)
     return nullptr;
@@ -40,8 +95,18 @@ BaseObject* ExportPlane(ExportContext& context, AEGP_ItemH item, AEGP_FootageH, 
   host(&AEGP_ItemSuite13::AEGP_GetItemDimensions, item, &width, &height);
   if (!ExportTransform(context, width, height))
     return nullptr;
-  if (!isNull)
-    SetPlaneParameters(*object, width, height);
+  if (isNull)
+    return host.Good() ? object : nullptr;
+  if (!isComposition) {
+    Material* material = MakeMaterialOf(context, *object);
+    if (!material)
+      return nullptr;
+    if (isSolid)
+      SetSolidColor(host, item, *material);
+    else if (footage)
+      SetFootageBitmap(context, host, footage, *material);
+  }
+  SetPlaneParameters(*object, width, height);
   return host.Good() ? object : nullptr;
 }
 

@@ -38,4 +38,9 @@ inline constexpr Long kPlaneWidthSegments = 1233;
 inline constexpr Long kPlaneAxis = 1300;
 inline constexpr Long kPlaneAxisTowardsViewer = 5;
 
+// Texture tags.
+inline constexpr Long kTextureProjection = 1004;
+inline constexpr Long kTextureProjectionUVW = 6;
+inline constexpr Long kTextureMaterialLink = 1010;
+
 } // namespace exporter
