@@ -143,7 +143,7 @@ Bool K2VPaintLayer::ReadRows(HyperFile& file, const PixelBlock& block, K2VImageF
   if (block.width < 1 || block.height < 1 || block.components < 1)
     return true;
   LLong rowSize = LLong{block.width} * block.components;
-  if (!filter.SpendRowBytes(rowSize))
+  if (!filter.SpendRowBytes(rowSize)) // the buffer
     return false;
   PlaneBuffers buffers(block.width, block.components);
   if (!buffers.IsComplete()) {
@@ -151,14 +151,14 @@ Bool K2VPaintLayer::ReadRows(HyperFile& file, const PixelBlock& block, K2VImageF
     return false;
   }
   for (Long row = 0; row < block.height; ++row) {
+    if (!filter.SpendRowBytes(rowSize))
+      return false;
     for (Long component = 0; component < block.components; ++component) {
       if (!ReadPlane(file, buffers, block.width, component, block.components))
         return false;
     }
     auto y = static_cast<Long>(LLong{block.y} + row);
     SetLayerLine(file, block.x, y, block.width, buffers.Row(), block.components);
-    if (!filter.SpendRowBytes(rowSize))
-      return false;
   }
   return true;
 }
@@ -355,7 +355,7 @@ Bool K2VImageFilter::SpendRowBytes(LLong count)
 Bool K2VImageFilter::Load(const Filename& name, K2VClient& client)
 {
   constexpr LLong kAlwaysGranted = LLong{1} << 24;
-  constexpr LLong kMostPerByte = 1024;
+  constexpr LLong kMostPerByte = 128;
   if (Open(name, client, kHyperFileRead)) {
     rowBytesLeft_ = kAlwaysGranted + file_.GetLength() * kMostPerByte;
     ReadChunks(file_, false);
