@@ -1,5 +1,6 @@
 // The custom value types that the library knows. A class that interprets a type puts its maker into the type's row.
 #include "torvane/custom_data.h"
+#include "torvane/joint_tree.h"
 
 namespace _torvane_
 {
@@ -20,7 +21,7 @@ constexpr CustomDataType kTypes[] = {
     {1018397, 0, MakeCustomData<OpaqueCustomData>},
     {1019655, 1, MakeCustomData<OpaqueCustomData>},
     {1019660, 3, MakeCustomData<OpaqueCustomData>},
-    {kCustomJointTree, 0, MakeCustomData<OpaqueCustomData>},
+    {kCustomJointTree, 0, MakeCustomData<JointTreeData>},
     {100004811, 0, MakeCustomData<OpaqueCustomData>},
     {180000104, 0, MakeCustomData<OpaqueCustomData>},
     {kCustomUnitScale, 0, MakeCustomData<UnitScaleData>},
