@@ -198,9 +198,12 @@ TEST(SceneWriter, TellsAMissingPathFromAnEmptyOne)
 // Every kind of layer, animated and not, nested, locked, parented.
 const std::string kEverything = Composition(
     Layer(13, "Camera", R"("p":)" + Ramp("[500,250,-1000]", "[500,250,-900]") + R"(,"a":)" + Property("[500,250,0]"),
-          R"("pe":{"k":1000})") +
-        "," + Layer(14, "Spot", R"("a":{"k":[0,0,9]})", R"("light":{"type":"spot"})") + "," +
-        Layer(14, "Ambient", "", R"("light":{"type":"ambient"})") + "," +
+          R"("pe":)" + Ramp("[1000]", "[900]")) +
+        "," +
+        Layer(14, "Spot", R"("a":)" + Ramp("[0,0,9]", "[9,0,9]"),
+              R"("light":{"type":"spot","coneAngle":)" + Ramp("[90]", "[0]") + R"(,"color":)" +
+                  Ramp("[1,1,1]", "[0,0,0]") + "}") +
+        "," + Layer(14, "Ambient", "", R"("light":{"type":"ambient"})") + "," +
         Solid("Locked", R"("rx":)" + Ramp("[0]", "[90]"), R"("ae":{"locked":true},"parent":9)") + "," +
         Layer(3, "Null", "", R"("ind":9)") + "," + Layer(2, "", "", R"("refId":"still")") + "," +
         Layer(0, "Nested", "", R"("refId":"inner")"),

@@ -2,8 +2,11 @@
 #pragma once
 
 #include <memory>
+#include <sstream>
 #include <string>
 #include <vector>
+
+#include <gtest/gtest.h>
 
 #include "exporter/walk/composition.h"
 #include "host/standalone_host.h"
@@ -82,6 +85,35 @@ inline std::string Tracks(const BaseObject& object)
     tracks += (tracks.empty() ? "" : " ") + Text(track->GetName()) + ":" +
               std::to_string(track->GetCurve(1, 1)->GetKeyCount());
   return tracks;
+}
+
+// The track of a parameter, or of a component (0 to 2) of a Vector parameter; null when there is none.
+inline CTrack* FindTrack(const BaseObject& object, Long parameter, Long component = -1)
+{
+  if (component < 0)
+    return object.FindTrack(ParameterPath(parameter));
+  return object.FindTrack({ParameterLevel{parameter, 0, 0}, ParameterLevel{kVectorX + component, 0, 0}});
+}
+
+// "0:10 0.04:15" for the keys at 0 and 1/25 s; "-" without such a track. Numbers have six digits.
+inline std::string Keys(const BaseObject& object, Long parameter, Long component = -1)
+{
+  CTrack* track = FindTrack(object, parameter, component);
+  std::ostringstream keys;
+  if (!track)
+    return "-";
+  for (Long i = 0; i < track->GetCurve(1, 0)->GetKeyCount(); ++i) {
+    const CKey& key = *track->GetCurve(1, 0)->GetKey(i);
+    keys << (i ? " " : "") << key.GetTime().Get() << ':' << key.GetValue() + 0.0; // no "-0"
+  }
+  return keys.str();
+}
+
+inline void ExpectNear(const Vector& actual, const Vector& expected, const std::string& what)
+{
+  EXPECT_NEAR(actual.x, expected.x, 1e-9) << what;
+  EXPECT_NEAR(actual.y, expected.y, 1e-9) << what;
+  EXPECT_NEAR(actual.z, expected.z, 1e-9) << what;
 }
 
 class Exported
