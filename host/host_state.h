@@ -1,6 +1,7 @@
 // What a standalone host knows while it runs, for its suites.
 #pragma once
 
+#include "host/progress.h"
 #include "host/standalone_host.h"
 
 #include <map>
@@ -43,6 +44,7 @@ struct HostState
   std::string outputPath;
   std::function<bool()> askOverwrite;
   std::function<void(const std::string&)> report;
+  Progress progress;
 
   AEGP_PluginID plugin = 0;
   std::string pluginName;

@@ -65,6 +65,7 @@ A_Err GetLayerName(AEGP_PluginID, AEGP_LayerH layer, AEGP_MemHandle* layerName, 
     if (!layer)
       return kNoLayer;
     const Layer& found = *FromHandle(layer);
+    state.progress.BeginLayer();
     if (layerName)
       *layerName = state.NewUtf16(found.name);
     if (sourceName)
@@ -238,6 +239,7 @@ A_Err GetNewStreamValue(AEGP_PluginID, AEGP_StreamRefH stream, AEGP_LTimeMode, c
     if (!time || time->scale == 0)
       return "no time";
     const double frame = FrameAt(*time, state.project.frameDuration);
+    state.progress.ReadFrame(frame);
     value->streamH = stream;
     value->val = ToStreamValue(found.Info().type, found.At(frame, preExpression != 0));
     ++state.balance.streamValues;

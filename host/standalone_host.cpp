@@ -111,6 +111,7 @@ void StandaloneHost::Activate(const Item* item) { state_->active = item; }
 void StandaloneHost::SetOutputPath(std::string path) { state_->outputPath = std::move(path); }
 void StandaloneHost::OnAskOverwrite(std::function<bool()> ask) { state_->askOverwrite = std::move(ask); }
 void StandaloneHost::OnReport(std::function<void(const std::string&)> report) { state_->report = std::move(report); }
+void StandaloneHost::OnProgress(std::function<void(double)> progress) { state_->progress.Listen(std::move(progress)); }
 
 A_Err StandaloneHost::Start(AEGP_EntryPoint entry)
 {
@@ -131,6 +132,8 @@ A_Err StandaloneHost::CallMenuHook()
 CommandResult StandaloneHost::CallCommandHook(AEGP_Command command, bool alreadyHandled)
 {
   CommandResult result;
+  if (state_->active && state_->active->composition)
+    state_->progress.Start(*state_->active->composition);
   for (const Hook& hook : state_->hooks) {
     if (hook.command != AEGP_Command_ALL && hook.command != command)
       continue;

@@ -75,6 +75,9 @@ class StandaloneHost
   void OnAskOverwrite(std::function<bool()> ask);
   // Takes the messages that the plug-in shows.
   void OnReport(std::function<void(const std::string&)> report);
+  // Hears, while a command runs, which share of the active composition was read: from 0 to 1, never falling. It is
+  // called for every value that is read, so it has to be quick.
+  void OnProgress(std::function<void(double share)> progress);
 
   // --- What the application does
 

@@ -3,8 +3,8 @@
 #include "exporter/walk/layer_transform.h"
 #include "exporter/walk/scene_parameters.h"
 #include "torvane/base_shader.h"
-#include "torvane/base_tag.h"
 #include "torvane/material.h"
+#include "torvane/texture_tag.h"
 
 namespace exporter
 {
@@ -37,7 +37,7 @@ Material* MakeMaterialOf(ExportContext& context, BaseObject& object)
   if (!tag)
     return nullptr;
   tag->SetParameterById(kTextureProjection, kTextureProjectionUVW);
-  tag->GetDataInstance().SetLink(kTextureMaterialLink, material);
+  tag->GetDataInstance().SetLink(kTextureMaterial, material);
   return material;
 }
 

@@ -41,6 +41,5 @@ inline constexpr Long kPlaneAxisTowardsViewer = 5;
 // Texture tags.
 inline constexpr Long kTextureProjection = 1004;
 inline constexpr Long kTextureProjectionUVW = 6;
-inline constexpr Long kTextureMaterialLink = 1010;
 
 } // namespace exporter

@@ -1,7 +1,9 @@
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <filesystem>
 #include <fstream>
+#include <set>
 
 #include "export_fixture.h"
 #include "exporter/entry/dialog_scripts.h"
@@ -112,6 +114,31 @@ TEST_F(CommandHook, WritesTheSceneFile)
   EXPECT_TRUE(IsScene("scene.q7r"));
   EXPECT_TRUE(host_.Reports().empty());
   EXPECT_EQ(host_.Balance(), host::HostBalance());
+}
+
+TEST_F(CommandHook, LetsTheHostTellHowFarItIs)
+{
+  // Five objects: a composition of one layer, twice, and a layer that moves; a title and a flat layer don't count.
+  const std::string nested = Layer(0, "N", "", R"("refId":"in")");
+  host::StandaloneHost host(
+      host::LoadCompositionText(Composition(nested + "," + Layer(5, "Title", "") + "," + nested +
+                                                R"(,{"ty":1,"sw":9,"sh":9,"sc":"#fff","ks":{}},)" +
+                                                Solid("A", R"("p":)" + Ramp("[0,0,0]", "[9,9,9]")),
+                                            R"("assets":[{"id":"in","layers":[)" + Solid("B") + "]}]"),
+                                "test.json", "/"));
+  std::vector<double> shares;
+  host.OnProgress([&](double share) { shares.push_back(share); });
+  host.Start(EntryPointFunc);
+  host.SetOutputPath(folder_ / "progress.q7r");
+  host.OnAskOverwrite([] { return true; });
+  for (int round = 0; round < 2; ++round) { // each export counts from 0
+    shares.clear();
+    EXPECT_EQ(host.CallCommandHook(ExportCommand).error, 0);
+    EXPECT_TRUE(std::is_sorted(shares.begin(), shares.end()));
+    const std::set<double> seen(shares.begin(), shares.end());
+    for (double share : {0.0, 0.2, 0.4, 0.6, 0.8, 0.9, 1.0})
+      EXPECT_TRUE(seen.count(share)) << share;
+  }
 }
 
 TEST_F(CommandHook, KeepsTheTextOfACancelledDialogLocked)

@@ -5,6 +5,7 @@
 
 #include "exporter/host_api/aegp_entry.h"
 #include "host/standalone_host.h"
+#include "progress_bar.h"
 #include "scene_file.h"
 #include "verbs.h"
 
@@ -55,6 +56,7 @@ void RequireWritable(const std::string& output)
 // Plays one export. True if the exporter showed no message.
 bool PlayExport(host::StandaloneHost& player, const Options& options, const std::string& output)
 {
+  ProgressBar bar("reading layers");
   bool quiet = true;
   bool refused = false;
   player.SetOutputPath(std::filesystem::absolute(output).string());
@@ -64,8 +66,10 @@ bool PlayExport(host::StandaloneHost& player, const Options& options, const std:
   });
   player.OnReport([&](const std::string& message) {
     quiet = false;
+    bar.Clear();
     std::fprintf(stderr, "%s\n", message.c_str());
   });
+  player.OnProgress([&](double share) { bar.Show(share); });
   if (A_Err error = player.Start(EntryPointFunc))
     throw Failure(output + ": the exporter didn't start (error " + std::to_string(error) + ")");
   AEGP_Command command = player.FindCommand(kMenuEntry);

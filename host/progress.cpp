@@ -1,0 +1,54 @@
+#include "host/progress.h"
+
+#include <algorithm>
+#include <unordered_map>
+
+namespace host
+{
+
+namespace
+{
+
+// The layers that become objects, in all uses of all compositions.
+std::uint64_t CountLayers(const Composition& composition, std::unordered_map<const Composition*, std::uint64_t>& known)
+{
+  if (const auto found = known.find(&composition); found != known.end())
+    return found->second;
+  std::uint64_t count = 0;
+  for (const Layer* layer : composition.layers) {
+    const bool isObject = layer->type == AEGP_ObjectType_AV
+                              ? layer->source != nullptr
+                              : layer->type == AEGP_ObjectType_CAMERA || layer->type == AEGP_ObjectType_LIGHT;
+    if (!layer->is3D || !isObject)
+      continue;
+    ++count;
+    if (layer->source && layer->source->composition)
+      count += CountLayers(*layer->source->composition, known);
+  }
+  known[&composition] = count;
+  return count;
+}
+
+} // namespace
+
+void Progress::Start(const Composition& composition)
+{
+  std::unordered_map<const Composition*, std::uint64_t> known;
+  layers_ = listener_ ? CountLayers(composition, known) : 0;
+  begun_ = 0;
+  singleFrame_ = composition.workAreaStart;
+  frames_ = std::max(1, composition.workAreaEnd - composition.workAreaStart);
+  share_ = 0;
+}
+
+void Progress::Tell(double frame)
+{
+  if (!listener_ || begun_ == 0 || layers_ == 0)
+    return;
+  const double before = static_cast<double>(begun_) - 1;
+  const double share = (before + std::clamp(frame / frames_, 0.0, 1.0)) / static_cast<double>(layers_);
+  share_ = std::clamp(share, share_, 1.0);
+  listener_(share_);
+}
+
+} // namespace host
