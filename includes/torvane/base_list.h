@@ -4,6 +4,7 @@
 #include "torvane/alias.h"
 #include "torvane/base_container.h"
 #include "torvane/ge_string.h"
+#include "torvane/kept_chunks.h"
 #include "torvane/private_chunk.h"
 #include "torvane/root_list.h"
 
@@ -52,6 +53,9 @@ class BaseList2D : public GeListNode
   Bool ReadChunk(HyperFile& file, Long id, Long level) override;
   Long GetType() const override { return type_; }
   void WriteChunks(HyperFile& file) override;
+  // Keeps what other programs put among the node's chunks: WriteChunks writes it behind those of this class. Chunks of
+  // this library's own ids are never kept, since whoever refused one had a reason, nor are those of older files.
+  Bool KeepChunk(HyperFile& file, Long id, Long level) override;
   Bool CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation) override;
   // Looks in the node's container. A level of kDataGroup steps into a nested container, a level of kDataVector selects
   // a component of a Vector, which is always looked up in, and written back to, the top container; setting a component
@@ -137,6 +141,7 @@ class BaseList2D : public GeListNode
   RootCTrack tracks_;
   BaseContainer data_;
   RootList2D* listHead_ = nullptr; // the list that holds the node; not owned
+  KeptChunks keptChunks_;
 
  private:
   template <class Visitor>

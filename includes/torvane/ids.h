@@ -100,6 +100,9 @@ inline constexpr Long kLevelContainer = 1;
 inline constexpr Long kChunkParameterPath = 1;
 inline constexpr Long kLevelParameterPath = 2;
 
+// True for the chunks that stand among a node's own and belong to this library, whichever class they are for.
+constexpr Bool IsLibraryChunk(Long id) { return (id >= 110000 && id < 111000) || (id >= 300001047 && id <= 300001060); }
+
 inline constexpr Long kChunkLayer = 110313;
 inline constexpr Long kLevelLayer = 1;
 

@@ -29,6 +29,9 @@ class PrivateChunk : public GeTempPublicNode2D<PrivateChunk>
   // Takes the chunk `id` whose start was just read. True: it was consumed with its end. False: the id isn't known here,
   // or its content can't be built; the loop then skips the chunk.
   virtual Bool ReadChunk(HyperFile& file, Long id, Long level);
+  // Called in a loop that keeps going, for a chunk that nobody took and nothing was read of. True: it was kept, and
+  // consumed with its end.
+  virtual Bool KeepChunk(HyperFile&, Long, Long) { return false; }
   virtual Bool IsRootList() const { return false; }
   virtual Long GetType() const { return 0; }
   // Writes the chunks of this node, those of the base class first. Failures show in the file's error.

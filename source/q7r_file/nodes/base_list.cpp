@@ -135,6 +135,7 @@ void BaseList2D::WriteChunks(HyperFile& file)
   if (uniqueIds_)
     WriteUniqueIds(file);
   GeListNode::WriteChunks(file);
+  keptChunks_.Write(file);
 }
 
 Bool BaseList2D::ReadChunk(HyperFile& file, Long id, Long level)
@@ -155,6 +156,11 @@ Bool BaseList2D::ReadChunk(HyperFile& file, Long id, Long level)
   }
 }
 
+Bool BaseList2D::KeepChunk(HyperFile& file, Long id, Long level)
+{
+  return !IsLibraryChunk(id) && file.GetFileVersion() >= kCurrentFileVersion && keptChunks_.Read(file, id, level);
+}
+
 Bool BaseList2D::CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation)
 {
   auto& target = static_cast<BaseList2D&>(destination);
@@ -163,6 +169,8 @@ Bool BaseList2D::CopyTo(PrivateChunk& destination, ULong flags, TransArray* tran
   if (!data_.CopyTo(target.data_, flags, translation))
     return false;
   target.markerDrawn_ = false; // a copy is never the same node
+  if (!keptChunks_.CopyTo(target.keptChunks_))
+    return false;
   link_.CopyLinkTo(&target.link_, translation);
   target.name_ = name_;
   if (!GeListNode::CopyTo(destination, flags, translation))

@@ -91,7 +91,8 @@ Bool PrivateChunk::ReadOneChunk(HyperFile& file, Bool keepGoing, Bool& finished)
   Long level = 0;
   if (!file.ReadChunkStart(id, level))
     return false;
-  if (!ReadChunk(file, id, level)) {
+  const LLong body = file.GetPosition();
+  if (!ReadChunk(file, id, level) && !(keepGoing && file.GetPosition() == body && KeepChunk(file, id, level))) {
     Bool skipped = file.SkipToEndChunk();
     if (!keepGoing) {
       finished = true;

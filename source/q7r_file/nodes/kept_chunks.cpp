@@ -1,0 +1,69 @@
+#include "torvane/kept_chunks.h"
+
+#include "torvane/hyper_file.h"
+#include "torvane/raw_chunk_body.h"
+
+namespace _torvane_
+{
+
+struct KeptChunks::Chunk
+{
+  explicit Chunk(Long chunkId) : id(chunkId) {}
+
+  Long id;
+  RawChunkBody body;
+  Chunk* next = nullptr;
+};
+
+void KeptChunks::Flush()
+{
+  while (Chunk* chunk = first_) {
+    first_ = chunk->next;
+    DeleteObj(chunk);
+  }
+  last_ = nullptr;
+}
+
+KeptChunks::Chunk* KeptChunks::Append(Long id)
+{
+  Chunk* chunk = NewObj<Chunk>(id);
+  if (!chunk)
+    return nullptr;
+  (last_ ? last_->next : first_) = chunk;
+  last_ = chunk;
+  return chunk;
+}
+
+Bool KeptChunks::Read(HyperFile& file, Long id, Long level)
+{
+  Chunk* chunk = Append(id);
+  if (!chunk) {
+    file.SetError(FILEERROR_MEMORY);
+    return false;
+  }
+  return chunk->body.Read(file, level);
+}
+
+void KeptChunks::Write(HyperFile& file) const
+{
+  for (const Chunk* chunk = first_; chunk; chunk = chunk->next) {
+    file.WriteChunkStart(chunk->id, chunk->body.GetLevel());
+    chunk->body.Write(file);
+    file.WriteChunkEnd();
+  }
+}
+
+Bool KeptChunks::CopyTo(KeptChunks& destination) const
+{
+  destination.Flush();
+  for (const Chunk* chunk = first_; chunk; chunk = chunk->next) {
+    Chunk* copy = destination.Append(chunk->id);
+    if (!copy || !chunk->body.CopyTo(copy->body)) {
+      destination.Flush();
+      return false;
+    }
+  }
+  return true;
+}
+
+} // namespace _torvane_

@@ -1,0 +1,40 @@
+// Runs the built program as its users do.
+#pragma once
+
+#include <cstdlib>
+#include <string>
+
+#include "support/temp_folder.h"
+
+#ifndef _WIN32
+#include <sys/wait.h>
+#endif
+
+struct RunResult
+{
+  int status;      // the exit status; negative when the program was killed
+  std::string out; // standard output
+  std::string err; // standard error
+};
+
+inline std::string Quoted(const std::string& argument) { return "\"" + argument + "\""; }
+
+// `arguments` as they stand on a command line, with the paths Quoted. Standard input is empty.
+inline RunResult RunQ7r(const std::string& arguments)
+{
+  const TempFolder folder;
+  const std::string out = folder / "out";
+  const std::string err = folder / "err";
+#ifdef _WIN32
+  const std::string command =
+      "\"" + Quoted(TEST_Q7R) + " " + arguments + " <NUL >" + Quoted(out) + " 2>" + Quoted(err) + "\"";
+  const int status = std::system(command.c_str());
+#else
+  const std::string command = Quoted(TEST_Q7R) + " " + arguments + " </dev/null >" + Quoted(out) + " 2>" + Quoted(err);
+  const int raw = std::system(command.c_str());
+  const int status = WIFEXITED(raw) ? WEXITSTATUS(raw) : -1;
+#endif
+  const std::vector<std::uint8_t> outBytes = ReadWholeFile(out);
+  const std::vector<std::uint8_t> errBytes = ReadWholeFile(err);
+  return {status, {outBytes.begin(), outBytes.end()}, {errBytes.begin(), errBytes.end()}};
+}

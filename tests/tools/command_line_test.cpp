@@ -1,0 +1,237 @@
+// The program as its users meet it: results, exit status, and one plain line for everything that goes wrong.
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <random>
+
+#include "support/byte_writer.h"
+#include "support/run_q7r.h"
+
+namespace
+{
+
+using Bytes = std::vector<std::uint8_t>;
+
+constexpr const char* kComposition = R"({"fr":25,"ip":0,"op":50,"w":1000,"h":500,"nm":"Main","layers":[
+  {"ddd":1,"ty":13,"nm":"Eye","ks":{"p":{"k":[500,250,-800]}},"pe":{"k":800}},
+  {"ddd":1,"ty":3,"nm":"Carrier","ind":1,"ks":{}},
+  {"ddd":1,"ty":1,"nm":"Wall","parent":1,"sw":100,"sh":50,"sc":"#ff8000","ks":{"p":{"k":[10,20,30]}}}]})";
+
+class CommandLine : public testing::Test
+{
+ protected:
+  std::string Write(const std::string& name, const Bytes& bytes) const
+  {
+    WriteWholeFile(folder_ / name, bytes);
+    return folder_ / name;
+  }
+  std::string Write(const std::string& name, const std::string& text) const
+  {
+    return Write(name, Bytes(text.begin(), text.end()));
+  }
+  // A scene made by the program itself.
+  std::string Scene(const std::string& name = "scene.q7r") const
+  {
+    const RunResult run = RunQ7r("export " + Quoted(Write("in.json", kComposition)) + " " + Quoted(folder_ / name));
+    EXPECT_EQ(run.status, 0) << run.err;
+    return folder_ / name;
+  }
+
+  TempFolder folder_;
+};
+
+// Nothing on standard output and one line that holds all of `parts` on standard error.
+void ExpectRefusal(const RunResult& run, const std::vector<std::string>& parts, int status = 2)
+{
+  EXPECT_EQ(run.status, status);
+  EXPECT_EQ(run.out, "");
+  EXPECT_EQ(std::count(run.err.begin(), run.err.end(), '\n'), 1) << run.err;
+  for (const std::string& part : parts)
+    EXPECT_NE(run.err.find(part), std::string::npos) << run.err << "does not say: " << part;
+}
+
+bool Contains(const Bytes& all, const Bytes& part)
+{
+  return std::search(all.begin(), all.end(), part.begin(), part.end()) != all.end();
+}
+
+TEST_F(CommandLine, ExportsASceneThatTheOtherVerbsUnderstand)
+{
+  const std::string scene = Scene();
+  const RunResult check = RunQ7r("check " + Quoted(scene));
+  EXPECT_EQ(check.status, 0) << check.out;
+  EXPECT_NE(check.out.find("good"), std::string::npos);
+  const RunResult tree = RunQ7r("tree " + Quoted(scene));
+  EXPECT_EQ(tree.status, 0);
+  for (const char* word : {"Eye", "Carrier", "Wall", "Camera", "Null", "Plane"})
+    EXPECT_NE(tree.out.find(word), std::string::npos) << word << " is not in\n" << tree.out;
+  const RunResult info = RunQ7r("info --json " + Quoted(scene));
+  EXPECT_EQ(info.status, 0);
+  for (const char* word : {"\"version\": 13000", "\"fps\": 25", "\"objects\": 4", "\"renderSettings\": 1"})
+    EXPECT_NE(info.out.find(word), std::string::npos) << word << " is not in\n" << info.out;
+  const RunResult dump = RunQ7r("dump " + Quoted(scene));
+  EXPECT_EQ(dump.status, 0);
+  EXPECT_NE(dump.out.find("110059"), std::string::npos);
+}
+
+TEST_F(CommandLine, RefusesCompositionsAndPathsWithOneLine)
+{
+  const std::string good = Write("good.json", kComposition);
+  const std::string out = folder_ / "out.q7r";
+  struct Case
+  {
+    const char* name;
+    std::string arguments;
+    std::vector<std::string> says;
+  };
+  const Case cases[] = {
+      {"no file", Quoted(folder_ / "none.json") + " " + Quoted(out), {"none.json"}},
+      {"an empty file", Quoted(Write("empty.json", "")) + " " + Quoted(out), {"empty.json"}},
+      {"no JSON", Quoted(Write("text.json", "Once upon a time")) + " " + Quoted(out), {"text.json", "line 1"}},
+      {"JSON of something else", Quoted(Write("list.json", "[1, 2]")) + " " + Quoted(out), {"list.json"}},
+      {"an unknown composition", Quoted(good) + " " + Quoted(out) + " --composition Moon", {"good.json", "Moon"}},
+      {"a missing folder", Quoted(good) + " " + Quoted(folder_ / "missing/out.q7r"), {"missing/out.q7r"}},
+      {"a folder as the output", Quoted(good) + " " + Quoted(folder_ / "folder"), {"folder.q7r", "folder"}},
+  };
+  std::filesystem::create_directory(folder_ / "folder.q7r");
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.name);
+    ExpectRefusal(RunQ7r("export " + c.arguments), c.says);
+    EXPECT_FALSE(std::filesystem::exists(out));
+  }
+}
+
+TEST_F(CommandLine, LeavesAnExistingFileAloneWithoutForce)
+{
+  const std::string scene = Scene();
+  const std::string other = Scene("other.q7r");
+  const std::string old = Write("old.q7r", "precious");
+  const std::string in = folder_ / "in.json";
+  for (const std::string& arguments :
+       {"export " + Quoted(in) + " " + Quoted(old), "resave " + Quoted(scene) + " " + Quoted(old),
+        "merge " + Quoted(scene) + " " + Quoted(other) + " -o " + Quoted(old)}) {
+    SCOPED_TRACE(arguments);
+    Write("old.q7r", "precious");
+    ExpectRefusal(RunQ7r(arguments), {"old.q7r", "--force"});
+    EXPECT_EQ(ReadWholeFile(old).size(), 8U);
+    const RunResult forced = RunQ7r(arguments + " --force");
+    EXPECT_EQ(forced.status, 0) << forced.err;
+    EXPECT_EQ(RunQ7r("check " + Quoted(old)).status, 0);
+  }
+}
+
+TEST_F(CommandLine, SaysWhatIsWrongWithASceneFileAndDestroysNothing)
+{
+  const Bytes whole = ReadWholeFile(Scene());
+  std::mt19937 random(5);
+  Bytes noise(5000);
+  std::generate(noise.begin(), noise.end(), [&] { return static_cast<std::uint8_t>(random()); });
+  Bytes inside = whole;
+  std::copy(noise.begin(), noise.begin() + 400, inside.begin() + 300);
+  struct Case
+  {
+    const char* name;
+    Bytes bytes;
+    int checkStatus;
+  };
+  const Case cases[] = {{"empty.q7r", {}, 2},
+                        {"header.q7r", Bytes(whole.begin(), whole.begin() + 13), 1},
+                        {"cut.q7r", Bytes(whole.begin(), whole.begin() + static_cast<long>(whole.size() / 2)), 1},
+                        {"ident.q7r", ByteWriter().Header("Q7R5").Start(110059, 0).End().bytes, 2},
+                        {"noise.q7r", noise, 2},
+                        {"inside.q7r", inside, 1}};
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.name);
+    const std::string file = Write(c.name, c.bytes);
+    for (const std::string& arguments :
+         {"info " + Quoted(file), "tree --json " + Quoted(file),
+          "resave " + Quoted(file) + " " + Quoted(folder_ / "new.q7r"),
+          "resave --force " + Quoted(file) + " " + Quoted(file),
+          "merge " + Quoted(folder_ / "scene.q7r") + " " + Quoted(file) + " -o " + Quoted(folder_ / "new.q7r")})
+      ExpectRefusal(RunQ7r(arguments), {c.name, "byte "});
+    const RunResult check = RunQ7r("check " + Quoted(file));
+    EXPECT_EQ(check.status, c.checkStatus) << check.out << check.err;
+    EXPECT_NE((check.out + check.err).find("byte "), std::string::npos);
+    EXPECT_EQ(ReadWholeFile(file), c.bytes) << "the damaged file was touched";
+    EXPECT_FALSE(std::filesystem::exists(folder_ / "new.q7r"));
+  }
+  ExpectRefusal(RunQ7r("info " + Quoted(folder_ / "none.q7r")), {"none.q7r"});
+}
+
+TEST_F(CommandLine, TellsArgumentsThatItCannotTake)
+{
+  for (const char* arguments :
+       {"", "dance", "info", "export only-one.json", "tree a.q7r --loud", "merge a.q7r b.q7r"}) {
+    const RunResult run = RunQ7r(arguments);
+    EXPECT_EQ(run.status, 2) << arguments;
+    EXPECT_EQ(run.out, "") << arguments;
+    EXPECT_NE(run.err, "") << arguments;
+  }
+  for (const char* verb : {"", "export", "info", "tree", "dump", "check", "resave", "merge"}) {
+    const RunResult run = RunQ7r(std::string(verb) + " --help");
+    EXPECT_EQ(run.status, 0) << verb;
+    EXPECT_NE(run.out.find("Usage: q7r"), std::string::npos) << run.out;
+  }
+  EXPECT_EQ(RunQ7r("--version").status, 0);
+}
+
+// What other programs put into a scene: an object, a tag, a value and chunks of kinds that nobody here knows.
+TEST_F(CommandLine, ResavesWhatItDoesNotKnowByteForByte)
+{
+  const Bytes objectData = ByteWriter()
+                               .Start(110064, 9)
+                               .Long(1012345)
+                               .Long(0)
+                               .String(u"Fog")
+                               .Real(0.25)
+                               .Start(9, 2)
+                               .String(u"deep")
+                               .End()
+                               .End()
+                               .bytes;
+  const Bytes tagData =
+      ByteWriter().Start(110064, 8).Long(1012346).Long(0).String(u"Mark").Memory("of another").LLong(1).End().bytes;
+  const Bytes value = ByteWriter().Long(1000077).Start(0, 4).Long(5).Vector(1, 2, 3).End().bytes;
+  const Bytes objectChunk = ByteWriter().Start(777001, 3).Bool(true).Start(5, 5).Long(6).End().End().bytes;
+  const Bytes documentChunk = ByteWriter().Start(777002, 1).String(u"of the document").SReal(2).End().bytes;
+  const Bytes header = ByteWriter()
+                           .Start(110050, 0)
+                           .Long(0)
+                           .Long(0)
+                           .Start(132, 1)
+                           .Long(1012345)
+                           .Long(40)
+                           .Append(value)
+                           .End()
+                           .UChar(0)
+                           .String(u"Fog")
+                           .End()
+                           .bytes;
+  ByteWriter w;
+  w.Header().Start(110059, 0).Append(documentChunk).Start(110107, 0).Start(110100, 0).Start(5154, 0).Append(header);
+  w.Append(objectChunk).Append(objectData).Start(110108, 0).Start(110100, 0).Start(5691, 0).Append(tagData);
+  w.End().End().End().End().End().End().End();
+  const std::string once = folder_ / "once.q7r";
+  const std::string twice = folder_ / "twice.q7r";
+  const RunResult first = RunQ7r("resave " + Quoted(Write("strange.q7r", w.bytes)) + " " + Quoted(once));
+  ASSERT_EQ(first.status, 0) << first.err;
+  const RunResult second = RunQ7r("resave " + Quoted(once) + " " + Quoted(twice));
+  ASSERT_EQ(second.status, 0) << second.err;
+  EXPECT_EQ(RunQ7r("check " + Quoted(once)).status, 0);
+  for (const Bytes& part : {objectData, tagData, value, objectChunk, documentChunk}) {
+    EXPECT_TRUE(Contains(ReadWholeFile(once), part)) << static_cast<int>(part[4]);
+    EXPECT_TRUE(Contains(ReadWholeFile(twice), part)) << static_cast<int>(part[4]);
+  }
+  EXPECT_EQ(ReadWholeFile(once).size(), ReadWholeFile(twice).size());
+}
+
+TEST_F(CommandLine, MergesWhatOtherFilesHold)
+{
+  const std::string all = folder_ / "all.q7r";
+  const RunResult run = RunQ7r("merge " + Quoted(Scene("a.q7r")) + " " + Quoted(Scene("b.q7r")) + " -o " + Quoted(all));
+  ASSERT_EQ(run.status, 0) << run.err;
+  const RunResult info = RunQ7r("info --json " + Quoted(all));
+  EXPECT_NE(info.out.find("\"objects\": 8"), std::string::npos) << info.out;
+}
+
+} // namespace
