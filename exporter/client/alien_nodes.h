@@ -4,6 +4,7 @@
 #include "torvane/base_object.h"
 #include "torvane/layer_object.h"
 #include "torvane/material.h"
+#include "torvane/point_object_data.h"
 #include "torvane/render_data.h"
 #include "torvane/root_list.h"
 
@@ -47,6 +48,13 @@ class AlienMaterial : public _torvane_::Material
 
 class AlienRenderData : public _torvane_::RenderData
 {};
+
+class AlienPolygonObjectData : public _torvane_::PolygonObjectData
+{
+ public:
+  // True for an object whose points and polygons can be used: it has both, or points alone, or neither.
+  Bool Execute() override;
+};
 
 // Planes: all that the exporter knows of them is in their container.
 class AlienPrimitiveObjectData : public _torvane_::NodeData

@@ -2,6 +2,8 @@
 #include "exporter/client/alien_nodes.h"
 #include "torvane/ge_string.h"
 #include "torvane/hooks.h"
+#include "torvane/point_object.h"
+#include "torvane/value_tags.h"
 
 namespace exporter
 {
@@ -18,10 +20,24 @@ Long MaterialCounter = 0; // the number of the next material that runs
 
 } // namespace
 
-// Polygon objects stand under a label of their own in a file.
+// Point and polygon objects stand under labels in a file that are no types.
 BaseObject* AlienRootObject::AllocMember(Long type)
 {
+  if (type == kObjectPoint)
+    return NewObj<PointObject>();
   return AllocObject(type == kObjectPolygonLabel ? kObjectPolygon : type);
+}
+
+Bool AlienPolygonObjectData::Execute()
+{
+  if (!GetNode() || !GetNode()->IsInstanceOf(kObjectPolygon))
+    return false;
+  const auto& object = static_cast<const BaseObject&>(*GetNode());
+  const PointTag* points = GetPointTag(object);
+  const PolygonTag* polygons = GetPolygonTag(object);
+  const Bool noPoints = !points || points->GetCount() == 0;
+  const Bool noPolygons = !polygons || polygons->GetCount() == 0;
+  return noPolygons || !noPoints;
 }
 
 Bool AlienMaterial::Execute()
@@ -56,6 +72,8 @@ NodeData* AllocNodeData(Long type, Bool& known)
 {
   known = true;
   switch (type) {
+  case kObjectPolygon:
+    return NewObj<exporter::AlienPolygonObjectData>();
   case kObjectPlane:
     return NewObj<exporter::AlienPrimitiveObjectData>(type);
   default:

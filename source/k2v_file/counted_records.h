@@ -30,7 +30,8 @@ Bool MakeRoomForRecord(T*& block, Long& capacity, Long held, Long count)
 
 // Reads `count` records into a new block, each by `visit(reader, record)` onto an empty one. A count that the rest of
 // the file can't hold, at `bytesEach` bytes a record at least, is an error before anything is allocated. The block
-// (null for a count of 0) is the caller's, and `read` tells how many records it holds, after a failure too.
+// (null for a count of 0) is the caller's, and `read` tells how many records it holds; after a failure too, the one
+// that it fell on included.
 template <class T, class Visit>
 Bool ReadRecords(ChunkReader& reader, Long count, LLong bytesEach, T*& block, Long& read, Visit&& visit)
 {
@@ -38,13 +39,14 @@ Bool ReadRecords(ChunkReader& reader, Long count, LLong bytesEach, T*& block, Lo
   read = 0;
   if (!reader.Note(reader.Good() && reader.File().HasRoomFor(count, bytesEach)))
     return false;
-  for (Long capacity = 0; read < count; ++read) {
+  for (Long capacity = 0; read < count;) {
     if (!MakeRoomForRecord(block, capacity, read, count)) {
       reader.File().SetError(FILEERROR_MEMORY);
       return reader.Note(false);
     }
-    block[read] = T{};
-    if (!visit(reader, block[read]))
+    T& record = block[read++];
+    record = T{};
+    if (!visit(reader, record))
       return false;
   }
   return true;

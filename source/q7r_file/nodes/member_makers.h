@@ -8,6 +8,7 @@ namespace _torvane_
 {
 
 class BaseList2D;
+class BaseObject;
 class NodeData;
 
 BaseList2D* MakeViewPanel();
@@ -17,6 +18,7 @@ BaseList2D* MakeVideoPost();
 BaseList2D* MakeEmptyShader();
 BaseList2D* MakeEmptyTrack();
 BaseList2D* MakeEmptyKey();
+BaseObject* MakePointObject();
 NodeData* MakePointObjectData();
 
 } // namespace _torvane_

@@ -160,6 +160,8 @@ BaseObject* RootObject::AllocMember(Long type)
   }
   case kObjectGeneric:
     return new BaseObject(kObjectGeneric);
+  case kObjectPoint: // a label alone; the object's chunks tell its type
+    return MakePointObject();
   case kObjectPolygonLabel:
     return AllocObject(kObjectPolygon);
   default:

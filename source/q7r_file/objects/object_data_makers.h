@@ -2,7 +2,7 @@
 // a new thing that the caller owns, or null when memory is short.
 #pragma once
 
-#include "q7r_file/nodes/member_makers.h" // MakePointObjectData
+#include "q7r_file/nodes/member_makers.h" // MakePointObject, MakePointObjectData
 #include "torvane/types.h"
 
 namespace _torvane_

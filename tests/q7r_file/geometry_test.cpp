@@ -1,0 +1,333 @@
+// Objects of points: their own chunks, the operations that resize their tags, splines, and copies.
+#include <algorithm>
+#include <climits>
+#include <functional>
+#include <string>
+
+#include <gtest/gtest.h>
+
+#include "q7r_file/node_bytes.h"
+#include "support/assertion_counter.h"
+#include "support/counting_memory.h"
+#include "torvane/ge_data.h"
+#include "torvane/point_object_data.h"
+#include "torvane/spline_object.h"
+#include "torvane/value_tags.h"
+
+namespace
+{
+
+using namespace _torvane_;
+
+// A chunk around the chunk of the one segment (n, n).
+ByteWriter& Selection(ByteWriter& to, Long chunk, Long n)
+{
+  return to.Start(chunk, 0).Start(110011, 0).Long(1).Long(n).Long(n).End().End();
+}
+
+// All that polygon data can hold, in the order of a file.
+Bytes AllPolygonChunks()
+{
+  ByteWriter chunks;
+  Long n = 1;
+  for (const Long chunk : {110117, 110118, 110119, 110120, 110128, 110129, 110132})
+    Selection(chunks, chunk, n++);
+  chunks.Start(110133, 1).Long(2).Long(3).ULong(7).ULong(8).ULong(0xFFFFFFFF).Long(0).End();
+  return chunks.bytes;
+}
+
+bool EndsWith(const Bytes& whole, const Bytes& end)
+{
+  return whole.size() >= end.size() &&
+         std::equal(end.begin(), end.end(), whole.end() - static_cast<std::ptrdiff_t>(end.size()));
+}
+
+bool Holds(const Bytes& whole, const Bytes& part)
+{
+  return std::search(whole.begin(), whole.end(), part.begin(), part.end()) != whole.end();
+}
+
+BaseArrayTag* AddTag(BaseObject& object, Long type, Long count)
+{
+  auto* tag = static_cast<BaseArrayTag*>(object.MakeTag(type));
+  EXPECT_TRUE(tag->ResizeTagArray(count));
+  return tag;
+}
+
+// Runs `attempt` with ever more memory until it succeeds.
+void TryWithLittleMemory(const std::function<bool()>& attempt)
+{
+  counting_memory::BalanceCheck balance;
+  for (LLong count = 0;; ++count) {
+    ASSERT_LT(count, 500);
+    counting_memory::FailAfter(count);
+    const bool done = attempt();
+    counting_memory::FailNever();
+    if (done)
+      return;
+  }
+}
+
+} // namespace
+
+TEST(PolygonObject, KeepsItsSelectionsAndNgonsBehindTheTransform)
+{
+  counting_memory::BalanceCheck balance;
+  BaseObject* object = AllocObject(kObjectPolygon);
+  EXPECT_EQ(BytesOf(*GetPolygonData(*object)), Bytes());
+  EXPECT_TRUE(ReadInto(*object, AllPolygonChunks()));
+  EXPECT_TRUE(GetPolygonData(*object)->GetPhongBreakEdges().IsSelected(7));
+  EXPECT_EQ(GetPolygonData(*object)->GetNgons()->GetCount(), 2);
+  EXPECT_TRUE(EndsWith(BytesOf(*object), AllPolygonChunks()));
+
+  auto* clone = static_cast<BaseObject*>(object->MakeClone(0, nullptr));
+  auto* bare = static_cast<BaseObject*>(object->MakeClone(kCopyNoNgons, nullptr));
+  DeleteObj(object);
+  EXPECT_EQ(ToHex(BytesOf(*GetPolygonData(*clone))), ToHex(AllPolygonChunks()));
+  EXPECT_EQ(GetPolygonData(*bare)->GetNgons(), nullptr);
+  EXPECT_TRUE(GetPolygonData(*bare)->GetHiddenEdges().IsSelected(6));
+
+  PointObjectData points;
+  EXPECT_TRUE(clone->GetObjectData()->CopyTo(points, 0, nullptr) && points.CopyTo(*clone->GetObjectData(), 0, nullptr));
+  EXPECT_EQ(points.GetPointSelection().SegmentCount(), 0) << "data of another class";
+  EXPECT_TRUE(GetPolygonData(*clone)->GetPointSelection().IsSelected(1));
+  DeleteObj(clone);
+  DeleteObj(bare);
+}
+
+TEST(PolygonObject, StaysInStepWithStrangeChunks)
+{
+  AssertionCounter quiet;
+  struct Row
+  {
+    const char* what;
+    ByteWriter chunk;
+    bool read;
+    Long points; // selected
+    Long ngons;
+  };
+  const Row rows[] = {
+      {"nothing inside", std::move(ByteWriter().Start(110117, 0).End()), true, 1, 2},
+      {"an empty set", std::move(ByteWriter().Start(110117, 0).Start(110011, 0).Long(0).End().End()), true, 0, 2},
+      {"another chunk inside", std::move(ByteWriter().Start(110117, 0).Start(9, 0).Long(1).End().Long(2).End()), true,
+       1, 2},
+      {"more than the set",
+       std::move(ByteWriter().Start(110117, 3).Start(110011, 4).Long(0).Long(5).End().Long(6).End()), true, 0, 2},
+      {"a value", std::move(ByteWriter().Start(110117, 0).Long(1).End()), false, 1, 2},
+      {"n-gons of level 0", std::move(ByteWriter().Start(110133, 0).Long(9).End()), true, 1, 2},
+      {"n-gons of level 2", std::move(ByteWriter().Start(110133, 2).Long(9).End()), true, 1, 2},
+      {"other n-gons", std::move(ByteWriter().Start(110133, 1).Long(1).Long(1).ULong(4).Long(8).End()), true, 1, 1},
+      {"no n-gons", std::move(ByteWriter().Start(110133, 1).Long(0).End()), true, 1, 0},
+      {"too many n-gons", std::move(ByteWriter().Start(110133, 1).Long(INT_MAX).Long(1).ULong(4).End()), false, 1, 0},
+      {"a negative count", std::move(ByteWriter().Start(110133, 1).Long(-1).End()), false, 1, 0},
+      {"too many edges", std::move(ByteWriter().Start(110133, 1).Long(1).Long(INT_MAX).ULong(4).End()), false, 1, 1},
+      {"edges of another kind", std::move(ByteWriter().Start(110133, 1).Long(1).Long(2).ULong(4).Long(4).End()), false,
+       1, 1},
+  };
+  for (const Row& row : rows) {
+    counting_memory::BalanceCheck balance;
+    BaseObject* object = AllocObject(kObjectPolygon);
+    ASSERT_TRUE(ReadInto(*object, AllPolygonChunks()));
+    counting_memory::ResetPeak();
+    const LLong before = counting_memory::Get().bytes;
+    EXPECT_EQ(ReadInto(*object, ByteWriter(row.chunk).Start(1234, 0).End().bytes), row.read) << row.what;
+    EXPECT_LT(counting_memory::Get().peakBytes - before, 100000) << row.what;
+    EXPECT_EQ(GetPolygonData(*object)->GetPointSelection().SelectedCount(), row.points) << row.what;
+    EXPECT_EQ(GetPolygonData(*object)->GetNgons()->GetCount(), row.ngons) << row.what;
+    DeleteObj(object);
+  }
+}
+
+TEST(PolygonObject, ResizesAllTagsInStep)
+{
+  BaseObject* object = AllocObject(kObjectPolygon);
+  EXPECT_TRUE(ResizePolygons(*object, -1, -1, -1) && ResizePolygons(*object, 0, 0, 0));
+  EXPECT_EQ(object->GetFirstTag(), nullptr) << "nothing is no reason to make a tag";
+  BaseTag* plugin = NewObj<BaseTag>(kTagPlugin, kTagPoint); // bears the number of another class
+  object->InsertTag(plugin);
+  EXPECT_TRUE(ResizePolygons(*object, 4, 2, 3));
+  EXPECT_EQ(GetPointCount(*object), 4);
+  EXPECT_EQ(GetPolygonCount(*object), 2);
+  EXPECT_EQ(GetPolygonData(*object)->GetNgons()->GetCount(), 3);
+
+  GetPointTag(*object)->GetArray()[3] = Vector(1, 2, 3);
+  BaseArrayTag* maps[] = {AddTag(*object, kTagVertexMap, 4), AddTag(*object, kTagVertexMap, 1)};
+  BaseArrayTag* normals = AddTag(*object, kTagNormal, 4);
+  EXPECT_TRUE(AddUVWTag(*object));
+  auto* uvw = static_cast<UVWTag*>(object->GetTag(kTagUVW));
+  EXPECT_EQ(uvw->GetCount(), 2);
+  EXPECT_TRUE(ResizePolygons(*object, 6, 5, -1));
+  for (const BaseArrayTag* tag : {maps[0], maps[1], normals})
+    EXPECT_EQ(tag->GetCount(), 6);
+  EXPECT_EQ(GetPointTag(*object)->GetArray()[3], Vector(1, 2, 3));
+  EXPECT_EQ(GetPointTag(*object)->GetArray()[5], Vector());
+  EXPECT_EQ(GetPolygonCount(*object), 5);
+  EXPECT_EQ(uvw->GetCount(), 5);
+  EXPECT_EQ(GetPolygonData(*object)->GetNgons()->GetCount(), 3);
+
+  EXPECT_TRUE(ResizePolygons(*object, -1, -1, 0));
+  EXPECT_EQ(GetPolygonData(*object)->GetNgons(), nullptr);
+  EXPECT_EQ(GetPointCount(*object) + GetPolygonCount(*object), 11);
+  EXPECT_TRUE(ResizePolygons(*object, 0, 0, 0));
+  EXPECT_EQ(GetPointCount(*object), 0);
+  EXPECT_EQ(maps[1]->GetCount(), 0);
+  EXPECT_EQ(GetPolygonCount(*object), 5) << "a polygon tag is never emptied";
+  EXPECT_EQ(uvw->GetCount(), 0);
+  DeleteObj(object);
+
+  BaseObject plain(kObjectNull);
+  EXPECT_TRUE(ResizePolygons(plain, 1, -1, 0));
+  EXPECT_FALSE(ResizePolygons(plain, -1, -1, 1)) << "no place for n-gons";
+}
+
+TEST(PolygonObject, TakesAnotherNumberOfNgonsWithTheirEdges)
+{
+  counting_memory::BalanceCheck balance;
+  NgonData ngons;
+  const ULong edges[] = {5, 6, 7};
+  EXPECT_TRUE(ngons.Resize(3) && ngons.SetEdges(0, edges, 3) && ngons.SetEdges(2, edges, 1));
+  EXPECT_FALSE(ngons.SetEdges(3, edges, 1) || ngons.SetEdges(-1, edges, 1));
+  EXPECT_TRUE(ngons.Resize(2) && ngons.Resize(4));
+  EXPECT_EQ(ngons.GetEntry(0)->edges[2], 7u);
+  EXPECT_EQ(ngons.GetEntry(2)->count, 0);
+  EXPECT_EQ(ngons.GetEntry(4), nullptr);
+  EXPECT_TRUE(ngons.Resize(-3));
+  EXPECT_EQ(ngons.GetCount(), 0);
+}
+
+TEST(Geometry, SurvivesLittleMemory)
+{
+  AssertionCounter quiet;
+  TryWithLittleMemory([] {
+    BaseObject* object = AllocObject(kObjectPolygon);
+    const bool done = object && ResizePolygons(*object, 4, 2, 3) && AddUVWTag(*object) &&
+                      ResizePolygons(*object, 5, 3, 9) && ReadInto(*object, AllPolygonChunks());
+    BaseObject* clone = done ? static_cast<BaseObject*>(object->MakeClone(0, nullptr)) : nullptr;
+    const bool copied = clone && GetPointCount(*clone) == 5 && GetPolygonData(*clone)->GetNgons() &&
+                        GetPolygonData(*clone)->GetNgons()->GetCount() == 2;
+    DeleteObj(clone);
+    DeleteObj(object);
+    return copied;
+  });
+  TryWithLittleMemory([] {
+    SplineObject* spline = AllocSpline(3, 1);
+    const bool done = spline && ResizeSpline(*spline, 5, 2) && GetTangentTag(*spline)->GetCount() == 5;
+    DeleteObj(spline);
+    return done;
+  });
+}
+
+TEST(SplineObject, HasTangentsAsItsTypeAsks)
+{
+  counting_memory::BalanceCheck balance;
+  EXPECT_EQ(AllocSpline(kMaxSplinePoints + 1, 0), nullptr);
+  SplineObject* spline = AllocSpline(0, 1);
+  ASSERT_NE(GetTangentTag(*spline), nullptr);
+  EXPECT_EQ(GetTangentTag(*spline)->GetCount(), 0);
+  const BaseContainer& data = spline->GetDataInstance();
+  EXPECT_EQ(data.GetLong(kSplineType), 1);
+  EXPECT_EQ(data.GetLong(1001), 3);
+  EXPECT_TRUE(data.FindData(1002) && !data.GetBool(1002));
+  EXPECT_EQ(data.GetLong(1003), 8);
+  EXPECT_EQ(data.GetReal(1004), 5.0 / 180.0 * 3.141592653589793);
+  EXPECT_EQ(data.GetReal(1005), 5.0);
+
+  EXPECT_TRUE(ResizeSpline(*spline, 3, 2));
+  EXPECT_EQ(GetTangentTag(*spline)->GetCount(), 3);
+  GetTangentTag(*spline)->GetArray()[1].left = Vector(1, 1, 1);
+  for (const Long type : {0, 3, 5, 1, 2, 4}) {
+    EXPECT_TRUE(SetSplineType(*spline, type));
+    EXPECT_EQ(GetTangentTag(*spline) != nullptr, type == 1 || type == 2 || type == 4) << type;
+    EXPECT_EQ(data.GetLong(kSplineType), type);
+  }
+  EXPECT_EQ(GetTangentTag(*spline)->GetCount(), 3);
+  EXPECT_EQ(GetTangentTag(*spline)->GetArray()[1].left, Vector()) << "the old values are gone";
+  DeleteObj(spline);
+}
+
+TEST(SplineObject, ResizesPointsTangentsAndSegments)
+{
+  struct Row
+  {
+    Long points, segments;
+    Long pointsThen, segmentsThen, tangentsThen; // -1: no tag
+  };
+  const Row rows[] = {{8, -1, 8, -1, 8}, {8, 2, 8, 2, 8},  {4, -1, 4, 2, 4}, {-1, 3, 4, 3, 4},
+                      {0, 1, 0, 1, 4},   {5, 0, 5, -1, 5}, {5, 0, 5, -1, 5}};
+  SplineObject* spline = AllocSpline(1, 2);
+  BaseArrayTag* map = AddTag(*spline, kTagVertexMap, 1);
+  for (const Row& row : rows) {
+    const int number = static_cast<int>(&row - rows);
+    EXPECT_TRUE(ResizeSpline(*spline, row.points, row.segments)) << number;
+    EXPECT_EQ(GetPointCount(*spline), row.pointsThen) << number;
+    EXPECT_EQ(map->GetCount(), row.pointsThen) << number;
+    EXPECT_EQ(GetTangentTag(*spline)->GetCount(), row.tangentsThen) << number;
+    const SegmentTag* segments = GetSegmentTag(*spline);
+    EXPECT_EQ(segments ? segments->GetCount() : -1, row.segmentsThen) << number;
+  }
+  DeleteObj(spline);
+}
+
+TEST(SplineObject, KeepsItsSelectionsInItsOwnChunkOnce)
+{
+  counting_memory::BalanceCheck balance;
+  ByteWriter chunks;
+  Selection(chunks, 110117, 4);
+  Selection(chunks, 110118, 6);
+  SplineObject* spline = AllocSpline(2, 0);
+  EXPECT_TRUE(ReadInto(*spline, chunks.bytes));
+  BaseObject parent(kObjectNull);
+  spline->InsertUnder(&parent);
+  const Bytes bytes = BytesOf(parent);
+  EXPECT_TRUE(Holds(bytes, FromHex("01 000013ED 00000000"))) << "its label";
+  const auto first = std::search(bytes.begin(), bytes.end(), chunks.bytes.begin(), chunks.bytes.end());
+  ASSERT_NE(first, bytes.end());
+  EXPECT_EQ(std::search(first + 1, bytes.end(), chunks.bytes.begin(), chunks.bytes.end()), bytes.end());
+
+  BaseObject again(kObjectNull);
+  EXPECT_TRUE(ReadInto(again, bytes));
+  BaseObject* read = again.GetDown();
+  ASSERT_NE(read, nullptr);
+  EXPECT_EQ(read->GetName(), String("Spline")) << "a spline without a name";
+  EXPECT_EQ(GetPointCount(*read), 2);
+  EXPECT_TRUE(Holds(BytesOf(again), chunks.bytes));
+  read->SetName(String("arc"));
+  EXPECT_TRUE(ReadInto(*read, FromHex("01 0001ADF5 00000002 0F 00000000 0C 00 02")));
+  EXPECT_EQ(read->GetName(), String("arc"));
+}
+
+TEST(PointObject, ComesBackFromAFileUnderItsLabel)
+{
+  counting_memory::BalanceCheck balance;
+  BaseObject* object = AllocObject(kObjectPointBased);
+  ByteWriter chunks;
+  static_cast<PointObjectData*>(object->GetObjectData())->GetHiddenPoints().SelectAdd(3);
+  Selection(chunks, 110118, 3);
+  ResizePoints(*object, 2);
+  BaseObject parents[] = {BaseObject(kObjectNull), BaseObject(kObjectNull), BaseObject(kObjectNull)};
+  object->InsertUnder(&parents[0]);
+  for (int i = 0; i < 3; ++i) {
+    BaseObject* member = parents[i].GetDown();
+    ASSERT_NE(member, nullptr);
+    EXPECT_EQ(member->GetType(), kObjectPointBased);
+    EXPECT_EQ(member->GetDiskType(), kObjectPoint);
+    EXPECT_EQ(GetPointCount(*member), 2);
+    EXPECT_TRUE(Holds(BytesOf(parents[i]), chunks.bytes));
+    EXPECT_TRUE(i == 2 || ReadInto(parents[i + 1], BytesOf(parents[i])));
+  }
+}
+
+TEST(PolygonObject, RunsWhenItsPolygonsHavePoints)
+{
+  struct Row
+  {
+    Long points, polygons;
+    bool runs;
+  };
+  for (const Row& row : {Row{-1, -1, true}, Row{3, -1, true}, Row{3, 1, true}, Row{-1, 1, false}}) {
+    BaseObject* object = AllocObject(kObjectPolygon);
+    ResizePolygons(*object, row.points, row.polygons, -1);
+    EXPECT_EQ(object->Execute(), row.runs) << row.points << ", " << row.polygons;
+    DeleteObj(object);
+  }
+}
