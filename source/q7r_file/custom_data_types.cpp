@@ -1,5 +1,7 @@
 // The custom value types that the library knows. A class that interprets a type puts its maker into the type's row.
+#include "torvane/blend_layers.h"
 #include "torvane/custom_data.h"
+#include "torvane/gradient.h"
 #include "torvane/joint_tree.h"
 
 namespace _torvane_
@@ -10,13 +12,13 @@ namespace
 
 // In the order of their ids.
 constexpr CustomDataType kTypes[] = {
-    {kCustomGradient, 1, MakeCustomData<OpaqueCustomData>},
+    {kCustomGradient, 1, MakeCustomData<GradientData>},
     {1000997, 0, MakeCustomData<OpaqueCustomData>},
     {1009060, 3, MakeCustomData<OpaqueCustomData>},
     {1009290, 2, MakeCustomData<OpaqueCustomData>},
     {kCustomThreeNumbers, 0, MakeCustomData<ThreeNumbersData>},
     {1009398, 0, MakeCustomData<OpaqueCustomData>},
-    {1011131, 2, MakeCustomData<OpaqueCustomData>},
+    {kCustomBlendLayers, 2, MakeCustomData<iBlendDataType>},
     {1011153, 7, MakeCustomData<OpaqueCustomData>},
     {1018397, 0, MakeCustomData<OpaqueCustomData>},
     {1019655, 1, MakeCustomData<OpaqueCustomData>},

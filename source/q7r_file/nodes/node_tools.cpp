@@ -3,20 +3,6 @@
 namespace _torvane_
 {
 
-Real* ComponentOf(Vector& vector, Long id)
-{
-  switch (id) {
-  case kVectorX:
-    return &vector.x;
-  case kVectorY:
-    return &vector.y;
-  case kVectorZ:
-    return &vector.z;
-  default:
-    return nullptr;
-  }
-}
-
 Bool GetVectorParameter(const Vector& vector, const ParameterPath& path, GeData& value)
 {
   Vector copy = vector;

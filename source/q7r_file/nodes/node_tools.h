@@ -1,6 +1,7 @@
 // Small things that the node classes share.
 #pragma once
 
+#include "k2v_file/vector_component.h"
 #include "torvane/ge_data.h"
 #include "torvane/hyper_file.h"
 #include "torvane/private_chunk.h"
@@ -46,8 +47,5 @@ Bool ReadInnerChunk(HyperFile& file, Inner& inner)
     return false;
   return file.SkipToEndChunk();
 }
-
-// The component of a Vector that a path level names, or null for another id.
-Real* ComponentOf(Vector& vector, Long id);
 
 } // namespace _torvane_

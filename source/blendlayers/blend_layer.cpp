@@ -1,0 +1,128 @@
+// What all layers do alike, by the list of their settings.
+#include "blendlayers/blend_fields.h"
+#include "torvane/ge_data.h"
+#include "torvane/hyper_file.h"
+
+namespace _torvane_
+{
+
+Bool BlendLayer::CopyLayerTo(BlendLayer& destination, TransArray* translation) const
+{
+  if (destination.layerType_ != layerType_)
+    return false;
+  if (&destination == this)
+    return true;
+  destination.name_ = name_;
+  destination.isOpen_ = isOpen_;
+  destination.selected_ = selected_;
+  destination.enabled_ = enabled_;
+  destination.layerId_ = layerId_;
+  destination.blendMode_ = blendMode_;
+  const BlendFields from = FieldsOf();
+  const BlendFields to = destination.Fields();
+  for (Long i = 0; i < from.count; ++i) {
+    if (!CopyField(from.fields[i], to.fields[i], translation))
+      return false;
+  }
+  return true;
+}
+
+Bool BlendLayer::ReadLayer(HyperFile& file, Long level)
+{
+  Bool read = true;
+  for (const BlendField& field : Fields())
+    read = ReadField(file, level, field) && read;
+  return read;
+}
+
+Bool BlendLayer::WriteLayer(HyperFile& file) const
+{
+  Bool written = true;
+  for (const BlendField& field : FieldsOf())
+    written = WriteField(file, field) && written;
+  return written;
+}
+
+Bool BlendLayer::LayersDiffer(const BlendLayer& other) const
+{
+  if (layerType_ != other.layerType_ || !(name_ == other.name_) || isOpen_ != other.isOpen_ ||
+      selected_ != other.selected_ || enabled_ != other.enabled_ || layerId_ != other.layerId_ ||
+      blendMode_ != other.blendMode_ || layerMark_ != other.layerMark_)
+    return true;
+  const BlendFields own = FieldsOf();
+  const BlendFields others = other.FieldsOf();
+  for (Long i = 0; i < own.count; ++i) {
+    if (FieldsDiffer(own.fields[i], others.fields[i]))
+      return true;
+  }
+  return false;
+}
+
+Bool BlendLayer::LayersEqualIgnoringFlags(const BlendLayer& other, Long) const
+{
+  return layerType_ == other.layerType_ && name_ == other.name_;
+}
+
+Bool BlendLayer::GetLayerParameter(Long id, GeData& value) const
+{
+  switch (id) {
+  case kBlendEnabled:
+    value = GeData(enabled_);
+    return true;
+  case kBlendSelected:
+    value = GeData(selected_);
+    return true;
+  case kBlendMode:
+    value = GeData(blendMode_);
+    return true;
+  default:
+    break;
+  }
+  for (const BlendField& field : FieldsOf()) {
+    if (field.id == id)
+      return GetField(field, value);
+  }
+  return false;
+}
+
+Bool BlendLayer::SetLayerParameter(Long id, const GeData& value)
+{
+  switch (id) {
+  case kBlendEnabled:
+    enabled_ = value.GetBool();
+    return true;
+  case kBlendSelected:
+    selected_ = value.GetBool();
+    return true;
+  case kBlendMode:
+    blendMode_ = value.GetLong();
+    return true;
+  default:
+    break;
+  }
+  for (const BlendField& field : Fields()) {
+    if (field.id == id)
+      return SetField(field, value);
+  }
+  return false;
+}
+
+Bool BlendLayer::GetLayerValue(Long sub, const ParameterPath& path, GeData& value, ULong& flags) const
+{
+  for (const BlendField& field : FieldsOf()) {
+    if (field.sub == sub && sub != kNoBlendSub && GetFieldPart(field, path, value))
+      flags |= kParameterAnswered;
+  }
+  return true;
+}
+
+Bool BlendLayer::SetLayerValue(Long sub, const ParameterPath& path, const GeData& value, ULong& flags)
+{
+  for (const BlendField& field : Fields()) {
+    if (field.sub == sub && sub != kNoBlendSub && SetFieldPart(field, path, value))
+      flags |= kParameterAnswered;
+  }
+  return true;
+}
+
+} // namespace _torvane_

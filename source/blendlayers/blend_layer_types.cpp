@@ -1,0 +1,90 @@
+// The kinds of layers and their settings, each in file order: the value, its id, its sub number, its range.
+#include "blendlayers/blend_fields.h"
+#include "torvane/base_shader.h"
+
+namespace _torvane_
+{
+
+BlendFields BlendFolder::Fields()
+{
+  return {{mode_, 2000}, {opacity_, 2001, 0, 0.0, 1.0}, {isOpen2_, 2002}, {children_, kBlendFolderFirstLink}};
+}
+
+Bool BlendFolder::LayersEqualIgnoringFlags(const BlendLayer& other, Long mode) const
+{
+  if (!BlendLayer::LayersEqualIgnoringFlags(other, mode))
+    return false;
+  const CBlendLayers& others = static_cast<const BlendFolder&>(other).children_;
+  if (children_.GetCount() != others.GetCount())
+    return false;
+  for (Long i = 0; i < children_.GetCount(); ++i) {
+    if (!children_.GetLayer(i)->LayersEqualIgnoringFlags(*others.GetLayer(i), mode))
+      return false;
+  }
+  return true;
+}
+
+BlendFields BlendShader::Fields() { return {{mode_, 2000}, {opacity_, 2001, 0, 0.0, 1.0}, {link_, 2002}}; }
+
+BaseShader* BlendShader::GetShader() const
+{
+  GeListNode* target = link_.GetLink();
+  // A link of a file may name a thing that is no named node.
+  return target && target->GoalIsWrittenElsewhere() ? static_cast<BaseList2D*>(target)->AsShader() : nullptr;
+}
+
+void BlendShader::GetLayerName(String& name)
+{
+  const BaseShader* shader = GetShader();
+  name_ = shader ? shader->GetName() : String("BlendShader");
+  name = name_;
+}
+
+// A shader in no list isn't the scene's to delete.
+void BlendShader::ReleaseLinked()
+{
+  BaseShader* shader = GetShader();
+  link_.ClearLink();
+  if (!shader || !shader->IsInList())
+    return;
+  shader->RemoveFromList();
+  DeleteObj(shader);
+}
+
+BlendFields BlendEffectBC::Fields()
+{
+  return {{brightness_, 2000, 0, -1.0, 1.0}, {contrast_, 2001, 1, -1.0, 1.0}, {gamma_, 2002, 2, 0.1, 10.0}};
+}
+
+BlendFields BlendEffectHSL::Fields()
+{
+  const Real lowestHue = absolute_ ? 0.0 : -180.0;
+  const Real highestHue = absolute_ ? 360.0 : 180.0;
+  return {{hue_, 2000, 0, lowestHue, highestHue},
+          {second_, 2001, 1, absolute_ ? 0.0 : -1.0, 1.0},
+          {third_, 2002, 2, -1.0, 1.0},
+          {absolute_, 2003, 3}};
+}
+
+BlendFields BlendEffectPosterize::Fields() { return {{width_, 2001, 0, 0.0, 1.0}, {levels_, 2000, 1, 1.0, 255.0}}; }
+
+BlendFields BlendEffectColorize::Fields()
+{
+  return {{input_, 2000, 0, 0.0, 6.0}, {gradient_, 2001, 1}, {first_, 2002}, {second_, 2003, 2, 1}};
+}
+
+BlendFields BlendEffectLimits::Fields() { return {{low_, 2000, 0, 0.0, 1000.0}, {high_, 2001, 1, 0.0, 1000.0}}; }
+
+BlendFields BlendEffectDistorter::Fields()
+{
+  return {{noise_, 2000},    {strength_, 2001, 0, -1.0, 1.0}, {wrap_, 2006},
+          {flag_, 2005},     {second_, 2002, 1, 0.0, 20.0},   {third_, 2003, 2},
+          {fourth_, 2004, 3}};
+}
+
+BlendFields BlendEffectTransform::Fields()
+{
+  return {{angle_, 2000, 0}, {mirror_, 2001, 1}, {flip_, 2002, 2}, {scale_, 2003, 3}, {offset_, 2004, 4}};
+}
+
+} // namespace _torvane_

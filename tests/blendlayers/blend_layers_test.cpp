@@ -1,0 +1,507 @@
+// Stacks of blend layers: their file forms, their parameters at the ends of every range, and how layers are moved,
+// copied and found.
+#include <gtest/gtest.h>
+
+#include "support/assertion_record.h"
+#include "support/byte_writer.h"
+#include "support/counting_memory.h"
+#include "support/memory_file.h"
+#include "support/text.h"
+#include "torvane/base_shader.h"
+#include "torvane/blend_layers.h"
+#include "torvane/ge_data.h"
+
+namespace
+{
+
+using namespace _torvane_;
+using Bytes = std::vector<std::uint8_t>;
+using Reports = std::vector<std::string>;
+
+// A custom value with its stack.
+class Stack
+{
+ public:
+  Stack() { value.SetType(kCustomBlendLayers); }
+
+  iBlendDataType& Data() { return static_cast<iBlendDataType&>(*value.GetCustomDataType(kCustomBlendLayers)); }
+  CBlendLayers& Layers() { return Data().GetLayers(); }
+  BlendLayer* Add(Long type, Long id)
+  {
+    BlendLayer* layer = Layers().AppendLayer(type);
+    layer->SetLayerId(id);
+    return layer;
+  }
+
+  GeData value;
+};
+
+// "1 2(3 4) 5": the layer ids of a stack.
+std::string Ids(const CBlendLayers& layers)
+{
+  std::string text;
+  for (Long i = 0; i < layers.GetCount(); ++i) {
+    BlendLayer* layer = layers.GetLayer(i);
+    EXPECT_EQ(layer->GetParent(), &layers);
+    text += (i ? " " : "") + std::to_string(layer->GetLayerId());
+    if (BlendFolder* folder = layer->AsFolder())
+      text += "(" + Ids(folder->GetChildren()) + ")";
+  }
+  return text;
+}
+
+double RealOf(const BlendLayer& layer, Long id)
+{
+  GeData value;
+  EXPECT_TRUE(layer.GetLayerParameter(id, value)) << id;
+  return value.GetReal();
+}
+
+// What opens a layer in a file; ended by `Tail` from level 2 on.
+ByteWriter Head(Long type, Long id, bool selected = false)
+{
+  return ByteWriter().Long(type).Bool(selected).String(u"L").Long(id).Long(0);
+}
+
+// The values of the settings that the table in the file tells, all different from the defaults.
+ByteWriter Settings(Long type, Long level)
+{
+  ByteWriter w;
+  const Bytes gradient = ByteWriter()
+                             .Start(132, 1)
+                             .Long(-1)
+                             .Long(1)
+                             .Long(1000481)
+                             .Start(0, 1)
+                             .Start(132, 1)
+                             .Long(-1)
+                             .Long(1000)
+                             .Long(15)
+                             .Long(5)
+                             .End()
+                             .Bool(false)
+                             .End()
+                             .End()
+                             .bytes;
+  switch (type) {
+  case 1:
+    return w.Long(4).Real(0.5).Bool(false).Long(0).Long(3);
+  case 2:
+    return w.Long(4).Real(0.5).Memory(std::string_view("alias2\0\0\0\0\0\0\0\0", 14));
+  case 3:
+    return w.Real(0.25).Real(0.5).Real(2);
+  case 4:
+    return w.Real(10).Real(0.5).Real(0.25).Bool(true);
+  case 5:
+    return w.Real(0.5).Long(7);
+  case 6:
+    w.Long(3).Append(gradient).Bool(true);
+    return level >= 1 ? w.Bool(true) : w;
+  case 9:
+    return w.Long(1).Real(0.5).Long(2).Bool(true).Real(6).Real(7).Real(8);
+  case 10:
+    return w.Real(0.5).Bool(true).Bool(true).Vector(2, 3, 4).Vector(5, 6, 7);
+  default:
+    return w.Real(0.25).Real(0.5);
+  }
+}
+
+// A list of one layer of each type, ids 1 to 10, as level `level` holds it.
+ByteWriter AllLayers(Long level)
+{
+  ByteWriter w;
+  w.Long(10).Long(level);
+  for (Long type = 1; type <= 10; ++type) {
+    w.Append(Head(type, type, type == 5).bytes).Append(Settings(type, level).bytes);
+    if (level >= 2)
+      w.Bool(type != 3);
+  }
+  return w;
+}
+
+// Reads a stack with `body` in its chunk; a Long behind it must be in step.
+bool ReadStack(Stack& stack, const Bytes& body)
+{
+  ByteWriter w;
+  w.Header().Long(kCustomBlendLayers).Start(0, 2).Append(body).End().Long(77);
+  MemoryReadFile memory(w.bytes);
+  Long witness = 0;
+  return stack.value.Read(memory.file) && memory.file.ReadLong(witness) && witness == 77;
+}
+
+Bytes WriteStack(const Stack& stack)
+{
+  return WriteToMemory([&](HyperFile& file) { stack.value.Write(file); });
+}
+
+} // namespace
+
+TEST(BlendLayers, WriteAStackByteForByte)
+{
+  Stack stack;
+  BlendLayer* layer = stack.Add(kBlendClip, 3);
+  layer->SetSelected(true);
+  stack.Add(kBlendColorize, 4)->SetEnabled(false);
+  EXPECT_EQ(ToHex(WriteStack(stack)),
+            "0F 00 0F 6D BB 01 00 00 00 00 00 00 00 02 0F 00 00 00 02 0F 00 00 00 03 "
+            // clip: type, selected, name, id, mode, two Reals, enabled
+            "0F 00 00 00 08 15 01 82 00 00 00 08 00 43 00 6C 00 69 00 70 0F 00 00 00 03 0F 00 00 00 00 "
+            "13 00 00 00 00 00 00 00 00 13 3F F0 00 00 00 00 00 00 15 01 "
+            // colorize: the same, a Long, the gradient in a container, two Bools, enabled
+            "0F 00 00 00 06 15 00 82 00 00 00 10 00 43 00 6F 00 6C 00 6F 00 72 00 69 00 7A 00 65 0F 00 00 00 04 "
+            "0F 00 00 00 00 0F 00 00 00 00 01 00 00 00 84 00 00 00 01 0F FF FF FF FF 0F 00 00 00 01 0F 00 0F 44 21 "
+            "01 00 00 00 00 00 00 00 01 01 00 00 00 84 00 00 00 01 0F FF FF FF FF 0F 00 00 03 E9 0F 00 00 00 84 "
+            "01 00 00 00 84 00 00 00 01 0F FF FF FF FF 02 02 15 00 02 02 15 00 15 00 15 00 "
+            "0F 00 00 00 02 02");
+}
+
+TEST(BlendLayers, ReadEveryLevelAndComeBackTheSame)
+{
+  const counting_memory::BalanceCheck balance;
+  for (Long level : {0, 1, 2, 3}) {
+    SCOPED_TRACE(level);
+    Stack stack;
+    ASSERT_TRUE(ReadStack(stack, AllLayers(level).Long(9).Long(1).bytes)); // and a value of a newer program
+    EXPECT_EQ(Ids(stack.Layers()), "1() 2 3 4 5 6 7 8 9 10");
+    EXPECT_EQ(stack.Data().GetBlendVersion(), 9);
+    EXPECT_EQ(stack.Layers().GetLayer(2)->IsEnabled(), level < 2);
+    EXPECT_TRUE(stack.Layers().GetLayer(4)->IsSelected());
+    EXPECT_EQ(RealOf(*stack.Layers().GetLayer(5), 2003), level < 1 ? 0 : 1);
+    EXPECT_EQ(Utf8(stack.Layers().GetLayer(0)->GetName()), "L");
+    if (level == 3) {
+      const Bytes same =
+          ByteWriter().Long(kCustomBlendLayers).Start(0, 2).Append(AllLayers(3).Long(9).End().bytes).bytes;
+      EXPECT_EQ(ToHex(WriteStack(stack)), ToHex(same));
+    }
+  }
+}
+
+TEST(BlendLayers, ReadFoldersByTheLevelOfTheirOwnList)
+{
+  // A folder of level 3 in a list of level 1, and one of level 0 in that.
+  ByteWriter inner;
+  inner.Append(Head(1, 2).bytes).Long(1).Real(1).Bool(true).Long(1).Long(0).Append(Head(7, 3).bytes).Real(0).Real(1);
+  ByteWriter w;
+  w.Long(2).Long(1).Append(Head(1, 1).bytes).Long(1).Real(1).Bool(true).Long(1).Long(3).Append(inner.bytes).Bool(false);
+  w.Append(Head(7, 4).bytes).Real(0).Real(1).Long(2);
+  Stack stack;
+  ASSERT_TRUE(ReadStack(stack, w.bytes));
+  EXPECT_EQ(Ids(stack.Layers()), "1(2(3)) 4");
+  EXPECT_FALSE(stack.Layers().FindById(2)->IsEnabled());
+  EXPECT_TRUE(stack.Layers().FindById(3)->IsEnabled());
+}
+
+TEST(BlendLayers, RefuseDamagedStacks)
+{
+  const counting_memory::BalanceCheck balance;
+  const AssertionRecord record;
+  Stack stack;
+  EXPECT_FALSE(ReadStack(stack, ByteWriter().Long(1).Long(3).Append(Head(11, 1).bytes).Bool(true).Long(2).bytes));
+  ASSERT_GE(record.Reports().size(), 2U);
+  EXPECT_EQ(record.Reports()[0], "blendlayers:41");
+  EXPECT_EQ(record.Reports()[1], "blendlayers:152");
+  EXPECT_EQ(stack.value.GetType(), kDataNil);
+
+  // A Colorize layer without a gradient: the values behind it are read, but the list has failed.
+  ByteWriter plain;
+  plain.Header().Long(1).Long(3).Append(Head(6, 1).bytes).Long(2).Start(132, 1).Long(-1).Long(1).Long(15).Long(1).End();
+  plain.Bool(true).Bool(true).Bool(true).Long(77);
+  MemoryReadFile memory(plain.bytes);
+  CBlendLayers layers;
+  Long witness = 0;
+  EXPECT_FALSE(layers.ReadList(memory.file, true));
+  EXPECT_TRUE(memory.file.ReadLong(witness) && witness == 77);
+  EXPECT_EQ(RealOf(*layers.GetLayer(0), 2003), 1);
+
+  const Bytes whole = AllLayers(3).bytes;
+  for (std::size_t cut = 0; cut < whole.size(); ++cut) {
+    MemoryReadFile part(
+        ByteWriter().Header().Append({whole.begin(), whole.begin() + static_cast<std::ptrdiff_t>(cut)}).bytes);
+    EXPECT_FALSE(layers.ReadList(part.file, true)) << cut;
+  }
+  // Folders in folders without end.
+  ByteWriter deep;
+  for (int i = 0; i < 20000; ++i)
+    deep.Long(1).Long(3).Append(Head(1, 1).bytes).Long(1).Real(1).Bool(true);
+  EXPECT_FALSE(ReadStack(stack = Stack(), deep.bytes));
+}
+
+TEST(BlendLayers, StartWithTheirDefaults)
+{
+  struct Case
+  {
+    Long type;
+    const char* name;
+    Long mark;
+    std::vector<std::pair<Long, double>> values; // by parameter id
+  };
+  const Case cases[] = {
+      {1, "Folder", 1, {{2000, 1}, {2001, 1}, {2002, 1}}},
+      {2, "BlendShader", 1, {{2000, 1}, {2001, 1}}},
+      {3, "B/C/G", 0, {{2000, 0}, {2001, 0}, {2002, 1}}},
+      {4, "HLS", 0, {{2000, 0}, {2001, 0}, {2002, 0}, {2003, 0}}},
+      {5, "Posterize", 0, {{2000, 5}, {2001, 0.1}}},
+      {6, "Colorize", 0, {{2000, 0}, {2002, 0}, {2003, 0}}},
+      {7, "Clamp", 0, {{2000, 0}, {2001, 1}}},
+      {8, "Clip", 0, {{2000, 0}, {2001, 1}}},
+      {9, "Distort", 1, {{2000, 13}, {2001, 0.1}, {2002, 5}, {2003, 1}, {2004, 1}, {2005, 0}, {2006, 3}}},
+      {10, "Transform", 1, {{2000, 0}, {2001, 0}, {2002, 0}}},
+  };
+  Stack stack;
+  EXPECT_EQ(stack.Data().GetBlendVersion(), 2);
+  for (const Case& c : cases) {
+    BlendLayer* layer = stack.Add(c.type, c.type);
+    EXPECT_EQ(layer->GetLayerType(), c.type);
+    EXPECT_EQ(Utf8(layer->GetName()), c.name);
+    EXPECT_EQ(layer->GetLayerMark(), c.mark) << c.name;
+    EXPECT_TRUE(layer->IsOpen() && layer->IsEnabled() && !layer->IsSelected());
+    for (const auto& [id, value] : c.values)
+      EXPECT_EQ(RealOf(*layer, id), value) << c.name << ' ' << id;
+    for (Long id : {1000, 1001, 1002}) {
+      EXPECT_EQ(RealOf(*layer, id), id == 1000 ? 1 : 0);
+      EXPECT_TRUE(layer->SetLayerParameter(id, GeData(1)));
+      EXPECT_EQ(RealOf(*layer, id), 1);
+    }
+    GeData value;
+    EXPECT_FALSE(layer->GetLayerParameter(2007, value) || layer->SetLayerParameter(2007, GeData(1)));
+  }
+  GeData vector;
+  EXPECT_TRUE(stack.Layers().GetLayer(9)->GetLayerParameter(2003, vector));
+  EXPECT_TRUE(vector.GetVector() == Vector(1, 1, 1));
+  const AssertionRecord record;
+  EXPECT_EQ(stack.Layers().AppendLayer(0), nullptr);
+  EXPECT_EQ(CBlendLayers::AllocObject(), nullptr);
+  EXPECT_EQ(record.Reports(), (Reports{"blendlayers:41", "blendlayers:16"}));
+}
+
+TEST(BlendLayers, BringValuesIntoTheirRanges)
+{
+  struct Case
+  {
+    Long type, id, sub;
+    double low, high;
+    bool free = false; // no range
+  };
+  const Case cases[] = {{1, 2001, 0, 0, 1},       {2, 2001, 0, 0, 1},       {3, 2000, 0, -1, 1},
+                        {3, 2001, 1, -1, 1},      {3, 2002, 2, 0.1, 10},    {4, 2000, 0, -180, 180},
+                        {4, 2001, 1, -1, 1},      {4, 2002, 2, -1, 1},      {5, 2000, 1, 1, 255},
+                        {5, 2001, 0, 0, 1},       {6, 2000, 0, 0, 6},       {7, 2000, 0, 0, 1000},
+                        {8, 2001, 1, 0, 1000},    {9, 2001, 0, -1, 1},      {9, 2002, 1, 0, 20},
+                        {9, 2003, 2, 0, 0, true}, {9, 2004, 3, 0, 0, true}, {10, 2000, 0, 0, 0, true}};
+  for (const Case& c : cases) {
+    SCOPED_TRACE(::testing::Message() << "type " << c.type << " sub " << c.sub);
+    Stack stack;
+    BlendLayer* layer = stack.Add(c.type, 7);
+    const Long path = 10000 + 7 * 20 + c.sub;
+    const double values[][2] = {{c.low, c.low}, {c.high, c.high}, {-5000, c.low}, {5000, c.high}};
+    for (const auto& [given, kept] : values) {
+      EXPECT_TRUE(stack.Data().SetParameter(path, GeData(given)));
+      GeData value;
+      EXPECT_TRUE(stack.Data().GetParameter(path, value));
+      EXPECT_EQ(value.GetReal(), c.free ? given : kept);
+      EXPECT_EQ(RealOf(*layer, c.id), c.free ? given : kept);
+    }
+    EXPECT_TRUE(layer->SetLayerParameter(c.id, GeData(5000.0)));
+    EXPECT_EQ(RealOf(*layer, c.id), 5000);
+  }
+  Stack stack;
+  BlendLayer* hsl = stack.Add(kBlendHSL, 0);
+  const ParameterPath hue = 10000, second = 10001, flag = 10003;
+  EXPECT_TRUE(stack.Data().SetParameter(hue, GeData(200.0)));
+  EXPECT_EQ(RealOf(*hsl, 2000), 180);
+  EXPECT_TRUE(stack.Data().SetParameter(flag, GeData(true)) && stack.Data().SetParameter(hue, GeData(200.0)));
+  EXPECT_EQ(RealOf(*hsl, 2000), 200);
+  EXPECT_TRUE(stack.Data().SetParameter(hue, GeData(361.0)) && stack.Data().SetParameter(second, GeData(-0.5)));
+  EXPECT_EQ(RealOf(*hsl, 2000), 360);
+  EXPECT_EQ(RealOf(*hsl, 2001), 0);
+}
+
+TEST(BlendLayers, RouteAParameterToItsLayer)
+{
+  Stack stack;
+  stack.Add(kBlendBC, 1);
+  auto* folder = stack.Add(kBlendFolder, 2)->AsFolder();
+  BlendLayer* transform = folder->GetChildren().AppendLayer(kBlendTransform);
+  transform->SetLayerId(3);
+  stack.Add(kBlendColorize, 4);
+
+  ULong flags = 0;
+  GeData value;
+  EXPECT_TRUE(stack.Data().GetValue(10025, value, flags)); // the layer hasn't this sub
+  EXPECT_EQ(flags, 0U);
+  EXPECT_TRUE(stack.Data().GetValue(10022, value, flags));
+  EXPECT_EQ(flags, 2U);
+  EXPECT_EQ(value.GetReal(), 1.0);
+  EXPECT_FALSE(stack.Data().GetParameter(10025, value) || stack.Data().SetParameter(10025, GeData(1.0)));
+  for (Long none : {0, 9999, 10000, 10019, 10100}) {
+    EXPECT_FALSE(stack.Data().GetValue(none, value, flags) || stack.Data().SetValue(none, GeData(1.0), flags)) << none;
+  }
+  // A component of a Vector, below a folder.
+  EXPECT_TRUE(stack.Data().SetParameter({{10063}, {1001}}, GeData(9.0)));
+  EXPECT_TRUE(stack.Data().GetParameter(10063, value) && value.GetVector() == Vector(1, 9, 1));
+  EXPECT_TRUE(stack.Data().GetParameter({{10063}, {1001}}, value) && value.GetReal() == 9.0);
+  EXPECT_FALSE(stack.Data().SetParameter({{10063}, {1003}}, GeData(9.0)));
+  EXPECT_TRUE(stack.Data().SetParameter(10064, GeData(Vector(1, 2, 3))));
+
+  // Parts of a gradient, and the whole.
+  EXPECT_TRUE(stack.Data().SetParameter({{10081}, {1000}}, GeData(6)));
+  EXPECT_TRUE(stack.Data().GetParameter(10081, value));
+  EXPECT_EQ(static_cast<GradientData*>(value.GetCustom())->GetSettings().GetLong(1000), 6);
+  EXPECT_TRUE(stack.Data().SetParameter({{10081}, {1000}}, GeData(2)) && stack.Data().SetParameter(10081, value));
+  EXPECT_TRUE(stack.Data().GetParameter({{10081}, {1000}}, value) && value.GetLong() == 6);
+  const AssertionRecord record;
+  EXPECT_FALSE(stack.Data().GetParameter({{10081}, {10500}}, value));
+  EXPECT_FALSE(stack.Data().SetParameter({{10081}, {10500}}, GeData(1.0)));
+  EXPECT_EQ(record.Reports(), (Reports{"blendlayers:1235", "blendlayers:1259"}));
+}
+
+TEST(BlendLayers, MoveWithinAndBetweenFolders)
+{
+  const counting_memory::BalanceCheck balance;
+  Stack stack;
+  CBlendLayers& layers = stack.Layers();
+  BlendLayer* first = stack.Add(kBlendBC, 1);
+  BlendLayer* folder = stack.Add(kBlendFolder, 2);
+  BlendLayer* inner = folder->AsFolder()->GetChildren().AppendLayer(kBlendFolder);
+  inner->SetLayerId(3);
+  BlendLayer* last = stack.Add(kBlendClip, 4);
+  struct Move
+  {
+    BlendLayer* layer;
+    BlendLayer* target;
+    Long place;
+    bool moved;
+    const char* ids;
+  };
+  const Move moves[] = {
+      {first, folder, 2, true, "2(3()) 1 4"},  {last, first, 0, true, "2(3()) 4 1"},
+      {first, last, 0, true, "2(3()) 1 4"},    {last, folder, 1, true, "2(4 3()) 1"},
+      {first, inner, 1, true, "2(4 3(1))"},    {first, last, 1, false, "2(4 3(1))"},
+      {folder, inner, 1, false, "2(4 3(1))"},  {folder, first, 0, false, "2(4 3(1))"},
+      {folder, folder, 1, false, "2(4 3(1))"}, {first, first, 2, true, "2(4 3(1))"},
+      {first, nullptr, 2, true, "1 2(4 3())"}, {inner, nullptr, 0, true, "3() 1 2(4)"},
+      {first, folder, 7, true, "3() 1 2(4)"},  {nullptr, folder, 1, false, "3() 1 2(4)"},
+      {last, inner, 2, true, "3() 4 1 2()"},
+  };
+  for (const Move& move : moves) {
+    EXPECT_EQ(layers.MoveLayer(move.layer, move.target, move.place), move.moved) << move.ids;
+    EXPECT_EQ(Ids(layers), move.ids);
+  }
+  BlendLayer* fresh = stack.Add(kBlendFolder, 5);
+  counting_memory::FailAfter(0);
+  EXPECT_FALSE(layers.MoveLayer(last, fresh, 1));
+  counting_memory::FailNever();
+  EXPECT_EQ(Ids(layers), "3() 4 1 2() 5()");
+  CBlendLayers::RemoveLayerFromParent(last);
+  EXPECT_EQ(last->GetParent(), nullptr);
+  EXPECT_TRUE(layers.MoveLayer(last, inner, 0));
+  EXPECT_EQ(Ids(layers), "4 3() 1 2() 5()");
+  EXPECT_FALSE(folder->AsFolder()->GetChildren().RemoveLayer(last));
+  EXPECT_TRUE(layers.RemoveLayer(last));
+  CBlendLayers::DeleteLayer(last);
+  EXPECT_EQ(Ids(layers), "3() 1 2() 5()");
+}
+
+TEST(BlendLayers, FindAndSelectDepthFirst)
+{
+  Stack stack;
+  stack.Add(kBlendBC, 1);
+  CBlendLayers& children = stack.Add(kBlendFolder, 2)->AsFolder()->GetChildren();
+  children.AppendLayer(kBlendClip)->SetLayerId(5);
+  stack.Add(kBlendClamp, 5);
+  EXPECT_EQ(stack.Layers().FindById(5), children.GetLayer(0));
+  EXPECT_EQ(stack.Layers().FindById(6), nullptr);
+  EXPECT_EQ(stack.Layers().FirstSelected(), nullptr);
+  stack.Layers().GetLayer(2)->SetSelected(true);
+  EXPECT_EQ(stack.Layers().FirstSelected(), stack.Layers().GetLayer(2));
+  children.GetLayer(0)->SetSelected(true);
+  EXPECT_EQ(stack.Layers().FirstSelected(), children.GetLayer(0));
+  stack.Layers().ClearSelection();
+  EXPECT_EQ(stack.Layers().FirstSelected(), nullptr);
+}
+
+TEST(BlendLayers, CopyAndCompareEverySetting)
+{
+  const counting_memory::BalanceCheck balance;
+  Stack stack;
+  ASSERT_TRUE(ReadStack(stack, AllLayers(3).Long(2).bytes));
+  const GeData copy(stack.value);
+  EXPECT_TRUE(copy.IsEqual(stack.value));
+  auto& copied = static_cast<iBlendDataType&>(*copy.GetCustom());
+  EXPECT_EQ(Ids(copied.GetLayers()), "1() 2 3 4 5 6 7 8 9 10");
+  for (Long i = 0; i < 10; ++i) {
+    BlendLayer& layer = *copied.GetLayers().GetLayer(i);
+    const BlendLayer& other = *stack.Layers().GetLayer(i);
+    for (Long id = 1000; id <= 2006; ++id) {
+      GeData value;
+      if (!layer.GetLayerParameter(id, value) || (value.GetType() != kDataLong && value.GetType() != kDataReal))
+        continue;
+      EXPECT_FALSE(layer.LayersDiffer(other));
+      EXPECT_TRUE(layer.SetLayerParameter(id, GeData(value.GetReal() == 0 ? 1 : 0)));
+      EXPECT_TRUE(layer.LayersDiffer(other) && !copy.IsEqual(stack.value)) << i << ' ' << id;
+      EXPECT_TRUE(layer.LayersEqualIgnoringFlags(other, 0));
+      EXPECT_TRUE(layer.SetLayerParameter(id, value));
+    }
+    EXPECT_FALSE(layer.CopyLayerTo(*stack.Layers().GetLayer((i + 1) % 10), nullptr));
+  }
+  EXPECT_TRUE(copy.IsEqual(stack.value));
+  BlendLayer& folder = *copied.GetLayers().GetLayer(0);
+  folder.AsFolder()->GetChildren().AppendLayer(kBlendBC);
+  EXPECT_TRUE(folder.LayersDiffer(*stack.Layers().GetLayer(0)));
+  EXPECT_FALSE(folder.LayersEqualIgnoringFlags(*stack.Layers().GetLayer(0), 0));
+  stack.Layers().GetLayer(0)->AsFolder()->GetChildren().AppendLayer(kBlendBC);
+  EXPECT_TRUE(copy.IsEqual(stack.value));
+  stack.Data().SetBlendVersion(3);
+  EXPECT_FALSE(copy.IsEqual(stack.value));
+
+  bool done = false;
+  for (LLong step = 0; !done && step < 500; ++step) {
+    counting_memory::FailAfter(step);
+    const GeData clone(stack.value);
+    counting_memory::FailNever();
+    done = clone.GetCustom() != nullptr;
+  }
+  EXPECT_TRUE(done);
+}
+
+TEST(BlendLayers, NameAndReleaseTheirShader)
+{
+  const counting_memory::BalanceCheck balance;
+  BaseShader owner;
+  BaseShader* shader = MakeShader(5833);
+  shader->SetName("Stone");
+  owner.InsertShaderLast(shader);
+  Stack stack;
+  BlendLayer* folder = stack.Add(kBlendFolder, 1);
+  GeData value;
+  EXPECT_TRUE(folder->GetLayerParameter(2003, value) && value.GetAliasLink() && !value.GetLink());
+  EXPECT_FALSE(folder->SetLayerParameter(2003, value)); // no child to take it
+  auto* layer = static_cast<BlendShader*>(folder->AsFolder()->GetChildren().AppendLayer(kBlendShader));
+  GeAliasLink link;
+  link.SetLink(shader);
+  EXPECT_TRUE(folder->SetLayerParameter(2003, GeData(link)));
+  EXPECT_EQ(layer->GetShader(), shader);
+  EXPECT_TRUE(layer->GetLayerParameter(2002, value) && value.GetLink() == shader);
+  EXPECT_FALSE(layer->SetLayerParameter(2002, GeData(1)));
+  String name;
+  layer->GetLayerName(name);
+  EXPECT_EQ(Utf8(name), "Stone");
+  EXPECT_EQ(Utf8(layer->GetName()), "Stone");
+
+  // The copy of a node with the stack in its container leads to the copy's own shader.
+  owner.GetDataInstance().SetData(1, stack.value);
+  auto* clone = static_cast<BaseShader*>(owner.MakeClone(0, nullptr));
+  auto* copied = static_cast<iBlendDataType*>(clone->GetDataInstance().GetCustomDataType(1, kCustomBlendLayers));
+  GeAliasLink* copiedLink = copied->GetLayers().GetFirstLink();
+  ASSERT_NE(copiedLink, nullptr);
+  EXPECT_EQ(copiedLink->GetLink(), clone->GetShaders());
+  EXPECT_NE(copiedLink->GetLink(), shader);
+  DeleteObj(clone);
+
+  EXPECT_TRUE(stack.Layers().RemoveLayer(folder)); // takes the shader along
+  EXPECT_EQ(owner.GetShaders(), nullptr);
+  EXPECT_EQ(layer->GetShader(), nullptr);
+  layer->GetLayerName(name);
+  EXPECT_EQ(Utf8(name), "BlendShader");
+  CBlendLayers::DeleteLayer(folder);
+}
