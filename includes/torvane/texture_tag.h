@@ -10,6 +10,7 @@ namespace _torvane_
 
 class BaseDocument;
 class BaseMaterial;
+class ChunkReader;
 
 // Entries of a texture tag's container.
 inline constexpr Long kTextureOffsetX = 1000;     // Real
@@ -81,6 +82,7 @@ class TextureTag : public BaseTag
   Real GetTiles(Long id) const;
   void SetPreset(Long id, const GeData& value);
   Bool ReadOldChunk(HyperFile& file, Long level);
+  void ReadOldAspects(ChunkReader& v);
   Bool ReadLinkEntry(HyperFile& file, Long id);
 
   Bool matrixValid_ = false;

@@ -2,7 +2,7 @@
 
 #include <cmath>
 
-#include "k2v_file/chunk_visitor.h"
+#include "q7r_file/tags/tag_entries.h"
 #include "q7r_file/tags/tag_makers.h"
 #include "torvane/base_material.h"
 #include "torvane/ge_math.h"
@@ -130,39 +130,8 @@ Long LengthOfTiles(Long id)
 
 Bool IsPlace(Long id) { return id == kTexturePosition || id == kTextureSize || id == kTextureRotation; }
 
-// What an old chunk holds behind the place.
-struct OldEntry
-{
-  Long id;
-  Form form;
-};
-
-constexpr OldEntry kOldEntries[] = {
-    {kTextureOffsetX, Form::kReal}, {kTextureOffsetY, Form::kReal}, {kTextureLengthX, Form::kReal},
-    {kTextureLengthY, Form::kReal}, {kTextureSwitch1, Form::kBool}, {kTextureSwitch2, Form::kBool},
-    {kTextureSwitch3, Form::kBool}, {kTextureMode1, Form::kLong},   {kTextureMode2, Form::kLong},
-};
-
 // Files below this version hold values that were dropped then.
 constexpr Long kShorterVersion = 11600;
-
-template <class Value>
-Bool ReadEntry(HyperFile& file, BaseContainer& container, Long id)
-{
-  Value value{};
-  if (!ReadValue(file, value))
-    return false;
-  container.SetData(id, GeData(value));
-  return true;
-}
-
-Bool ReadOldEntry(HyperFile& file, BaseContainer& container, const OldEntry& entry)
-{
-  if (entry.form == Form::kReal)
-    return ReadEntry<Real>(file, container, entry.id);
-  return entry.form == Form::kBool ? ReadEntry<Bool>(file, container, entry.id)
-                                   : ReadEntry<Long>(file, container, entry.id);
-}
 
 Real QuotientOrOne(Real a, Real b) { return b != 0.0 ? a / b : 1.0; }
 
@@ -298,38 +267,50 @@ Bool TextureTag::ReadChunk(HyperFile& file, Long id, Long level)
 Bool TextureTag::ReadOldChunk(HyperFile& file, Long level)
 {
   ChunkReader v(file, level);
+  EntryReader entries(v, data_);
   const Bool old = v.VersionBelow(kShorterVersion);
   for (Long id : {kTexturePosition, kTextureSize, kTextureRotation}) {
     Vector part;
-    if (!v.Vector(part))
-      return false;
-    SetPlace(id, part);
+    if (v.Vector(part))
+      SetPlace(id, part);
   }
   if (old)
     v.Skip<Matrix, Matrix>();
-  for (const OldEntry& entry : kOldEntries)
-    v.Note(v.Good() && ReadOldEntry(file, data_, entry));
+  for (Long id : {kTextureOffsetX, kTextureOffsetY, kTextureLengthX, kTextureLengthY})
+    entries.Real(id);
+  for (Long id : {kTextureSwitch1, kTextureSwitch2, kTextureSwitch3})
+    entries.Bool(id);
+  entries.Long(kTextureMode1);
+  entries.Long(kTextureMode2);
   if (old)
     v.Skip<Long, Long>();
-  if (level >= 1)
-    v.Note(v.Good() && ReadEntry<String>(file, data_, kTextureOldName));
+  String name;
+  if (level >= 1 && v.String(name))
+    data_.SetString(kTextureOldName, name);
   if (level >= 2 && old)
     v.Skip<Bool>();
   if (level >= 3)
     v.Note(v.Good() && ReadLinkEntry(file, kTextureMaterial));
   if (level >= 4)
     v.Note(v.Good() && ReadLinkEntry(file, kTextureSecondLink));
-  if (level >= 5) {
-    Long film[2] = {0, 0};
-    Real pixel[2] = {0.0, 0.0};
-    if (!v.Long(film[0]) || !v.Long(film[1]) || !v.Real(pixel[0]) || !v.Real(pixel[1]))
-      return false;
-    data_.SetReal(kTextureFilmAspect, QuotientOrOne(film[0], film[1]));
-    data_.SetReal(kTexturePixelAspect, QuotientOrOne(pixel[0], pixel[1]));
-  }
+  if (level >= 5)
+    ReadOldAspects(v);
   if (level >= 6)
-    v.Note(v.Good() && ReadEntry<Bool>(file, data_, kTextureSwitch4));
+    entries.Bool(kTextureSwitch4);
   return v.Good();
+}
+
+// As quotients.
+void TextureTag::ReadOldAspects(ChunkReader& v)
+{
+  Long width = 0;
+  Long height = 0;
+  Real pixelWidth = 0.0;
+  Real pixelHeight = 0.0;
+  if (!v.Long(width) || !v.Long(height) || !v.Real(pixelWidth) || !v.Real(pixelHeight))
+    return;
+  data_.SetReal(kTextureFilmAspect, QuotientOrOne(width, height));
+  data_.SetReal(kTexturePixelAspect, QuotientOrOne(pixelWidth, pixelHeight));
 }
 
 // Into the link of that entry; a file may have put something else there, or nothing.
