@@ -5,10 +5,10 @@
 #include "support/assertion_counter.h"
 #include "torvane/base_tag.h"
 
-// The chunks that `tag` writes behind those of a plain tag of its type.
+// The chunks that `tag` writes behind those of a plain tag.
 inline Bytes OwnChunks(_torvane_::BaseTag& tag)
 {
-  _torvane_::BaseTag plain(tag.GetDiskType());
+  _torvane_::BaseTag plain(_torvane_::kTagProtection);
   plain.SetName(tag.GetName());
   plain.GetDataInstance() = tag.GetDataInstance();
   const Bytes all = BytesOf(tag);

@@ -1,0 +1,343 @@
+// The joint weight tag: its bytes, the data of every level, copies, its tree of rows, and the bind pose.
+#include <memory>
+
+#include <gtest/gtest.h>
+
+#include "q7r_file/tag_bytes.h"
+#include "support/counting_memory.h"
+#include "support/text.h"
+#include "torvane/base_object.h"
+#include "torvane/ge_data.h"
+#include "torvane/joint_tree.h"
+#include "torvane/weight_tag_data.h"
+
+namespace
+{
+
+using namespace _torvane_;
+
+// A matrix with the offset (n, 0, 0) and axes of length `scale`.
+Matrix Frame(Real n, Real scale) { return {{n, 0, 0}, {scale, 0, 0}, {0, scale, 0}, {0, 0, scale}}; }
+
+void PutFrame(ByteWriter& writer, Real n, Real scale)
+{
+  writer.Matrix({n, 0, 0, scale, 0, 0, 0, scale, 0, 0, 0, scale});
+}
+
+std::string Link(std::uint8_t id) { return std::string("alias2\0\0\0\0\0\0\0", 13) + static_cast<char>(id); }
+
+// The values of a joint up to its entries; 2.0 and 8.0 are the scales of bind and rest pose.
+void PutJoint(ByteWriter& writer, Long level, Real bind)
+{
+  if (level >= 1)
+    writer.Long(99);
+  writer.Memory(Link(0));
+  PutFrame(writer, bind, 2.0);
+  writer.Real(2.5);
+  writer.Long(0).Long(0).Long(1).ArrayHead(3, 12).I32(3).I32(3).I32(0);
+  writer.ULong(0).ULong(0).ULong(0).ULong(0).Long(0).Long(1).ArrayHead(2, 2).U16(0xFFFF);
+  writer.Long(5).ULong(1).ULong(2).ULong(3).ULong(1).Long(4).Long(1).ArrayHead(3, 4).I32(-9);
+  writer.Long(1).ULong(21).Memory(Link(0)).Long(22);
+  if (level == 4)
+    PutFrame(writer, bind, 8.0);
+}
+
+void PutRest(ByteWriter& writer, Long level, Real n)
+{
+  writer.Start(1021281, 3);
+  PutFrame(writer, n, 8.0);
+  if (level >= 6)
+    writer.Memory(Link(0));
+  writer.Long(7).End(); // a later writer's value
+}
+
+// An object that holds a weight tag, and its data.
+struct Rig
+{
+  BaseObject object{kObjectNull};
+  BaseTag* tag = object.MakeTag(kTagWeight);
+  WeightTagData* data = static_cast<WeightTagData*>(tag->GetNodeData());
+
+  const JointTreeData& Tree() const
+  {
+    return *static_cast<JointTreeData*>(tag->GetDataInstance().GetCustomDataType(2009, 1024869));
+  }
+  // "joint/entry": the kinds of the rows.
+  std::string Rows() const
+  {
+    std::string text;
+    for (Long i = 0; i < Tree().GetRowCount(); ++i)
+      text += std::to_string(Tree().GetRow(i).GetKind()) + ":" + std::to_string(Tree().GetRow(i).node) + " ";
+    return text;
+  }
+};
+
+std::string RowOf(int kind, BaseObject& object)
+{
+  return std::to_string(kind) + ":" + std::to_string(object.GetGoal().GetGoalId()) + " ";
+}
+
+// Reads data of a level that lie in a chunk; true if they were taken and the chunk's end came next.
+bool ReadData(WeightTagData& data, Long level, const Bytes& body, bool expected = true)
+{
+  AssertionCounter silence;
+  MemoryReadFile memory(ByteWriter().Header().Append(body).End().bytes);
+  EXPECT_EQ(data.ReadData(memory.file, kChunkNodeData, level), expected);
+  return memory.file.SkipToEndChunk() && memory.file.GetFile().GetRemaining() == 0;
+}
+
+} // namespace
+
+TEST(WeightTag, BeginsWithItsEntriesAndNoJoints)
+{
+  Rig rig;
+  EXPECT_EQ(rig.tag->GetDataInstance().GetReal(2007), 1.0);
+  EXPECT_EQ(rig.Tree().GetRowCount(), 0);
+  EXPECT_EQ(rig.data->GetJointCount(), 0);
+  EXPECT_EQ(rig.data->GetJoint(0), nullptr);
+  EXPECT_FALSE(WeightTagData().Init()); // without a tag
+  counting_memory::BalanceCheck balance;
+  counting_memory::FailAfter(3);
+  EXPECT_EQ(MakeTag(kTagWeight), nullptr);
+  counting_memory::FailNever();
+}
+
+TEST(WeightTag, WritesItsJointsByteForByte)
+{
+  Rig rig;
+  BaseObject joint(kObjectJoint);
+  ASSERT_EQ(rig.data->InsertJointRecord(&joint), 0);
+  JointRecord& record = *rig.data->GetJoint(0);
+  record.joint->ClearLink(); // ids of goals are another test's business
+  rig.data->SetGlobalMatrix(Frame(1, 1));
+  record.bindMatrix = Frame(2, 1);
+  record.restMatrix = Frame(4, 1);
+  record.length = 0.5;
+  record.flags = 3;
+  record.weights.WritePointWeight(6, 1.0);
+  record.pairs.tail = -1;
+  JointEntry* entry = record.AddEntry();
+  entry->number = 21;
+  entry->value = 22;
+  const std::string zero = "0000000000000000";
+  const std::string one = "3FF0000000000000";
+  const std::string axes = one + zero + zero + zero + one + zero + zero + zero + one;
+  auto frame = [&](const char* offset) { return std::string("19") + offset + zero + zero + axes; };
+  const std::string link = "80 0000000E 616C69617332 0000000000000000";
+  const std::string list = "10 00000000 10 00000000 10 00000000 10 00000000";
+  EXPECT_EQ(ToHex(OwnChunks(*rig.tag)),
+            ToHex(FromHex("01 0001ADF0 00000006  0F 000F8DE5  0F 00000000  82 00000000"
+                          "0F 00000001" +
+                          frame(one.c_str()) + "0F 00000000" + link + frame("4000000000000000") +
+                          "13 3FE0000000000000"
+                          "0F 00000000 0F 00000000 0F 00000001 8C 0000000D 03 00000006 00000006 00000000" +
+                          list + "0F 00000000  0F 00000001 8C 00000003 02 FFFF  0F 00000003" + list +
+                          "0F FFFFFFFF  0F 00000001 10 00000015" + link +
+                          "0F 00000016"
+                          "01 000F9561 00000001" +
+                          frame("4010000000000000") + link + "02 02")));
+}
+
+TEST(WeightTag, ReadsTheDataOfEveryLevel)
+{
+  for (Long level = 0; level <= 7; ++level) {
+    Rig rig;
+    ByteWriter body;
+    body.Long(2);
+    if (level >= 1)
+      PutFrame(body, 4, 0.5);
+    PutJoint(body, level, 1);
+    PutJoint(body, level, 3);
+    if (level >= 5)
+      body.Long(1); // in place of the first joint's chunk, which then is as it was
+    if (level >= 5)
+      PutRest(body, level, 16);
+    ASSERT_TRUE(ReadData(*rig.data, level, body.Long(1).bytes)) << level;
+    EXPECT_EQ(rig.data->GetReadLevel(), level);
+    EXPECT_EQ(rig.data->GetGlobalMatrix(), level >= 1 ? Frame(4, 0.5) : Matrix());
+    EXPECT_EQ(rig.data->GetGlobalInverse(), level >= 1 ? Frame(-8, 2) : Matrix());
+    ASSERT_EQ(rig.data->GetJointCount(), 2);
+    const JointRecord& first = *rig.data->GetJoint(0);
+    const JointRecord& second = *rig.data->GetJoint(1);
+    EXPECT_EQ(first.bindMatrix, Frame(1, 2));
+    EXPECT_EQ(first.bindInverse, Frame(-0.5, 0.5));
+    EXPECT_EQ(first.restMatrix, level < 4 ? Frame(1, 2) : level == 4 ? Frame(1, 8) : Matrix()) << level;
+    EXPECT_EQ(second.restMatrix, level < 4 ? Frame(3, 2) : level == 4 ? Frame(3, 8) : Frame(16, 8)) << level;
+    EXPECT_EQ(second.restInverse, level < 4 ? Frame(-1.5, 0.5) : level == 4 ? Frame(-0.375, 0.125) : Frame(-2, 0.125));
+    EXPECT_EQ(first.length, 2.5);
+    EXPECT_EQ(first.weights.ReadPointWeight(3), 1.0);
+    EXPECT_EQ(first.flags, 5U);
+    EXPECT_EQ(first.index, -1);
+    EXPECT_EQ(first.pairs.values[0], -9);
+    ASSERT_EQ(first.entries.GetCount(), 1);
+    EXPECT_EQ(first.entries[0]->number, 21U);
+    EXPECT_EQ(first.entries[0]->value, 22);
+    EXPECT_EQ(second.second != nullptr, level >= 6);
+  }
+}
+
+TEST(WeightTag, StaysInStepWithDamagedData)
+{
+  Rig rig;
+  ByteWriter none; // no chunk at all behind the joints
+  none.Long(1).IdentityMatrix();
+  PutJoint(none, 6, 1);
+  EXPECT_TRUE(ReadData(*rig.data, 6, none.bytes));
+  ByteWriter other = none;
+  EXPECT_TRUE(ReadData(*rig.data, 6, other.Start(1021282, 1).Long(1).End().bytes, false));
+  PutRest(none, 6, 1);
+  for (std::size_t cut = 0; cut < none.bytes.size(); ++cut) {
+    AssertionCounter silence;
+    ByteWriter whole;
+    whole.Header().Append({none.bytes.begin(), none.bytes.begin() + static_cast<std::ptrdiff_t>(cut)});
+    MemoryReadFile memory(whole.bytes);
+    EXPECT_FALSE(rig.data->ReadData(memory.file, kChunkNodeData, 6)) << cut;
+  }
+  for (Long count : {2147483647, -1, 40}) {
+    counting_memory::ResetPeak();
+    const LLong before = counting_memory::Get().bytes;
+    ReadData(*rig.data, 6, ByteWriter().Long(count).IdentityMatrix().Append(Bytes(500, 11)).bytes, false);
+    EXPECT_LT(counting_memory::Get().peakBytes - before, 100000);
+  }
+}
+
+TEST(WeightTag, AddsEachJointOnceAndKeepsRowsForThem)
+{
+  Rig rig;
+  BaseObject joints[] = {BaseObject(kObjectJoint), BaseObject(kObjectJoint), BaseObject(kObjectJoint)};
+  BaseObject listed(kObjectNull);
+  rig.object.SetRelPos({4, 0, 0});
+  EXPECT_EQ(rig.data->InsertJointRecord(nullptr), -1);
+  for (Long i = 0; i < 3; ++i)
+    EXPECT_EQ(rig.data->InsertJointRecord(&joints[i]), i);
+  EXPECT_EQ(rig.data->InsertJointRecord(&joints[1]), 1);
+  EXPECT_EQ(rig.data->GetTreeChanges(), 3);
+  EXPECT_EQ(rig.data->GetGlobalMatrix().off, Vector(4, 0, 0));
+  EXPECT_EQ(rig.data->GetGlobalInverse().off, Vector(-4, 0, 0));
+  EXPECT_EQ(rig.Rows(), RowOf(1, joints[0]) + RowOf(1, joints[1]) + RowOf(1, joints[2]));
+  rig.data->GetJoint(1)->AddEntry()->link.SetLink(&listed);
+  EXPECT_TRUE(rig.data->DeleteJointRecord(&joints[0]));
+  EXPECT_FALSE(rig.data->DeleteJointRecord(&joints[0]));
+  EXPECT_EQ(rig.data->GetTreeChanges(), 4);
+  EXPECT_EQ(rig.Rows(), RowOf(1, joints[1]) + RowOf(2, listed) + RowOf(1, joints[2]));
+  EXPECT_EQ(rig.data->FindJoint(&joints[2]), 1);
+  rig.data->GetJoint(0)->FlushEntries();
+  EXPECT_EQ(rig.data->InsertJointRecord(&joints[0]), 2);
+  EXPECT_EQ(rig.Rows(), RowOf(1, joints[1]) + RowOf(1, joints[2]) + RowOf(1, joints[0]));
+  const GeData tree = rig.tag->GetDataInstance().GetData(2009);
+  EXPECT_TRUE(tree.IsEqual(rig.tag->GetDataInstance().GetData(2009))); // a copy has the rows
+  rig.data->DeleteJointRecord(&joints[2]);
+  EXPECT_FALSE(tree.IsEqual(rig.tag->GetDataInstance().GetData(2009)));
+
+  BaseTag loose(kTagPlugin, kTagWeight); // on no object
+  loose.SetNodeData(NewObj<WeightTagData>());
+  EXPECT_EQ(static_cast<WeightTagData*>(loose.GetNodeData())->InsertJointRecord(&joints[0]), -1);
+  for (LLong count = 0; count < 4; ++count) {
+    BaseObject another(kObjectJoint);
+    counting_memory::FailAfter(count);
+    EXPECT_EQ(rig.data->InsertJointRecord(&another), -1) << count;
+    counting_memory::FailNever();
+    EXPECT_EQ(rig.data->GetJointCount(), 2);
+  }
+}
+
+TEST(WeightTag, TakesTheBindPoseFromTheJoints)
+{
+  Rig rig;
+  auto* parent = NewObj<BaseObject>(kObjectJoint);
+  auto* plain = NewObj<BaseObject>(kObjectNull);
+  auto* child = NewObj<BaseObject>(kObjectJoint);
+  parent->InsertUnder(&rig.object);
+  plain->InsertUnder(parent);
+  child->InsertUnderLast(parent);
+  parent->SetRelPos({1, 0, 0});
+  child->SetRelPos({0, 3, 4});
+  ASSERT_EQ(rig.data->InsertJointRecord(parent), 0);
+  ASSERT_EQ(rig.data->InsertJointRecord(child), 1);
+  EXPECT_FALSE(rig.data->RefreshBindPose(2) || rig.data->RefreshBindPose(-2));
+  EXPECT_TRUE(rig.data->RefreshBindPose(0));
+  EXPECT_EQ(rig.data->GetJoint(0)->length, 5.0);
+  EXPECT_EQ(rig.data->GetJoint(0)->bindInverse.off, Vector(-1, 0, 0));
+  EXPECT_EQ(rig.data->GetJoint(1)->bindMatrix, Matrix());
+  rig.data->GetJoint(1)->object = nullptr; // as after reading: found in the tree
+  EXPECT_TRUE(rig.data->RefreshBindPose(-1));
+  EXPECT_EQ(rig.data->GetJoint(1)->bindMatrix.off, Vector(1, 3, 4));
+  EXPECT_EQ(rig.data->GetJoint(1)->length, 0.0);
+  rig.data->GetJoint(1)->joint->SetLink(rig.tag); // no object
+  EXPECT_FALSE(rig.data->RefreshBindPose(-1));
+}
+
+TEST(WeightTag, AnswersTheSecondLinkOfTheOneSelectedJoint)
+{
+  Rig rig;
+  BaseObject joints[] = {BaseObject(kObjectJoint), BaseObject(kObjectJoint)};
+  BaseObject other(kObjectNull);
+  for (BaseObject& joint : joints)
+    rig.data->InsertJointRecord(&joint);
+  GeAliasLink link;
+  link.SetLink(&other);
+  auto answer = [&] {
+    GeData value(Long{1});
+    EXPECT_TRUE(rig.tag->GetParameterById(2008, value));
+    return value.GetType() == kDataLink ? value.GetLink() : nullptr;
+  };
+  for (ULong flags : {0U, 2U, 3U}) {
+    rig.data->GetJoint(1)->flags = flags;
+    EXPECT_EQ(answer(), nullptr);
+    EXPECT_TRUE(rig.tag->SetParameterById(2008, GeData(link)));
+    EXPECT_EQ(rig.data->GetJoint(1)->second != nullptr, flags == 3);
+  }
+  EXPECT_EQ(answer(), &other);
+  rig.data->GetJoint(0)->flags = 1; // two are selected
+  EXPECT_EQ(answer(), nullptr);
+  EXPECT_TRUE(rig.tag->SetParameterById(2007, GeData(0.5))); // the tag's own
+  EXPECT_EQ(rig.tag->GetDataInstance().GetReal(2007), 0.5);
+}
+
+TEST(WeightTag, CopiesItsJointsWithTheirLinks)
+{
+  counting_memory::BalanceCheck balance;
+  Rig rig;
+  auto* joint = NewObj<BaseObject>(kObjectJoint);
+  joint->InsertUnder(&rig.object);
+  rig.data->InsertJointRecord(joint);
+  JointRecord& record = *rig.data->GetJoint(0);
+  record.NeedSecond()->SetLink(joint);
+  record.AddEntry()->link.SetLink(joint);
+  record.entries[0]->value = 8;
+  record.index = 4;
+  record.restMatrix = Frame(1, 2);
+  record.weights.WritePointWeight(2, 1.0);
+  rig.data->SetGlobalMatrix(Frame(3, 1));
+  AliasTranslator translator;
+  ASSERT_TRUE(translator.MakeTranslator());
+  std::unique_ptr<GeListNode> clone(rig.object.MakeClone(0, translator.GetArray()));
+  ASSERT_NE(clone, nullptr);
+  translator.Finish(true);
+  auto& copy = static_cast<BaseObject&>(*clone);
+  auto* data = static_cast<WeightTagData*>(copy.GetTag(kTagWeight)->GetNodeData());
+  ASSERT_TRUE(data && data->GetJointCount() == 1);
+  const JointRecord& copied = *data->GetJoint(0);
+  EXPECT_EQ(copied.GetTarget(), copy.GetDown());
+  EXPECT_EQ(copied.second->GetLink(), copy.GetDown());
+  EXPECT_EQ(copied.entries[0]->link.GetLink(), copy.GetDown());
+  EXPECT_EQ(copied.entries[0]->value, 8);
+  EXPECT_EQ(copied.index, 4);
+  EXPECT_EQ(copied.restMatrix, Frame(1, 2));
+  EXPECT_EQ(copied.weights.ReadPointWeight(2), 1.0);
+  EXPECT_EQ(data->GetGlobalMatrix(), Frame(3, 1));
+
+  EXPECT_TRUE(rig.data->CopyTo(*rig.data, 0, nullptr));
+  EXPECT_EQ(rig.data->GetJointCount(), 1);
+  WeightTagData loose;
+  EXPECT_FALSE(rig.data->CopyTo(loose, 0, nullptr));
+  bool done = false;
+  for (LLong count = 0; !done; ++count) {
+    ASSERT_LT(count, 1000);
+    counting_memory::FailAfter(count);
+    GeListNode* attempt = rig.tag->MakeClone(0, nullptr);
+    counting_memory::FailNever();
+    done = attempt != nullptr;
+    DeleteObj(attempt);
+  }
+}
