@@ -1,0 +1,114 @@
+// The export: what the exporter adds to the host's own reads.
+#include <memory>
+#include <string>
+
+#include "exporter/entry/host_calls.h"
+#include "exporter/host_api/aegp_entry.h"
+#include "exporter/walk/composition.h"
+#include "host/standalone_host.h"
+#include "measure.h"
+#include "torvane/base_document.h"
+
+namespace
+{
+
+using namespace benchmarks;
+using _torvane_::BaseDocument;
+
+struct FreeDocument
+{
+  void operator()(BaseDocument* document) const { BaseDocument::Free(document); }
+};
+
+// The streams that a plane is sampled from.
+constexpr AEGP_LayerStream kStreams[] = {
+    AEGP_LayerStream_POSITION,    AEGP_LayerStream_ROTATE_X,    AEGP_LayerStream_ROTATE_Y, AEGP_LayerStream_ROTATE_Z,
+    AEGP_LayerStream_ORIENTATION, AEGP_LayerStream_ANCHORPOINT, AEGP_LayerStream_SCALE};
+
+// Two eased keys over the whole length.
+std::string Eased(const std::string& from, const std::string& to, std::int64_t frames)
+{
+  return R"({"k":[{"t":0,"s":)" + from + R"(,"o":{"x":0.4,"y":0},"i":{"x":0.6,"y":1}},{"t":)" + std::to_string(frames) +
+         R"(,"s":)" + to + "}]}";
+}
+
+// Solids whose every stream changes in every frame.
+std::string Composition(std::int64_t layers, std::int64_t frames)
+{
+  std::string list;
+  for (std::int64_t i = 0; i < layers; ++i) {
+    const std::string n = std::to_string(i + 1);
+    list += (i ? "," : "") + std::string(R"({"ty":1,"ddd":1,"nm":"Solid )") + n +
+            R"(","sw":100,"sh":50,"sc":"#804020","ks":{"p":)" + Eased("[" + n + ",0,0]", "[900,500,700]", frames) +
+            R"(,"a":)" + Eased("[0,0,0]", "[100,50,10]", frames) + R"(,"s":)" +
+            Eased("[100,100,100]", "[150,70,90]", frames) + R"(,"or":)" + Eased("[0,0,0]", "[50,20,80]", frames) +
+            R"(,"rx":)" + Eased("[0]", "[360]", frames) + R"(,"ry":)" + Eased("[0]", "[" + n + "]", frames) +
+            R"(,"rz":)" + Eased("[0]", "[720]", frames) + "}}";
+  }
+  return R"({"w":1920,"h":1080,"fr":25,"ip":0,"op":)" + std::to_string(frames) + R"(,"layers":[)" + list + "]}";
+}
+
+// Reads what an export of the composition reads for its samples, and nothing else.
+void ReadAllSamples(host::StandaloneHost& host, A_long layers, A_long frames)
+{
+  exporter::ExportSuites suites(host.Basic());
+  exporter::HostCalls calls(suites);
+  AEGP_ItemH item = nullptr;
+  AEGP_CompH composition = nullptr;
+  calls(&AEGP_ItemSuite13::AEGP_GetActiveItem, &item);
+  calls(&AEGP_CompSuite15::AEGP_GetCompFromItem, item, &composition);
+  for (A_long i = 0; i < layers; ++i) {
+    AEGP_LayerH layer = nullptr;
+    calls(&AEGP_LayerSuite13::AEGP_GetCompLayerByIndex, composition, i, &layer);
+    exporter::HostStream streams[std::size(kStreams)];
+    for (std::size_t s = 0; s < std::size(kStreams); ++s)
+      streams[s].Open(calls, layer, kStreams[s]);
+    for (A_long frame = 0; frame <= frames; ++frame) {
+      for (const exporter::HostStream& stream : streams) {
+        AEGP_StreamVal2 value = {};
+        exporter::ReadStream(calls, stream.Get(), {frame, 25}, value);
+        benchmark::DoNotOptimize(value);
+      }
+    }
+    for (exporter::HostStream& stream : streams)
+      stream.Dispose(calls);
+  }
+}
+
+// "host ns": the host's reads for one sample of one layer. "exporter ns": what the exporter takes on top of them, for
+// the conversion, nine keys, and the scene around them; "exporter/host" is the ratio of the two.
+void ExportAnimatedLayers(benchmark::State& state)
+{
+  const std::int64_t layers = state.range(0);
+  const std::int64_t frames = state.range(1);
+  host::StandaloneHost host(host::LoadCompositionText(Composition(layers, frames), "benchmark.json", "/"));
+  host.Start(EntryPointFunc);
+  const Seconds reads = BestOfThree(
+      [&] { return TimeOf([&] { ReadAllSamples(host, static_cast<A_long>(layers), static_cast<A_long>(frames)); }); });
+  ResetPeakMemory();
+  const std::int64_t before = PresentMemory();
+  Seconds best(1e9);
+  RunBest(state, [&] {
+    const std::unique_ptr<BaseDocument, FreeDocument> document(BaseDocument::Alloc());
+    const Seconds time = TimeOf([&] {
+      if (!exporter::ExportComposition(document.get()))
+        state.SkipWithError("the export failed");
+    });
+    best = std::min(best, time);
+    return time;
+  });
+  const auto samples = static_cast<double>(layers * (frames + 1));
+  state.counters["host ns"] = reads.count() / samples * 1e9;
+  state.counters["exporter ns"] = (best - reads).count() / samples * 1e9;
+  state.counters["exporter/host"] = (best - reads) / reads;
+  state.counters["peak MB"] = static_cast<double>(PeakMemory() - before) * 1e-6;
+}
+
+BENCHMARK(ExportAnimatedLayers)
+    ->Args({100, 1000})
+    ->Args({200, 1000})
+    ->Args({100, 2000})
+    ->Args({100, 10'000})
+    ->Apply(OneBest);
+
+} // namespace
