@@ -1,5 +1,6 @@
 #include "node_details.h"
 
+#include "geometry_details.h"
 #include "scene_file.h"
 #include "torvane/base_tag.h"
 
@@ -10,16 +11,14 @@ using namespace _torvane_;
 
 Json ObjectParams(BaseObject&) { return Json::object(); }
 
-Json TagValues(BaseTag&) { return nullptr; }
-
 Json ViewsJson(BaseDocument&) { return Json::array(); }
 
-std::string ObjectWords(BaseObject&) { return {}; }
+std::string ObjectWords(BaseObject& object) { return GeometryWords(object); }
 
 std::string TagWords(BaseTag& tag)
 {
   if (tag.GetType() != kTagTarget)
-    return {};
+    return TagCountWords(tag);
   const BaseList2D* target = tag.GetDataInstance().GetLink(kTargetLink);
   return target ? "-> \"" + ToUtf8(target->GetName()) + "\"" : std::string();
 }

@@ -1,4 +1,5 @@
-// What particular classes of nodes add to a listing. One place for each family.
+// What particular classes of nodes add to a listing. One place for each family; arrays and selections have a file of
+// their own.
 #pragma once
 
 #include <string>

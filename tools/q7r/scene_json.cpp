@@ -1,5 +1,6 @@
 #include "scene_json.h"
 
+#include "geometry_details.h"
 #include "node_details.h"
 #include "scene_file.h"
 #include "torvane/base_tag.h"
@@ -73,21 +74,23 @@ Json ObjectJson(BaseObject& object)
   for (BaseObject* child = object.GetDown(); child; child = child->GetNext())
     children.push_back(ObjectJson(*child));
   const BaseList2D* layer = object.GetLayer();
-  return {{"type", object.GetType()},
-          {"typeName", TypeName(object.GetType())},
-          {"name", ToJson(object.GetName())},
-          {"pos", ToJson(object.GetRelPos())},
-          {"scale", ToJson(object.GetRelScale())},
-          {"rot", ToJson(object.GetRelRot())},
-          {"rotationOrder", object.GetRotationOrder()},
-          {"editorMode", object.GetEditorMode()},
-          {"renderMode", object.GetRenderMode()},
-          {"layer", layer ? ToJson(layer->GetName()) : Json()},
-          {"data", ToJson(object.GetDataInstance())},
-          {"params", ObjectParams(object)},
-          {"tags", std::move(tags)},
-          {"tracks", TracksJson(object)},
-          {"children", std::move(children)}};
+  Json json = {{"type", object.GetType()},
+               {"typeName", TypeName(object.GetType())},
+               {"name", ToJson(object.GetName())},
+               {"pos", ToJson(object.GetRelPos())},
+               {"scale", ToJson(object.GetRelScale())},
+               {"rot", ToJson(object.GetRelRot())},
+               {"rotationOrder", object.GetRotationOrder()},
+               {"editorMode", object.GetEditorMode()},
+               {"renderMode", object.GetRenderMode()},
+               {"layer", layer ? ToJson(layer->GetName()) : Json()},
+               {"data", ToJson(object.GetDataInstance())},
+               {"params", ObjectParams(object)},
+               {"tags", std::move(tags)},
+               {"tracks", TracksJson(object)},
+               {"children", std::move(children)}};
+  AddGeometry(object, json);
+  return json;
 }
 
 Json LayerJson(LayerObject& layer)
