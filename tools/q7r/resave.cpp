@@ -1,6 +1,4 @@
 // q7r resave and q7r merge: load scene files and write the result.
-#include <cstdio>
-#include <filesystem>
 #include <memory>
 #include <vector>
 
@@ -36,26 +34,6 @@ struct Options
   std::string output;
   bool force = false;
 };
-
-// Writes beside the output first and moves the whole file into place, so that a failure leaves an existing file alone.
-void WriteScene(BaseDocument& document, const std::string& output)
-{
-  std::string partial = output + ".part";
-  FileProblem problem;
-  bool opened = SaveDocument(&document, ToFilename(partial), 0, &problem);
-  std::error_code error;
-  if (!opened || problem.code != FILEERROR_NONE) {
-    std::filesystem::remove(partial, error);
-    throw Failure(ProblemText(output, problem));
-  }
-  std::filesystem::rename(partial, output, error);
-  if (error) {
-    std::string reason = error.message();
-    std::filesystem::remove(partial, error);
-    throw Failure(output + ": " + reason);
-  }
-  std::printf("%s: %s\n", output.c_str(), SizeText(std::filesystem::file_size(output)).c_str());
-}
 
 int Resave(const Options& options)
 {

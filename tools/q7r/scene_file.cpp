@@ -92,6 +92,34 @@ DocumentPtr LoadScene(const std::string& path)
   return document;
 }
 
+void WriteWhole(const std::string& path, const std::function<void(const std::string& partial)>& write)
+{
+  std::string partial = path + ".part";
+  std::error_code error;
+  try {
+    write(partial);
+  } catch (const Failure&) {
+    std::filesystem::remove(partial, error);
+    throw;
+  }
+  std::filesystem::rename(partial, path, error);
+  if (error) {
+    std::string reason = error.message();
+    std::filesystem::remove(partial, error);
+    throw Failure(path + ": " + reason);
+  }
+}
+
+void WriteScene(BaseDocument& document, const std::string& path)
+{
+  WriteWhole(path, [&](const std::string& partial) {
+    FileProblem problem;
+    if (!SaveDocument(&document, ToFilename(partial), 0, &problem) || problem.code != FILEERROR_NONE)
+      throw Failure(ProblemText(path, problem));
+  });
+  std::printf("%s: %s\n", path.c_str(), SizeText(std::filesystem::file_size(path)).c_str());
+}
+
 void VerifyScene(const std::string& path)
 {
   HyperFile file;

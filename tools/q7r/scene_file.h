@@ -2,6 +2,7 @@
 #pragma once
 
 #include <cstdint>
+#include <functional>
 #include <memory>
 #include <string>
 
@@ -27,6 +28,13 @@ std::string ProblemText(const std::string& path, const _torvane_::FileProblem& p
 
 // Loads a scene file; throws Failure.
 DocumentPtr LoadScene(const std::string& path);
+
+// Lets `write` make the file under a name beside `path` and then moves it there, so that a failure, which it tells by a
+// Failure, leaves an existing file alone.
+void WriteWhole(const std::string& path, const std::function<void(const std::string& partial)>& write);
+
+// Saves a document so and tells the file's size on standard output; throws Failure.
+void WriteScene(_torvane_::BaseDocument& document, const std::string& path);
 
 // Walks every value of a written file once, from the header to the last byte; throws Failure at the first fault. So a
 // disk that ran full or a file that was cut is found even though its writer didn't say so.

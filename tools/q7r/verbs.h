@@ -28,5 +28,6 @@ void AddDump(CLI::App& program, int& status);
 void AddCheck(CLI::App& program, int& status);
 void AddResave(CLI::App& program, int& status);
 void AddMerge(CLI::App& program, int& status);
+void AddPreview(CLI::App& program, int& status);
 
 } // namespace q7r
