@@ -226,6 +226,19 @@ TEST(BmpFiles, KeepTheRowsBeforeACut)
   }
 }
 
+TEST(ImageValues, HoldAPictureSavedInTheWantedFormat)
+{
+  Bitmap bitmap;
+  Fill(bitmap, kSmall);
+  EXPECT_EQ("81 00 00 00 4E " + ToHex(FromHex(kSmallBmp)), ToHex(WriteToMemory([&](HyperFile& file) {
+              EXPECT_TRUE(file.WriteImage(&bitmap, kImageFormatBmp, nullptr, 0));
+            })));
+  // Of a picture that its format can't hold the tag alone is written, and that counts as success.
+  bitmap.Init(32001, 1, kDepthGrey);
+  EXPECT_EQ("81", ToHex(WriteToMemory(
+                      [&](HyperFile& file) { EXPECT_TRUE(file.WriteImage(&bitmap, kImageFormatBmp, nullptr, 0)); })));
+}
+
 TEST(BmpRuns, DecodeByHand)
 {
   const struct
