@@ -1,0 +1,60 @@
+// Any bytes as a scene file: loading ends, gives a document or a reason, and what was loaded can be written, read again
+// and copied.
+#include <cstddef>
+#include <cstdint>
+
+#include "torvane/assertion.h"
+#include "torvane/base_document.h"
+#include "torvane/filename.h"
+#include "torvane/hyper_file.h"
+
+using namespace _torvane_;
+
+namespace
+{
+
+void Require(bool holds)
+{
+  if (!holds)
+    __builtin_trap();
+}
+
+BaseDocument* Load(const void* data, LLong size, FileProblem& problem)
+{
+  Filename name;
+  name.SetMemoryRead(data, size);
+  return LoadDocument(name, LoadObjects | LoadMaterials, &problem);
+}
+
+void WriteAndReadAgain(BaseDocument& document)
+{
+  MemoryDescription description;
+  Filename name;
+  name.SetMemoryWrite(&description);
+  FileProblem problem;
+  Require(SaveDocument(&document, name, 0, &problem) && problem.code == FILEERROR_NONE);
+  const void* data = nullptr;
+  LLong size = 0;
+  Require(name.GetMemoryContinuous(data, size));
+  BaseDocument* again = Load(data, size, problem);
+  Require(again != nullptr);
+  BaseDocument::Free(again);
+}
+
+} // namespace
+
+extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size)
+{
+  SetAssertionLog(nullptr);
+  FileProblem problem;
+  BaseDocument* document = Load(data, static_cast<LLong>(size), problem);
+  Require(document || problem.code != FILEERROR_NONE);
+  if (!document)
+    return 0;
+  WriteAndReadAgain(*document);
+  BaseDocument* copy = BaseDocument::Alloc();
+  Require(copy && document->CopyWithTranslation(*copy, 0, nullptr));
+  BaseDocument::Free(copy);
+  BaseDocument::Free(document);
+  return 0;
+}
