@@ -37,4 +37,20 @@ TEST(Crc, MatchesItsCheckValue)
   EXPECT_EQ(Crc64().GetCrc(), 0u);
 }
 
+// Long data are taken in slices: at every place and length they must come to what single bytes come to.
+TEST(Crc, TakesLongDataAsItTakesSingleBytes)
+{
+  UChar data[80];
+  for (ULong i = 0; i < sizeof data; ++i)
+    data[i] = static_cast<UChar>(i * 151 + 7);
+  for (LLong start = 0; start < 3; ++start) {
+    Crc32 bytes;
+    for (LLong size = 0; size < 77; bytes.UpdateByte(data[start + size++])) {
+      Crc32 whole;
+      whole.Update(data + start, size);
+      EXPECT_EQ(whole.GetCrc(), bytes.GetCrc()) << start << ", " << size;
+    }
+  }
+}
+
 } // namespace
