@@ -40,6 +40,8 @@ class PolygonObject : public PointObject
   PolygonObject() : PointObject(kObjectPolygon) {}
 
   Bool IsInstanceOf(Long type) const override { return type == kObjectPolygon || PointObject::IsInstanceOf(type); }
+  // The label comes from the object data, as for most objects.
+  // NOLINTNEXTLINE(bugprone-parent-virtual-call)
   Long GetDiskType() const override { return BaseObject::GetDiskType(); }
 };
 
