@@ -2,7 +2,9 @@
 #pragma once
 
 #include "torvane/base_object.h"
+#include "torvane/camera_object_data.h"
 #include "torvane/layer_object.h"
+#include "torvane/light_object_data.h"
 #include "torvane/material.h"
 #include "torvane/point_object_data.h"
 #include "torvane/render_data.h"
@@ -48,6 +50,18 @@ class AlienMaterial : public _torvane_::Material
 
 class AlienRenderData : public _torvane_::RenderData
 {};
+
+class AlienLightObjectData : public _torvane_::LightObjectData
+{
+ public:
+  Bool Execute() override { return GetNode() != nullptr; }
+};
+
+class AlienCameraObjectData : public _torvane_::CameraObjectData
+{
+ public:
+  Bool Execute() override { return GetNode() != nullptr; }
+};
 
 class AlienPolygonObjectData : public _torvane_::PolygonObjectData
 {

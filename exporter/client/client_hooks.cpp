@@ -74,6 +74,10 @@ NodeData* AllocNodeData(Long type, Bool& known)
   switch (type) {
   case kObjectPolygon:
     return NewObj<exporter::AlienPolygonObjectData>();
+  case kObjectLight:
+    return NewObj<exporter::AlienLightObjectData>();
+  case kObjectCamera:
+    return NewObj<exporter::AlienCameraObjectData>();
   case kObjectPlane:
     return NewObj<exporter::AlienPrimitiveObjectData>(type);
   default:

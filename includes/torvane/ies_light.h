@@ -40,12 +40,12 @@ class IESLight : public GeMemory
 
   Long GetVerticalCount() const { return verticalAngles.GetCount(); }
   Long GetHorizontalCount() const { return horizontalAngles.GetCount(); }
-  // The table has a row for each horizontal angle.
+  // The table has a row for each horizontal angle, and no more of either than kMaxIESAngles.
   Bool IsComplete() const;
 
-  // The intensity toward a direction of length 1, relative to maxCandela, from 0 up; 0 outside the vertical angles. The
-  // lamp's axis is -z: a file's
-  // vertical angle of 0 looks down. Horizontal angles run from y to x.
+  // The intensity toward a direction of length 1, relative to maxCandela, from 0 up; 0 outside the vertical angles, and
+  // for a table that isn't complete. The lamp's axis is -z: a vertical angle of 0 looks along it. Horizontal angles run
+  // from y to x.
   Real SampleIESLight(const Vector& direction) const;
 
   // Computes maxCandela from the table, and totalFlux from 65536 samples that are the same each time.

@@ -9,12 +9,6 @@ namespace q7r
 
 using namespace _torvane_;
 
-Json ObjectParams(BaseObject&) { return Json::object(); }
-
-Json ViewsJson(BaseDocument&) { return Json::array(); }
-
-std::string ObjectWords(BaseObject& object) { return GeometryWords(object); }
-
 std::string TagWords(BaseTag& tag)
 {
   if (tag.GetType() != kTagTarget)
@@ -22,7 +16,5 @@ std::string TagWords(BaseTag& tag)
   const BaseList2D* target = tag.GetDataInstance().GetLink(kTargetLink);
   return target ? "-> \"" + ToUtf8(target->GetName()) + "\"" : std::string();
 }
-
-std::vector<std::string> ViewLines(BaseDocument&) { return {}; }
 
 } // namespace q7r

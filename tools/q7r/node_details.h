@@ -12,6 +12,8 @@ namespace q7r
 
 // The parameters of an object's own data, by id; an empty object where there are none.
 Json ObjectParams(_torvane_::BaseObject& object);
+// The measured distribution of a light; null without one.
+Json ObjectIES(_torvane_::BaseObject& object);
 // The array of a tag; null for a tag without one.
 Json TagValues(_torvane_::BaseTag& tag);
 Json MaterialsJson(_torvane_::BaseDocument& document);

@@ -90,6 +90,9 @@ Json ObjectJson(BaseObject& object)
                {"tracks", TracksJson(object)},
                {"children", std::move(children)}};
   AddGeometry(object, json);
+  Json ies = ObjectIES(object);
+  if (!ies.is_null())
+    json["ies"] = std::move(ies);
   return json;
 }
 

@@ -29,5 +29,6 @@ void AddCheck(CLI::App& program, int& status);
 void AddResave(CLI::App& program, int& status);
 void AddMerge(CLI::App& program, int& status);
 void AddPreview(CLI::App& program, int& status);
+void AddIES(CLI::App& program, int& status);
 
 } // namespace q7r

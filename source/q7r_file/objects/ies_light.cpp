@@ -105,7 +105,8 @@ struct IESLight::Interval
 
 Bool IESLight::IsComplete() const
 {
-  return static_cast<LLong>(GetVerticalCount()) * GetHorizontalCount() == candela.GetCount();
+  return GetVerticalCount() <= kMaxIESAngles && GetHorizontalCount() <= kMaxIESAngles &&
+         GetVerticalCount() * GetHorizontalCount() == candela.GetCount();
 }
 
 // Where an angle from 0 to below 360 lies among the horizontal angles, which may cover a part of the circle only.
@@ -174,7 +175,7 @@ void IESLight::Normalise()
     maxCandela = value > maxCandela ? value : maxCandela;
   RandomGenerator random(kFluxSeed);
   Real sum = 0.0;
-  for (Long i = 0; i < kFluxSamples; ++i)
+  for (Long i = 0; i < kFluxSamples && candela.GetCount() > 0; ++i) // without a table every sample is 0
     sum += SampleIESLight(DrawDirection(random));
   totalFlux = sum * kFluxOfSample;
 }

@@ -323,7 +323,7 @@ Bool IESParser::ParseNumbers()
   Real h = 0.0;
   Real ballast = 0.0;
   Real future = 0.0;
-  Real lampFactor = 0.0;
+  Real watts = 0.0; // what the luminaire draws: no factor of its light
   if (light_.tiltMode == kIESTiltInclude && !ParseIncludedTilt())
     return false;
   if (!TakeInteger(lampCount) || !TakeNumbers({&lampLumens, &multiplier}) || !TakeInteger(verticalCount) ||
@@ -332,7 +332,7 @@ Bool IESParser::ParseNumbers()
   SetShape(light_, x, l, h);
   if (unit == kUnitFeet)
     light_.size *= kFoot;
-  if (!TakeNumbers({&ballast, &future, &lampFactor}))
+  if (!TakeNumbers({&ballast, &future, &watts}))
     return false;
   for (Long count : {verticalCount, horizontalCount}) {
     if (count < 0 || count > kMaxIESAngles)
@@ -341,8 +341,11 @@ Bool IESParser::ParseNumbers()
   if (!TakeTable(light_.verticalAngles, verticalCount) || !TakeTable(light_.horizontalAngles, horizontalCount) ||
       !TakeTable(light_.candela, verticalCount * horizontalCount))
     return false;
-  for (Real& value : light_.candela)
-    value *= multiplier * ballast * lampFactor;
+  for (Real& value : light_.candela) {
+    value *= multiplier * ballast;
+    if (!std::isfinite(value))
+      return false;
+  }
   light_.Normalise();
   return true;
 }

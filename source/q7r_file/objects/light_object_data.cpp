@@ -281,11 +281,12 @@ void LightObjectData::VisitExtraBlock(Visitor& v)
     VisitKnot(v, knot);
 }
 
-// A distribution that reads badly is left out, and the light is read all the same.
+// A distribution that reads badly is left out, and the light is read all the same; one that could not be read again
+// isn't written.
 template <class Visitor>
 void LightObjectData::VisitIES(Visitor& v)
 {
-  Bool present = iesLight_ != nullptr;
+  Bool present = iesLight_ && iesLight_->IsComplete();
   if (!v.Bool(present) || !present)
     return;
   if constexpr (Visitor::kReading) {
