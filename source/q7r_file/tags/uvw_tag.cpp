@@ -173,7 +173,7 @@ Bool UVWTag::VisitEntries(Visitor& v)
   } else {
     v.Note(v.File().WriteArray(block_, kArrayLong, sizeof(ULong), LLong{count} * kWordsPerQuad));
   }
-  return v.Level() < kLevelParameter || v.Bool(parameter_);
+  return v.Good() && (v.Level() < kLevelParameter || v.Bool(parameter_));
 }
 
 void UVWTag::WriteEntries(HyperFile& file)
@@ -189,9 +189,10 @@ Bool UVWTag::ReadEntries(HyperFile& file, Long level)
     return ReadOldEntries(file, level) && (level < kLevelParameter || reader.Bool(parameter_));
   if (level == kLevelFloats)
     return ReadFloatEntries(file) && reader.Bool(parameter_);
-  if (!VisitEntries(reader))
+  const Bool read = VisitEntries(reader);
+  if (!read)
     file.SetError(FILEERROR_MEMORY);
-  return reader.Good();
+  return read;
 }
 
 // `cornerAt` gives the coordinate of corner n, counted through all quads.

@@ -97,7 +97,7 @@ Bool VisitRestPose(Visitor& v, JointRecord& record, Long dataLevel)
   return v.Good() && (dataLevel < kLevelSecondLinks || VisitLink(v, record.second));
 }
 
-// The object whose goal or address is `target` among the descendants of `top` and its siblings; null if there is none.
+// `target` as the object that it is, if it is found among `top`, the objects behind it, and all below these; else null.
 BaseObject* FindInTree(BaseObject* top, const GeListNode* target)
 {
   for (BaseObject* object = top; object;) {
