@@ -273,7 +273,7 @@ TEST(BmpFiles, AreTheSameToOtherPrograms)
   if (!HasProgram("convert"))
     GTEST_SKIP() << "ImageMagick is not here";
   const TempFolder folder;
-  for (int width : {1, 2, 3, 4, 33}) {
+  for (int width : {1, 3, 4}) {
     for (int components : {1, 3}) {
       SCOPED_TRACE(std::to_string(width) + " x 5, " + std::to_string(components));
       const PlainPicture picture = RandomPicture(width, 5, components, static_cast<unsigned>(width));
