@@ -102,10 +102,17 @@ void BaseContainer::Swap(BaseContainer& other)
   std::swap(blocks_, other.blocks_);
 }
 
+// The places of a small container stay: most often the elements that a file holds take those of the defaults.
 void BaseContainer::Flush()
 {
   dirty_ = static_cast<UWord>(dirty_ + GetCount());
-  FreeElements();
+  if (!tail_ || blocks_->capacity == kLargestBlock)
+    return FreeElements();
+  for (Element* element = head_; element; element = element->next)
+    element->value.Free();
+  tail_->next = free_;
+  free_ = head_;
+  head_ = tail_ = nullptr;
 }
 
 // Containers that lie in containers are put into a list and freed one after the other, however deep they are nested.
@@ -231,7 +238,7 @@ GeData* BaseContainer::InsertData(Long id, GeData&& value)
   Element* element = NewElement(id);
   if (!element)
     return nullptr;
-  element->value = std::move(value);
+  ::new (static_cast<void*>(&element->value)) GeData(std::move(value)); // a nil value owns nothing that would be lost
   Append(element);
   return &element->value;
 }

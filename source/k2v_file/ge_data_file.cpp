@@ -59,6 +59,11 @@ Bool GeData::Read(HyperFile& file)
   Long type = 0;
   if (!file.ReadLong(type))
     return false;
+  // The two kinds that most elements of containers are.
+  if (type == kDataLong || type == kDataReal) {
+    type_ = type;
+    return Keep(type == kDataLong ? file.ReadLong(payload_.integer) : file.ReadReal(payload_.real));
+  }
   if (type >= kDataFirstCustom)
     return Keep(ReadCustom(file, type));
   if (type == kDataOldMemory) {

@@ -16,6 +16,32 @@ constexpr Long kContainerLevel = 1;
 // floats.
 constexpr Long kTrueLegacyLengths = 11925;
 
+// Where the type and the value of a container's element stand, with their tags, behind its id, and the sizes of whole
+// elements.
+constexpr LLong kElementType = 5;
+constexpr LLong kElementValue = 10;
+constexpr LLong kLongElementSize = 15;
+constexpr LLong kRealElementSize = 19;
+
+// The id and value of an element that is a Long or a double, and its size; 0 for any other one. `next` is null or the
+// place of kRealElementSize bytes.
+LLong GetNumberElement(const UChar* next, Long& id, GeData& number)
+{
+  if (!next || next[0] != kTagLong || next[kElementType] != kTagLong)
+    return 0;
+  const auto type = static_cast<Long>(bytes::GetBig<ULong>(next + kElementType + 1));
+  const UChar tag = next[kElementValue];
+  const UChar* value = next + kElementValue + 1;
+  if (type == kDataLong && tag == kTagLong)
+    number = GeData(static_cast<Long>(bytes::GetBig<ULong>(value)));
+  else if (type == kDataReal && tag == kTagReal)
+    number = GeData(bytes::CleanReal(bytes::GetBig<ULLong>(value)));
+  else
+    return 0;
+  id = static_cast<Long>(bytes::GetBig<ULong>(next + 1));
+  return type == kDataLong ? kLongElementSize : kRealElementSize;
+}
+
 } // namespace
 
 Bool HyperFile::WriteChunkStart(Long id, Long level)
@@ -220,8 +246,20 @@ Bool HyperFile::ReadContainerChunk(BaseContainer& container, Bool flush)
   if (!ReadLong(id))
     return false;
   container.SetId(id);
-  UChar tag = 0;
-  while (ReadValueHeader(tag) && tag != kTagChunkEnd) {
+  // Most elements are numbers: these are taken straight out of the buffer, as long as it holds the longest of them.
+  const Bool numbersInBuffer = flush && !singlePrecision_;
+  while (error_ == FILEERROR_NONE) {
+    GeData number;
+    const LLong size = numbersInBuffer ? GetNumberElement(file_.ReadWindow(kRealElementSize), id, number) : 0;
+    if (size > 0 && container.InsertData(id, std::move(number))) {
+      file_.CommitRead(size);
+      TickRead(); // the type's
+      TickRead();
+      continue;
+    }
+    UChar tag = 0;
+    if (!ReadValueHeader(tag) || tag == kTagChunkEnd)
+      break;
     if (tag != kTagLong)
       return FailFromFile();
     if (!ReadPlainLong(id))

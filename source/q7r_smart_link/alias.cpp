@@ -40,6 +40,33 @@ Bool GetRecord(const void* block, LLong size, const char (&mark)[kMarkSize], GeA
   return true;
 }
 
+// A Memory value that was read. One of a record's size, as nearly all are, needs no block when it lies in the file's
+// buffer.
+class ReadRecord
+{
+ public:
+  explicit ReadRecord(HyperFile& file)
+  {
+    const UChar* next = file.GetFile().ReadWindow(1 + static_cast<LLong>(sizeof(ULong)) + kRecordSize);
+    if (next && next[0] == kTagMemory && bytes::GetBig<ULong>(next + 1) == kRecordSize)
+      bytes_ = file.ReadMemoryInto(record_, kRecordSize, size_) ? record_ : nullptr;
+    else if (file.ReadMemory(block_, size_))
+      bytes_ = static_cast<const UChar*>(block_);
+  }
+  ~ReadRecord() { GeFree(block_); }
+  ReadRecord(const ReadRecord&) = delete;
+  ReadRecord& operator=(const ReadRecord&) = delete;
+
+  const UChar* Bytes() const { return bytes_; } // null after a failure and for an empty value
+  LLong Size() const { return size_; }
+
+ private:
+  UChar record_[kRecordSize];
+  void* block_ = nullptr;
+  const UChar* bytes_ = nullptr;
+  LLong size_ = 0;
+};
+
 // Gives `done` back; a failure is one of memory and becomes the file's error.
 Bool CheckMemory(HyperFile& file, Bool done)
 {
@@ -221,19 +248,15 @@ Bool GeAliasLink::ReadName(const UChar* bytes, LLong size)
 
 Bool GeAliasLink::ReadLink(HyperFile& file)
 {
-  void* block = nullptr;
-  LLong size = 0;
-  if (!file.ReadMemory(block, size) || !block)
+  const ReadRecord record(file);
+  if (!record.Bytes())
     return false;
-  Bool done = true;
   GeAliasID id = 0;
-  if (GetRecord(block, size, kLinkMark, id)) {
-    TransArray* translation = file.GetTranslator();
-    done = ReadName(static_cast<const UChar*>(block) + kRecordSize, size - kRecordSize) &&
-           (!translation || translation->RegisterLink(id, *this, nullptr));
-  }
-  GeFree(block);
-  return CheckMemory(file, done);
+  if (!GetRecord(record.Bytes(), record.Size(), kLinkMark, id))
+    return true;
+  TransArray* translation = file.GetTranslator();
+  return CheckMemory(file, ReadName(record.Bytes() + kRecordSize, record.Size() - kRecordSize) &&
+                               (!translation || translation->RegisterLink(id, *this, nullptr)));
 }
 
 // ---------------------------------------------------------------------------------------------------------------
@@ -308,14 +331,12 @@ Bool GeAliasGoal::WriteGoal(HyperFile& file) const
 
 Bool GeAliasGoal::ReadGoal(HyperFile& file)
 {
-  void* block = nullptr;
-  LLong size = 0;
-  if (!file.ReadMemory(block, size) || !block)
+  const ReadRecord record(file);
+  if (!record.Bytes())
     return false;
   GeAliasID id = 0;
-  if (size == kRecordSize)
-    GetRecord(block, size, kGoalMark, id);
-  GeFree(block);
+  if (record.Size() == kRecordSize)
+    GetRecord(record.Bytes(), record.Size(), kGoalMark, id);
   TransArray* translation = file.GetTranslator();
   return !translation || CheckMemory(file, translation->RegisterGoal(id, *this));
 }

@@ -50,20 +50,21 @@ constexpr Default kDefaults[] = {
     {kTextureReal2, Form::kReal, 0.0},
 };
 
-void SetDefault(BaseContainer& container, const Default& row)
+GeData MakeDefault(const Default& row)
 {
   switch (row.form) {
   case Form::kBool:
-    return container.SetBool(row.id, row.number != 0.0);
+    return row.number != 0.0;
   case Form::kLong:
-    return container.SetLong(row.id, static_cast<Long>(row.number));
+    return static_cast<Long>(row.number);
   case Form::kReal:
-    return container.SetReal(row.id, row.number);
+    return row.number;
   case Form::kVector:
-    return container.SetVector(row.id, {row.number, row.number, row.number});
+    return Vector(row.number, row.number, row.number);
   case Form::kLink:
-    return container.SetLink(row.id, nullptr);
+    return GeAliasLink();
   }
+  return {};
 }
 
 // An aspect: the number that is looked for, and the one that is stored. They are not always the same.
@@ -140,7 +141,7 @@ Real QuotientOrOne(Real a, Real b) { return b != 0.0 ? a / b : 1.0; }
 TextureTag::TextureTag() : BaseTag(kTagTexture)
 {
   for (const Default& row : kDefaults)
-    SetDefault(data_, row);
+    data_.InsertData(row.id, MakeDefault(row));
 }
 
 BaseTag* MakeTextureTag() { return NewObj<TextureTag>(); }
