@@ -13,6 +13,7 @@ namespace
 constexpr LLong kTextPiece = 512;          // characters that are converted at a time
 constexpr LLong kFirstStep = 65536;        // first allocation for a block whose size can't be checked
 constexpr LLong kLargestShort = INT32_MAX; // larger memory blocks have a 64-bit length
+constexpr LLong kSmallBlock = 64;
 
 void PackText(UChar* place, const UniChar* text, LLong count)
 {
@@ -164,6 +165,17 @@ Bool HyperFile::WriteMemory(const void* data, LLong size)
   LLong start = file_.GetPosition();
   if (size < 0 || (size > 0 && !data))
     return Fail(FILEERROR_INVALID, start);
+  constexpr LLong kHead = 5;
+  // Small blocks, as those of links and goals, go into the buffer in one go.
+  UChar* place = size > 0 && size <= kSmallBlock ? file_.WriteWindow(kHead + size) : nullptr;
+  if (place) {
+    place[0] = kTagMemory;
+    bytes::PutBig(place + 1, static_cast<ULong>(size));
+    GeCopyMem(place + kHead, data, size);
+    file_.CommitWrite(kHead + size);
+    TickWrite();
+    return true;
+  }
   Bool head = size > kLargestShort ? file_.WriteUChar(kTagLargeMemory) && file_.WriteLLong(size)
                                    : file_.WriteUChar(kTagMemory) && file_.WriteULong(static_cast<ULong>(size));
   if (!head || !file_.WriteBytes(data, size))
