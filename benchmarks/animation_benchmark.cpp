@@ -168,14 +168,12 @@ void LoadLongCurve(benchmark::State& state)
 void ThinLongCurve(benchmark::State& state)
 {
   const auto frames = static_cast<Long>(state.range(0));
-  exporter::ExportContext context;
-  context.framesPerSecond = kManyFrames;
   RunBest(state, [&] {
     const std::unique_ptr<BaseObject> object(AllocObject(kObjectNull));
     const Seconds time = TimeOf([&] {
-      exporter::SampledTrack track(context, object.get(), ComponentPath(kObjectRelPos, 0), "Track");
+      exporter::SampledTrack track(object.get(), ComponentPath(kObjectRelPos, 0), "Track");
       for (Long frame = 0; frame < frames; ++frame)
-        track.Add(frame, frame / 4);
+        track.Add(BaseTime(frame, kManyFrames), frame / 4);
       track.Finish();
     });
     const Long kept = object->GetFirstTrack() ? object->GetFirstTrack()->GetCurve(1, 0)->GetKeyCount() : 0;

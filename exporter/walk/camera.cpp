@@ -27,7 +27,7 @@ void ExportZoom(ExportContext& context, HostCalls& host, Real width)
   if (ReadStream(host, zoom.Get(), context.workAreaStart, value))
     context.object->SetParameterById(kCameraFieldOfView, FieldOfView(value.one_d, width, context.pixelAspect));
   if (StreamVaries(host, zoom.Get()) > 0) {
-    SampledTrack track(context, context.object, kCameraFieldOfView, "Field of View");
+    SampledTrack track(context.object, kCameraFieldOfView, "Field of View");
     SampleStream(context, host, zoom.Get(), {&track, 1}, {.mode = SampleMode::kFieldOfView, .width = width});
   }
   zoom.Dispose(host);
@@ -43,7 +43,7 @@ void ExportFocus(ExportContext& context, HostCalls& host)
   if (ReadStream(host, focus.Get(), context.workAreaStart, value))
     context.object->SetParameterById(kCameraFocusDistance, PixelsToMillimetres(value.one_d));
   if (StreamVaries(host, focus.Get()) > 0) {
-    SampledTrack track(context, context.object, kCameraFocusDistance, "Focus Distance");
+    SampledTrack track(context.object, kCameraFocusDistance, "Focus Distance");
     SampleStream(context, host, focus.Get(), {&track, 1},
                  {.mode = SampleMode::kValue, .divisor = kPixelsPerMillimetre});
   }

@@ -82,10 +82,8 @@ std::array<Real, 3> ValueConverter::Convert(const AEGP_StreamVal2& value, const 
 
 } // namespace
 
-SampledTrack::SampledTrack(ExportContext& context, BaseObject* object, const ParameterPath& path, const String& name,
-                           Content content)
-    : context_(context),
-      object_(object),
+SampledTrack::SampledTrack(BaseObject* object, const ParameterPath& path, const String& name, Content content)
+    : object_(object),
       track_(CTrack::Alloc(object, path, name)),
       content_(content),
       comparesData_(track_ && track_->GetKind() != kTrackValue)
@@ -99,30 +97,30 @@ bool SampledTrack::IsSame(Real a, Real b) const
   return comparesData_ ? a == b : std::abs(a - b) < kThinTolerance;
 }
 
-void SampledTrack::Add(Long frame, Real value)
+void SampledTrack::Add(const BaseTime& time, Real value)
 {
   if (!track_)
     return;
   if (isEmpty_) {
     isEmpty_ = false;
-    AddSampledKey(frame, value);
+    AddSampledKey(time, value);
     previous_ = value;
     return;
   }
   if (hasPending_) {
     if (!IsSame(previous_, pending_) || !IsSame(value, pending_))
-      AddSampledKey(pendingFrame_, pending_);
+      AddSampledKey(pendingTime_, pending_);
     previous_ = pending_;
   }
   hasPending_ = true;
-  pendingFrame_ = frame;
+  pendingTime_ = time;
   pending_ = value;
 }
 
-void SampledTrack::AddSampledKey(Long frame, Real value)
+void SampledTrack::AddSampledKey(const BaseTime& time, Real value)
 {
   CCurve* curve = track_->GetCurve(1, 1);
-  CKey* key = curve ? curve->AddKey(KeyTime(context_, frame)) : nullptr;
+  CKey* key = curve ? curve->AddKey(time) : nullptr;
   if (!key)
     return;
   constexpr Long kSet = 1;
@@ -149,7 +147,7 @@ void SampledTrack::Finish()
   if (!track_)
     return;
   if (hasPending_)
-    AddSampledKey(pendingFrame_, pending_);
+    AddSampledKey(pendingTime_, pending_);
   if (IsConstant())
     track_.reset();
   Insert();
@@ -157,21 +155,21 @@ void SampledTrack::Finish()
 
 void SampledTrack::Insert()
 {
-  if (track_)
-    object_->InsertTrackLast(track_.release());
+  if (track_ && object_->InsertTrackLast(track_.get()))
+    track_.release();
 }
 
-VectorTracks::VectorTracks(ExportContext& context, BaseObject* object, Long parameter, const char* const (&names)[3])
-    : tracks_{{context, object, ComponentPath(parameter, 0), names[0]},
-              {context, object, ComponentPath(parameter, 1), names[1]},
-              {context, object, ComponentPath(parameter, 2), names[2]}}
+VectorTracks::VectorTracks(BaseObject* object, Long parameter, const char* const (&names)[3])
+    : tracks_{{object, ComponentPath(parameter, 0), names[0]},
+              {object, ComponentPath(parameter, 1), names[1]},
+              {object, ComponentPath(parameter, 2), names[2]}}
 {}
 
-void VectorTracks::Add(Long frame, const Vector& value)
+void VectorTracks::Add(const BaseTime& time, const Vector& value)
 {
-  tracks_[0].Add(frame, value.x);
-  tracks_[1].Add(frame, value.y);
-  tracks_[2].Add(frame, value.z);
+  tracks_[0].Add(time, value.x);
+  tracks_[1].Add(time, value.y);
+  tracks_[2].Add(time, value.z);
 }
 
 void VectorTracks::Finish()
@@ -202,9 +200,10 @@ bool SampleStream(ExportContext& context, HostCalls& host, AEGP_StreamRefH strea
       ReadStream(host, sampling.secondStream, time, second);
     if (!host.Good())
       break;
+    const BaseTime keyTime = KeyTime(context, frame);
     const std::array<Real, 3> values = converter.Convert(value, second);
     for (std::size_t i = 0; i < tracks.size() && i < values.size(); ++i)
-      tracks[i].Add(frame, values[i]);
+      tracks[i].Add(keyTime, values[i]);
   }
   for (SampledTrack& track : tracks)
     track.Finish();
@@ -224,10 +223,11 @@ bool SampleTransform(ExportContext& context, HostCalls& host, const HostStream& 
     if (!ReadLayerSample(host, context, anchorStream, scaleStream, FrameTime(context, frame), sample))
       break;
     const SceneTransform transform = ConvertTransform(sample, rules, frame > 0 ? &previousRotation : nullptr);
+    const BaseTime keyTime = KeyTime(context, frame);
     previousRotation = transform.rotation;
-    tracks.position.Add(frame, transform.position);
-    tracks.rotation.Add(frame, transform.rotation);
-    tracks.scale.Add(frame, transform.scale);
+    tracks.position.Add(keyTime, transform.position);
+    tracks.rotation.Add(keyTime, transform.rotation);
+    tracks.scale.Add(keyTime, transform.scale);
   }
   for (VectorTracks* vector : {&tracks.position, &tracks.rotation, &tracks.scale})
     vector->Finish();

@@ -26,12 +26,12 @@ class SampledTrack
   };
 
   // Holds nothing when the object is null or memory is short; adding then does nothing.
-  SampledTrack(ExportContext& context, _torvane_::BaseObject* object, const _torvane_::ParameterPath& path,
-               const _torvane_::String& name, Content content = Content::kValue);
+  SampledTrack(_torvane_::BaseObject* object, const _torvane_::ParameterPath& path, const _torvane_::String& name,
+               Content content = Content::kValue);
 
   explicit operator bool() const { return track_ != nullptr; }
-  // Frames come in ascending order.
-  void Add(_torvane_::Long frame, Real value);
+  // Times come in ascending order.
+  void Add(const _torvane_::BaseTime& time, Real value);
   // Puts the track last among those of the object. One that holds a single value throughout vanishes instead: it has
   // less than two keys, or two of exactly the same value.
   void Finish();
@@ -46,9 +46,8 @@ class SampledTrack
 
   bool IsSame(Real a, Real b) const;
   bool IsConstant();
-  void AddSampledKey(_torvane_::Long frame, Real value);
+  void AddSampledKey(const _torvane_::BaseTime& time, Real value);
 
-  ExportContext& context_;
   _torvane_::BaseObject* object_;
   std::unique_ptr<_torvane_::CTrack, DeleteTrack> track_;
   Content content_;
@@ -56,7 +55,7 @@ class SampledTrack
   bool isEmpty_ = true;
   // The last value is held back until the next one shows whether it is needed.
   bool hasPending_ = false;
-  _torvane_::Long pendingFrame_ = 0;
+  _torvane_::BaseTime pendingTime_;
   Real pending_ = 0.0;
   Real previous_ = 0.0; // the one before, with a key or without
 };
@@ -65,13 +64,12 @@ class SampledTrack
 class VectorTracks
 {
  public:
-  VectorTracks(ExportContext& context, _torvane_::BaseObject* object, _torvane_::Long parameter,
-               const char* const (&names)[3]);
+  VectorTracks(_torvane_::BaseObject* object, _torvane_::Long parameter, const char* const (&names)[3]);
 
   // True if all three are there.
   explicit operator bool() const { return tracks_[0] && tracks_[1] && tracks_[2]; }
   std::span<SampledTrack, 3> All() { return tracks_; }
-  void Add(_torvane_::Long frame, const Vector& value);
+  void Add(const _torvane_::BaseTime& time, const Vector& value);
   void Finish();
   void Insert();
 

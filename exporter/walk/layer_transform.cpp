@@ -260,9 +260,9 @@ void LayerTransform::ExportTracks()
     return;
   BaseObject* turning = rules_.useRotation ? &object_ : nullptr;
   BaseObject* scaling = hasScaleTracks ? &object_ : nullptr;
-  TransformTracks tracks = {.position = {context_, &object_, kObjectRelPos, kPositionTrackNames},
-                            .rotation = {context_, turning, kObjectRelRot, kRotationTrackNames},
-                            .scale = {context_, scaling, kObjectRelScale, kScaleTrackNames}};
+  TransformTracks tracks = {.position = {&object_, kObjectRelPos, kPositionTrackNames},
+                            .rotation = {turning, kObjectRelRot, kRotationTrackNames},
+                            .scale = {scaling, kObjectRelScale, kScaleTrackNames}};
   if (!tracks.position)
     return;
   SampleTransform(context_, host_, anchorStream_, scaleStream_, tracks, rules_);
@@ -290,7 +290,7 @@ void LayerTransform::PlaceTarget()
     host_(&AEGP_KeyframeSuite4::AEGP_GetStreamNumKFs, stream, &keyframes);
     host_(&AEGP_StreamSuite9::AEGP_IsStreamTimevarying, stream, &varies);
     if (varies || keyframes > 0) {
-      VectorTracks tracks(context_, target_, kObjectRelPos, kPositionTrackNames);
+      VectorTracks tracks(target_, kObjectRelPos, kPositionTrackNames);
       // The first place is shifted by the parent, the keys are not.
       SampleStream(context_, host_, stream, tracks.All(), {.mode = SampleMode::kPosition});
     }

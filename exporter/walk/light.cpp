@@ -27,7 +27,7 @@ void ExportPercentage(ExportContext& context, HostCalls& host, AEGP_LayerStream 
   if (ReadStream(host, stream.Get(), context.workAreaStart, value))
     context.object->SetParameterById(parameter, value.one_d / kPercent);
   if (StreamVaries(host, stream.Get()) > 0) {
-    SampledTrack track(context, context.object, parameter, trackName);
+    SampledTrack track(context.object, parameter, trackName);
     SampleStream(context, host, stream.Get(), {&track, 1}, {.mode = SampleMode::kValue, .divisor = kPercent});
   }
   stream.Dispose(host);
@@ -56,7 +56,7 @@ void ExportColor(ExportContext& context, HostCalls& host)
     context.object->SetParameterById(kLightColor, Vector(value.color.redF, value.color.greenF, value.color.blueF));
   host(&AEGP_StreamSuite9::AEGP_GetStreamType, stream.Get(), &type); // only its failure counts
   if (StreamVaries(host, stream.Get()) > 0) {
-    VectorTracks tracks(context, context.object, kLightColor, kColorTrackNames);
+    VectorTracks tracks(context.object, kLightColor, kColorTrackNames);
     if (tracks)
       SampleStream(context, host, stream.Get(), tracks.All(), {.mode = SampleMode::kColor});
   }
@@ -82,8 +82,8 @@ void ExportCone(ExportContext& context, HostCalls& host)
   const bool angleVaries = StreamVaries(host, angle.Get()) > 0;
   const bool featherVaries = StreamVaries(host, feather.Get()) > 0;
   if (angleVaries || featherVaries) {
-    SampledTrack tracks[] = {{context, context.object, kLightOuterAngle, "Outer Angle"},
-                             {context, context.object, kLightInnerAngle, "Inner Angle"}};
+    SampledTrack tracks[] = {{context.object, kLightOuterAngle, "Outer Angle"},
+                             {context.object, kLightInnerAngle, "Inner Angle"}};
     if (tracks[0] && tracks[1])
       SampleStream(context, host, angle.Get(), tracks, {.mode = SampleMode::kCone, .secondStream = feather.Get()});
   }

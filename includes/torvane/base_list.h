@@ -104,14 +104,15 @@ class BaseList2D : public GeListNode
   // Index 0 is the marker.
   Bool GetUniqueIDByIndex(Long index, Long& appId, const void*& data, LLong& size) const;
 
-  RootShader& GetShaderRoot() { return shaders_; }
+  // The lists of shaders and tracks are null until the first member. False when memory for the list is short: the
+  // shader or track then stays the caller's.
+  RootShader* GetShaderRoot() const { return shaders_; }
   BaseShader* GetShaders() const;
-  void InsertShader(BaseShader* shader, BaseShader* after); // first when `after` is null
-  void InsertShaderLast(BaseShader* shader);
-  RootCTrack& GetTrackRoot() { return tracks_; }
-  const RootCTrack& GetTrackRoot() const { return tracks_; }
+  Bool InsertShader(BaseShader* shader, BaseShader* after); // first when `after` is null
+  Bool InsertShaderLast(BaseShader* shader);
+  RootCTrack* GetTrackRoot() const { return tracks_; }
   CTrack* GetFirstTrack() const;
-  void InsertTrackLast(CTrack* track);
+  Bool InsertTrackLast(CTrack* track);
   // The first track whose path begins with the ids of `path`; data types and creators play no part. Null for an empty
   // path.
   CTrack* FindTrack(const ParameterPath& path) const;
@@ -126,7 +127,7 @@ class BaseList2D : public GeListNode
 
  protected:
   void SetType(Long type) { type_ = type; }
-  static void SetDocumentOfMembers(RootList2D& root, BaseDocument* document);
+  static void SetDocumentOfMembers(RootList2D* root, BaseDocument* document); // null: does nothing
 
   String name_;
   GeAliasLink link_;
@@ -137,8 +138,8 @@ class BaseList2D : public GeListNode
   BaseDocument* document_ = nullptr; // not owned; null outside a document
   Long type_;
   ULong info_ = 0;
-  RootShader shaders_;
-  RootCTrack tracks_;
+  RootShader* shaders_ = nullptr; // owned, as the tracks; most nodes, every key for one, have neither
+  RootCTrack* tracks_ = nullptr;
   BaseContainer data_;
   RootList2D* listHead_ = nullptr; // the list that holds the node; not owned
   KeptChunks keptChunks_;
@@ -148,6 +149,12 @@ class BaseList2D : public GeListNode
   Bool VisitHeader(Visitor& visitor);
   template <class Visitor>
   Bool VisitMarker(Visitor& visitor);
+  template <class Root>
+  Root* NeedRoot(Root*& root);
+  template <class Root>
+  Bool ReadRoot(Root*& root, HyperFile& file);
+  template <class Root>
+  Bool CopyRoot(const Root* root, BaseList2D& target, Root*& targetRoot, ULong flags, TransArray* translation);
   static Bool SkipOneChunk(HyperFile& file);
   Bool ReadUniqueIds(HyperFile& file);
   void WriteUniqueIds(HyperFile& file);

@@ -146,7 +146,7 @@ class Sampling
            exporter::SampledTrack::Content content, Long lastFrame)
   {
     context_.frameCount = lastFrame;
-    exporter::SampledTrack track(context_, &object, path, "T", content);
+    exporter::SampledTrack track(&object, path, "T", content);
     return exporter::SampleStream(context_, calls_, stream_.Get(), {&track, 1}, {.mode = mode});
   }
 
@@ -185,7 +185,7 @@ TEST(SampleStream, TurnsEnumeratorsIntoDataAndDegreesIntoRadians)
 TEST(SampleStream, NeedsAStreamAndATrack)
 {
   Sampling sampling("1,2");
-  ASSERT_FALSE(exporter::SampledTrack(*std::make_unique<exporter::ExportContext>(), nullptr, ParameterPath(20), "T"));
+  ASSERT_FALSE(exporter::SampledTrack(nullptr, ParameterPath(20), "T"));
   BaseObject object(5140);
   EXPECT_FALSE(
       sampling.Run(object, ParameterPath(), exporter::SampleMode::kValue, exporter::SampledTrack::Content::kValue, 2));

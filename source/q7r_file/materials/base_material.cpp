@@ -102,8 +102,8 @@ Bool BaseMaterial::ReadChunk(HyperFile& file, Long id, Long level)
 // The shaders stand before everything else of a material.
 void BaseMaterial::WriteChunks(HyperFile& file)
 {
-  if (!shaders_.IsEmpty())
-    shaders_.WriteAsChunk(file, kChunkShaders);
+  if (GetShaders())
+    shaders_->WriteAsChunk(file, kChunkShaders);
   if (preview_.GetEncodedSize() <= 0 && preview_.GetBw() < 1)
     SetBit(kMaterialNoPreview);
   BaseList2D::WriteChunks(file);

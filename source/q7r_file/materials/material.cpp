@@ -177,9 +177,8 @@ BaseShader* Material::BindChannelBitmap(Long id, const Filename& filename)
     return nullptr;
   shader->SetBitmapFilename(filename);
   data_.SetLink(id, shader);
-  if (shader->BitmapFilename() != filename || ChannelShaderOf(id) != shader)
+  if (shader->BitmapFilename() != filename || ChannelShaderOf(id) != shader || !InsertShaderLast(shader))
     DeleteObj(shader); // memory is short
-  InsertShaderLast(shader);
   return shader;
 }
 
@@ -190,9 +189,8 @@ BaseShader* Material::BindChannelShader(Long id, Long shaderType)
     return nullptr;
   GeAliasLink link;
   link.SetLink(shader);
-  if (!SetParameterById(id, GeData(link)) || ChannelShaderOf(id) != shader)
+  if (!SetParameterById(id, GeData(link)) || ChannelShaderOf(id) != shader || !InsertShaderLast(shader))
     DeleteObj(shader);
-  InsertShaderLast(shader);
   return shader;
 }
 

@@ -10,13 +10,42 @@
 namespace _torvane_
 {
 
-BaseList2D::BaseList2D(Long type) : type_(type)
+BaseList2D::BaseList2D(Long type) : type_(type) {}
+
+BaseList2D::~BaseList2D()
 {
-  shaders_.SetOwner(this);
-  tracks_.SetOwner(this);
+  DeleteObj(tracks_);
+  DeleteObj(shaders_);
+  DeleteObj(uniqueIds_);
 }
 
-BaseList2D::~BaseList2D() { DeleteObj(uniqueIds_); }
+// The list, made if there is none; null when memory is short.
+template <class Root>
+Root* BaseList2D::NeedRoot(Root*& root)
+{
+  if (!root && (root = NewObj<Root>()))
+    root->SetOwner(this);
+  return root;
+}
+
+template <class Root>
+Bool BaseList2D::ReadRoot(Root*& root, HyperFile& file)
+{
+  if (NeedRoot(root))
+    return root->ReadChunks(file, false);
+  file.SetError(FILEERROR_MEMORY);
+  return false;
+}
+
+template <class Root>
+Bool BaseList2D::CopyRoot(const Root* root, BaseList2D& target, Root*& targetRoot, ULong flags, TransArray* translation)
+{
+  if (root)
+    return target.NeedRoot(targetRoot) && const_cast<Root*>(root)->CopyWithTranslation(*targetRoot, flags, translation);
+  if (targetRoot && !(flags & kCopyNoBranches))
+    targetRoot->FreeAll();
+  return true;
+}
 
 // The marker's block: a flag that says that one follows, and its 16 bytes.
 template <class Visitor>
@@ -129,8 +158,8 @@ void BaseList2D::WriteUniqueIds(HyperFile& file)
 
 void BaseList2D::WriteChunks(HyperFile& file)
 {
-  if (!tracks_.IsEmpty())
-    tracks_.WriteAsChunk(file, kChunkTracks);
+  if (GetFirstTrack())
+    tracks_->WriteAsChunk(file, kChunkTracks);
   WriteChunk(file, kChunkNodeHeader, kLevelNodeHeader, [this](ChunkWriter& v) { return VisitHeader(v); });
   if (uniqueIds_)
     WriteUniqueIds(file);
@@ -148,9 +177,9 @@ Bool BaseList2D::ReadChunk(HyperFile& file, Long id, Long level)
   case kChunkUniqueIds:
     return ReadUniqueIds(file);
   case kChunkShaders:
-    return shaders_.ReadChunks(file, false);
+    return ReadRoot(shaders_, file);
   case kChunkTracks:
-    return tracks_.ReadChunks(file, false);
+    return ReadRoot(tracks_, file);
   default:
     return false;
   }
@@ -177,9 +206,9 @@ Bool BaseList2D::CopyTo(PrivateChunk& destination, ULong flags, TransArray* tran
     return false;
   if (!dynamicParameters_.CopyTo(target.dynamicParameters_, flags, translation))
     return false;
-  if (!(flags & kCopyNoBranches) && !shaders_.CopyWithTranslation(target.shaders_, flags, translation))
+  if (!(flags & kCopyNoBranches) && !CopyRoot(shaders_, target, target.shaders_, flags, translation))
     return false;
-  return (flags & kCopyNoTracks) || tracks_.CopyWithTranslation(target.tracks_, flags, translation);
+  return (flags & kCopyNoTracks) || CopyRoot(tracks_, target, target.tracks_, flags, translation);
 }
 
 void BaseList2D::RemoveFromList() { Remove(); }
@@ -200,9 +229,9 @@ void BaseList2D::SetDocument(BaseDocument* document)
 }
 
 // Members that have the document already have it in all that they own.
-void BaseList2D::SetDocumentOfMembers(RootList2D& root, BaseDocument* document)
+void BaseList2D::SetDocumentOfMembers(RootList2D* root, BaseDocument* document)
 {
-  for (BaseList2D* member = root.GetFirst(); member; member = member->GetNext())
+  for (BaseList2D* member = root ? root->GetFirst() : nullptr; member; member = member->GetNext())
     member->SetDocument(document);
 }
 
@@ -255,15 +284,21 @@ Bool BaseList2D::GetUniqueIDByIndex(Long index, Long& appId, const void*& data, 
   return FindUniqueID(appId, data, size);
 }
 
-BaseShader* BaseList2D::GetShaders() const { return static_cast<BaseShader*>(shaders_.GetFirst()); }
+BaseShader* BaseList2D::GetShaders() const
+{
+  return shaders_ ? static_cast<BaseShader*>(shaders_->GetFirst()) : nullptr;
+}
 
-void BaseList2D::InsertShader(BaseShader* shader, BaseShader* after) { shaders_.InsertAfter(shader, after); }
+Bool BaseList2D::InsertShader(BaseShader* shader, BaseShader* after)
+{
+  return NeedRoot(shaders_) && shaders_->InsertAfter(shader, after);
+}
 
-void BaseList2D::InsertShaderLast(BaseShader* shader) { shaders_.InsertLast(shader); }
+Bool BaseList2D::InsertShaderLast(BaseShader* shader) { return NeedRoot(shaders_) && shaders_->InsertLast(shader); }
 
-CTrack* BaseList2D::GetFirstTrack() const { return static_cast<CTrack*>(tracks_.GetFirst()); }
+CTrack* BaseList2D::GetFirstTrack() const { return tracks_ ? static_cast<CTrack*>(tracks_->GetFirst()) : nullptr; }
 
-void BaseList2D::InsertTrackLast(CTrack* track) { tracks_.InsertLast(track); }
+Bool BaseList2D::InsertTrackLast(CTrack* track) { return NeedRoot(tracks_) && tracks_->InsertLast(track); }
 
 CTrack* BaseList2D::FindTrack(const ParameterPath& path) const
 {
@@ -295,7 +330,7 @@ void BaseList4D::SetDocument(BaseDocument* document)
     return;
   BaseList2D::SetDocument(document);
   if (children_)
-    SetDocumentOfMembers(*children_, document);
+    SetDocumentOfMembers(children_, document);
 }
 
 BaseList4D* BaseList4D::GetUp() const { return listHead_ ? static_cast<BaseList4D*>(listHead_->GetOwner()) : nullptr; }

@@ -50,10 +50,9 @@ void BaseObject::SetDocument(BaseDocument* document)
   if (document == GetDocument())
     return;
   BaseList4D::SetDocument(document);
-  SetDocumentOfMembers(tags_, document);
+  SetDocumentOfMembers(&tags_, document);
   for (RootObject* list : {legacyListA_, legacyListB_})
-    if (list)
-      SetDocumentOfMembers(*list, document);
+    SetDocumentOfMembers(list, document);
 }
 
 BaseTag* BaseObject::GetFirstTag() const { return static_cast<BaseTag*>(tags_.GetFirst()); }

@@ -78,8 +78,8 @@ void RenderData::SetDocument(BaseDocument* document)
   if (document_ == document)
     return;
   BaseList4D::SetDocument(document);
-  SetDocumentOfMembers(videoPosts_, document);
-  SetDocumentOfMembers(multipasses_, document);
+  SetDocumentOfMembers(&videoPosts_, document);
+  SetDocumentOfMembers(&multipasses_, document);
 }
 
 RenderData* AllocRenderData() { return new RenderData; }

@@ -108,7 +108,7 @@ void ViewPanel::SetDocument(BaseDocument* document)
   if (document_ == document)
     return;
   BaseList2D::SetDocument(document);
-  SetDocumentOfMembers(draws_, document);
+  SetDocumentOfMembers(&draws_, document);
 }
 
 void ViewPanel::WriteChunks(HyperFile& file)
