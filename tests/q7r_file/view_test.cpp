@@ -1,0 +1,245 @@
+// Views: panels with their draws, the settings of new ones, and the scene camera of a document.
+#include <algorithm>
+#include <sstream>
+#include <string>
+
+#include <gtest/gtest.h>
+
+#include "q7r_file/node_bytes.h"
+#include "support/assertion_counter.h"
+#include "support/counting_memory.h"
+#include "support/scene_bytes.h"
+#include "torvane/base_draw.h"
+#include "torvane/base_object.h"
+#include "torvane/ge_data.h"
+
+namespace
+{
+
+using namespace _torvane_;
+
+BaseDraw* DrawAt(ViewPanel& panel, Long index)
+{
+  auto* draw = static_cast<BaseDraw*>(panel.GetDraws().GetFirst());
+  for (Long i = 0; i < index; ++i)
+    draw = draw->GetNext();
+  return draw;
+}
+
+ViewPanel* FirstPanel(BaseDocument& document)
+{
+  return static_cast<ViewPanel*>(document.GetViewPanelRoot()->GetFirst());
+}
+
+// The chunk of a draw at a level, with a camera of one entry, 500, that stands at (1, 2, 3).
+Bytes DrawChunk(Long level)
+{
+  ByteWriter w;
+  w.Start(110305, level).String(u"").Start(132, 1).Long(-1).Long(500).Long(19).Real(24).End();
+  w.Vector(1, 2, 3).Vector(4, 5, 6).Vector(0.1, 0.2, 0.3);
+  for (Long link = 1; link <= level && link <= 2; ++link)
+    w.Memory(std::string_view("alias2\0\0\0\0\0\0\0\0", 14));
+  return w.bytes;
+}
+
+// The last bytes of what a node writes.
+std::string LastBytes(PrivateChunk& node, std::size_t count)
+{
+  const Bytes all = BytesOf(node);
+  return ToHex({all.end() - static_cast<long>(std::min(count, all.size())), all.end()});
+}
+
+} // namespace
+
+TEST(View, StartsWithItsDisplaySettings)
+{
+  // b is a switch, i an integer, r a Real, v a Vector.
+  std::istringstream entries(
+      "1019 b 1; 1020 b 0; 1021 b 0; 1022 b 1; 1023 r 0.8; 1024 r 0.9; 1025 b 0; 1026 r 0.8; 1027 b 0; 1028 r 1;"
+      "1029 b 1; 1031 r 0.25; 1032 r 0.1; 1038 b 10; 1037 r 0; 1044 b 0; 1045 b 1; 1046 r 1; 1047 r 1; 1048 r 1;"
+      "1049 b 1; 1050 b 1; 1051 r 0; 1064 r 0.75; 1052 r 100; 1053 i 100; 1054 i 10; 1056 i 1; 1058 b 1; 1059 b 1;"
+      "1060 b 1; 1061 b 0; 1062 b 1; 3026 b 1; 3028 b 1; 1065 b 1; 1066 r 0.10000000149011612; 1068 b 0; 1070 b 0;"
+      "1071 b 0; 1072 b 0; 2007 v 1 0.67 0.1; 2001 v 0.2 0.2 0.2; 2002 v 0.8 0.8 0.8; 3001 b 1; 3002 b 1; 3003 b 1;"
+      "3004 b 1; 3005 b 1; 3006 b 1; 3027 b 1; 3007 b 1; 3008 b 1");
+  BaseDraw draw;
+  const BaseContainer& settings = draw.GetDataInstance();
+  Long count = 0;
+  for (std::string entry; std::getline(entries, entry, ';'); ++count) {
+    std::istringstream words(entry);
+    Long id = 0;
+    char kind = 0;
+    Vector value;
+    words >> id >> kind >> value.x >> value.y >> value.z;
+    ASSERT_EQ(settings.GetIndexId(count), id);
+    const GeData& set = settings.GetData(id);
+    EXPECT_EQ(set.GetType(), kind == 'v' ? 23 : kind == 'r' ? 19 : 15) << entry;
+    EXPECT_TRUE(kind == 'v' ? set.GetVector() == value : set.GetReal() == value.x) << entry;
+  }
+  EXPECT_EQ(settings.GetCount(), count);
+  const BaseObject& camera = *draw.GetEditorCamera();
+  EXPECT_TRUE(camera.GetDataInstance().GetBool(1123));
+  EXPECT_TRUE(camera.GetRelPos() == Vector(600.0001, 300, -600));
+  EXPECT_NEAR(camera.GetRelRot().x, 0.7853981633974483, 1e-15);
+  EXPECT_NEAR(camera.GetRelRot().y, -0.3490658503988659, 1e-15);
+  EXPECT_EQ(camera.GetRelRot().z, 0);
+}
+
+TEST(View, MakesFourDrawsWithThePerspectiveFirst)
+{
+  const counting_memory::BalanceCheck balance;
+  struct Made
+  {
+    Long projection;
+    Long values[4]; // 1003, 1042, 1004, 1043
+  };
+  constexpr Made kMade[] = {{0, {0, 0, 0, 0}}, {6, {6, 1, 6, 1}}, {3, {6, 1, 6, 1}}, {4, {6, 1, 6, 1}}};
+  ViewPanel panel;
+  for (Long index : {7, 3, 4, 2, 1, 0, -1, -100}) {
+    const BaseDraw* draw = panel.GetBaseDraw(index);
+    EXPECT_EQ(draw, DrawAt(panel, std::clamp(index, Long{0}, Long{3}))) << index;
+  }
+  ASSERT_EQ(panel.GetDraws().GetCount(), 4);
+  for (Long index = 0; index < 4; ++index) {
+    SCOPED_TRACE(index);
+    BaseDraw* draw = panel.GetBaseDraw(index);
+    const BaseContainer& camera = draw->GetEditorCamera()->GetDataInstance();
+    EXPECT_EQ(camera.GetLong(1001), kMade[index].projection);
+    EXPECT_EQ(camera.GetReal(1000), 1.0);
+    EXPECT_EQ(camera.GetReal(500), 36.0);
+    EXPECT_EQ(camera.GetReal(1118) + camera.GetReal(1119), 0.0);
+    const Long ids[] = {1003, 1042, 1004, 1043};
+    for (int i = 0; i < 4; ++i) {
+      EXPECT_EQ(draw->GetDataInstance().GetIndexId(53 + i), ids[i]);
+      EXPECT_EQ(draw->GetDataInstance().GetLong(ids[i], -1), kMade[index].values[i]);
+    }
+  }
+  // A panel that has some gets four before them; all or none when memory is short.
+  ViewPanel some;
+  auto* own = NewObj<BaseDraw>();
+  some.GetDraws().InsertLast(own);
+  BaseDraw* made = nullptr;
+  for (LLong count = 0; !made; count += 7) {
+    ASSERT_LT(count, 10000);
+    counting_memory::FailAfter(count);
+    made = some.GetBaseDraw(0);
+    counting_memory::FailNever();
+    EXPECT_EQ(some.GetDraws().GetCount(), made ? 5 : 1) << count;
+  }
+  EXPECT_NE(made, own);
+  EXPECT_EQ(DrawAt(some, 4), own);
+}
+
+TEST(View, WritesADrawByteForByte)
+{
+  BaseDraw draw;
+  draw.GetEditorCamera()->GetDataInstance().Flush();
+  draw.GetEditorCamera()->GetDataInstance().SetReal(500, 24);
+  draw.GetEditorCamera()->SetRelPos(Vector(1, 2, 3));
+  draw.GetEditorCamera()->SetRelScale(Vector(4, 5, 6));
+  draw.GetEditorCamera()->SetRelRot(Vector(0.5, 0.25, 2));
+  const Bytes expected = FromHex(
+      "01 0001AEE1 00000002  82 00000000"
+      "01 00000084 00000001 0F FFFFFFFF 0F 000001F4 0F 00000013 13 4038000000000000 02"
+      "17 3FF0000000000000 4000000000000000 4008000000000000  17 4010000000000000 4014000000000000 4018000000000000"
+      "17 3FE0000000000000 3FD0000000000000 4000000000000000"
+      "80 0000000E 616C69617332 0000000000000000  80 0000000E 616C69617332 0000000000000000  02");
+  EXPECT_EQ(LastBytes(draw, expected.size()), ToHex(expected));
+  // Before it stand the chunks of a node and nothing else.
+  const std::string node =
+      "01 0001ADF5 00000002  0F 00000004  0F 00000000 0F 00000000 0F 00000000 0F 00000000  0C 00  02";
+  EXPECT_EQ(LastBytes(draw, FromHex(node).size() + expected.size()), ToHex(FromHex(node)) + " " + ToHex(expected));
+}
+
+TEST(View, ReadsADrawOfEveryLevel)
+{
+  for (Long level = 0; level <= 4; ++level) {
+    SCOPED_TRACE(level);
+    BaseDraw draw;
+    ByteWriter w;
+    w.Append(DrawChunk(level)).Real(5).Start(9, 9).String(u"later").End().End().Start(77, 0).End();
+    ASSERT_TRUE(ReadInto(draw, w.bytes));
+    const BaseObject& camera = *draw.GetEditorCamera();
+    EXPECT_EQ(camera.GetDataInstance().GetCount(), 1);
+    EXPECT_EQ(camera.GetDataInstance().GetReal(500), 24);
+    EXPECT_TRUE(camera.GetRelPos() == Vector(1, 2, 3));
+    EXPECT_TRUE(camera.GetRelScale() == Vector(4, 5, 6));
+    EXPECT_TRUE(camera.GetRelRot() == Vector(0.1, 0.2, 0.3));
+    EXPECT_EQ(draw.GetSceneCamera().GetLink(), nullptr);
+  }
+}
+
+TEST(View, WritesAndReadsAPanel)
+{
+  const counting_memory::BalanceCheck balance;
+  const std::string own = "01 0001AEE2 00000000  01 00000084 00000001 0F FFFFFFFF";
+  ViewPanel panel;
+  const std::string empty = "0C 00  02" + own + "02 02"; // no list
+  EXPECT_EQ(LastBytes(panel, FromHex(empty).size()), ToHex(FromHex(empty)));
+  panel.GetSettings().SetLong(5, 6);
+  panel.GetBaseDraw(0);
+  const std::string whole = ToHex(BytesOf(panel));
+  EXPECT_NE(whole.find(ToHex(FromHex("0C 00 02 01 0001AE2C 00000000 01 0001AE14 00000000 01 0001AEE1 00000000"))),
+            std::string::npos);
+  const std::string end = "02 02 02" + own + "0F 00000005 0F 0000000F 0F 00000006 02 02"; // draw, list, chunk
+  EXPECT_EQ(LastBytes(panel, FromHex(end).size()), ToHex(FromHex(end)));
+
+  ViewPanel again;
+  ASSERT_TRUE(ReadInto(again, BytesOf(panel)));
+  EXPECT_EQ(again.GetSettings().GetLong(5), 6);
+  ASSERT_EQ(again.GetDraws().GetCount(), 4);
+  EXPECT_EQ(DrawAt(again, 1)->GetEditorCamera()->GetDataInstance().GetLong(1001), 6);
+  // An empty chunk, one with more behind the list, and one with another value.
+  for (const auto& [body, draws, read] :
+       {std::tuple<ByteWriter, Long, bool>{ByteWriter(), 4, true},
+        {ByteWriter().Start(110100, 0).Start(110305, 0).End().Start(99, 0).End().End().Long(4), 1, true},
+        {ByteWriter().Start(98, 0).Long(1).End(), 1, true},
+        {ByteWriter().Long(1), 1, false}}) {
+    AssertionCounter quiet;
+    const Bytes chunk = ByteWriter().Start(110124, 0).Append(body.bytes).End().Start(7, 7).End().bytes;
+    EXPECT_EQ(ReadInto(again, chunk), read);
+    EXPECT_EQ(again.GetDraws().GetCount(), draws);
+  }
+  AssertionCounter silent;
+  MemoryReadFile memory(ByteWriter().Header().Long(1).bytes);
+  EXPECT_FALSE(again.ReadChunk(memory.file, 110124, 0));
+  EXPECT_EQ(memory.file.GetError(), -100);
+}
+
+TEST(View, LooksThroughTheSceneCameraThatWasSetLast)
+{
+  const DocumentPtr document = NewDocument();
+  BaseObject* first = AllocObject(kObjectCamera);
+  BaseObject* second = AllocObject(kObjectCamera);
+  BaseObject* light = AllocObject(kObjectLight);
+  first->SetName("One");
+  second->SetName("Two");
+  for (BaseObject* object : {first, second, light})
+    document->InsertObject(object);
+  EXPECT_FALSE(document->SetSceneCamera(nullptr));
+  EXPECT_FALSE(document->SetSceneCamera(light));
+  EXPECT_EQ(FirstPanel(*document), nullptr);
+  for (BaseObject* camera : {first, second}) {
+    EXPECT_TRUE(document->SetSceneCamera(camera));
+    ASSERT_NE(FirstPanel(*document), nullptr);
+    EXPECT_EQ(document->GetViewPanelRoot()->GetCount(), 1);
+    EXPECT_EQ(DrawAt(*FirstPanel(*document), 0)->GetSceneCamera().GetLink(), camera);
+  }
+  EXPECT_FALSE(document->SetSceneCamera(light));
+  EXPECT_EQ(DrawAt(*FirstPanel(*document), 0)->GetSceneCamera().GetLink(), second);
+  for (Long index = 1; index < 4; ++index)
+    EXPECT_EQ(DrawAt(*FirstPanel(*document), index)->GetSceneCamera().GetLink(), nullptr);
+
+  // Through a file, and as a copy.
+  const DocumentPtr loaded = LoadFromBytes(SaveToBytes(*document));
+  ASSERT_NE(loaded, nullptr);
+  auto* camera = static_cast<BaseList2D*>(DrawAt(*FirstPanel(*loaded), 0)->GetSceneCamera().GetLink());
+  ASSERT_NE(camera, nullptr);
+  EXPECT_EQ(camera->GetName(), String("Two"));
+  EXPECT_EQ(camera->GetDocument(), loaded.get());
+  auto* copy = static_cast<ViewPanel*>(FirstPanel(*document)->MakeClone(0, nullptr));
+  ASSERT_NE(copy, nullptr);
+  EXPECT_EQ(DrawAt(*copy, 0)->GetSceneCamera().GetLink(), second);
+  EXPECT_NE(DrawAt(*copy, 0)->GetEditorCamera(), DrawAt(*FirstPanel(*document), 0)->GetEditorCamera());
+  EXPECT_EQ(DrawAt(*copy, 2)->GetEditorCamera()->GetDataInstance().GetLong(1001), 3);
+  DeleteObj(copy);
+}
