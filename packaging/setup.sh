@@ -14,10 +14,11 @@ fail() {
   exit 2
 }
 
-# Only one process at a time installs and builds in this tree; the others wait here.
+# Only one process at a time installs and builds in this tree, or in a folder of it; the others wait here.
 lock_tree() {
-  mkdir -p "$top/build" || fail "cannot make $top/build"
-  exec 9>"$top/build/.lock"
+  local folder=${1-$top/build}
+  mkdir -p "$folder" || fail "cannot make $folder"
+  exec 9>"$folder/.lock"
   if ! flock --nonblock 9; then
     say "waiting for another build in this tree"
     flock 9
