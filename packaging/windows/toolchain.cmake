@@ -16,7 +16,8 @@ set(CMAKE_FIND_ROOT_PATH_MODE_PACKAGE ONLY)
 list(APPEND CMAKE_MODULE_PATH ${CMAKE_CURRENT_LIST_DIR}/cmake)
 
 # A plug-in must not ask for the compiler's libraries, and neither must the programs that try it.
-set(CMAKE_EXE_LINKER_FLAGS_INIT "-static")
+# Programs get the stack that they have on Linux, for files that nest as deep as the library follows them.
+set(CMAKE_EXE_LINKER_FLAGS_INIT "-static -Wl,--stack,8388608")
 set(CMAKE_MODULE_LINKER_FLAGS_INIT "-static")
 # The system's functions since Windows 10, which every After Effects in question needs.
 set(CMAKE_C_FLAGS_INIT "-D_WIN32_WINNT=0x0A00")

@@ -1,3 +1,5 @@
+#include <filesystem>
+
 #include <gtest/gtest.h>
 
 #include "export_fixture.h"
@@ -87,7 +89,8 @@ TEST(Planes, ShowTheirFootageThroughABitmapShader)
     ASSERT_NE(shader, nullptr) << c.file;
     EXPECT_EQ(shader, material->GetShaders()) << c.file;
     EXPECT_EQ(shader->GetType(), 5833) << c.file;
-    EXPECT_EQ(Text(shader->BitmapFilename().GetString()), std::string("/footage/clips/") + c.file);
+    EXPECT_EQ(Text(shader->BitmapFilename().GetString()),
+              std::filesystem::absolute("/footage/clips/").append(c.file).make_preferred().string());
     EXPECT_EQ(shader->GetDataInstance().GetLong(2001, -1), c.lastFrame) << c.file;
   }
 }

@@ -94,7 +94,8 @@ struct ItemCase
 void ExpectItem(const ItemCase& expected, const host::Item& item)
 {
   SCOPED_TRACE(expected.name);
-  const std::string path = *expected.path == '/' ? stage::kFolder.string() + expected.path : expected.path;
+  const std::string path =
+      *expected.path == '/' ? (stage::kFolder / (expected.path + 1)).make_preferred().string() : expected.path;
   EXPECT_EQ(expected.name, item.name);
   EXPECT_EQ(path, item.path);
   EXPECT_EQ(expected.width, item.width);

@@ -6,10 +6,13 @@
 #include <memory>
 #include <set>
 
-#include <fcntl.h>
 #include <gtest/gtest.h>
+
+#ifndef _WIN32
+#include <fcntl.h>
 #include <sys/stat.h>
 #include <unistd.h>
+#endif
 
 #include "support/assertion_counter.h"
 #include "support/byte_writer.h"
@@ -369,9 +372,9 @@ TEST_F(BaseFileTest, WhatCannotBeOpenedIsAnOpenFailure)
   } kCases[] = {
       {Filename(), kFileRead},
       {Filename((folder / "none/file").c_str()), kFileWrite},
-      {Filename(folder.Path().c_str()), kFileRead},
-      {Filename(folder.Path().c_str()), kFileWrite},
-      {Filename(folder.Path().c_str()), kFileReadWrite},
+      {Filename(folder.Path().string().c_str()), kFileRead},
+      {Filename(folder.Path().string().c_str()), kFileWrite},
+      {Filename(folder.Path().string().c_str()), kFileReadWrite},
       {Filename(withZero), kFileWrite},
       {noMemory, kFileRead},
       {readOnlyMemory, kFileWrite},
@@ -427,6 +430,7 @@ TEST_F(BaseFileTest, MisuseIsInvalidAndSomeOfItIsReported)
   }
 }
 
+#ifndef _WIN32 // no such device
 TEST_F(BaseFileTest, AFullDeviceFailsTheWriteThatMeetsIt)
 {
   const Bytes large(20000);
@@ -444,16 +448,19 @@ TEST_F(BaseFileTest, AFullDeviceFailsTheWriteThatMeetsIt)
   EXPECT_FALSE(file.Close());
   EXPECT_EQ(file.GetError(), FILEERROR_CLOSE) << "what the C library held";
 }
+#endif
 
 TEST_F(BaseFileTest, TargetsThatCannotBePositionedFailSo)
 {
+  BaseFile file;
+#ifndef _WIN32
   const std::string pipe = folder / "pipe";
   ASSERT_EQ(mkfifo(pipe.c_str(), 0600), 0);
   const int writer = open(pipe.c_str(), O_RDWR);
-  BaseFile file;
   EXPECT_FALSE(file.Open(pipe.c_str(), kFileRead));
   EXPECT_EQ(file.GetError(), FILEERROR_SEEK);
   close(writer);
+#endif
   for (Bool length : {false, true}) {
     ASSERT_TRUE(file.Open(NameOf("stream", Bytes(10)), kFileRead));
     stream->works = false;
@@ -510,6 +517,7 @@ TEST_F(BaseFileTest, AMemoryTargetGrowsByDoubledBlocksAndLosesThemWithAnError)
   EXPECT_EQ(name.GetMemory(), 0);
 }
 
+#ifndef _WIN32 // nobody else may write to an open file
 TEST_F(BaseFileTest, AFileThatChangesWhileItIsReadKeepsItsLength)
 {
   const Bytes bytes = RandomBytes(40000, 5);
@@ -532,6 +540,7 @@ TEST_F(BaseFileTest, AFileThatChangesWhileItIsReadKeepsItsLength)
   EXPECT_EQ(file.ReadBytes(got.data(), 40000, true), 100);
   EXPECT_EQ(file.GetLength(), 100);
 }
+#endif
 
 TEST_F(BaseFileTest, PositionsPastTwoGigabytesWork)
 {
@@ -548,6 +557,7 @@ TEST_F(BaseFileTest, PositionsPastTwoGigabytesWork)
   }
 }
 
+#ifndef _WIN32 // tests/windows has its system's
 TEST_F(BaseFileTest, PathsReachTheSystemAsUtf8)
 {
   const struct
@@ -575,11 +585,12 @@ TEST_F(BaseFileTest, PathsReachTheSystemAsUtf8)
   EXPECT_TRUE(BaseFile().Open((longPath + "/deep").c_str(), kFileWrite));
   EXPECT_TRUE(std::filesystem::exists(folder / "deep"));
 }
+#endif
 
 TEST_F(BaseFileTest, ExistenceTellsFilesFromDirectories)
 {
   const Filename file = NameOf("disk", {});
-  const Filename directory(folder.Path().c_str());
+  const Filename directory(folder.Path().string().c_str());
   EXPECT_TRUE(GeFExist(file) && GeFExist(directory, true));
   EXPECT_FALSE(GeFExist(file, true) || GeFExist(directory));
   EXPECT_FALSE(GeFExist((folder / "none").c_str()) || GeFExist((folder / "none").c_str(), true) ||

@@ -101,10 +101,12 @@ TEST(DateTime, GoesThroughTheCalendarOfTheMachine)
   ASSERT_TRUE(DateTimeToTime(date, seconds));
   ASSERT_TRUE(DateTimeFromTime(seconds, back));
   EXPECT_EQ(back, date);
+#ifndef _WIN32 // where the C library has no times before its epoch
   // The second before the epoch of the C library is a valid time, whatever the time zone.
   ASSERT_TRUE(DateTimeFromTime(-1, back));
   ASSERT_TRUE(DateTimeToTime(back, seconds));
   EXPECT_EQ(seconds, -1);
+#endif
 
   DateTime now;
   GetDateTimeNow(now);
