@@ -80,6 +80,7 @@ TEST(ReadWriteSpinLock, KeepsWritersApartFromOneAnotherAndFromReaders)
   Long second = 0;
   std::atomic<int> torn{0};
   std::vector<std::thread> threads;
+  threads.reserve(4);
   constexpr Long kRounds = 2000;
   for (int i = 0; i < 2; ++i) {
     threads.emplace_back([&] {
@@ -109,6 +110,7 @@ TEST(JointWeightTableThreads, ReadersSeeOnlyWholeStatesOfAWriter)
   std::atomic<bool> done{false};
   std::atomic<int> wrong{0};
   std::vector<std::thread> threads;
+  threads.reserve(4);
   for (int i = 0; i < 3; ++i) {
     threads.emplace_back([&, i] {
       while (!done) {
@@ -148,6 +150,7 @@ TEST(JointWeightTableThreads, CopiesInOppositeDirectionsEnd)
   for (JointWeightTable& table : tables)
     ASSERT_TRUE(table.WritePointWeight(5, 1.0));
   std::vector<std::thread> threads;
+  threads.reserve(4);
   for (int i = 0; i < 2; ++i) {
     threads.emplace_back([&, i] {
       for (int round = 0; round < 500; ++round)

@@ -218,9 +218,13 @@ TEST(JointWeightTable, ReadsPresentAndOldFilesAndKeepsWhatItDoesNotUse)
     EXPECT_EQ(Written(copy), ToHex(FromHex(present)));
   }
   // The size of the values is twice their count, and runs and lists are as long as they say.
+  const std::string start = head + "80 0000000C" + runs + kEmptyList;
   for (const char* bad : {"0F 00000002 80 00000005 FFFF 0001 00", "0F 00000003 80 00000004 FFFF 0001"}) {
+    Bytes bytes = FromHex(start);
+    const Bytes values = FromHex(bad);
+    bytes.insert(bytes.end(), values.begin(), values.end());
     JointWeightTable table;
-    EXPECT_EQ(ReadTable(table, FromHex(head + "80 0000000C" + runs + kEmptyList + bad), 11599), -100);
+    EXPECT_EQ(ReadTable(table, bytes, 11599), -100);
   }
 }
 
