@@ -40,7 +40,7 @@ std::string WithSuffix(const std::string& path)
   _torvane_::Filename output = ToFilename(path);
   if (!output.CheckSuffix(kSuffix))
     output.SetSuffix(kSuffix);
-  return ToUtf8(output.GetString());
+  return (std::filesystem::path(path).parent_path() / ToUtf8(output.GetFileString())).string(); // as it was given
 }
 
 // What must hold before the exporter is asked, since it answers all of it with a number.
