@@ -25,5 +25,5 @@ set(CMAKE_C_FLAGS_INIT "-D_WIN32_WINNT=0x0A00")
 # for overruns; the native builds, which look at the same code, keep the warning.
 set(CMAKE_CXX_FLAGS_INIT "-D_WIN32_WINNT=0x0A00 -Wno-stringop-overflow")
 # Nobody debugs these files here, and debug information takes half of the time.
-set(CMAKE_C_FLAGS_RELEASE_INIT "-O2")
-set(CMAKE_CXX_FLAGS_RELEASE_INIT "-O2")
+set(CMAKE_C_FLAGS_RELEASE "-O2 -DNDEBUG" CACHE STRING "Flags of the release build")
+set(CMAKE_CXX_FLAGS_RELEASE "-O2 -DNDEBUG" CACHE STRING "Flags of the release build")

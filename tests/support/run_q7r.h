@@ -19,6 +19,13 @@ struct RunResult
 
 inline std::string Quoted(const std::string& argument) { return "\"" + argument + "\""; }
 
+// What a program has printed; line ends are read as the system writes them.
+inline std::string ReadOutput(const std::string& path)
+{
+  std::ifstream file(path);
+  return {std::istreambuf_iterator<char>(file), std::istreambuf_iterator<char>()};
+}
+
 // `arguments` as they stand on a command line, with the paths Quoted. Standard input is empty.
 inline RunResult RunQ7r(const std::string& arguments)
 {
@@ -34,7 +41,5 @@ inline RunResult RunQ7r(const std::string& arguments)
   const int raw = std::system(command.c_str());
   const int status = WIFEXITED(raw) ? WEXITSTATUS(raw) : -1;
 #endif
-  const std::vector<std::uint8_t> outBytes = ReadWholeFile(out);
-  const std::vector<std::uint8_t> errBytes = ReadWholeFile(err);
-  return {status, {outBytes.begin(), outBytes.end()}, {errBytes.begin(), errBytes.end()}};
+  return {status, ReadOutput(out), ReadOutput(err)};
 }
