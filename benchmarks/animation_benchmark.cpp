@@ -97,11 +97,6 @@ Seconds Load(benchmark::State& state, const ScratchFile& scratch)
   return time;
 }
 
-void SetMemory(benchmark::State& state, double keys, std::int64_t before)
-{
-  state.counters["bytes/key"] = static_cast<double>(PeakMemory() - before) / keys;
-}
-
 void WriteAnimatedScene(benchmark::State& state)
 {
   const ScratchFile scratch;
@@ -112,7 +107,7 @@ void WriteAnimatedScene(benchmark::State& state)
   const DocumentPtr document = MakeAnimatedScene(objects);
   RunBest(state, [&] { return Save(state, *document, scratch); });
   SetRate(state, keys, ValueWriteLimit());
-  SetMemory(state, keys, before);
+  state.counters["bytes/key"] = static_cast<double>(PeakMemory() - before) / keys;
 }
 
 void ReadAnimatedScene(benchmark::State& state)
@@ -121,11 +116,8 @@ void ReadAnimatedScene(benchmark::State& state)
   const auto objects = static_cast<Long>(state.range(0));
   const double keys = static_cast<double>(objects) * kTracksEach * kKeysEach;
   Save(state, *MakeAnimatedScene(objects), scratch);
-  const std::int64_t before = PresentMemory();
-  ResetPeakMemory();
   RunBest(state, [&] { return Load(state, scratch); });
   SetRate(state, keys, ValueReadLimit());
-  SetMemory(state, keys, before);
 }
 
 BENCHMARK(WriteAnimatedScene)->Arg(300)->Arg(600)->Apply(OneBest);
