@@ -3,6 +3,7 @@
 #include "geometry_details.h"
 #include "scene_file.h"
 #include "torvane/base_tag.h"
+#include "torvane/texture_tag.h"
 
 namespace q7r
 {
@@ -11,9 +12,14 @@ using namespace _torvane_;
 
 std::string TagWords(BaseTag& tag)
 {
-  if (tag.GetType() != kTagTarget)
+  Long link = 0;
+  if (tag.GetType() == kTagTarget)
+    link = kTargetLink;
+  else if (tag.GetType() == kTagTexture)
+    link = kTextureMaterial;
+  else
     return TagCountWords(tag);
-  const BaseList2D* target = tag.GetDataInstance().GetLink(kTargetLink);
+  const BaseList2D* target = tag.GetDataInstance().GetLink(link);
   return target ? "-> \"" + ToUtf8(target->GetName()) + "\"" : std::string();
 }
 
