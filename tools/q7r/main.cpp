@@ -16,6 +16,7 @@ Results go to standard output, messages to standard error. Exit status: 0 done;
 int Run(int argc, char** argv)
 {
   CLI::App program(kDescription, "q7r");
+  program.allow_windows_style_options(false); // "/..." is a path everywhere
   program.set_version_flag("--version", "q7r 1.0.0 (scene file version 13000)");
   program.require_subcommand(1);
   int status = q7r::kDone;
