@@ -97,8 +97,11 @@ enum IESResult : Long
 };
 
 // Reads a photometric file. On success `light` is deleted and replaced by a new distribution that the caller owns;
-// on failure it stays as it was.
-Long LoadIESFile(IESLight*& light, const Filename& name);
+// on failure it stays as it was. The table is multiplied by the three factors before it, as the application does: of
+// these the last one is, in files of today, the power that the luminaire draws in watts, and no factor of its light.
+// Who wants the light alone takes it out again: `watts`, if it isn't null, gets it on success (1 when the file has no
+// numbers).
+Long LoadIESFile(IESLight*& light, const Filename& name, Real* watts = nullptr);
 
 // A plain sentence for a result, without a full stop.
 const char* GetIESResultText(Long result);

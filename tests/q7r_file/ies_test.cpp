@@ -242,11 +242,11 @@ TEST(IESFile, RefusesCountsOutOfRangeAndTablesThatEndEarly)
 
 TEST(IESFile, MultipliesTheTableByItsFactors)
 {
-  const IESPtr light = LoadText(kHead + "3 1000 2 2 2 1 2 0 0 0  1.5 7 60  0 90  0 90  10 20 30 -5");
+  const IESPtr light = LoadText(kHead + "3 1000 2 2 2 1 2 0 0 0  1.5 7 4  0 90  0 90  10 20 30 -5");
   ASSERT_NE(light, nullptr);
-  EXPECT_EQ(Values(light->candela), (std::vector<double>{30, 60, 90, -15}));
+  EXPECT_EQ(Values(light->candela), (std::vector<double>{120, 240, 360, -60}));
   EXPECT_EQ(Values(light->verticalAngles), (std::vector<double>{0, 90}));
-  EXPECT_EQ(light->maxCandela, 90);
+  EXPECT_EQ(light->maxCandela, 360);
   // Lines alone are a file without a table.
   const IESPtr none = LoadText("IESNA91\n[LAMP] only");
   ASSERT_NE(none, nullptr);

@@ -20,7 +20,8 @@ them) and tells its version, texts, luminous opening, angles, largest intensity 
 output.
 
 Use it to see whether a light can carry the file, and whether the output is the one that
-the maker tells. With --json the table of intensities is there too.
+the maker tells. A light in a scene has all intensities multiplied by the power in watts
+as well; here they are without it. With --json the table of intensities is there too.
 
 Example: q7r ies downlight.ies)";
 
@@ -36,13 +37,26 @@ struct IESDeleter
 };
 using IESPtr = std::unique_ptr<IESLight, IESDeleter>;
 
+// Leaves the light alone in a table that was multiplied by the power, too.
+void TakeOut(Real watts, IESLight& light)
+{
+  if (watts == 0) // then nothing is left of the table
+    return;
+  for (Real& candela : light.candela)
+    candela /= watts;
+  light.Normalise();
+}
+
 IESPtr LoadIES(const std::string& path)
 {
-  IESLight* light = nullptr;
-  const Long result = LoadIESFile(light, ToFilename(path));
+  IESLight* loaded = nullptr;
+  Real watts = 1;
+  const Long result = LoadIESFile(loaded, ToFilename(path), &watts);
   if (result != kIESLoaded)
     throw Failure(path + ": " + GetIESResultText(result));
-  return IESPtr(light);
+  IESPtr light(loaded);
+  TakeOut(watts, *light);
+  return light;
 }
 
 Json Numbers(const Real* numbers, Long count)

@@ -172,6 +172,7 @@ class IESParser
 
   // Reads all of the file, or up to the end of the numbers.
   Bool Parse();
+  Real GetWatts() const { return watts_; }
 
  private:
   Bool NextByte(char& byte);
@@ -189,6 +190,7 @@ class IESParser
 
   BaseFile& file_;
   IESLight& light_;
+  Real watts_ = 1.0; // the last factor of the table
   char buffer_[kBufferSize];
   LLong bufferCount_ = 0;
   LLong bufferPosition_ = 0;
@@ -323,7 +325,6 @@ Bool IESParser::ParseNumbers()
   Real h = 0.0;
   Real ballast = 0.0;
   Real future = 0.0;
-  Real watts = 0.0; // what the luminaire draws: no factor of its light
   if (light_.tiltMode == kIESTiltInclude && !ParseIncludedTilt())
     return false;
   if (!TakeInteger(lampCount) || !TakeNumbers({&lampLumens, &multiplier}) || !TakeInteger(verticalCount) ||
@@ -332,7 +333,7 @@ Bool IESParser::ParseNumbers()
   SetShape(light_, x, l, h);
   if (unit == kUnitFeet)
     light_.size *= kFoot;
-  if (!TakeNumbers({&ballast, &future, &watts}))
+  if (!TakeNumbers({&ballast, &future, &watts_}))
     return false;
   for (Long count : {verticalCount, horizontalCount}) {
     if (count < 0 || count > kMaxIESAngles)
@@ -342,7 +343,7 @@ Bool IESParser::ParseNumbers()
       !TakeTable(light_.candela, verticalCount * horizontalCount))
     return false;
   for (Real& value : light_.candela) {
-    value *= multiplier * ballast;
+    value *= multiplier * ballast * watts_;
     if (!std::isfinite(value))
       return false;
   }
@@ -440,7 +441,7 @@ constexpr ResultText kResultTexts[] = {
 
 } // namespace
 
-Long LoadIESFile(IESLight*& light, const Filename& name)
+Long LoadIESFile(IESLight*& light, const Filename& name, Real* watts)
 {
   BaseFile file;
   if (!file.Open(name, kFileRead))
@@ -453,9 +454,12 @@ Long LoadIESFile(IESLight*& light, const Filename& name)
   Long result = kIESUnreadable;
   if (file.GetError() == FILEERROR_NONE && !HoldsMark(head, count))
     result = kIESNotPhotometric;
-  else if (file.Seek(0) && IESParser(file, *loaded).Parse())
+  IESParser parser(file, *loaded);
+  if (result == kIESUnreadable && file.Seek(0) && parser.Parse())
     result = kIESLoaded;
   if (result == kIESLoaded) {
+    if (watts)
+      *watts = parser.GetWatts();
     DeleteObj(light);
     light = loaded;
   } else {
