@@ -19,7 +19,7 @@ using namespace _torvane_;
 constexpr double kTurn = 3.141592653589793 / 180.0;
 
 // What stands behind the counts of a table of two vertical angles and one horizontal angle.
-const std::string kOpening = " 1 2 0 0 0  1 1 50 ";
+const std::string kOpening = " 1 2 0 0 0  1 1 1 ";
 const std::string kTable = "0 90  0  100 50\n";
 const std::string kNumbers = "1 -1 1 2 1" + kOpening + kTable;
 const std::string kHead = "IESNA91\nTILT=NONE\n";
@@ -117,7 +117,7 @@ TEST(IESFile, ReadsNumbersInEveryLegalFormAndNoOther)
   // A product that no number holds.
   ExpectUnreadable(kHead + "1 -1 1e300 2 1" + kOpening + "0 90 0 1e300 50");
   // Integers lose what stands behind the point.
-  EXPECT_EQ(FirstValue(kHead + "1.9 -1 1 2.9 1.2 1.5 2.7 0 0 0  1 1 50 " + kTable), 100);
+  EXPECT_EQ(FirstValue(kHead + "1.9 -1 1 2.9 1.2 1.5 2.7 0 0 0  1 1 1 " + kTable), 100);
 }
 
 TEST(IESFile, TakesNumbersAcrossLinesAndSeparators)
@@ -125,7 +125,7 @@ TEST(IESFile, TakesNumbersAcrossLinesAndSeparators)
   for (const char* separator : {" ", "\t", ",", "=", ", ", " \t ", "\n", "\r\n", "\n\n", "\r\n \r\n", ",\n", "= "}) {
     std::string text = kHead;
     for (const char* number :
-         {"1", "-1", "1", "2", "1", "1", "2", "0", "0", "0", "1", "1", "50", "0", "90", "0", "100"})
+         {"1", "-1", "1", "2", "1", "1", "2", "0", "0", "0", "1", "1", "1", "0", "90", "0", "100"})
       text += std::string(number) + separator;
     EXPECT_EQ(FirstValue(text + "50"), 100) << testing::PrintToString(separator);
   }

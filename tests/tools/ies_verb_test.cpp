@@ -142,7 +142,7 @@ TEST(Tree, ShowsLightsCamerasAndViews)
   EXPECT_EQ(text.status, 0) << text.err;
   ExpectParts(text.out, {"perspective, focal length 36 mm, aperture 36 mm, field of view 53.1301 degrees, focus 2000",
                          "spot, color (1, 1, 1), intensity 100 %, shadow 40 %, inner 0 degrees, outer 30 degrees",
-                         "measured, color (1, 1, 1), intensity 100 %, distribution \"Disc \"A\"\", output 2513.27 lm",
+                         "measured, color (1, 1, 1), intensity 100 %, distribution \"Disc \"A\"\", output 125664 lm",
                          "    perspective through \"Eye\"\n    projection 6\n    projection 3\n    parallel\n"});
   const Json json = Parsed(RunQ7r("tree --json " + Quoted(path)));
   const Json& objects = json["objects"];
