@@ -4,7 +4,7 @@
 #include <memory>
 
 #include "exporter/walk/keyframes.h"
-#include "limits.h"
+#include "machine_limits.h"
 #include "measure.h"
 #include "torvane/base_document.h"
 #include "torvane/base_object.h"

@@ -48,6 +48,18 @@ std::string Composition(std::int64_t layers, std::int64_t frames)
   return R"({"w":1920,"h":1080,"fr":25,"ip":0,"op":)" + std::to_string(frames) + R"(,"layers":[)" + list + "]}";
 }
 
+// Solids that stand still, each in a place of its own.
+std::string StaticComposition(std::int64_t layers)
+{
+  std::string list;
+  for (std::int64_t i = 0; i < layers; ++i) {
+    const std::string n = std::to_string(i + 1);
+    list += (i ? "," : "") + std::string(R"({"ty":1,"ddd":1,"nm":"Solid )") + n +
+            R"(","sw":100,"sh":50,"sc":"#804020","ks":{"p":{"k":[)" + n + R"(,20,30]},"rz":{"k":)" + n + "}}}";
+  }
+  return R"({"w":1920,"h":1080,"fr":25,"ip":0,"op":250,"layers":[)" + list + "]}";
+}
+
 // Reads what an export of the composition reads for its samples, and nothing else.
 void ReadAllSamples(host::StandaloneHost& host, A_long layers, A_long frames)
 {
@@ -104,6 +116,28 @@ void ExportAnimatedLayers(benchmark::State& state)
   state.counters["peak MB"] = static_cast<double>(PeakMemory() - before) * 1e-6;
 }
 
+// From the composition to the closed file, a layer, its material and its tag at a time.
+void ExportStaticLayers(benchmark::State& state)
+{
+  const std::int64_t layers = state.range(0);
+  const ScratchFile scratch;
+  host::StandaloneHost host(host::LoadCompositionText(StaticComposition(layers), "benchmark.json", "/"));
+  host.Start(EntryPointFunc);
+  ResetPeakMemory();
+  const std::int64_t before = PresentMemory();
+  RunBest(state, [&] {
+    const std::unique_ptr<BaseDocument, FreeDocument> document(BaseDocument::Alloc());
+    return TimeOf([&] {
+      if (!exporter::ExportComposition(document.get()) ||
+          !SaveDocument(document.get(), _torvane_::Filename(scratch.Path().c_str()), 0))
+        state.SkipWithError("the export failed");
+    });
+  });
+  SetRate(state, static_cast<double>(layers));
+  state.counters["peak MB"] = static_cast<double>(PeakMemory() - before) * 1e-6;
+}
+
+BENCHMARK(ExportStaticLayers)->Arg(10'000)->Arg(20'000)->Apply(OneBest);
 BENCHMARK(ExportAnimatedLayers)
     ->Args({100, 1000})
     ->Args({200, 1000})

@@ -2,7 +2,7 @@
 #include <cmath>
 #include <memory>
 
-#include "limits.h"
+#include "machine_limits.h"
 #include "measure.h"
 #include "torvane/base_document.h"
 #include "torvane/point_object.h"

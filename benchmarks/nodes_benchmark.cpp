@@ -4,7 +4,7 @@
 #include <memory>
 #include <vector>
 
-#include "limits.h"
+#include "machine_limits.h"
 #include "measure.h"
 #include "torvane/base_document.h"
 #include "torvane/base_object.h"

@@ -1,7 +1,7 @@
 // The tagged stream itself: single values, and whole arrays.
 #include <vector>
 
-#include "limits.h"
+#include "machine_limits.h"
 #include "measure.h"
 #include "torvane/filename.h"
 #include "torvane/hyper_file.h"

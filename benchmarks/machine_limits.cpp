@@ -1,4 +1,4 @@
-#include "limits.h"
+#include "machine_limits.h"
 
 #include <bit>
 #include <cstdio>
