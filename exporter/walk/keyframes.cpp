@@ -156,7 +156,7 @@ void SampledTrack::Finish()
 void SampledTrack::Insert()
 {
   if (track_ && object_->InsertTrackLast(track_.get()))
-    track_.release();
+    static_cast<void>(track_.release()); // the object owns it now
 }
 
 VectorTracks::VectorTracks(BaseObject* object, Long parameter, const char* const (&names)[3])

@@ -35,7 +35,7 @@ class Walk
  public:
   Walk(unsigned seed, const Faults& faults) : random_(seed), faults_(faults), document_(BaseDocument::Alloc())
   {
-    compositions_.resize(static_cast<std::size_t>(3 + Roll(4)));
+    compositions_.resize(3 + static_cast<std::size_t>(Roll(4)));
     Long id = 1;
     for (std::size_t c = 0; c < compositions_.size(); ++c) {
       const int count = 1 + Roll(5);

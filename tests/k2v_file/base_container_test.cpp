@@ -365,11 +365,11 @@ TEST(ParameterPathTest, KeepsManyLevelsThroughCopiesMovesAndFailures)
   ParameterPath path;
   for (Long i = 1; i <= 20; ++i)
     EXPECT_TRUE(path.Append(i == 10 ? path[0] : ParameterLevel{i, i, i}));
-  ParameterPath copy(path), short_(3);
+  ParameterPath copy(path), shorter(3);
   EXPECT_TRUE(copy.IsExactly(path));
-  short_ = copy;
+  shorter = copy;
   ParameterPath moved(std::move(copy));
-  EXPECT_TRUE(moved.IsExactly(short_));
+  EXPECT_TRUE(moved.IsExactly(shorter));
   EXPECT_EQ(moved.WithoutFirst(18)[0].id, 19);
   EXPECT_EQ(moved[9].id, 1);
   counting_memory::FailAfter(0);

@@ -54,7 +54,7 @@ Bytes MakeJpeg(int width, int height, const MakeOptions& options)
   }
   jpeg_finish_compress(&jpeg);
   jpeg_destroy_compress(&jpeg);
-  const Bytes bytes(data, data + size);
+  Bytes bytes(data, data + size);
   std::free(data);
   return bytes;
 }

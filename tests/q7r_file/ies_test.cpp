@@ -124,8 +124,7 @@ TEST(IESFile, TakesNumbersAcrossLinesAndSeparators)
 {
   for (const char* separator : {" ", "\t", ",", "=", ", ", " \t ", "\n", "\r\n", "\n\n", "\r\n \r\n", ",\n", "= "}) {
     std::string text = kHead;
-    for (const char* number :
-         {"1", "-1", "1", "2", "1", "1", "2", "0", "0", "0", "1", "1", "1", "0", "90", "0", "100"})
+    for (const char* number : {"1", "-1", "1", "2", "1", "1", "2", "0", "0", "0", "1", "1", "1", "0", "90", "0", "100"})
       text += std::string(number) + separator;
     EXPECT_EQ(FirstValue(text + "50"), 100) << testing::PrintToString(separator);
   }
