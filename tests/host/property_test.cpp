@@ -192,13 +192,15 @@ TEST(PropertyValue, IsFoundInAnyOrderOfFrames)
     keys += (i ? "," : "") + std::string(R"({"t": )") + std::to_string(i * 2) + R"(, "s": [)" +
             std::to_string(i % 2 ? 10 : i) + "]}";
   const Stage stage = WithPosition(R"({"k": [)" + keys + "]}");
-  for (int frame : {0, 1, 2, 397, 398, 5, 4, 3, 200, 7, 399})
+  for (int frame : {0, 1, 2, 397, 398, 5, 4, 3, 200, 7, 399}) {
+    const int half = frame / 2;
     EXPECT_EQ(frame > 398 ? 10
-              : frame % 2 ? ((frame / 2) % 2 ? (10 + frame / 2 + 1) / 2.0 : (frame / 2 + 10) / 2.0)
+              : frame % 2 ? (half % 2 ? (10 + half + 1) / 2.0 : (half + 10) / 2.0)
               : frame % 4 ? 10
-                          : frame / 2,
+                          : half,
               PositionAt(stage, frame)[0])
         << frame;
+  }
 }
 
 TEST(PropertyState, CountsKeysAndTellsWhatVaries)

@@ -63,7 +63,8 @@ struct Form
 
 std::vector<Form> Forms()
 {
-  const std::string identity = "00 00 00 00 00 00 00 00 ", zero = identity, one = "3F F0 00 00 00 00 00 00 ";
+  const std::string zero = "00 00 00 00 00 00 00 00 ";
+  const std::string one = "3F F0 00 00 00 00 00 00 ";
   std::string matrix =
       "0F 00 00 00 19 19 " + zero + zero + zero + one + zero + zero + zero + one + zero + zero + zero + one;
   matrix.pop_back();

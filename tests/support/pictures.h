@@ -126,7 +126,6 @@ inline PlainPicture PictureFrom(const std::string& command)
   PlainPicture picture;
   char kind = 0;
   int most = 0;
-  // NOLINTNEXTLINE(cert-err34-c): a number that is no number fails the count
   if (!pipe || std::fscanf(pipe.get(), "P%c %d %d %d", &kind, &picture.width, &picture.height, &most) != 4 ||
       std::fgetc(pipe.get()) == EOF || most != 255)
     return {};
