@@ -161,7 +161,8 @@ void GradientData::StoreCache()
 void GradientData::MirrorGradient()
 {
   const BaseContainer* knots = settings_.GetContainerInstance(kGradientKnots);
-  if (!knots || knots->GetCount() < 2 || !PrepareGradient())
+  // Entries may be something else than knots.
+  if (!knots || knots->GetCount() < 2 || !PrepareGradient() || knotCount_ < 1)
     return;
   for (Long low = 0, high = knotCount_ - 1; low < high; ++low, --high)
     SwapKnots(knotCache_[low], knotCache_[high]);

@@ -305,6 +305,15 @@ TEST(Gradient, MirrorsItsKnotsAndTheirBiases)
   for (int i = 0; i < 4; ++i)
     EXPECT_NEAR(after[i], before[i], 1e-12);
 
+  // A file may have other things among the knots, and nothing else.
+  GradientData strange;
+  BaseContainer numbers;
+  numbers.SetLong(1, 1);
+  numbers.SetLong(2, 2);
+  strange.GetSettings().SetContainer(kGradientKnots, numbers);
+  strange.MirrorGradient();
+  EXPECT_EQ(strange.GetSettings().GetContainerInstance(kGradientKnots)->GetLong(2), 2);
+
   GradientData single;
   AddKnots(single, {{0.25, 0.25, kWhite}});
   single.MirrorGradient();

@@ -232,8 +232,8 @@ TEST(SortSearchArray, KeepsElementsInTheOrderOfTheirKeys)
 class Node : public GeTempPublicNode2D<Node>
 {
  public:
-  explicit Node(int number) : number_(number) {}
-  int number_;
+  explicit Node(int value) : number(value) {}
+  int number;
 };
 
 std::vector<int> Numbers(const GeTempPublicList2D<Node>& list)
@@ -241,9 +241,9 @@ std::vector<int> Numbers(const GeTempPublicList2D<Node>& list)
   std::vector<int> forward;
   std::vector<int> backward;
   for (const Node* node = list.GetFirst(); node; node = node->GetNext())
-    forward.push_back(node->number_);
+    forward.push_back(node->number);
   for (const Node* node = list.GetLast(); node; node = node->GetPrev())
-    backward.insert(backward.begin(), node->number_);
+    backward.insert(backward.begin(), node->number);
   EXPECT_EQ(forward, backward);
   EXPECT_EQ(static_cast<std::size_t>(list.GetCount()), forward.size());
   return forward;
