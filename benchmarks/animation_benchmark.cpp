@@ -6,9 +6,9 @@
 #include "exporter/walk/keyframes.h"
 #include "machine_limits.h"
 #include "measure.h"
-#include "torvane/base_document.h"
-#include "torvane/base_object.h"
-#include "torvane/ctrack.h"
+#include "torvane/animation/ctrack.h"
+#include "torvane/document/base_document.h"
+#include "torvane/objects/base_object.h"
 
 namespace
 {

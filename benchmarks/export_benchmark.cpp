@@ -7,7 +7,7 @@
 #include "exporter/walk/composition.h"
 #include "host/standalone_host.h"
 #include "measure.h"
-#include "torvane/base_document.h"
+#include "torvane/document/base_document.h"
 
 namespace
 {

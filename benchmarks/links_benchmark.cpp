@@ -6,7 +6,7 @@
 #include <vector>
 
 #include "measure.h"
-#include "torvane/alias.h"
+#include "torvane/links/alias.h"
 
 namespace
 {

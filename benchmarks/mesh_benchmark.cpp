@@ -4,9 +4,9 @@
 
 #include "machine_limits.h"
 #include "measure.h"
-#include "torvane/base_document.h"
-#include "torvane/point_object.h"
-#include "torvane/value_tags.h"
+#include "torvane/document/base_document.h"
+#include "torvane/objects/point_object.h"
+#include "torvane/tags/value_tags.h"
 
 namespace
 {

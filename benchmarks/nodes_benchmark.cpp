@@ -6,10 +6,10 @@
 
 #include "machine_limits.h"
 #include "measure.h"
-#include "torvane/base_document.h"
-#include "torvane/base_object.h"
-#include "torvane/material.h"
-#include "torvane/texture_tag.h"
+#include "torvane/document/base_document.h"
+#include "torvane/materials/material.h"
+#include "torvane/objects/base_object.h"
+#include "torvane/tags/texture_tag.h"
 
 namespace
 {

@@ -3,8 +3,8 @@
 
 #include "machine_limits.h"
 #include "measure.h"
-#include "torvane/filename.h"
-#include "torvane/hyper_file.h"
+#include "torvane/stream/hyper_file.h"
+#include "torvane/text/filename.h"
 
 namespace
 {

@@ -18,11 +18,3 @@ if(TORVANE_SANITIZE)
     -fsanitize=${TORVANE_SANITIZE} -fno-sanitize=vptr -fno-sanitize-recover=all -fno-omit-frame-pointer)
   target_link_options(torvane_options INTERFACE -fsanitize=${TORVANE_SANITIZE})
 endif()
-
-# While a folder has no sources its target is made of this one file, so that the tree configures from its first day.
-function(torvane_placeholder variable text)
-  if(NOT ${variable})
-    file(CONFIGURE OUTPUT ${CMAKE_CURRENT_BINARY_DIR}/placeholder.cpp CONTENT "${text}\n")
-    set(${variable} ${CMAKE_CURRENT_BINARY_DIR}/placeholder.cpp PARENT_SCOPE)
-  endif()
-endfunction()

@@ -6,8 +6,8 @@
 
 #include "exporter/walk/composition.h"
 #include "host/standalone_host.h"
-#include "torvane/assertion.h"
-#include "torvane/base_document.h"
+#include "torvane/document/base_document.h"
+#include "torvane/memory/assertion.h"
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size)
 {

@@ -2,10 +2,10 @@
 #include <cstddef>
 #include <cstdint>
 
-#include "torvane/assertion.h"
-#include "torvane/filename.h"
-#include "torvane/ies_light.h"
-#include "torvane/memory.h"
+#include "torvane/memory/assertion.h"
+#include "torvane/memory/memory.h"
+#include "torvane/objects/ies_light.h"
+#include "torvane/text/filename.h"
 
 using namespace _torvane_;
 

@@ -2,9 +2,9 @@
 #include <cstddef>
 #include <cstdint>
 
-#include "torvane/assertion.h"
-#include "torvane/filename.h"
-#include "torvane/paint_texture.h"
+#include "torvane/memory/assertion.h"
+#include "torvane/pictures/paint_texture.h"
+#include "torvane/text/filename.h"
 
 using namespace _torvane_;
 

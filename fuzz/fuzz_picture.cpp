@@ -2,9 +2,9 @@
 #include <cstddef>
 #include <cstdint>
 
-#include "torvane/assertion.h"
-#include "torvane/bitmap_filters.h"
-#include "torvane/filename.h"
+#include "torvane/memory/assertion.h"
+#include "torvane/pictures/bitmap_filters.h"
+#include "torvane/text/filename.h"
 
 using namespace _torvane_;
 

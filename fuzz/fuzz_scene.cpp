@@ -3,10 +3,10 @@
 #include <cstddef>
 #include <cstdint>
 
-#include "torvane/assertion.h"
-#include "torvane/base_document.h"
-#include "torvane/filename.h"
-#include "torvane/hyper_file.h"
+#include "torvane/document/base_document.h"
+#include "torvane/memory/assertion.h"
+#include "torvane/stream/hyper_file.h"
+#include "torvane/text/filename.h"
 
 using namespace _torvane_;
 

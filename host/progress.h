@@ -2,7 +2,7 @@
 // over and over from the start of the composition to the end of the work area.
 #pragma once
 
-#include "host/composition.h"
+#include "host/model/composition.h"
 
 #include <cstdint>
 #include <functional>

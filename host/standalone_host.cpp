@@ -1,6 +1,6 @@
 #include "host/standalone_host.h"
 
-#include "host/host_state.h"
+#include "host/suites/host_state.h"
 #include "host/text.h"
 
 #include <algorithm>

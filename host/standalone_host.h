@@ -3,7 +3,7 @@
 #pragma once
 
 #include "exporter/host_api/aegp_entry.h"
-#include "host/composition.h"
+#include "host/model/composition.h"
 
 #include <cstdint>
 #include <functional>

@@ -1,14 +1,14 @@
 // The classes that stand behind the library's nodes in this program. Each is its base with at most one field more.
 #pragma once
 
-#include "torvane/base_object.h"
-#include "torvane/camera_object_data.h"
-#include "torvane/layer_object.h"
-#include "torvane/light_object_data.h"
-#include "torvane/material.h"
-#include "torvane/point_object_data.h"
-#include "torvane/render_data.h"
-#include "torvane/root_list.h"
+#include "torvane/layers/layer_object.h"
+#include "torvane/materials/material.h"
+#include "torvane/nodes/root_list.h"
+#include "torvane/objects/base_object.h"
+#include "torvane/objects/camera_object_data.h"
+#include "torvane/objects/light_object_data.h"
+#include "torvane/objects/point_object_data.h"
+#include "torvane/render/render_data.h"
 
 namespace exporter
 {

@@ -1,9 +1,9 @@
 // What the library asks of its client, memory aside.
 #include "exporter/client/alien_nodes.h"
-#include "torvane/ge_string.h"
 #include "torvane/hooks.h"
-#include "torvane/point_object.h"
-#include "torvane/value_tags.h"
+#include "torvane/objects/point_object.h"
+#include "torvane/tags/value_tags.h"
+#include "torvane/text/ge_string.h"
 
 namespace exporter
 {

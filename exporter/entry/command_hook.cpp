@@ -6,8 +6,8 @@
 #include "exporter/entry/host_calls.h"
 #include "exporter/entry/plugin_state.h"
 #include "exporter/entry/scene_writer.h"
-#include "torvane/base_file.h"
-#include "torvane/filename.h"
+#include "torvane/bytes/base_file.h"
+#include "torvane/text/filename.h"
 
 namespace exporter
 {

@@ -4,7 +4,7 @@
 #include <type_traits>
 
 #include "exporter/entry/export_suites.h"
-#include "torvane/ge_string.h"
+#include "torvane/text/ge_string.h"
 
 namespace exporter
 {

@@ -3,8 +3,8 @@
 #include <memory>
 
 #include "exporter/walk/composition.h"
-#include "torvane/base_document.h"
-#include "torvane/hyper_file.h"
+#include "torvane/document/base_document.h"
+#include "torvane/stream/hyper_file.h"
 
 namespace exporter
 {

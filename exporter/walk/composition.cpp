@@ -6,7 +6,7 @@
 #include "exporter/walk/composition_settings.h"
 #include "exporter/walk/light.h"
 #include "exporter/walk/plane.h"
-#include "torvane/base_tag.h"
+#include "torvane/tags/base_tag.h"
 
 namespace exporter
 {

@@ -2,8 +2,8 @@
 
 #include <algorithm>
 
-#include "torvane/base_document.h"
-#include "torvane/render_data.h"
+#include "torvane/document/base_document.h"
+#include "torvane/render/render_data.h"
 
 namespace exporter
 {

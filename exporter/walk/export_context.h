@@ -3,8 +3,8 @@
 
 #include "exporter/entry/host_calls.h"
 #include "exporter/walk/layer_index.h"
-#include "torvane/base_document.h"
-#include "torvane/base_time.h"
+#include "torvane/document/base_document.h"
+#include "torvane/time/base_time.h"
 
 namespace exporter
 {

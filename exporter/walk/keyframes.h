@@ -7,7 +7,7 @@
 
 #include "exporter/walk/export_context.h"
 #include "exporter/walk/transform.h"
-#include "torvane/ctrack.h"
+#include "torvane/animation/ctrack.h"
 
 namespace exporter
 {

@@ -5,7 +5,7 @@
 #include <unordered_map>
 
 #include "exporter/host_api/aegp_types.h"
-#include "torvane/base_object.h"
+#include "torvane/objects/base_object.h"
 
 namespace exporter
 {

@@ -5,7 +5,7 @@
 #include "exporter/walk/layer_sample.h"
 #include "exporter/walk/scene_parameters.h"
 #include "exporter/walk/transform.h"
-#include "torvane/base_tag.h"
+#include "torvane/tags/base_tag.h"
 
 namespace exporter
 {

@@ -2,9 +2,9 @@
 
 #include "exporter/walk/layer_transform.h"
 #include "exporter/walk/scene_parameters.h"
-#include "torvane/base_shader.h"
-#include "torvane/material.h"
-#include "torvane/texture_tag.h"
+#include "torvane/materials/material.h"
+#include "torvane/shaders/base_shader.h"
+#include "torvane/tags/texture_tag.h"
 
 namespace exporter
 {

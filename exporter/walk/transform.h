@@ -2,8 +2,8 @@
 // position, rotation and scale. A host pixel is one scene unit.
 #pragma once
 
-#include "torvane/ge_math.h"
-#include "torvane/vector.h"
+#include "torvane/math/ge_math.h"
+#include "torvane/math/vector.h"
 
 namespace exporter
 {

@@ -1,8 +1,8 @@
 #include "blendlayers/blend_fields.h"
 
-#include "k2v_file/chunk_visitor.h"
-#include "k2v_file/vector_component.h"
-#include "torvane/assertion.h"
+#include "k2v_file/stream/chunk_visitor.h"
+#include "k2v_file/values/vector_component.h"
+#include "torvane/memory/assertion.h"
 
 namespace _torvane_
 {

@@ -1,7 +1,7 @@
 // What is done with one setting of a blend layer, whatever its kind.
 #pragma once
 
-#include "torvane/blend_layers.h"
+#include "torvane/shaders/blend_layers.h"
 
 namespace _torvane_
 {

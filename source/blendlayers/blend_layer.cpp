@@ -1,7 +1,7 @@
 // What all layers do alike, by the list of their settings.
 #include "blendlayers/blend_fields.h"
-#include "torvane/ge_data.h"
-#include "torvane/hyper_file.h"
+#include "torvane/stream/hyper_file.h"
+#include "torvane/values/ge_data.h"
 
 namespace _torvane_
 {

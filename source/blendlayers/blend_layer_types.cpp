@@ -1,6 +1,6 @@
 // The kinds of layers and their settings, each in file order: the value, its id, its sub number, its range.
 #include "blendlayers/blend_fields.h"
-#include "torvane/base_shader.h"
+#include "torvane/shaders/base_shader.h"
 
 namespace _torvane_
 {

@@ -1,10 +1,10 @@
 // The array of layers, and the custom value around it.
-#include "torvane/blend_layers.h"
+#include "torvane/shaders/blend_layers.h"
 
 #include "blendlayers/blend_fields.h"
-#include "torvane/assertion.h"
-#include "torvane/ge_data.h"
-#include "torvane/hyper_file.h"
+#include "torvane/memory/assertion.h"
+#include "torvane/stream/hyper_file.h"
+#include "torvane/values/ge_data.h"
 
 namespace _torvane_
 {

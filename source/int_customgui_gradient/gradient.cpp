@@ -1,12 +1,12 @@
 // What a gradient holds: copying, comparing, its file form and its parameters.
-#include "torvane/gradient.h"
+#include "torvane/shaders/gradient.h"
 
 #include <limits>
 
-#include "k2v_file/vector_component.h"
-#include "torvane/assertion.h"
-#include "torvane/ge_data.h"
-#include "torvane/hyper_file.h"
+#include "k2v_file/values/vector_component.h"
+#include "torvane/memory/assertion.h"
+#include "torvane/stream/hyper_file.h"
+#include "torvane/values/ge_data.h"
 
 namespace _torvane_
 {

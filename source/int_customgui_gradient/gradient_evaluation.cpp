@@ -1,7 +1,7 @@
 // The colours of a gradient: its sorted knots, the blend between two of them, and the mirrored gradient.
 #include "int_customgui_gradient/gradient_sort.h"
-#include "torvane/ge_data.h"
-#include "torvane/gradient.h"
+#include "torvane/shaders/gradient.h"
+#include "torvane/values/ge_data.h"
 
 namespace _torvane_
 {

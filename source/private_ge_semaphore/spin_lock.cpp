@@ -1,4 +1,4 @@
-#include "torvane/spin_lock.h"
+#include "torvane/memory/spin_lock.h"
 
 #ifdef _WIN32
 #include <windows.h>

@@ -1,9 +1,9 @@
-#include "torvane/base_time.h"
+#include "torvane/time/base_time.h"
 
 #include <utility>
 
 #include "q7r_basetime/basetime_log.h"
-#include "torvane/assertion.h"
+#include "torvane/memory/assertion.h"
 
 namespace _torvane_
 {

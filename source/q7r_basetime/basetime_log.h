@@ -1,7 +1,7 @@
 // Reports of this module, with the lines that its log readers know.
 #pragma once
 
-#include "torvane/assertion.h"
+#include "torvane/memory/assertion.h"
 
 namespace _torvane_
 {

@@ -1,4 +1,4 @@
-#include "torvane/date_time.h"
+#include "torvane/time/date_time.h"
 
 #include <cmath>
 

@@ -1,4 +1,4 @@
-#include "torvane/uuid.h"
+#include "torvane/time/uuid.h"
 
 #include <cstring>
 

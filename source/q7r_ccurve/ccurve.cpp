@@ -1,8 +1,8 @@
-#include "torvane/ccurve.h"
+#include "torvane/animation/ccurve.h"
 
-#include "k2v_file/chunk_visitor.h"
+#include "k2v_file/stream/chunk_visitor.h"
 #include "q7r_file/nodes/node_tools.h"
-#include "torvane/animation_ids.h"
+#include "torvane/animation/animation_ids.h"
 
 namespace _torvane_
 {

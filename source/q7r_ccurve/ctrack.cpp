@@ -1,9 +1,9 @@
-#include "torvane/ctrack.h"
+#include "torvane/animation/ctrack.h"
 
-#include "k2v_file/chunk_visitor.h"
-#include "q7r_file/nodes/member_makers.h"
+#include "k2v_file/stream/chunk_visitor.h"
 #include "q7r_file/nodes/node_tools.h"
-#include "torvane/animation_ids.h"
+#include "q7r_file/types/member_makers.h"
+#include "torvane/animation/animation_ids.h"
 
 namespace _torvane_
 {

@@ -1,7 +1,7 @@
 // Tangents and values of a curve.
 #include <cmath>
 
-#include "torvane/ccurve.h"
+#include "torvane/animation/ccurve.h"
 
 namespace _torvane_
 {

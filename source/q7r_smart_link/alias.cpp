@@ -1,10 +1,10 @@
-#include "torvane/alias.h"
+#include "torvane/links/alias.h"
 
 #include <atomic>
 #include <cstring>
 
-#include "torvane/hyper_file.h"
-#include "torvane/private_chunk.h"
+#include "torvane/nodes/private_chunk.h"
+#include "torvane/stream/hyper_file.h"
 
 namespace _torvane_
 {

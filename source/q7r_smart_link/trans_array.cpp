@@ -1,5 +1,5 @@
-#include "torvane/alias.h"
-#include "torvane/assertion.h"
+#include "torvane/links/alias.h"
+#include "torvane/memory/assertion.h"
 
 namespace _torvane_
 {

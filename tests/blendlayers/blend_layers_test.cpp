@@ -7,9 +7,9 @@
 #include "support/counting_memory.h"
 #include "support/memory_file.h"
 #include "support/text.h"
-#include "torvane/base_shader.h"
-#include "torvane/blend_layers.h"
-#include "torvane/ge_data.h"
+#include "torvane/shaders/base_shader.h"
+#include "torvane/shaders/blend_layers.h"
+#include "torvane/values/ge_data.h"
 
 namespace
 {

@@ -4,7 +4,7 @@
 
 #include "export_fixture.h"
 #include "exporter/walk/camera.h"
-#include "torvane/base_draw.h"
+#include "torvane/views/base_draw.h"
 
 namespace
 {

@@ -1,8 +1,8 @@
 #include <gtest/gtest.h>
 
 #include "export_fixture.h"
-#include "torvane/layer_object.h"
-#include "torvane/render_data.h"
+#include "torvane/layers/layer_object.h"
+#include "torvane/render/render_data.h"
 
 namespace
 {

@@ -10,10 +10,10 @@
 
 #include "exporter/walk/composition.h"
 #include "host/standalone_host.h"
-#include "torvane/base_document.h"
-#include "torvane/base_tag.h"
-#include "torvane/ctrack.h"
-#include "torvane/ge_math.h"
+#include "torvane/animation/ctrack.h"
+#include "torvane/document/base_document.h"
+#include "torvane/math/ge_math.h"
+#include "torvane/tags/base_tag.h"
 
 namespace export_test
 {

@@ -5,7 +5,7 @@
 #include <vector>
 
 #include "exporter/walk/layer_index.h"
-#include "torvane/base_document.h"
+#include "torvane/document/base_document.h"
 
 namespace
 {

@@ -3,8 +3,8 @@
 #include <gtest/gtest.h>
 
 #include "export_fixture.h"
-#include "torvane/base_shader.h"
-#include "torvane/material.h"
+#include "torvane/materials/material.h"
+#include "torvane/shaders/base_shader.h"
 
 namespace
 {

@@ -1,7 +1,7 @@
 // What a file that cannot be used is refused with, and what it is warned of.
 #include "stage.h"
 
-#include "host/json_document.h"
+#include "host/reader/json_document.h"
 #include "host/text.h"
 
 namespace

@@ -1,7 +1,7 @@
 // The value of a stream at a time.
 #include "stage.h"
 
-#include "host/timing.h"
+#include "host/model/timing.h"
 
 #include <cmath>
 

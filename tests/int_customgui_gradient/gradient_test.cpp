@@ -5,8 +5,8 @@
 #include "support/byte_writer.h"
 #include "support/counting_memory.h"
 #include "support/memory_file.h"
-#include "torvane/ge_data.h"
-#include "torvane/gradient.h"
+#include "torvane/shaders/gradient.h"
+#include "torvane/values/ge_data.h"
 
 namespace
 {

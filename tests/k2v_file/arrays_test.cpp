@@ -6,7 +6,7 @@
 #include <gtest/gtest.h>
 
 #include "support/counting_memory.h"
-#include "torvane/private_ge_mtools.h"
+#include "torvane/memory/private_ge_mtools.h"
 
 using namespace _torvane_;
 

@@ -1,4 +1,4 @@
-#include "torvane/base_container.h"
+#include "torvane/values/base_container.h"
 
 #include <bit>
 #include <cmath>

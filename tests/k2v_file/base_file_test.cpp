@@ -1,4 +1,4 @@
-#include "torvane/base_file.h"
+#include "torvane/bytes/base_file.h"
 
 #include <cmath>
 #include <functional>
@@ -18,7 +18,7 @@
 #include "support/byte_writer.h"
 #include "support/counting_memory.h"
 #include "support/temp_folder.h"
-#include "torvane/file_stream.h"
+#include "torvane/bytes/file_stream.h"
 
 namespace
 {

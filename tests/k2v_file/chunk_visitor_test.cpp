@@ -1,4 +1,4 @@
-#include "source/k2v_file/chunk_visitor.h"
+#include "source/k2v_file/stream/chunk_visitor.h"
 
 #include <gtest/gtest.h>
 

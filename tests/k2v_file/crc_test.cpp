@@ -1,6 +1,6 @@
 #include <gtest/gtest.h>
 
-#include "torvane/crc.h"
+#include "torvane/math/crc.h"
 
 using namespace _torvane_;
 

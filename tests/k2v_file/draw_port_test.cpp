@@ -1,4 +1,4 @@
-#include "torvane/draw_port.h"
+#include "torvane/pictures/draw_port.h"
 
 #include <memory>
 
@@ -7,7 +7,7 @@
 #include "k2v_file/hyper_file_bytes.h"
 #include "support/assertion_counter.h"
 #include "support/counting_memory.h"
-#include "torvane/bitmap.h"
+#include "torvane/pictures/bitmap.h"
 
 using namespace _torvane_;
 using hyper_file_bytes::Bytes;

@@ -7,7 +7,7 @@
 
 #include "support/counting_memory.h"
 #include "support/text.h"
-#include "torvane/filename.h"
+#include "torvane/text/filename.h"
 
 using namespace _torvane_;
 

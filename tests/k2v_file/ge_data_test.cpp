@@ -1,4 +1,4 @@
-#include "torvane/ge_data.h"
+#include "torvane/values/ge_data.h"
 
 #include <cmath>
 #include <limits>
@@ -9,8 +9,8 @@
 #include "support/byte_writer.h"
 #include "support/counting_memory.h"
 #include "support/memory_file.h"
-#include "torvane/alias.h"
-#include "torvane/base_container.h"
+#include "torvane/links/alias.h"
+#include "torvane/values/base_container.h"
 
 using namespace _torvane_;
 

@@ -9,7 +9,7 @@
 #include "support/assertion_counter.h"
 #include "support/counting_memory.h"
 #include "support/temp_folder.h"
-#include "torvane/hyper_file.h"
+#include "torvane/stream/hyper_file.h"
 
 using namespace _torvane_;
 using namespace hyper_file_bytes;

@@ -5,9 +5,9 @@
 #include "support/assertion_counter.h"
 #include "support/counting_memory.h"
 #include "support/temp_folder.h"
-#include "torvane/alias.h"
-#include "torvane/base_container.h"
-#include "torvane/hyper_file.h"
+#include "torvane/links/alias.h"
+#include "torvane/stream/hyper_file.h"
+#include "torvane/values/base_container.h"
 
 using namespace _torvane_;
 using namespace hyper_file_bytes;
@@ -52,7 +52,7 @@ Bytes OneOfEach(bool single)
   return writer.End().bytes;
 }
 
-std::vector<std::uint8_t> SmallContainer()
+std::vector<std::uint8_t> SmallContainerBytes()
 {
   return ByteWriter()
       .Start(132, 1)
@@ -223,7 +223,7 @@ TEST(HyperFileContainer, WritesEveryKindButPointers)
   container.SetContainer(2, nested);
   container.InsertData(1, GeData(String("ab")));
   Bytes written = WriteToMemory([&](HyperFile& file) { EXPECT_TRUE(file.WriteContainer(container)); });
-  EXPECT_EQ(ToHex(written), ToHex(SmallContainer()));
+  EXPECT_EQ(ToHex(written), ToHex(SmallContainerBytes()));
   EXPECT_EQ(ToHex(Bytes(written.begin(), written.begin() + 24)),
             "01 00 00 00 84 00 00 00 01 0F 00 00 00 09 0F 00 00 00 01 0F 00 00 00 0F");
   container.RemoveData(3);
@@ -240,7 +240,7 @@ TEST(HyperFileContainer, WritesEveryKindButPointers)
 
 TEST(HyperFileContainer, ReplacesElementsUnlessItIsFlushed)
 {
-  MemoryReadFile read(WithHeader(SmallContainer()));
+  MemoryReadFile read(WithHeader(SmallContainerBytes()));
   BaseContainer container(1);
   container.SetReal(1, 3.5);
   container.SetLong(50, 1);
@@ -280,7 +280,7 @@ TEST(HyperFileContainer, FailsWithoutALeakWhereverItIsCut)
 {
   AssertionCounter quiet;
   counting_memory::BalanceCheck balance;
-  Bytes whole = WithHeader(SmallContainer());
+  Bytes whole = WithHeader(SmallContainerBytes());
   for (std::size_t size = 13; size < whole.size(); ++size) {
     MemoryReadFile read(Bytes(whole.begin(), whole.begin() + static_cast<std::ptrdiff_t>(size)));
     BaseContainer container;

@@ -1,4 +1,4 @@
-#include "torvane/hyper_file.h"
+#include "torvane/stream/hyper_file.h"
 
 #include <cmath>
 #include <cstring>
@@ -11,8 +11,8 @@
 #include "support/assertion_counter.h"
 #include "support/counting_memory.h"
 #include "support/temp_folder.h"
-#include "torvane/bitmap.h"
-#include "torvane/network_connection.h"
+#include "torvane/bytes/network_connection.h"
+#include "torvane/pictures/bitmap.h"
 
 using namespace _torvane_;
 using namespace hyper_file_bytes;

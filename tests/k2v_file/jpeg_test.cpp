@@ -9,8 +9,8 @@
 #include "support/counting_memory.h"
 #include "support/pictures.h"
 #include "support/temp_folder.h"
-#include "torvane/base_container.h"
-#include "torvane/bitmap_filters.h"
+#include "torvane/pictures/bitmap_filters.h"
+#include "torvane/values/base_container.h"
 
 using namespace _torvane_;
 using hyper_file_bytes::Bytes;

@@ -4,7 +4,7 @@
 
 #include <gtest/gtest.h>
 
-#include "torvane/ge_math.h"
+#include "torvane/math/ge_math.h"
 
 using namespace _torvane_;
 

@@ -1,4 +1,4 @@
-#include "torvane/network_connection.h"
+#include "torvane/bytes/network_connection.h"
 
 #include <chrono>
 #include <cstring>
@@ -10,7 +10,7 @@
 
 #include "support/assertion_counter.h"
 #include "support/counting_memory.h"
-#include "torvane/base_file.h"
+#include "torvane/bytes/base_file.h"
 
 namespace
 {

@@ -1,11 +1,11 @@
-#include "torvane/paint_texture.h"
+#include "torvane/pictures/paint_texture.h"
 
 #include <random>
 
 #include <gtest/gtest.h>
 
 #include "k2v_file/hyper_file_bytes.h"
-#include "source/k2v_file/run_coding.h"
+#include "source/k2v_file/pictures/run_coding.h"
 #include "support/assertion_counter.h"
 #include "support/counting_memory.h"
 #include "support/temp_folder.h"

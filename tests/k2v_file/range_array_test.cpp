@@ -6,7 +6,7 @@
 #include <gtest/gtest.h>
 
 #include "support/counting_memory.h"
-#include "torvane/range_array.h"
+#include "torvane/memory/range_array.h"
 
 using namespace _torvane_;
 

@@ -7,9 +7,9 @@
 
 #include "support/counting_memory.h"
 #include "support/text.h"
-#include "torvane/ge_string.h"
 #include "torvane/hooks.h"
-#include "torvane/memory.h"
+#include "torvane/memory/memory.h"
+#include "torvane/text/ge_string.h"
 
 using namespace _torvane_;
 

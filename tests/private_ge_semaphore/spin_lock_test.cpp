@@ -6,7 +6,7 @@
 #include <gtest/gtest.h>
 
 #include "support/memory_file.h"
-#include "torvane/joint_weight_table.h"
+#include "torvane/tags/joint_weight_table.h"
 
 namespace
 {

@@ -5,7 +5,7 @@
 #include <gtest/gtest.h>
 
 #include "support/assertion_record.h"
-#include "torvane/base_time.h"
+#include "torvane/time/base_time.h"
 
 using namespace _torvane_;
 

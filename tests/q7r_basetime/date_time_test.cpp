@@ -16,8 +16,8 @@
 #endif
 
 #include "support/assertion_record.h"
-#include "torvane/date_time.h"
-#include "torvane/uuid.h"
+#include "torvane/time/date_time.h"
+#include "torvane/time/uuid.h"
 
 using namespace _torvane_;
 

@@ -6,8 +6,8 @@
 
 #include "animation_bytes.h"
 #include "support/counting_memory.h"
-#include "torvane/ccurve.h"
-#include "torvane/file_errors.h"
+#include "torvane/animation/ccurve.h"
+#include "torvane/bytes/file_errors.h"
 
 namespace
 {

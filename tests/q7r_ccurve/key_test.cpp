@@ -4,7 +4,7 @@
 #include <gtest/gtest.h>
 
 #include "animation_bytes.h"
-#include "torvane/ckey.h"
+#include "torvane/animation/ckey.h"
 
 namespace
 {

@@ -5,9 +5,9 @@
 #include "animation_bytes.h"
 #include "support/counting_memory.h"
 #include "support/text.h"
-#include "torvane/base_object.h"
-#include "torvane/ctrack.h"
-#include "torvane/file_errors.h"
+#include "torvane/animation/ctrack.h"
+#include "torvane/bytes/file_errors.h"
+#include "torvane/objects/base_object.h"
 
 namespace
 {

@@ -8,10 +8,10 @@
 #include "q7r_file/objects/opaque_object_data.h"
 #include "support/assertion_counter.h"
 #include "support/counting_memory.h"
-#include "torvane/base_document.h"
-#include "torvane/base_object.h"
-#include "torvane/base_tag.h"
-#include "torvane/ge_data.h"
+#include "torvane/document/base_document.h"
+#include "torvane/objects/base_object.h"
+#include "torvane/tags/base_tag.h"
+#include "torvane/values/ge_data.h"
 
 namespace
 {

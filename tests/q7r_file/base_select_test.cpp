@@ -13,7 +13,7 @@
 #include "q7r_file/node_bytes.h"
 #include "support/assertion_counter.h"
 #include "support/counting_memory.h"
-#include "torvane/base_select.h"
+#include "torvane/tags/base_select.h"
 
 namespace
 {

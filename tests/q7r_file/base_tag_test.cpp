@@ -5,16 +5,16 @@
 
 #include "q7r_file/node_bytes.h"
 #include "support/counting_memory.h"
-#include "torvane/base_object.h"
-#include "torvane/base_tag.h"
-#include "torvane/ge_data.h"
+#include "torvane/objects/base_object.h"
+#include "torvane/tags/base_tag.h"
+#include "torvane/values/ge_data.h"
 
 namespace
 {
 
 using namespace _torvane_;
 
-constexpr Long kUnknownType = 1234567;
+constexpr Long kUnknownTagType = 1234567;
 
 // The node chunks of a tag with no name and the counting marker.
 std::string NodeHex(const std::string& container)
@@ -66,7 +66,7 @@ TEST(BaseTag, KeepsTheChunkOfAnUnknownTypeByteForByteThroughReadCopyAndWrite)
   BaseTag* tag = MakeTag(kTagPlugin);
   EXPECT_EQ(tag->GetType(), -1);
   ASSERT_TRUE(ReadInto(*tag, UnknownChunk()));
-  EXPECT_EQ(tag->GetType(), kUnknownType);
+  EXPECT_EQ(tag->GetType(), kUnknownTagType);
   EXPECT_EQ(tag->GetDiskType(), kTagPlugin);
   EXPECT_EQ(tag->GetName(), String("Tg"));
   EXPECT_EQ(tag->GetRawLevel(), 6);

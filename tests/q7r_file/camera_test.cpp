@@ -11,10 +11,10 @@
 #include "support/counting_memory.h"
 #include "support/scene_bytes.h"
 #include "support/text.h"
-#include "torvane/base_object.h"
-#include "torvane/base_tag.h"
-#include "torvane/camera_object_data.h"
-#include "torvane/ge_data.h"
+#include "torvane/objects/base_object.h"
+#include "torvane/objects/camera_object_data.h"
+#include "torvane/tags/base_tag.h"
+#include "torvane/values/ge_data.h"
 
 namespace
 {

@@ -9,10 +9,10 @@
 #include "q7r_file/node_bytes.h"
 #include "support/assertion_counter.h"
 #include "support/counting_memory.h"
-#include "torvane/compositing_tag.h"
-#include "torvane/display_tag.h"
-#include "torvane/ge_data.h"
-#include "torvane/selection_tag.h"
+#include "torvane/tags/compositing_tag.h"
+#include "torvane/tags/display_tag.h"
+#include "torvane/tags/selection_tag.h"
+#include "torvane/values/ge_data.h"
 
 namespace
 {

@@ -11,9 +11,9 @@
 #include "support/scene_bytes.h"
 #include "support/temp_folder.h"
 #include "support/text.h"
-#include "torvane/base_tag.h"
-#include "torvane/ctrack.h"
-#include "torvane/date_time.h"
+#include "torvane/animation/ctrack.h"
+#include "torvane/tags/base_tag.h"
+#include "torvane/time/date_time.h"
 
 namespace
 {

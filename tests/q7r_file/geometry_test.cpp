@@ -9,10 +9,10 @@
 #include "q7r_file/node_bytes.h"
 #include "support/assertion_counter.h"
 #include "support/counting_memory.h"
-#include "torvane/ge_data.h"
-#include "torvane/point_object_data.h"
-#include "torvane/spline_object.h"
-#include "torvane/value_tags.h"
+#include "torvane/objects/point_object_data.h"
+#include "torvane/objects/spline_object.h"
+#include "torvane/tags/value_tags.h"
+#include "torvane/values/ge_data.h"
 
 namespace
 {

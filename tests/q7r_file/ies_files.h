@@ -6,8 +6,8 @@
 #include <string>
 #include <vector>
 
-#include "torvane/filename.h"
-#include "torvane/ies_light.h"
+#include "torvane/objects/ies_light.h"
+#include "torvane/text/filename.h"
 
 struct IESDeleter
 {

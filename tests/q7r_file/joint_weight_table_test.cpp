@@ -7,7 +7,7 @@
 #include "q7r_file/node_bytes.h"
 #include "support/assertion_counter.h"
 #include "support/counting_memory.h"
-#include "torvane/joint_weight_table.h"
+#include "torvane/tags/joint_weight_table.h"
 
 namespace
 {

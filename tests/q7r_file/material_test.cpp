@@ -10,10 +10,10 @@
 #include "support/scene_bytes.h"
 #include "support/temp_folder.h"
 #include "support/text.h"
-#include "torvane/base_shader.h"
-#include "torvane/ge_data.h"
-#include "torvane/material.h"
-#include "torvane/texture_tag.h"
+#include "torvane/materials/material.h"
+#include "torvane/shaders/base_shader.h"
+#include "torvane/tags/texture_tag.h"
+#include "torvane/values/ge_data.h"
 
 namespace
 {

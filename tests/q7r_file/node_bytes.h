@@ -7,7 +7,7 @@
 
 #include "support/byte_writer.h"
 #include "support/memory_file.h"
-#include "torvane/base_list.h"
+#include "torvane/nodes/base_list.h"
 
 using Bytes = std::vector<std::uint8_t>;
 

@@ -8,9 +8,9 @@
 #include "q7r_file/node_bytes.h"
 #include "support/assertion_counter.h"
 #include "support/counting_memory.h"
-#include "torvane/base_list.h"
-#include "torvane/ge_data.h"
-#include "torvane/layer_object.h"
+#include "torvane/layers/layer_object.h"
+#include "torvane/nodes/base_list.h"
+#include "torvane/values/ge_data.h"
 
 namespace
 {
@@ -26,7 +26,7 @@ ByteWriter HeaderStart(Long level)
 }
 
 // A chunk (110069, 2) that sets the first word: what follows in step is seen by it.
-void AppendWitness(ByteWriter& w) { w.Start(110069, 2).Long(4).Long(99).Long(0).Long(0).Long(0).UChar(0).End(); }
+void AppendNodeWitness(ByteWriter& w) { w.Start(110069, 2).Long(4).Long(99).Long(0).Long(0).Long(0).UChar(0).End(); }
 
 TEST(Node, WritesItsHeaderAndBitsByteForByte)
 {
@@ -78,7 +78,7 @@ TEST(Node, ReadsHeadersOfEveryLevelAndStaysInStep)
     ByteWriter w = HeaderStart(c.level);
     c.tail(w);
     w.End();
-    AppendWitness(w);
+    AppendNodeWitness(w);
     BaseList2D node;
     ASSERT_TRUE(ReadInto(node, w.bytes, c.version));
     EXPECT_EQ(node.GetInfo(), 3u);
@@ -93,7 +93,7 @@ TEST(Node, FilesBelow7500LeaveNameAndDataUnread)
 {
   ByteWriter w;
   w.Start(110050, 0).Long(3).Long(0).String(u"whatever stands here").End();
-  AppendWitness(w);
+  AppendNodeWitness(w);
   BaseList2D node;
   ASSERT_TRUE(ReadInto(node, w.bytes, 7499));
   EXPECT_FALSE(node.GetName().Content());

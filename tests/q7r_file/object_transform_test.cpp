@@ -4,9 +4,9 @@
 #include <gtest/gtest.h>
 
 #include "support/counting_memory.h"
-#include "torvane/base_object.h"
-#include "torvane/base_tag.h"
-#include "torvane/ge_data.h"
+#include "torvane/objects/base_object.h"
+#include "torvane/tags/base_tag.h"
+#include "torvane/values/ge_data.h"
 
 namespace
 {

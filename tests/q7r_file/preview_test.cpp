@@ -6,8 +6,8 @@
 #include "support/counting_memory.h"
 #include "support/pictures.h"
 #include "support/scene_bytes.h"
-#include "torvane/base_container.h"
-#include "torvane/material.h"
+#include "torvane/materials/material.h"
+#include "torvane/values/base_container.h"
 
 using namespace _torvane_;
 

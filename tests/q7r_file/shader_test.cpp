@@ -5,8 +5,8 @@
 #include "support/assertion_counter.h"
 #include "support/counting_memory.h"
 #include "support/text.h"
-#include "torvane/base_shader.h"
-#include "torvane/ge_data.h"
+#include "torvane/shaders/base_shader.h"
+#include "torvane/values/ge_data.h"
 
 namespace
 {

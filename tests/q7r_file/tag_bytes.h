@@ -3,7 +3,7 @@
 
 #include "q7r_file/node_bytes.h"
 #include "support/assertion_counter.h"
-#include "torvane/base_tag.h"
+#include "torvane/tags/base_tag.h"
 
 // The chunks that `tag` writes behind those of a plain tag.
 inline Bytes OwnChunks(_torvane_::BaseTag& tag)

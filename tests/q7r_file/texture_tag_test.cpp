@@ -9,10 +9,10 @@
 #include "support/scene_bytes.h"
 #include "support/temp_folder.h"
 #include "support/text.h"
-#include "torvane/base_object.h"
-#include "torvane/ge_math.h"
-#include "torvane/material.h"
-#include "torvane/texture_tag.h"
+#include "torvane/materials/material.h"
+#include "torvane/math/ge_math.h"
+#include "torvane/objects/base_object.h"
+#include "torvane/tags/texture_tag.h"
 
 namespace
 {

@@ -8,8 +8,8 @@
 #include "q7r_file/tag_bytes.h"
 #include "support/counting_memory.h"
 #include "support/text.h"
-#include "torvane/ge_data.h"
-#include "torvane/value_tags.h"
+#include "torvane/tags/value_tags.h"
+#include "torvane/values/ge_data.h"
 
 namespace
 {

@@ -6,7 +6,7 @@
 #include "q7r_file/tag_bytes.h"
 #include "support/counting_memory.h"
 #include "support/text.h"
-#include "torvane/value_tags.h"
+#include "torvane/tags/value_tags.h"
 
 namespace
 {

@@ -9,9 +9,9 @@
 #include "support/assertion_counter.h"
 #include "support/counting_memory.h"
 #include "support/scene_bytes.h"
-#include "torvane/base_draw.h"
-#include "torvane/base_object.h"
-#include "torvane/ge_data.h"
+#include "torvane/objects/base_object.h"
+#include "torvane/values/ge_data.h"
+#include "torvane/views/base_draw.h"
 
 namespace
 {

@@ -6,10 +6,10 @@
 #include "q7r_file/tag_bytes.h"
 #include "support/counting_memory.h"
 #include "support/text.h"
-#include "torvane/base_object.h"
-#include "torvane/ge_data.h"
-#include "torvane/joint_tree.h"
-#include "torvane/weight_tag_data.h"
+#include "torvane/objects/base_object.h"
+#include "torvane/tags/joint_tree.h"
+#include "torvane/tags/weight_tag_data.h"
+#include "torvane/values/ge_data.h"
 
 namespace
 {

@@ -1,4 +1,4 @@
-#include "torvane/alias.h"
+#include "torvane/links/alias.h"
 
 #include <algorithm>
 #include <cstring>
@@ -14,7 +14,7 @@
 #include "support/byte_writer.h"
 #include "support/counting_memory.h"
 #include "support/memory_file.h"
-#include "torvane/base_container.h"
+#include "torvane/values/base_container.h"
 
 using namespace _torvane_;
 

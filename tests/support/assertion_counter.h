@@ -1,7 +1,7 @@
 // Counts the reports to the assertion log and keeps them from standard error while it lives.
 #pragma once
 
-#include "torvane/assertion.h"
+#include "torvane/memory/assertion.h"
 
 class AssertionCounter
 {

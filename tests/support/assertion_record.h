@@ -4,7 +4,7 @@
 #include <string>
 #include <vector>
 
-#include "torvane/assertion.h"
+#include "torvane/memory/assertion.h"
 
 class AssertionRecord
 {

@@ -9,8 +9,8 @@
 
 #include <gtest/gtest.h>
 
-#include "torvane/filename.h"
-#include "torvane/hyper_file.h"
+#include "torvane/stream/hyper_file.h"
+#include "torvane/text/filename.h"
 
 // A file open for reading over a copy of the bytes, in a heap block of just their size, so that a sanitizer sees every
 // read past the end.

@@ -10,8 +10,8 @@
 #include <string>
 #include <vector>
 
-#include "torvane/bitmap.h"
-#include "torvane/bitmap_filters.h"
+#include "torvane/pictures/bitmap.h"
+#include "torvane/pictures/bitmap_filters.h"
 
 // Pixels from the top row down, without padding.
 struct PlainPicture

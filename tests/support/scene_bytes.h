@@ -4,7 +4,7 @@
 #include <memory>
 
 #include "support/memory_file.h"
-#include "torvane/base_document.h"
+#include "torvane/document/base_document.h"
 
 struct DocumentDeleter
 {

@@ -5,7 +5,7 @@
 #include <ostream>
 #include <string>
 
-#include "torvane/ge_string.h"
+#include "torvane/text/ge_string.h"
 
 inline std::u16string Units(const _torvane_::String& text)
 {

@@ -6,11 +6,11 @@
 
 #include "support/byte_writer.h"
 #include "support/run_q7r.h"
-#include "torvane/base_document.h"
-#include "torvane/point_object_data.h"
-#include "torvane/selection_tag.h"
-#include "torvane/spline_object.h"
-#include "torvane/value_tags.h"
+#include "torvane/document/base_document.h"
+#include "torvane/objects/point_object_data.h"
+#include "torvane/objects/spline_object.h"
+#include "torvane/tags/selection_tag.h"
+#include "torvane/tags/value_tags.h"
 
 namespace
 {

@@ -7,9 +7,9 @@
 
 #include "support/run_q7r.h"
 #include "support/scene_bytes.h"
-#include "torvane/base_object.h"
-#include "torvane/ge_data.h"
-#include "torvane/light_object_data.h"
+#include "torvane/objects/base_object.h"
+#include "torvane/objects/light_object_data.h"
+#include "torvane/values/ge_data.h"
 
 namespace
 {

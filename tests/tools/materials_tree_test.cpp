@@ -5,9 +5,9 @@
 
 #include "support/run_q7r.h"
 #include "support/scene_bytes.h"
-#include "torvane/base_shader.h"
-#include "torvane/ge_data.h"
-#include "torvane/material.h"
+#include "torvane/materials/material.h"
+#include "torvane/shaders/base_shader.h"
+#include "torvane/values/ge_data.h"
 
 namespace
 {

@@ -5,7 +5,7 @@
 
 #include "deep_path.h"
 #include "support/temp_folder.h"
-#include "torvane/base_file.h"
+#include "torvane/bytes/base_file.h"
 
 using namespace _torvane_;
 namespace fs = std::filesystem;

@@ -2,8 +2,8 @@
 #include <cstdio>
 #include <exception>
 
-#include "torvane/assertion.h"
-#include "verbs.h"
+#include "torvane/memory/assertion.h"
+#include "verbs/verbs.h"
 
 namespace
 {

@@ -10,8 +10,8 @@
 #include <unistd.h>
 #endif
 
-#include "torvane/hyper_file.h"
-#include "verbs.h"
+#include "torvane/stream/hyper_file.h"
+#include "verbs/verbs.h"
 
 namespace q7r
 {

@@ -6,7 +6,7 @@
 #include <memory>
 #include <string>
 
-#include "torvane/base_document.h"
+#include "torvane/document/base_document.h"
 
 namespace q7r
 {

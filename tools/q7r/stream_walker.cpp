@@ -3,7 +3,7 @@
 #include <algorithm>
 
 #include "scene_file.h"
-#include "verbs.h"
+#include "verbs/verbs.h"
 
 namespace q7r
 {

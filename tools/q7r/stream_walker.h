@@ -5,7 +5,7 @@
 #include <string>
 #include <vector>
 
-#include "torvane/hyper_file.h"
+#include "torvane/stream/hyper_file.h"
 
 namespace q7r
 {

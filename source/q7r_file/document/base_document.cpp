@@ -1,10 +1,10 @@
-#include "torvane/base_document.h"
+#include "torvane/document/base_document.h"
 
 #include "q7r_file/document/document_info.h"
 #include "q7r_file/nodes/node_tools.h"
-#include "torvane/base_material.h"
-#include "torvane/custom_data.h"
 #include "torvane/hooks.h"
+#include "torvane/materials/base_material.h"
+#include "torvane/values/custom_data.h"
 
 namespace _torvane_
 {

@@ -1,9 +1,9 @@
 // The layout of a scene file at the level of the document's own chunks.
-#include "k2v_file/chunk_visitor.h"
+#include "k2v_file/stream/chunk_visitor.h"
 #include "q7r_file/document/document_info.h"
-#include "torvane/base_document.h"
-#include "torvane/base_material.h"
-#include "torvane/bitmap_filters.h"
+#include "torvane/document/base_document.h"
+#include "torvane/materials/base_material.h"
+#include "torvane/pictures/bitmap_filters.h"
 
 namespace _torvane_
 {

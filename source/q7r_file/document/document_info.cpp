@@ -3,9 +3,9 @@
 #include <cstdio>
 #include <cstring>
 
-#include "torvane/base_document.h"
-#include "torvane/date_time.h"
+#include "torvane/document/base_document.h"
 #include "torvane/hooks.h"
+#include "torvane/time/date_time.h"
 
 namespace _torvane_
 {

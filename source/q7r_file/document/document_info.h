@@ -1,7 +1,7 @@
 // Who made and wrote a document, and when: entries of the document container and the texts made from them.
 #pragma once
 
-#include "torvane/base_container.h"
+#include "torvane/values/base_container.h"
 
 namespace _torvane_
 {

@@ -1,5 +1,5 @@
-#include "k2v_file/chunk_visitor.h"
-#include "torvane/base_document.h"
+#include "k2v_file/stream/chunk_visitor.h"
+#include "torvane/document/base_document.h"
 
 namespace _torvane_
 {

@@ -1,6 +1,6 @@
-#include "torvane/layer_object.h"
+#include "torvane/layers/layer_object.h"
 
-#include "k2v_file/chunk_visitor.h"
+#include "k2v_file/stream/chunk_visitor.h"
 #include "q7r_file/nodes/node_tools.h"
 #include "torvane/hooks.h"
 

@@ -1,10 +1,10 @@
-#include "torvane/base_material.h"
+#include "torvane/materials/base_material.h"
 
-#include "k2v_file/chunk_visitor.h"
+#include "k2v_file/stream/chunk_visitor.h"
 #include "q7r_file/materials/material_defaults.h"
 #include "q7r_file/nodes/node_data_chunk.h"
 #include "q7r_file/nodes/node_tools.h"
-#include "torvane/material.h"
+#include "torvane/materials/material.h"
 
 namespace _torvane_
 {

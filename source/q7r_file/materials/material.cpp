@@ -1,8 +1,8 @@
-#include "torvane/material.h"
+#include "torvane/materials/material.h"
 
-#include "k2v_file/chunk_visitor.h"
+#include "k2v_file/stream/chunk_visitor.h"
 #include "q7r_file/materials/material_defaults.h"
-#include "torvane/base_shader.h"
+#include "torvane/shaders/base_shader.h"
 
 namespace _torvane_
 {

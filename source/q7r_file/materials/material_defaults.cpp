@@ -1,7 +1,7 @@
 #include "q7r_file/materials/material_defaults.h"
 
-#include "torvane/alias.h"
-#include "torvane/base_container.h"
+#include "torvane/links/alias.h"
+#include "torvane/values/base_container.h"
 
 namespace _torvane_
 {

@@ -1,11 +1,11 @@
-#include "torvane/base_list.h"
+#include "torvane/nodes/base_list.h"
 
 #include <cstring>
 
-#include "k2v_file/chunk_visitor.h"
-#include "torvane/base_shader.h"
-#include "torvane/ctrack.h"
-#include "torvane/uuid.h"
+#include "k2v_file/stream/chunk_visitor.h"
+#include "torvane/animation/ctrack.h"
+#include "torvane/shaders/base_shader.h"
+#include "torvane/time/uuid.h"
 
 namespace _torvane_
 {

@@ -1,8 +1,8 @@
 // What a container does with the nodes that its links point at.
-#include "torvane/base_container.h"
+#include "torvane/values/base_container.h"
 
-#include "torvane/alias.h"
-#include "torvane/base_list.h"
+#include "torvane/links/alias.h"
+#include "torvane/nodes/base_list.h"
 
 namespace _torvane_
 {

@@ -1,5 +1,5 @@
 // Parameters added at run time: one nested container of settings for each, keyed by a number.
-#include "torvane/base_list.h"
+#include "torvane/nodes/base_list.h"
 
 namespace _torvane_
 {

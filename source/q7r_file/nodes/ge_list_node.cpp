@@ -1,6 +1,6 @@
-#include "k2v_file/chunk_visitor.h"
-#include "torvane/assertion.h"
-#include "torvane/private_chunk.h"
+#include "k2v_file/stream/chunk_visitor.h"
+#include "torvane/memory/assertion.h"
+#include "torvane/nodes/private_chunk.h"
 
 namespace _torvane_
 {

@@ -1,7 +1,7 @@
-#include "torvane/kept_chunks.h"
+#include "torvane/nodes/kept_chunks.h"
 
-#include "torvane/hyper_file.h"
-#include "torvane/raw_chunk_body.h"
+#include "torvane/stream/hyper_file.h"
+#include "torvane/stream/raw_chunk_body.h"
 
 namespace _torvane_
 {

@@ -1,8 +1,8 @@
 #include "q7r_file/nodes/node_data_chunk.h"
 
-#include "torvane/base_list.h"
 #include "torvane/hooks.h"
-#include "torvane/hyper_file.h"
+#include "torvane/nodes/base_list.h"
+#include "torvane/stream/hyper_file.h"
 
 namespace _torvane_
 {

@@ -2,8 +2,8 @@
 // node's name, and then the values of its NodeData or the bytes that were kept for want of one.
 #pragma once
 
-#include "torvane/private_chunk.h"
-#include "torvane/raw_chunk_body.h"
+#include "torvane/nodes/private_chunk.h"
+#include "torvane/stream/raw_chunk_body.h"
 
 namespace _torvane_
 {

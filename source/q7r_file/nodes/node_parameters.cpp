@@ -1,6 +1,6 @@
 // The walk along a parameter path through a node's container. It differs on purpose from that of BaseContainer.
 #include "q7r_file/nodes/node_tools.h"
-#include "torvane/base_list.h"
+#include "torvane/nodes/base_list.h"
 
 namespace _torvane_
 {

@@ -1,10 +1,10 @@
 // Small things that the node classes share.
 #pragma once
 
-#include "k2v_file/vector_component.h"
-#include "torvane/ge_data.h"
-#include "torvane/hyper_file.h"
-#include "torvane/private_chunk.h"
+#include "k2v_file/values/vector_component.h"
+#include "torvane/nodes/private_chunk.h"
+#include "torvane/stream/hyper_file.h"
+#include "torvane/values/ge_data.h"
 
 namespace _torvane_
 {

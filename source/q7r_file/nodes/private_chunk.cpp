@@ -1,8 +1,8 @@
-#include "torvane/private_chunk.h"
+#include "torvane/nodes/private_chunk.h"
 
-#include "torvane/base_document.h"
-#include "torvane/ge_data.h"
-#include "torvane/hyper_file.h"
+#include "torvane/document/base_document.h"
+#include "torvane/stream/hyper_file.h"
+#include "torvane/values/ge_data.h"
 
 namespace _torvane_
 {

@@ -1,12 +1,12 @@
-#include "torvane/root_list.h"
+#include "torvane/nodes/root_list.h"
 
-#include "k2v_file/chunk_visitor.h"
-#include "q7r_file/nodes/member_makers.h"
-#include "torvane/base_material.h"
-#include "torvane/base_object.h"
-#include "torvane/base_tag.h"
-#include "torvane/layer_object.h"
-#include "torvane/render_data.h"
+#include "k2v_file/stream/chunk_visitor.h"
+#include "q7r_file/types/member_makers.h"
+#include "torvane/layers/layer_object.h"
+#include "torvane/materials/base_material.h"
+#include "torvane/objects/base_object.h"
+#include "torvane/render/render_data.h"
+#include "torvane/tags/base_tag.h"
 
 namespace _torvane_
 {

@@ -1,4 +1,4 @@
-#include "torvane/base_list.h"
+#include "torvane/nodes/base_list.h"
 
 namespace _torvane_
 {

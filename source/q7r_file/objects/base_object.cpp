@@ -1,11 +1,11 @@
-#include "torvane/base_object.h"
+#include "torvane/objects/base_object.h"
 
-#include "k2v_file/chunk_visitor.h"
+#include "k2v_file/stream/chunk_visitor.h"
 #include "q7r_file/nodes/node_data_chunk.h"
-#include "torvane/assertion.h"
-#include "torvane/base_tag.h"
-#include "torvane/crc.h"
 #include "torvane/hooks.h"
+#include "torvane/math/crc.h"
+#include "torvane/memory/assertion.h"
+#include "torvane/tags/base_tag.h"
 
 namespace _torvane_
 {

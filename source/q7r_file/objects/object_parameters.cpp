@@ -1,8 +1,8 @@
 // The parameters of every scene object.
-#include "torvane/base_object.h"
+#include "torvane/objects/base_object.h"
 
 #include "q7r_file/nodes/node_tools.h"
-#include "torvane/ge_data.h"
+#include "torvane/values/ge_data.h"
 
 namespace _torvane_
 {

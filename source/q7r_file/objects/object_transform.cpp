@@ -1,8 +1,8 @@
 // The transform model of the scene object: a relative transform on top of an optional frozen one. The relative values
 // are what users and animation work with; the absolute ones, from which the local matrix is made, follow from both.
-#include "torvane/base_object.h"
+#include "torvane/objects/base_object.h"
 
-#include "torvane/base_tag.h"
+#include "torvane/tags/base_tag.h"
 
 namespace _torvane_
 {

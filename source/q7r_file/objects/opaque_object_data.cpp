@@ -1,7 +1,7 @@
 #include "q7r_file/objects/opaque_object_data.h"
 
-#include "torvane/hyper_file.h"
 #include "torvane/ids.h"
+#include "torvane/stream/hyper_file.h"
 
 namespace _torvane_
 {

@@ -1,8 +1,8 @@
 // Object data whose values the library doesn't interpret: it keeps and hands on the bytes.
 #pragma once
 
-#include "torvane/private_chunk.h"
-#include "torvane/raw_chunk_body.h"
+#include "torvane/nodes/private_chunk.h"
+#include "torvane/stream/raw_chunk_body.h"
 
 namespace _torvane_
 {

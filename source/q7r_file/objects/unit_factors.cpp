@@ -2,7 +2,7 @@
 
 #include <iterator>
 
-#include "torvane/assertion.h"
+#include "torvane/memory/assertion.h"
 
 namespace _torvane_
 {

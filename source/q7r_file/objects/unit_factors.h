@@ -1,7 +1,7 @@
 // What a length unit is in metres.
 #pragma once
 
-#include "torvane/custom_data.h"
+#include "torvane/values/custom_data.h"
 
 namespace _torvane_
 {

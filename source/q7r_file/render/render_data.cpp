@@ -1,9 +1,9 @@
-#include "torvane/render_data.h"
+#include "torvane/render/render_data.h"
 
-#include "k2v_file/chunk_visitor.h"
-#include "q7r_file/nodes/member_makers.h"
+#include "k2v_file/stream/chunk_visitor.h"
 #include "q7r_file/nodes/node_tools.h"
 #include "q7r_file/render/render_defaults.h"
+#include "q7r_file/types/member_makers.h"
 #include "torvane/hooks.h"
 
 namespace _torvane_

@@ -30,7 +30,7 @@ constexpr Long kSaverFlags = 10024;
 
 constexpr Real Degrees(Real angle) { return angle * 3.141592653589793 / 180.0; }
 
-constexpr Default kDefaults[] = {
+constexpr Default kRenderDefaults[] = {
     {6014, Form::kBool, 1, {}},
     {5008, Form::kReal, 800.0, {}},
     {5009, Form::kReal, 600.0, {}},
@@ -195,7 +195,7 @@ GeData ValueOf(const Default& row)
 
 void SetRenderDefaults(BaseContainer& container)
 {
-  for (const Default& row : kDefaults)
+  for (const Default& row : kRenderDefaults)
     container.InsertData(row.id, ValueOf(row));
 }
 

@@ -1,6 +1,6 @@
 #pragma once
 
-#include "torvane/base_container.h"
+#include "torvane/values/base_container.h"
 
 namespace _torvane_
 {

@@ -1,8 +1,8 @@
-#include "torvane/base_shader.h"
+#include "torvane/shaders/base_shader.h"
 
-#include "k2v_file/chunk_visitor.h"
-#include "q7r_file/nodes/member_makers.h"
+#include "k2v_file/stream/chunk_visitor.h"
 #include "q7r_file/nodes/node_data_chunk.h"
+#include "q7r_file/types/member_makers.h"
 
 namespace _torvane_
 {

@@ -1,8 +1,8 @@
-#include "torvane/base_select.h"
+#include "torvane/tags/base_select.h"
 
-#include "k2v_file/counted_records.h"
-#include "torvane/base_file.h"
-#include "torvane/private_ge_mtools.h"
+#include "k2v_file/stream/counted_records.h"
+#include "torvane/bytes/base_file.h"
+#include "torvane/memory/private_ge_mtools.h"
 
 namespace _torvane_
 {

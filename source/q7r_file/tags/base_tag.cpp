@@ -1,8 +1,8 @@
-#include "torvane/base_tag.h"
+#include "torvane/tags/base_tag.h"
 
-#include "k2v_file/chunk_visitor.h"
+#include "k2v_file/stream/chunk_visitor.h"
 #include "q7r_file/nodes/node_data_chunk.h"
-#include "q7r_file/tags/tag_makers.h"
+#include "q7r_file/types/tag_makers.h"
 #include "torvane/hooks.h"
 
 namespace _torvane_

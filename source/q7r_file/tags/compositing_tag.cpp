@@ -1,9 +1,9 @@
-#include "torvane/compositing_tag.h"
+#include "torvane/tags/compositing_tag.h"
 
 #include <chrono>
 
 #include "q7r_file/tags/tag_entries.h"
-#include "q7r_file/tags/tag_makers.h"
+#include "q7r_file/types/tag_makers.h"
 
 namespace _torvane_
 {
@@ -11,7 +11,7 @@ namespace _torvane_
 namespace
 {
 
-constexpr EntryDefault kDefaults[] = {
+constexpr EntryDefault kCompositingDefaults[] = {
     {1000, 1003, EntryForm::kBool, 1},    {1017, 1017, EntryForm::kBool, 1},   {1126, 1129, EntryForm::kBool, 1},
     {1142, 1142, EntryForm::kBool, 1},    {1004, 1005, EntryForm::kBool, 0},   {1143, 1143, EntryForm::kBool, 0},
     {1153, 1156, EntryForm::kBool, 0},    {1158, 1158, EntryForm::kBool, 0},   {1006, 1006, EntryForm::kLong, 0},
@@ -66,7 +66,7 @@ BaseTag* MakeCompositingTag() { return NewObj<CompositingTag>(); }
 
 CompositingTag::CompositingTag() : BaseTag(kTagCompositing)
 {
-  SetEntryDefaults(data_, kDefaults);
+  SetEntryDefaults(data_, kCompositingDefaults);
   data_.SetLong(kCompositingClock, ReadMilliseconds());
 }
 

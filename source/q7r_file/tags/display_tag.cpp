@@ -1,8 +1,8 @@
-#include "torvane/display_tag.h"
+#include "torvane/tags/display_tag.h"
 
 #include "q7r_file/nodes/node_tools.h"
 #include "q7r_file/tags/tag_entries.h"
-#include "q7r_file/tags/tag_makers.h"
+#include "q7r_file/types/tag_makers.h"
 
 namespace _torvane_
 {
@@ -18,7 +18,7 @@ constexpr EntryDefault ColorDefault(Long id, Real red, Real green, Real blue)
   return {id, id, EntryForm::kVector, 0, 0, Vector(red / 255.0, green / 255.0, blue / 255.0)};
 }
 
-constexpr EntryDefault kDefaults[] = {
+constexpr EntryDefault kDisplayDefaults[] = {
     {1015, 1015, EntryForm::kBool, 1},    {10000, 10000, EntryForm::kBool, 0},   {10001, 10001, EntryForm::kTime, 0},
     {10002, 10002, EntryForm::kTime, 3},  {10003, 10004, EntryForm::kLong, 12},  {10005, 10005, EntryForm::kLong, 3},
     {10006, 10007, EntryForm::kLong, 40}, {10009, 10009, EntryForm::kString, 0}, {10010, 10010, EntryForm::kReal, 1.0},
@@ -62,7 +62,7 @@ DisplayTag::DisplayTag() : BaseTag(kTagDisplay)
     longs_[i] = kLongSettings[i].initial;
   for (Long i = 0; i < kRealCount; ++i)
     reals_[i] = kRealSettings[i].initial;
-  SetEntryDefaults(data_, kDefaults);
+  SetEntryDefaults(data_, kDisplayDefaults);
 }
 
 Long* DisplayTag::FindLong(Long id)

@@ -1,6 +1,6 @@
-#include "torvane/selection_tag.h"
+#include "torvane/tags/selection_tag.h"
 
-#include "q7r_file/tags/tag_makers.h"
+#include "q7r_file/types/tag_makers.h"
 
 namespace _torvane_
 {

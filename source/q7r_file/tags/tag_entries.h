@@ -1,7 +1,7 @@
 // The entries of a tag's container: defaults from a table, and values of old chunks.
 #pragma once
 
-#include "k2v_file/chunk_visitor.h"
+#include "k2v_file/stream/chunk_visitor.h"
 
 namespace _torvane_
 {

@@ -1,11 +1,11 @@
-#include "torvane/texture_tag.h"
+#include "torvane/tags/texture_tag.h"
 
 #include <cmath>
 
 #include "q7r_file/tags/tag_entries.h"
-#include "q7r_file/tags/tag_makers.h"
-#include "torvane/base_material.h"
-#include "torvane/ge_math.h"
+#include "q7r_file/types/tag_makers.h"
+#include "torvane/materials/base_material.h"
+#include "torvane/math/ge_math.h"
 
 namespace _torvane_
 {
@@ -30,7 +30,7 @@ struct Default
 };
 
 // In the order in which a file holds them.
-constexpr Default kDefaults[] = {
+constexpr Default kTextureDefaults[] = {
     {kTextureOffsetX, Form::kReal, 0.0},
     {kTextureOffsetY, Form::kReal, 0.0},
     {kTextureLengthX, Form::kReal, 1.0},
@@ -140,7 +140,7 @@ Real QuotientOrOne(Real a, Real b) { return b != 0.0 ? a / b : 1.0; }
 
 TextureTag::TextureTag() : BaseTag(kTagTexture)
 {
-  for (const Default& row : kDefaults)
+  for (const Default& row : kTextureDefaults)
     data_.InsertData(row.id, MakeDefault(row));
 }
 

@@ -1,10 +1,10 @@
-#include "torvane/base_draw.h"
+#include "torvane/views/base_draw.h"
 
-#include "k2v_file/chunk_visitor.h"
-#include "q7r_file/nodes/member_makers.h"
+#include "k2v_file/stream/chunk_visitor.h"
 #include "q7r_file/nodes/node_tools.h"
+#include "q7r_file/types/member_makers.h"
 #include "q7r_file/views/draw_defaults.h"
-#include "torvane/base_document.h"
+#include "torvane/document/base_document.h"
 
 namespace _torvane_
 {

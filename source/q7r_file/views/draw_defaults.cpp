@@ -1,8 +1,8 @@
 #include "q7r_file/views/draw_defaults.h"
 
-#include "torvane/base_draw.h"
-#include "torvane/base_object.h"
-#include "torvane/camera_object_data.h"
+#include "torvane/objects/base_object.h"
+#include "torvane/objects/camera_object_data.h"
+#include "torvane/views/base_draw.h"
 
 namespace _torvane_
 {
@@ -27,7 +27,7 @@ struct DrawDefault
 };
 
 // In the order in which a file holds them. (1038 counts as a switch, but holds 10.)
-constexpr DrawDefault kDefaults[] = {
+constexpr DrawDefault kDrawDefaults[] = {
     {1019, Kind::kBool, 1},
     {1020, Kind::kBool, 0},
     {1021, Kind::kBool, 0},
@@ -106,7 +106,7 @@ constexpr Real kPerspectiveFocalLength = 36.0;
 
 void SetDrawDefaults(BaseContainer& settings)
 {
-  for (const DrawDefault& entry : kDefaults) {
+  for (const DrawDefault& entry : kDrawDefaults) {
     switch (entry.kind) {
     case Kind::kBool:
       settings.SetBool(entry.id, entry.number != 0.0);

@@ -3,11 +3,11 @@
 #include <cstdio>
 #include <cstdlib>
 
-#include "torvane/base_document.h"
-#include "torvane/ge_string.h"
+#include "torvane/document/base_document.h"
 #include "torvane/hooks.h"
-#include "torvane/memory.h"
-#include "torvane/root_list.h"
+#include "torvane/memory/memory.h"
+#include "torvane/nodes/root_list.h"
+#include "torvane/text/ge_string.h"
 
 namespace
 {

@@ -1,0 +1,87 @@
+// One key of an animated value: a time, a value and two tangents.
+#pragma once
+
+#include "torvane/nodes/base_list.h"
+#include "torvane/time/base_time.h"
+
+namespace _torvane_
+{
+
+class CCurve;
+
+// How a curve runs from one key to the next.
+inline constexpr Long kInterpolationSpline = 1;
+inline constexpr Long kInterpolationLinear = 2;
+inline constexpr Long kInterpolationStep = 3;
+
+// Parameters of a key. The node bits that stand behind its switches are listed in ckey.cpp.
+inline constexpr Long kKeyTime = 901;
+inline constexpr Long kKeyLeftTime = 911;
+inline constexpr Long kKeyRightTime = 912;
+inline constexpr Long kKeyLeftValue = 913;
+inline constexpr Long kKeyRightValue = 914;
+inline constexpr Long kKeyInterpolation = 924;
+
+// Node bits of a key that its curve looks at, and the same as masks of GetNBit(-2).
+inline constexpr Long kKeyBitClamp = 41;
+inline constexpr Long kKeyBitAutomatic = 46;
+inline constexpr ULong kKeyMaskClamp = 0x200;       // flat tangents at a turning point or beside an equal value
+inline constexpr ULong kKeyMaskAutomatic = 0x4000;  // tangents follow the neighbours
+inline constexpr ULong kKeyMaskZeroValue = 0x10000; // the tangents' value parts are zero
+inline constexpr ULong kKeyMaskZero = 0x20000;      // the tangents are zero
+
+class CKey : public BaseList2D
+{
+ public:
+  CKey();
+
+  Bool ReadChunk(HyperFile& file, Long id, Long level) override;
+  void WriteChunks(HyperFile& file) override;
+  Bool CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation) override;
+  Bool GetParameter(const ParameterPath& path, GeData& value) override;
+  Bool SetParameter(const ParameterPath& path, const GeData& value) override;
+  GeListNode* MakeClone(ULong flags, TransArray* translation) override;
+  Bool ChangeNBit(Long bit, Long mode) override;
+
+  CKey* GetNext() const { return static_cast<CKey*>(BaseList2D::GetNext()); }
+
+  const BaseTime& GetTime() const { return time_; }
+  // Only for a key that is in no curve: a curve is sorted by the times of its keys.
+  void SetTime(const BaseTime& time) { time_ = time; }
+  Real GetValue() const { return value_; }
+  // The curve that holds the key is not looked at; an equal value isn't stored again.
+  void SetValue(CCurve* curve, Real value);
+  // A value that isn't a number, for tracks that hold such values. Stored only when it differs.
+  void SetGeData(CCurve* curve, const GeData& data);
+  const GeData& GetGeData() const { return keyData_; }
+  Long GetInterpolation() const { return interpolation_; }
+  void SetInterpolation(CCurve* curve, Long type);
+
+  // Offsets of the tangents from the key.
+  const BaseTime& GetLeftTime() const { return leftTime_; }
+  const BaseTime& GetRightTime() const { return rightTime_; }
+  Real GetLeftValue() const { return leftValue_; }
+  Real GetRightValue() const { return rightValue_; }
+  void SetLeft(const BaseTime& time, Real value);
+  void SetRight(const BaseTime& time, Real value);
+
+  // Everything but the time goes back to its default.
+  void Reset();
+  // All fields and the data are equal.
+  Bool IsEqual(const CKey& other) const;
+
+ private:
+  template <class Visitor>
+  Bool VisitBody(Visitor& visitor);
+
+  BaseTime time_;
+  Real value_ = 0.0;
+  Real leftValue_ = 0.0;
+  Real rightValue_ = 0.0;
+  BaseTime leftTime_;
+  BaseTime rightTime_;
+  Long interpolation_ = kInterpolationSpline;
+  GeData keyData_;
+};
+
+} // namespace _torvane_

@@ -1,0 +1,39 @@
+// Chunks of other programs that stand among a node's own.
+#pragma once
+
+#include "torvane/memory/memory.h"
+#include "torvane/types.h"
+
+namespace _torvane_
+{
+
+class HyperFile;
+
+// A list of chunks, in the order in which they were read.
+class KeptChunks
+{
+ public:
+  KeptChunks() = default;
+  ~KeptChunks() { Flush(); }
+  KeptChunks(const KeptChunks&) = delete; // use CopyTo
+  KeptChunks& operator=(const KeptChunks&) = delete;
+
+  Bool IsEmpty() const { return !first_; }
+  void Flush();
+  // Adds the chunk whose start was just read and consumes it with its end. False on an error of the file, which is
+  // FILEERROR_MEMORY when memory is short.
+  Bool Read(HyperFile& file, Long id, Long level);
+  void Write(HyperFile& file) const;
+  // Replaces what the destination has. False when memory is short: the destination is then empty.
+  Bool CopyTo(KeptChunks& destination) const;
+
+ private:
+  struct Chunk;
+
+  Chunk* Append(Long id);
+
+  Chunk* first_ = nullptr; // owned
+  Chunk* last_ = nullptr;
+};
+
+} // namespace _torvane_

@@ -1,0 +1,124 @@
+// The chunk interface: what every persistent thing of the scene model answers, and the one loop that reads chunks.
+#pragma once
+
+#include "torvane/ids.h"
+#include "torvane/links/alias.h"
+#include "torvane/memory/memory.h"
+#include "torvane/memory/private_ge_mtools.h"
+#include "torvane/types.h"
+#include "torvane/values/parameter_path.h"
+
+namespace _torvane_
+{
+
+class BaseList2D;
+class GeData;
+class HyperFile;
+class TransArray;
+
+class PrivateChunk : public GeTempPublicNode2D<PrivateChunk>
+{
+ public:
+  PrivateChunk() = default;
+  ~PrivateChunk() override = default;
+  PrivateChunk(const PrivateChunk&) = delete;
+  PrivateChunk& operator=(const PrivateChunk&) = delete;
+
+  // True for 0, for the node's own type, and for the types of its classes.
+  virtual Bool IsInstanceOf(Long type) const { return type == 0; }
+  // Takes the chunk `id` whose start was just read. True: it was consumed with its end. False: the id isn't known here,
+  // or its content can't be built; the loop then skips the chunk.
+  virtual Bool ReadChunk(HyperFile& file, Long id, Long level);
+  // Called in a loop that keeps going, for a chunk that nobody took and nothing was read of. True: it was kept, and
+  // consumed with its end.
+  virtual Bool KeepChunk(HyperFile&, Long, Long) { return false; }
+  virtual Bool IsRootList() const { return false; }
+  virtual Long GetType() const { return 0; }
+  // Writes the chunks of this node, those of the base class first. Failures show in the file's error.
+  virtual void WriteChunks(HyperFile& file);
+  // Copies this node's content onto `destination`, a node of the same class. `flags` are those of ids.h.
+  virtual Bool CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation);
+  // False when the parameter isn't known here.
+  virtual Bool GetParameter(const ParameterPath& path, GeData& value);
+  virtual Bool SetParameter(const ParameterPath& path, const GeData& value);
+  // The level of the chunk that holds a NodeData's own values.
+  virtual Long GetChunkLevel() const { return 0; }
+
+  // Reads chunks up to the end mark of the chunk that encloses them and hands each to ReadChunk. With `keepGoing` a
+  // chunk that nobody takes is skipped; without it the loop ends there. False on an error, and at the end of the file
+  // (without an error). `tagAlreadyRead` is always false.
+  Bool ReadChunkLoop(HyperFile& file, Bool keepGoing, Bool tagAlreadyRead = false);
+  // The loop with `keepGoing`; with `consumeHeader` the start of the enclosing chunk is read first (an end mark there
+  // passes).
+  Bool ReadChunks(HyperFile& file, Bool consumeHeader);
+  // Chunk (id, 0) around WriteChunks.
+  void WriteAsChunk(HyperFile& file, Long id);
+  // The entry to CopyTo. Without an array, and unless kCopyNoTranslation is set, links inside the copy are translated
+  // here: they point at copies of what was copied along and else at what the source points at.
+  Bool CopyWithTranslation(PrivateChunk& destination, ULong flags, TransArray* translation);
+
+  Bool GetParameterById(Long id, GeData& value);
+  Bool SetParameterById(Long id, const GeData& value);
+
+ private:
+  Bool ReadOneChunk(HyperFile& file, Bool keepGoing, Bool& finished);
+};
+
+// A node with an alias goal and 128 node bits.
+class GeListNode : public PrivateChunk
+{
+ public:
+  GeListNode() : goal_(this) {}
+  ~GeListNode() override = default;
+
+  Bool ReadChunk(HyperFile& file, Long id, Long level) override;
+  void WriteChunks(HyperFile& file) override;
+  Bool CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation) override;
+
+  // True when a derived class writes the goal in a chunk of its own.
+  virtual Bool GoalIsWrittenElsewhere() const { return false; }
+  // A bit number from 0 to 127 gives 0 or 1; -1 to -4 give the whole words 0 to 3. Other negative numbers are reported
+  // and give 0.
+  virtual ULong GetNBit(Long bit) const;
+  // Mode 1 sets, 2 clears, 3 toggles (the bits 0xF0 of the mode are ignored). True when the bit changed. A bit number
+  // from 128 on lands in word 3, modulo 32.
+  virtual Bool ChangeNBit(Long bit, Long mode);
+  // The id that labels the node in its root list.
+  virtual Long GetDiskType() const { return GetType(); }
+  virtual void RemoveFromList();
+  // A new node with the same content, or null. The caller owns it.
+  virtual GeListNode* MakeClone(ULong flags, TransArray* translation);
+
+  GeAliasGoal& GetGoal() { return goal_; }
+  const GeAliasGoal& GetGoal() const { return goal_; }
+
+ protected:
+  GeAliasGoal goal_;
+  ULong nbits_[4] = {0, 0, 0, 0};
+
+ private:
+  template <class Visitor>
+  Bool VisitNodeBits(Visitor& visitor);
+};
+
+// The behaviour of a node: what is particular to its type. Owned by the node.
+class NodeData : public PrivateChunk
+{
+ public:
+  // Called after creation, with the node set; false makes the creation fail.
+  virtual Bool Init() { return true; }
+  // Reads the body of the node data chunk, and other chunks of a polygon object. False: not read; the caller skips.
+  virtual Bool ReadData(HyperFile& file, Long id, Long level);
+  // A hook for clients.
+  virtual Bool Execute() { return false; }
+  // The label of the owner object in its root list.
+  virtual Long GetDiskType() const { return kObjectGeneric; }
+
+  BaseList2D* GetNode() const { return node_; }
+  void SetNode(BaseList2D* node) { node_ = node; }
+
+ protected:
+  BaseList2D* node_ = nullptr; // the owner; not owned
+};
+
+} // namespace _torvane_

@@ -1,0 +1,175 @@
+// Root lists: the owning containers of sibling nodes. A root list is itself a chunk thing, so that a whole sub-tree is
+// written and read by the same loop as a single node. Each class knows how a member is labelled in a file and how a
+// member is made from that label.
+#pragma once
+
+#include "torvane/nodes/private_chunk.h"
+
+namespace _torvane_
+{
+
+class BaseObject;
+class BaseDocument;
+class BaseTag;
+
+class RootList2D : public PrivateChunk
+{
+ public:
+  RootList2D() = default;
+  ~RootList2D() override;
+
+  Bool IsRootList() const override { return true; }
+  Bool ReadChunk(HyperFile& file, Long id, Long level) override;
+  void WriteChunks(HyperFile& file) override;
+  Bool CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation) override;
+
+  BaseList2D* GetFirst() const;
+  BaseList2D* GetLast() const;
+  Bool IsEmpty() const { return GetFirst() == nullptr; }
+
+  // Inserting sets the member's list head and document. Always true; a null node is ignored.
+  Bool InsertFirst(BaseList2D* node);
+  Bool InsertLast(BaseList2D* node);
+  Bool InsertAfter(BaseList2D* node, BaseList2D* reference);  // first when the reference is null
+  Bool InsertBefore(BaseList2D* node, BaseList2D* reference); // first when the reference has no predecessor
+  void RemoveMember(BaseList2D* node);
+  // Deletes all members, first to last.
+  void FreeAll();
+  LLong GetCount() const;
+
+  // The node above the list, or null; set by the owner.
+  BaseList2D* GetOwner() const { return owner_; }
+  void SetOwner(BaseList2D* owner) { owner_ = owner; }
+
+  // The document that members belong to: that of the owner, or the one that was set for a document's own lists.
+  BaseDocument* GetDocument() const;
+  void SetDocument(BaseDocument* document) { document_ = document; }
+
+ protected:
+  // The label of a member's chunk.
+  virtual Long GetMemberLabel(BaseList2D& member) const;
+  // False: an empty list writes nothing at all, not even its outer chunk.
+  virtual Bool IsWrittenWhenEmpty() const { return false; }
+  // Reads a new member through the chunk loop and appends it; a member that reads badly is deleted. True if appended.
+  // Some lists leave the list head of the members that they read unset.
+  Bool ReadMember(HyperFile& file, BaseList2D* member, Bool setListHead);
+  // Appends behind the last member.
+  void Append(BaseList2D* node, Bool setListHead);
+
+ private:
+  GeTempPublicList2D<PrivateChunk> list_;
+  BaseList2D* owner_ = nullptr;
+  BaseDocument* document_ = nullptr;
+};
+
+// Objects: of a document, and the children of each object. Labels are the members' disk types; any is taken on reading.
+class RootObject : public RootList2D
+{
+ public:
+  Bool ReadChunk(HyperFile& file, Long id, Long level) override;
+  // A new object for a label, or null for one that can't be made.
+  virtual BaseObject* AllocMember(Long type);
+};
+
+// Tags of an object.
+class RootTag : public RootList2D
+{
+ public:
+  explicit RootTag(BaseObject* tagOwner) : tagOwner_(tagOwner) {}
+  Bool ReadChunk(HyperFile& file, Long id, Long level) override;
+
+ private:
+  BaseObject* tagOwner_;
+};
+
+// Materials of a document.
+class RootMaterial : public RootList2D
+{
+ public:
+  Bool ReadChunk(HyperFile& file, Long id, Long level) override;
+  virtual BaseList2D* AllocMember(Long type);
+};
+
+// Render settings of a document, and the children of each.
+class RootRenderData : public RootList2D
+{
+ public:
+  Bool ReadChunk(HyperFile& file, Long id, Long level) override;
+  virtual BaseList2D* AllocMember();
+};
+
+// Scene layers of a document, and the children of each.
+class RootLayer : public RootList2D
+{
+ public:
+  Bool ReadChunk(HyperFile& file, Long id, Long level) override;
+  virtual BaseList2D* AllocMember();
+};
+
+// View panels of a document.
+class RootViewPanel : public RootList2D
+{
+ public:
+  Bool ReadChunk(HyperFile& file, Long id, Long level) override;
+
+ protected:
+  Bool IsWrittenWhenEmpty() const override { return true; }
+};
+
+// Draws of a view panel.
+class RootBaseDraw : public RootList2D
+{
+ public:
+  Bool ReadChunk(HyperFile& file, Long id, Long level) override;
+
+ protected:
+  Bool IsWrittenWhenEmpty() const override { return true; }
+};
+
+// A list whose members are all of one class and stand under one label. A member that reads badly stays in the list.
+class FixedLabelRoot : public RootList2D
+{
+ public:
+  FixedLabelRoot(Long label, BaseList2D* (*makeMember)()) : label_(label), makeMember_(makeMember) {}
+  Bool ReadChunk(HyperFile& file, Long id, Long level) override;
+
+ protected:
+  Long GetMemberLabel(BaseList2D&) const override { return label_; }
+  Bool IsWrittenWhenEmpty() const override { return true; }
+
+ private:
+  Long label_;
+  BaseList2D* (*makeMember_)();
+};
+
+class RootMultipass : public FixedLabelRoot
+{
+ public:
+  RootMultipass();
+};
+
+class RootVideoPost : public FixedLabelRoot
+{
+ public:
+  RootVideoPost();
+};
+
+class RootShader : public FixedLabelRoot
+{
+ public:
+  RootShader();
+};
+
+class RootCTrack : public FixedLabelRoot
+{
+ public:
+  RootCTrack();
+};
+
+class RootCKey : public FixedLabelRoot
+{
+ public:
+  RootCKey();
+};
+
+} // namespace _torvane_

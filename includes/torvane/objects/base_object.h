@@ -1,0 +1,213 @@
+// The scene object: a node in the tree with a transform, tags, and a NodeData for what is particular to its type.
+#pragma once
+
+#include "torvane/math/ge_math.h"
+#include "torvane/math/vector.h"
+#include "torvane/nodes/base_list.h"
+#include "torvane/stream/raw_chunk_body.h"
+
+namespace _torvane_
+{
+
+class BaseTag;
+
+// Parameters of every object.
+inline constexpr Long kObjectEditorMode = 901;
+inline constexpr Long kObjectRenderMode = 902;
+inline constexpr Long kObjectRelPos = 903;
+inline constexpr Long kObjectRelRot = 904;
+inline constexpr Long kObjectRelScale = 905;
+inline constexpr Long kObjectEnabled = 906;
+inline constexpr Long kObjectColorMode = 907;
+inline constexpr Long kObjectDisplayColor = 908;
+inline constexpr Long kObjectDisplayFlag = 909;
+inline constexpr Long kObjectGlobalPos = 910;
+inline constexpr Long kObjectGlobalRot = 911;
+inline constexpr Long kObjectStoredVector = 912;
+inline constexpr Long kObjectStoredMode = 913;
+inline constexpr Long kObjectFrozenPos = 917;
+inline constexpr Long kObjectFrozenRot = 918;
+inline constexpr Long kObjectFrozenScale = 919;
+inline constexpr Long kObjectAbsPos = 925;
+inline constexpr Long kObjectAbsRot = 926;
+inline constexpr Long kObjectAbsScale = 927;
+inline constexpr Long kObjectRotationOrder = 928;
+
+// Editor and render modes.
+inline constexpr Long kObjectModeOn = 0;
+inline constexpr Long kObjectModeOff = 1;
+inline constexpr Long kObjectModeUndefined = 2;
+
+// Bits of GetFrozenFlags.
+inline constexpr ULong kFrozenPos = 2;
+inline constexpr ULong kFrozenRot = 4;
+inline constexpr ULong kFrozenScale = 8;
+
+class BaseObject : public BaseList4D
+{
+ public:
+  // Makes its child list through the client's hook.
+  explicit BaseObject(Long type);
+  ~BaseObject() override;
+
+  Bool IsInstanceOf(Long type) const override;
+  Bool ReadChunk(HyperFile& file, Long id, Long level) override;
+  void WriteChunks(HyperFile& file) override;
+  Bool CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation) override;
+  Bool GetParameter(const ParameterPath& path, GeData& value) override;
+  Bool SetParameter(const ParameterPath& path, const GeData& value) override;
+  Long GetDiskType() const override;
+  GeListNode* MakeClone(ULong flags, TransArray* translation) override;
+  void SetDocument(BaseDocument* document) override;
+  // The object data's Execute; false without object data.
+  virtual Bool Execute();
+
+  BaseObject* GetUp() const { return static_cast<BaseObject*>(BaseList4D::GetUp()); }
+  BaseObject* GetDown() const { return static_cast<BaseObject*>(BaseList4D::GetDown()); }
+  BaseObject* GetDownLast() const { return static_cast<BaseObject*>(BaseList4D::GetDownLast()); }
+  BaseObject* GetNext() const { return static_cast<BaseObject*>(BaseList4D::GetNext()); }
+  BaseObject* GetPrev() const { return static_cast<BaseObject*>(BaseList4D::GetPrev()); }
+
+  RootTag& GetTagRoot() { return tags_; }
+  BaseTag* GetFirstTag() const;
+  // The first tag of a type; a plug-in tag is found by its plug-in type. Null if there is none.
+  BaseTag* GetTag(Long type) const;
+  void InsertTag(BaseTag* tag, BaseTag* after = nullptr); // first when `after` is null
+  // A new tag, inserted first; null when memory is short.
+  BaseTag* MakeTag(Long type);
+
+  NodeData* GetObjectData() const { return objectData_; }
+  // Replaces the object data and sets its node; the object owns it.
+  void SetObjectData(NodeData* data);
+
+  // The payload of an object whose type the client doesn't know.
+  const void* GetRawData() const { return raw_.GetData(); }
+  LLong GetRawSize() const { return raw_.GetSize(); }
+  Long GetRawLevel() const { return raw_.GetLevel(); }
+
+  // Relative: what a user and the animation work with. Absolute: in the parent's system, frozen part included. Angles
+  // in radians, in the object's rotation order.
+  const Vector& GetRelPos() const { return relPos_; }
+  const Vector& GetRelRot() const { return relRot_; }
+  const Vector& GetRelScale() const { return relScale_; }
+  const Vector& GetFrozenPos() const { return frozenPos_; }
+  const Vector& GetFrozenRot() const { return frozenRot_; }
+  const Vector& GetFrozenScale() const { return frozenScale_; }
+  const Vector& GetAbsPos() const { return absPos_; }
+  const Vector& GetAbsRot() const { return absRot_; }
+  const Vector& GetAbsScale() const { return absScale_; }
+  ULong GetFrozenFlags() const { return frozenFlags_; }
+  Long GetRotationOrder() const { return rotationOrder_; }
+
+  const Matrix& GetLocalMatrix();
+  Matrix GetGlobalMatrix();
+  Matrix GetUpGlobalMatrix() const; // of the parent; identity without one
+  Matrix GetNormalizedLocalMatrix() const;
+  Matrix GetNormalizedGlobalMatrix();
+  Matrix GetRelativeMatrix() const;
+  Matrix GetRelativeNormalizedMatrix() const;
+  Matrix GetFrozenTransformMatrix() const;
+  const Matrix& GetStoredMatrix() const { return storedMatrix_; }
+
+  // Every setter of the transform does nothing on an object with a Protection Tag (5629).
+  void SetRelPos(const Vector& value);
+  void SetRelRot(const Vector& value);
+  void SetRelScale(const Vector& value);
+  void SetAbsPos(const Vector& value);
+  void SetAbsRot(const Vector& value);
+  void SetAbsScale(const Vector& value);
+  void SetFrozenPos(const Vector& value);
+  void SetFrozenRot(const Vector& value);
+  void SetFrozenScale(const Vector& value);
+  void SetRotationOrder(Long order);
+  void SetRelativeMatrix(const Matrix& matrix);
+  void SetLocalMatrix(const Matrix& matrix);
+  void SetGlobalMatrix(const Matrix& matrix);
+
+  Long GetEditorMode() const { return editorMode_; }
+  void SetEditorMode(Long mode) { editorMode_ = mode; }
+  Long GetRenderMode() const { return renderMode_; }
+  void SetRenderMode(Long mode) { renderMode_ = mode; }
+  Long GetDisabled() const { return disabled_; }
+  void SetDisabled(Long disabled) { disabled_ = disabled; }
+
+ protected:
+  Matrix matrixCache_;
+  Bool matrixDirty_ = true;
+  RawChunkBody raw_; // of the chunk kChunkNodeData, when there is no object data
+  Vector relPos_;
+  Vector relRot_;
+  Vector relScale_ = Vector(1.0, 1.0, 1.0);
+  Vector frozenPos_;
+  Vector frozenScale_ = Vector(1.0, 1.0, 1.0);
+  Vector frozenRot_;
+  Vector absRot_;
+  Vector absPos_;
+  Vector absScale_ = Vector(1.0, 1.0, 1.0);
+  Matrix frozenMatrix_;
+  Matrix frozenInverse_;
+  ULong frozenFlags_ = 0;
+  Long rotationOrder_ = kRotationOrderScene;
+  Matrix rotationMatrix_;
+  Matrix storedMatrix_; // kept and handed on
+  RootTag tags_;
+  Long editorMode_ = kObjectModeUndefined;
+  Long renderMode_ = kObjectModeUndefined;
+  Long disabled_ = 0;
+  Bool displayFlag_ = false;
+  Vector displayColor_ = Vector(1.0, 1.0, 1.0);
+  Long colorMode_ = 0;
+  Long storedMode_ = 0;
+  Vector storedVector_;
+  RootObject* legacyListA_ = nullptr; // read from old files only; owned
+  RootObject* legacyListB_ = nullptr;
+  NodeData* objectData_ = nullptr; // owned
+
+ private:
+  struct LongParameter;
+  struct VectorParameter;
+  static const LongParameter kLongParameters[];
+  static const VectorParameter kVectorParameters[];
+
+  Bool IsProtected() const { return GetTag(kTagProtection) != nullptr; }
+  Bool HasFrozenTransform() const { return (frozenFlags_ & (kFrozenPos | kFrozenRot | kFrozenScale)) != 0; }
+  Matrix GetRotation() const;
+  Vector DerivedAbsPos() const;
+  Vector DerivedAbsRot() const;
+  Vector DerivedAbsScale() const;
+  void TakeRelAsAbs();
+  void SetFrozenFlag(ULong flag, Bool set) { frozenFlags_ = set ? frozenFlags_ | flag : frozenFlags_ & ~flag; }
+  Vector GetGlobalAngles();
+  void SetGlobalPos(const Vector& value);
+  void SetGlobalAngles(const Vector& value);
+  Vector TakeDisplayColor();
+  template <class Visitor>
+  Bool VisitTransform(Visitor& v);
+  template <class Visitor>
+  void VisitDisplay(Visitor& v);
+  template <class Visitor>
+  void VisitFrozen(Visitor& v);
+  template <class Visitor>
+  void VisitMirroring(Visitor& v);
+  template <class Visitor>
+  void VisitLegacyList(Visitor& v, RootObject*& list);
+  Bool ReadTransform(HyperFile& file, Long level);
+  Bool ReadChildren(HyperFile& file);
+  Bool ReadObjectData(HyperFile& file, Long id, Long level);
+  void StoreModelCheckSum();
+  Bool KeepsChunksBesideTransform() const;
+  void WriteObjectData(HyperFile& file);
+  Bool CopyObjectData(BaseObject& destination, ULong flags, TransArray* translation) const;
+  void CopyTransform(BaseObject& destination) const;
+  Bool CloneChildren(BaseObject& destination, ULong flags, TransArray* translation) const;
+};
+
+// A new object of a type with its object data; null for a type that can't be made and when memory is short. The caller
+// owns it.
+BaseObject* AllocObject(Long type);
+
+// A new object data for a type by the same table, without asking for a class; null where none is due. `known` tells
+// whether the type stands in the table.
+NodeData* AllocObjectDataOfType(Long type, Bool& known);
+
+} // namespace _torvane_

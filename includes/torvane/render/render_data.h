@@ -1,0 +1,93 @@
+// Render settings: about 130 values in the node's container, video post effects and multipass objects.
+#pragma once
+
+#include "torvane/nodes/base_list.h"
+
+namespace _torvane_
+{
+
+// Settings that the exporter gives a meaning to.
+inline constexpr Long kRenderWidth = 5008;         // Real, pixels
+inline constexpr Long kRenderHeight = 5009;        // Real, pixels
+inline constexpr Long kRenderFrameSequence = 5016; // how the frame range is chosen
+inline constexpr Long kRenderFrameFrom = 5017;     // BaseTime
+inline constexpr Long kRenderFrameTo = 5018;       // BaseTime
+inline constexpr Long kRenderFrameRate = 5020;     // Real, frames per second
+inline constexpr Long kRenderFilmAspect = 6006;    // Real
+inline constexpr Long kRenderPixelAspect = 6008;   // Real
+
+// Chunks of render settings.
+inline constexpr Long kChunkVideoPosts = 110130;
+inline constexpr Long kChunkMultipasses = 300001049;
+inline constexpr Long kChunkRenderExtra = 300001047;
+inline constexpr Long kChunkMultipassData = 300001048;
+inline constexpr Long kChunkVideoPostData = 300001060;
+
+class RenderData : public BaseList4D
+{
+ public:
+  // With every default, in the order in which a file holds them.
+  RenderData();
+
+  Bool ReadChunk(HyperFile& file, Long id, Long level) override;
+  void WriteChunks(HyperFile& file) override;
+  Bool CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation) override;
+  GeListNode* MakeClone(ULong flags, TransArray* translation) override;
+  void SetDocument(BaseDocument* document) override;
+
+  RenderData* GetNext() const { return static_cast<RenderData*>(BaseList4D::GetNext()); }
+  RenderData* GetDown() const { return static_cast<RenderData*>(BaseList4D::GetDown()); }
+  RootVideoPost& GetVideoPosts() { return videoPosts_; }
+  RootMultipass& GetMultipasses() { return multipasses_; }
+  BaseContainer& GetExtraData() { return extraData_; }
+
+ private:
+  Bool MakeChildList();
+
+  RootVideoPost videoPosts_;
+  RootMultipass multipasses_;
+  BaseContainer extraData_;
+};
+
+class MultipassObject : public BaseList4D
+{
+ public:
+  MultipassObject();
+
+  Bool ReadChunk(HyperFile& file, Long id, Long level) override;
+  void WriteChunks(HyperFile& file) override;
+  Bool CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation) override;
+  GeListNode* MakeClone(ULong flags, TransArray* translation) override;
+
+  BaseContainer& GetSettings() { return settings_; }
+
+ private:
+  BaseContainer settings_;
+};
+
+class BaseVideoPost : public BaseList2D
+{
+ public:
+  BaseVideoPost();
+
+  Bool ReadChunk(HyperFile& file, Long id, Long level) override;
+  void WriteChunks(HyperFile& file) override;
+  Bool CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation) override;
+  GeListNode* MakeClone(ULong flags, TransArray* translation) override;
+
+  BaseContainer& GetSettings() { return settings_; }
+  Long GetPluginId() const { return pluginId_; }
+  void SetPluginId(Long id) { pluginId_ = id; }
+
+ private:
+  template <class Visitor>
+  Bool VisitHead(Visitor& visitor);
+
+  BaseContainer settings_;
+  Long pluginId_ = 0;
+};
+
+// A new set of render settings that the caller owns; null when memory is short.
+RenderData* AllocRenderData();
+
+} // namespace _torvane_

@@ -1,0 +1,44 @@
+// The content of a chunk that nobody here understands, kept as it stood in the file.
+#pragma once
+
+#include "torvane/memory/memory.h"
+#include "torvane/types.h"
+
+namespace _torvane_
+{
+
+class HyperFile;
+
+// Owns its bytes: values and nested chunks with their tags, without the end tag of the chunk itself. The bytes are
+// those of the file, but Reals of a single-precision file are widened: no file is written in that precision, and a body
+// that kept it would throw every later value out of step.
+class RawChunkBody
+{
+ public:
+  RawChunkBody() = default;
+  ~RawChunkBody() { Free(); }
+  RawChunkBody(const RawChunkBody&) = delete; // use CopyTo
+  RawChunkBody& operator=(const RawChunkBody&) = delete;
+
+  const void* GetData() const { return data_; } // null when there are no bytes
+  LLong GetSize() const { return size_; }
+  // The level of the chunk that the bytes came from.
+  Long GetLevel() const { return level_; }
+  void SetLevel(Long level) { level_ = level; }
+
+  // Drops the bytes and sets the level to 0.
+  void Free();
+  // Replaces the content by the rest of the chunk that the stream stands in, whose end tag is consumed.
+  Bool Read(HyperFile& file, Long level);
+  // Writes the bytes; the caller opens the chunk, with GetLevel, and closes it.
+  void Write(HyperFile& file) const;
+  // Gives the destination the level and a copy of the bytes. False when memory is short: it then has no bytes.
+  Bool CopyTo(RawChunkBody& destination) const;
+
+ private:
+  void* data_ = nullptr;
+  LLong size_ = 0;
+  Long level_ = 0;
+};
+
+} // namespace _torvane_

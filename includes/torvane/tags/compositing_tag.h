@@ -1,0 +1,21 @@
+// Render flags of an object. All of them are entries of the tag's container.
+#pragma once
+
+#include "torvane/tags/base_tag.h"
+
+namespace _torvane_
+{
+
+inline constexpr Long kCompositingClock = 1157; // Long: milliseconds of a clock when the tag was made
+
+class CompositingTag : public BaseTag
+{
+ public:
+  // Sets every default.
+  CompositingTag();
+
+  // Also takes the tag's own chunk of old files, whose values become entries.
+  Bool ReadChunk(HyperFile& file, Long id, Long level) override;
+};
+
+} // namespace _torvane_

@@ -1,0 +1,77 @@
+// The layout of a document's views: panels, each with up to four draws. A draw is one view: its display settings, a
+// camera of its own, and a link to the scene camera that it looks through.
+#pragma once
+
+#include "torvane/nodes/base_list.h"
+
+namespace _torvane_
+{
+
+class BaseObject;
+
+// Chunks of views.
+inline constexpr Long kChunkBaseDraw = 110305;
+inline constexpr Long kLevelBaseDraw = 2;
+inline constexpr Long kChunkViewPanel = 110306;
+inline constexpr Long kChunkBaseDrawRoot = 110124;
+
+// Preferences of a draw. They have no data, and nothing of them stands in a file.
+class BaseDrawPref : public PrivateChunk
+{};
+
+class BaseDraw : public BaseList2D
+{
+ public:
+  // With every default display setting, and an editor camera of its own; see IsComplete.
+  BaseDraw();
+  ~BaseDraw() override;
+
+  // False when the editor camera could not be made: the draw is of no use then.
+  Bool IsComplete() const { return editorCamera_ != nullptr; }
+
+  Bool ReadChunk(HyperFile& file, Long id, Long level) override;
+  void WriteChunks(HyperFile& file) override;
+  Bool CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation) override;
+  GeListNode* MakeClone(ULong flags, TransArray* translation) override;
+  void SetDocument(BaseDocument* document) override;
+
+  BaseDraw* GetNext() const { return static_cast<BaseDraw*>(BaseList2D::GetNext()); }
+  GeAliasLink& GetSceneCamera() { return sceneCamera_; }
+  BaseObject* GetEditorCamera() const { return editorCamera_; } // the draw owns it
+
+ private:
+  template <class Visitor>
+  Bool VisitBody(Visitor& visitor);
+
+  BaseDrawPref pref_;
+  GeAliasLink sceneCamera_;
+  BaseObject* editorCamera_ = nullptr; // owned
+};
+
+class ViewPanel : public BaseList2D
+{
+ public:
+  ViewPanel();
+
+  Bool ReadChunk(HyperFile& file, Long id, Long level) override;
+  void WriteChunks(HyperFile& file) override;
+  Bool CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation) override;
+  GeListNode* MakeClone(ULong flags, TransArray* translation) override;
+  void SetDocument(BaseDocument* document) override;
+
+  ViewPanel* GetNext() const { return static_cast<ViewPanel*>(BaseList2D::GetNext()); }
+  RootBaseDraw& GetDraws() { return draws_; }
+  BaseContainer& GetSettings() { return settings_; }
+
+  // The draw of an index, which is brought into the range 0 to 3. A panel with fewer than four draws first gets four
+  // new ones at the head of its list: the perspective view, then the three along the axes. Null when memory is short.
+  BaseDraw* GetBaseDraw(Long index);
+
+ private:
+  Bool MakeDraws();
+
+  RootBaseDraw draws_;
+  BaseContainer settings_;
+};
+
+} // namespace _torvane_

@@ -1,0 +1,32 @@
+// The operating system's file calls: paths of UTF-16 characters, 64-bit positions, and the sharing rules where there
+// are any.
+#pragma once
+
+#include <cstdio>
+
+#include "torvane/text/ge_string.h"
+#include "torvane/types.h"
+
+namespace _torvane_
+{
+
+// Opens `path` in a FileMode. The stream is not inherited by child processes. Null when that fails, for a directory
+// and for a path that holds a character 0. The caller closes the stream with fclose.
+std::FILE* OpenDiskFile(const String& path, Long mode);
+
+// Positions the stream, from its start.
+Bool SeekDiskFile(std::FILE* file, LLong position);
+
+// The length of the file; the stream stands at its end then.
+Bool MeasureDiskFile(std::FILE* file, LLong& length);
+
+enum class PathKind : UChar
+{
+  kNothing,
+  kFile, // all that is no directory
+  kDirectory,
+};
+
+PathKind LookUpPath(const String& path);
+
+} // namespace _torvane_

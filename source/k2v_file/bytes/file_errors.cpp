@@ -1,0 +1,40 @@
+#include "torvane/bytes/file_errors.h"
+
+namespace _torvane_
+{
+
+namespace
+{
+
+struct ErrorText
+{
+  Long code;
+  const char* text;
+};
+
+constexpr ErrorText kErrorTexts[] = {
+    {FILEERROR_NONE, "no error"},
+    {FILEERROR_OPEN, "the file could not be opened"},
+    {FILEERROR_CLOSE, "the file could not be closed"},
+    {FILEERROR_READ, "a read came short"},
+    {FILEERROR_WRITE, "a write came short"},
+    {FILEERROR_SEEK, "positioning failed"},
+    {FILEERROR_INVALID, "the operation does not fit the state of the file"},
+    {FILEERROR_MEMORY, "not enough memory"},
+    {FILEERROR_WRONG_VALUE, "a value is not of the expected kind"},
+    {FILEERROR_CHUNK_STRUCTURE, "the chunk structure is damaged"},
+    {FILEERROR_PREMATURE_END, "the file ends inside a chunk"},
+};
+
+} // namespace
+
+const char* GetFileErrorText(Long code)
+{
+  for (const ErrorText& error : kErrorTexts) {
+    if (error.code == code)
+      return error.text;
+  }
+  return "unknown error";
+}
+
+} // namespace _torvane_

@@ -1,0 +1,28 @@
+#include "torvane/memory/memory.h"
+
+#include <cstring>
+
+#include "torvane/hooks.h"
+
+namespace _torvane_
+{
+
+void* GeAlloc(LLong size) noexcept { return size > 0 ? MemAllocClear(size) : nullptr; }
+
+void* GeAllocNC(LLong size) noexcept { return size > 0 ? MemAlloc(size) : nullptr; }
+
+void* GeRealloc(void* block, LLong size) noexcept { return MemRealloc(block, size); }
+
+void GeCopyMem(void* destination, const void* source, LLong size) noexcept
+{
+  if (destination && source && size > 0)
+    std::memcpy(destination, source, static_cast<std::size_t>(size));
+}
+
+void detail::FreeBlock(void* block) noexcept
+{
+  if (block)
+    MemFree(&block);
+}
+
+} // namespace _torvane_

@@ -1,0 +1,283 @@
+// Walking by tags: skipping values and chunks, raw chunks, containers.
+#include "k2v_file/stream/value_sizes.h"
+#include "torvane/stream/hyper_file.h"
+#include "torvane/values/base_container.h"
+
+namespace _torvane_
+{
+
+namespace
+{
+
+constexpr Long kContainerChunk = 132;
+constexpr Long kContainerLevel = 1;
+
+// Files below this version count some legacy arrays by another element size than they hold, unless their Reals are
+// floats.
+constexpr Long kTrueLegacyLengths = 11925;
+
+// Where the type and the value of a container's element stand, with their tags, behind its id, and the sizes of whole
+// elements.
+constexpr LLong kElementType = 5;
+constexpr LLong kElementValue = 10;
+constexpr LLong kLongElementSize = 15;
+constexpr LLong kRealElementSize = 19;
+
+// The id and value of an element that is a Long or a double, and its size; 0 for any other one. `next` is null or the
+// place of kRealElementSize bytes.
+LLong GetNumberElement(const UChar* next, Long& id, GeData& number)
+{
+  if (!next || next[0] != kTagLong || next[kElementType] != kTagLong)
+    return 0;
+  const auto type = static_cast<Long>(bytes::GetBig<ULong>(next + kElementType + 1));
+  const UChar tag = next[kElementValue];
+  const UChar* value = next + kElementValue + 1;
+  if (type == kDataLong && tag == kTagLong)
+    number = GeData(static_cast<Long>(bytes::GetBig<ULong>(value)));
+  else if (type == kDataReal && tag == kTagReal)
+    number = GeData(bytes::CleanReal(bytes::GetBig<ULLong>(value)));
+  else
+    return 0;
+  id = static_cast<Long>(bytes::GetBig<ULong>(next + 1));
+  return type == kDataLong ? kLongElementSize : kRealElementSize;
+}
+
+} // namespace
+
+Bool HyperFile::WriteChunkStart(Long id, Long level)
+{
+  if (error_ != FILEERROR_NONE)
+    return false;
+  LLong start = file_.GetPosition();
+  UChar raw[9];
+  UChar* place = TakeRoom(raw, sizeof raw);
+  place[0] = kTagChunkStart;
+  bytes::PutBig(place + 1, static_cast<ULong>(id));
+  bytes::PutBig(place + 5, static_cast<ULong>(level));
+  if (!FinishRoom(place, raw, sizeof raw))
+    return FailFromFile(start);
+  TickWrite();
+  return true;
+}
+
+Bool HyperFile::WriteChunkEnd()
+{
+  if (error_ != FILEERROR_NONE)
+    return false;
+  LLong start = file_.GetPosition();
+  UChar raw[1];
+  UChar* place = TakeRoom(raw, sizeof raw);
+  place[0] = kTagChunkEnd;
+  if (!FinishRoom(place, raw, sizeof raw))
+    return FailFromFile(start);
+  TickWrite();
+  return true;
+}
+
+Bool HyperFile::ReadChunkStart(Long& id, Long& level)
+{
+  if (error_ != FILEERROR_NONE)
+    return false;
+  if (!ReadPlainLong(id) || !ReadPlainLong(level))
+    return false;
+  TickRead();
+  return true;
+}
+
+Bool HyperFile::ReadChunkEndMark()
+{
+  if (error_ != FILEERROR_NONE)
+    return false;
+  return mode_ != kHyperFileWrite || Fail(FILEERROR_WRITE, file_.GetPosition());
+}
+
+// Moves over `count` bytes; a count past the end is the error of a read that comes short.
+Bool HyperFile::Drop(LLong count, LLong position)
+{
+  if (file_.ReadWindow(count)) {
+    file_.CommitRead(count);
+    return true;
+  }
+  LLong remaining = file_.GetRemaining();
+  if (remaining >= 0 && count > remaining)
+    file_.SetError(FILEERROR_READ);
+  else if (file_.Seek(count, kSeekRelative))
+    return true;
+  return FailFromFile(position);
+}
+
+Bool HyperFile::SkipValue(UChar tag)
+{
+  if (error_ != FILEERROR_NONE)
+    return false;
+  LLong start = file_.GetPosition() - 1;
+  LLong count = 0;
+  if (tag < kTagMemory) {
+    count = kBodySizeTable.size[singlePrecision_ ? 1 : 0][tag];
+    if (count == kNoValue)
+      return Fail(FILEERROR_WRONG_VALUE, start);
+  } else if (tag <= kTagArray) {
+    // All of them by a 32-bit length, so that a memory block with a 64-bit length can't be passed over.
+    Long length = 0;
+    if (!ReadPlainLong(length))
+      return false;
+    count = static_cast<ULong>(length);
+    if (version_ < kTrueLegacyLengths && !singlePrecision_ && tag == kTagLegacyPointArray)
+      count *= 2;
+    if (version_ < kTrueLegacyLengths && !singlePrecision_ && tag == kTagLegacyArray)
+      count = count / 44 * 84;
+  } else {
+    return Fail(FILEERROR_WRONG_VALUE, start);
+  }
+  if (!Drop(count, start))
+    return false;
+  TickRead();
+  return true;
+}
+
+Bool HyperFile::SkipToEndChunk()
+{
+  if (error_ != FILEERROR_NONE)
+    return false;
+  LLong depth = 0;
+  do {
+    UChar tag = 0;
+    if (!ReadValueHeader(tag))
+      break;
+    if (tag == kTagChunkEnd && --depth < 0)
+      return true;
+    if (tag == kTagChunkStart)
+      ++depth;
+    if (tag != kTagChunkEnd)
+      SkipValue(tag);
+  } while (error_ == FILEERROR_NONE && file_.GetPosition() < length_);
+  return error_ != FILEERROR_NONE && Fail(FILEERROR_PREMATURE_END, file_.GetPosition());
+}
+
+Bool HyperFile::ReadRawChunk(void*& data, LLong& size, Bool withoutEnd)
+{
+  data = nullptr;
+  size = 0;
+  if (error_ != FILEERROR_NONE)
+    return false;
+  LLong start = file_.GetPosition();
+  SkipToEndChunk();
+  LLong count = file_.GetPosition() - start;
+  if (withoutEnd && count > 0)
+    --count;
+  if (error_ != FILEERROR_NONE)
+    return false;
+  if (count == 0)
+    return true;
+  void* block = GeAllocNC(count);
+  if (!block)
+    return Fail(FILEERROR_MEMORY, start);
+  if (!file_.Seek(start) || file_.ReadBytes(block, count) != count || (withoutEnd && !file_.Seek(1, kSeekRelative))) {
+    GeFree(block);
+    return Fail(FILEERROR_SEEK, start);
+  }
+  data = block;
+  size = count;
+  return true;
+}
+
+Bool HyperFile::WriteRawChunk(const void* data, LLong size, Bool withoutEnd)
+{
+  if (error_ != FILEERROR_NONE)
+    return false;
+  if (!data)
+    return withoutEnd || WriteChunkEnd();
+  LLong start = file_.GetPosition();
+  return file_.WriteBytes(data, size) || FailFromFile(start);
+}
+
+Bool HyperFile::WriteContainer(const BaseContainer& container)
+{
+  if (!EnterLoop())
+    return false;
+  WriteChunkStart(kContainerChunk, kContainerLevel);
+  WriteLong(container.GetId());
+  BaseContainer::Iterator iterator;
+  Long id = 0;
+  GeData* value = nullptr;
+  for (Bool more = container.BrowseFirst(iterator, id, value); more && error_ == FILEERROR_NONE;
+       more = container.BrowseNext(iterator, id, value)) {
+    if (value->GetType() == kDataPointer)
+      continue;
+    WriteLong(id);
+    value->Write(*this);
+  }
+  LeaveLoop();
+  return WriteChunkEnd();
+}
+
+Bool HyperFile::ReadContainer(BaseContainer& container, Bool flush)
+{
+  if (!EnterLoop())
+    return false;
+  if (flush)
+    container.Flush();
+  LLong start = file_.GetPosition();
+  UChar tag = 0;
+  Bool read = false;
+  if (ReadValueHeader(tag)) {
+    if (tag == kTagChunkStart)
+      read = ReadContainerChunk(container, flush);
+    else if (tag == kTagLegacyContainer)
+      read = ReadContainerLegacy(container, flush);
+    else
+      Fail(FILEERROR_WRONG_VALUE, start);
+  }
+  LeaveLoop();
+  return read;
+}
+
+Bool HyperFile::ReadContainerChunk(BaseContainer& container, Bool flush)
+{
+  LLong start = file_.GetPosition() - 1;
+  Long id = 0;
+  Long level = 0;
+  if (!ReadPlainLong(id) || !ReadPlainLong(level))
+    return false;
+  if (id != kContainerChunk)
+    return Fail(FILEERROR_WRONG_VALUE, start);
+  if (level < kContainerLevel)
+    return true;
+  if (!ReadLong(id))
+    return false;
+  container.SetId(id);
+  // Most elements are numbers: these are taken straight out of the buffer, as long as it holds the longest of them.
+  const Bool numbersInBuffer = flush && !singlePrecision_;
+  while (error_ == FILEERROR_NONE) {
+    GeData number;
+    const LLong size = numbersInBuffer ? GetNumberElement(file_.ReadWindow(kRealElementSize), id, number) : 0;
+    if (size > 0 && container.InsertData(id, std::move(number))) {
+      file_.CommitRead(size);
+      TickRead(); // the type's
+      TickRead();
+      continue;
+    }
+    UChar tag = 0;
+    if (!ReadValueHeader(tag) || tag == kTagChunkEnd)
+      break;
+    if (tag != kTagLong)
+      return FailFromFile();
+    if (!ReadPlainLong(id))
+      return false;
+    GeData* value = PlaceElement(container, flush, id);
+    if (!value || !value->Read(*this))
+      return false;
+  }
+  return error_ == FILEERROR_NONE;
+}
+
+// The element that a value of that id is to be read into, empty.
+GeData* HyperFile::PlaceElement(BaseContainer& container, Bool flush, Long id)
+{
+  GeData* value = flush ? container.InsertData(id, GeData()) : container.SetData(id, GeData());
+  if (!value)
+    Fail(FILEERROR_MEMORY, file_.GetPosition());
+  return value;
+}
+
+} // namespace _torvane_

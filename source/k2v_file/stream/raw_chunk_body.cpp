@@ -1,0 +1,46 @@
+#include "torvane/stream/raw_chunk_body.h"
+
+#include "k2v_file/stream/raw_values.h"
+#include "torvane/stream/hyper_file.h"
+
+namespace _torvane_
+{
+
+void RawChunkBody::Free()
+{
+  GeFree(data_);
+  size_ = 0;
+  level_ = 0;
+}
+
+Bool RawChunkBody::Read(HyperFile& file, Long level)
+{
+  Free();
+  level_ = level;
+  if (!file.ReadRawChunk(data_, size_, true))
+    return false;
+  if (!file.IsSinglePrecision() || WidenReals(data_, size_))
+    return true;
+  file.SetError(FILEERROR_MEMORY);
+  return false;
+}
+
+void RawChunkBody::Write(HyperFile& file) const { file.WriteRawChunk(data_, size_, true); }
+
+Bool RawChunkBody::CopyTo(RawChunkBody& destination) const
+{
+  if (&destination == this)
+    return true;
+  destination.Free();
+  destination.level_ = level_;
+  if (size_ <= 0)
+    return true;
+  destination.data_ = GeAllocNC(size_);
+  if (!destination.data_)
+    return false;
+  GeCopyMem(destination.data_, data_, size_);
+  destination.size_ = size_;
+  return true;
+}
+
+} // namespace _torvane_

@@ -1,0 +1,528 @@
+#include "torvane/values/base_container.h"
+
+#include <bit>
+
+#include "torvane/memory/assertion.h"
+
+namespace _torvane_
+{
+
+namespace
+{
+
+constexpr const char* kModule = "k2v_file";
+constexpr Long kFirstBlock = 2;
+constexpr Long kLargestBlock = 64;
+constexpr ULLong kSameBits = 8; // Reals whose bit patterns are closer than this count as the same
+
+constinit const GeData kNothing{};
+
+Bool IsSameReal(Real a, Real b)
+{
+  LLong x = std::bit_cast<LLong>(a);
+  LLong y = std::bit_cast<LLong>(b);
+  ULLong distance =
+      x > y ? static_cast<ULLong>(x) - static_cast<ULLong>(y) : static_cast<ULLong>(y) - static_cast<ULLong>(x);
+  return distance < kSameBits;
+}
+
+Bool IsSameVector(const Vector& a, const Vector& b)
+{
+  return IsSameReal(a.x, b.x) && IsSameReal(a.y, b.y) && IsSameReal(a.z, b.z);
+}
+
+// True if a value of the same type doesn't count as a change.
+Bool IsSameValue(const GeData& a, const GeData& b)
+{
+  switch (a.GetRawType()) {
+  case kDataReal:
+    return IsSameReal(a.GetReal(), b.GetReal());
+  case kDataVector:
+    return IsSameVector(a.GetVector(), b.GetVector());
+  default:
+    return a.IsEqual(b);
+  }
+}
+
+} // namespace
+
+// A run of places for elements, which follow. Elements never move: their values are handed out by address.
+struct BaseContainer::Block
+{
+  Block* next;
+  Long capacity;
+  Long used;
+
+  Element* Elements() { return reinterpret_cast<Element*>(this + 1); }
+};
+
+// ---------------------------------------------------------------------------------------------------------------
+
+BaseContainer::BaseContainer(const BaseContainer& other) : id_(other.id_)
+{
+  if (!AppendCopies(other, 0, nullptr))
+    FreeElements();
+}
+
+BaseContainer::BaseContainer(BaseContainer&& other) noexcept : id_(other.id_)
+{
+  Swap(other);
+  dirty_ = other.dirty_;
+  savedDirty_ = other.savedDirty_;
+}
+
+// CopyTo leaves a container that is copied to itself alone.
+// NOLINTNEXTLINE(bugprone-unhandled-self-assignment)
+BaseContainer& BaseContainer::operator=(const BaseContainer& other)
+{
+  if (this != &other && !other.CopyTo(*this, 0, nullptr))
+    Flush();
+  return *this;
+}
+
+BaseContainer& BaseContainer::operator=(BaseContainer&& other) noexcept
+{
+  if (this == &other)
+    return *this;
+  BaseContainer taken(std::move(other)); // `other` may lie inside of this container
+  Swap(taken);
+  id_ = taken.id_;
+  ++dirty_;
+  return *this;
+}
+
+BaseContainer::~BaseContainer() { FreeElements(); }
+
+// Exchanges the elements.
+void BaseContainer::Swap(BaseContainer& other)
+{
+  std::swap(head_, other.head_);
+  std::swap(tail_, other.tail_);
+  std::swap(free_, other.free_);
+  std::swap(blocks_, other.blocks_);
+}
+
+// The places of a small container stay: most often the elements that a file holds take those of the defaults.
+void BaseContainer::Flush()
+{
+  dirty_ = static_cast<UWord>(dirty_ + GetCount());
+  if (!tail_ || blocks_->capacity == kLargestBlock)
+    return FreeElements();
+  for (Element* element = head_; element; element = element->next)
+    element->value.Free();
+  tail_->next = free_;
+  free_ = head_;
+  head_ = tail_ = nullptr;
+}
+
+// Containers that lie in containers are put into a list and freed one after the other, however deep they are nested.
+void BaseContainer::FreeElements()
+{
+  BaseContainer* pending = nullptr;
+  DropElements(pending);
+  while (pending) {
+    BaseContainer* container = pending;
+    pending = container->pending_;
+    container->DropElements(pending);
+    DeleteObj(container);
+  }
+}
+
+void BaseContainer::DropElements(BaseContainer*& pending)
+{
+  for (Element* element = head_; element;) {
+    Element* next = element->next;
+    GeData& value = element->value;
+    if (value.type_ == kDataContainer) {
+      BaseContainer* nested = value.payload_.container;
+      value.type_ = kDataNil;
+      nested->pending_ = pending;
+      pending = nested;
+    }
+    element->~Element();
+    element = next;
+  }
+  head_ = tail_ = free_ = nullptr;
+  while (blocks_) {
+    Block* block = blocks_;
+    blocks_ = block->next;
+    GeFree(block);
+  }
+}
+
+// A nil element that is in no list yet; null when memory is short.
+BaseContainer::Element* BaseContainer::NewElement(Long id)
+{
+  Element* place = free_;
+  if (place) {
+    free_ = place->next;
+  } else {
+    if (!blocks_ || blocks_->used == blocks_->capacity) {
+      Long capacity = blocks_ ? blocks_->capacity * 2 : kFirstBlock;
+      if (capacity > kLargestBlock)
+        capacity = kLargestBlock;
+      if (!AddBlock(capacity))
+        return nullptr;
+    }
+    place = blocks_->Elements() + blocks_->used++;
+  }
+  return ::new (static_cast<void*>(place)) Element{nullptr, id < 0 ? -1 : id, GeData()};
+}
+
+Bool BaseContainer::AddBlock(Long capacity)
+{
+  void* place = GeAllocNC(static_cast<LLong>(sizeof(Block)) + capacity * static_cast<LLong>(sizeof(Element)));
+  if (!place)
+    return false;
+  blocks_ = ::new (place) Block{blocks_, capacity, 0};
+  return true;
+}
+
+void BaseContainer::Append(Element* element)
+{
+  (tail_ ? tail_->next : head_) = element;
+  tail_ = element;
+  ++dirty_;
+}
+
+// Takes an element out of the list and destroys it. `previous` is null for the head.
+void BaseContainer::Unlink(Element* element, Element* previous)
+{
+  (previous ? previous->next : head_) = element->next;
+  if (tail_ == element)
+    tail_ = previous;
+  Recycle(element);
+  ++dirty_;
+}
+
+// Frees the value of an element that is in no list and keeps its place for the next one.
+void BaseContainer::Recycle(Element* element)
+{
+  element->value.Free();
+  element->next = free_;
+  free_ = element;
+}
+
+BaseContainer::Element* BaseContainer::Find(Long id) const
+{
+  Element* element = head_;
+  while (element && element->id != id)
+    element = element->next;
+  return element;
+}
+
+// ---------------------------------------------------------------------------------------------------------------
+
+// The element's value, or null after a copy that found no memory.
+GeData* BaseContainer::FillNew(Element* element, const GeData& value)
+{
+  if (!element)
+    return nullptr;
+  if (element->value.Assign(value, 0, nullptr))
+    return &element->value;
+  Recycle(element);
+  return nullptr;
+}
+
+GeData* BaseContainer::InsertData(Long id, const GeData& value)
+{
+  Element* element = NewElement(id);
+  GeData* stored = FillNew(element, value);
+  if (stored)
+    Append(element);
+  return stored;
+}
+
+GeData* BaseContainer::InsertData(Long id, GeData&& value)
+{
+  Element* element = NewElement(id);
+  if (!element)
+    return nullptr;
+  ::new (static_cast<void*>(&element->value)) GeData(std::move(value)); // a nil value owns nothing that would be lost
+  Append(element);
+  return &element->value;
+}
+
+GeData* BaseContainer::InsertDataAfter(Long id, const GeData& value, const GeData* after)
+{
+  Element* previous = head_;
+  while (previous && &previous->value != after)
+    previous = previous->next;
+  if (previous && previous == tail_)
+    return InsertData(id, value);
+  Element* element = NewElement(id);
+  GeData* stored = FillNew(element, value);
+  if (!stored)
+    return nullptr;
+  Element*& place = previous ? previous->next : head_;
+  element->next = place;
+  place = element;
+  if (!tail_)
+    tail_ = element;
+  ++dirty_;
+  return stored;
+}
+
+GeData* BaseContainer::SetData(Long id, const GeData& value)
+{
+  Element* element = Find(id);
+  if (!element)
+    return InsertData(id, value);
+  GeData& stored = element->value;
+  if (stored.type_ == value.type_) {
+    if (stored.type_ == kDataContainer && stored.payload_.container == value.payload_.container) {
+      ReportAssertion(kModule, __LINE__, "a container was set onto itself");
+      return &stored;
+    }
+    if (!IsSameValue(stored, value))
+      ++dirty_;
+  } else {
+    ++dirty_;
+    if (stored.type_ == kDataReal && value.type_ == kDataLong)
+      return &(stored = GeData(value.GetReal()));
+    if (stored.type_ == kDataLong && value.type_ == kDataReal)
+      return &(stored = GeData(value.GetLong()));
+  }
+  return stored.Assign(value, 0, nullptr) ? &stored : nullptr;
+}
+
+Bool BaseContainer::RemoveData(Long id)
+{
+  Element* previous = nullptr;
+  Element* element = head_;
+  while (element && element->id != id) {
+    previous = element;
+    element = element->next;
+  }
+  if (element)
+    Unlink(element, previous);
+  return element != nullptr;
+}
+
+Bool BaseContainer::RemoveIndex(Long index)
+{
+  Element* previous = nullptr;
+  Element* element = index < 0 ? nullptr : head_;
+  for (; element && index > 0; --index) {
+    previous = element;
+    element = element->next;
+  }
+  if (element)
+    Unlink(element, previous);
+  return element != nullptr;
+}
+
+// ---------------------------------------------------------------------------------------------------------------
+
+Long BaseContainer::FindIndex(Long id) const
+{
+  Long index = 0;
+  for (const Element* element = head_; element; element = element->next, ++index) {
+    if (element->id == id)
+      return index;
+  }
+  return -1;
+}
+
+Long BaseContainer::GetCount() const
+{
+  Long count = 0;
+  for (const Element* element = head_; element; element = element->next)
+    ++count;
+  return count;
+}
+
+// The element at a position, or null.
+BaseContainer::Element* BaseContainer::FindAt(Long index) const
+{
+  Element* element = index < 0 ? nullptr : head_;
+  for (; element && index > 0; --index)
+    element = element->next;
+  return element;
+}
+
+GeData* BaseContainer::GetIndexData(Long index) const
+{
+  Element* element = FindAt(index);
+  return element ? &element->value : nullptr;
+}
+
+Long BaseContainer::GetIndexId(Long index) const
+{
+  const Element* element = FindAt(index);
+  return element ? element->id : -1;
+}
+
+const GeData& BaseContainer::GetData(Long id) const
+{
+  const Element* element = Find(id);
+  return element ? element->value : kNothing;
+}
+
+GeData* BaseContainer::FindData(Long id) const
+{
+  Element* element = Find(id);
+  return element ? &element->value : nullptr;
+}
+
+Bool BaseContainer::BrowseFirst(Iterator& iterator, Long& id, GeData*& value) const
+{
+  iterator.element_ = head_;
+  return Visit(iterator, id, value);
+}
+
+Bool BaseContainer::BrowseNext(Iterator& iterator, Long& id, GeData*& value) const
+{
+  iterator.element_ = iterator.element_ ? iterator.element_->next : nullptr;
+  return Visit(iterator, id, value);
+}
+
+Bool BaseContainer::Visit(const Iterator& iterator, Long& id, GeData*& value)
+{
+  Element* element = iterator.element_;
+  if (!element)
+    return false;
+  id = element->id;
+  value = &element->value;
+  return true;
+}
+
+// ---------------------------------------------------------------------------------------------------------------
+
+// Appends copies to this container, which is new. Nested containers are copied here and not by their values, to need
+// little of the stack for each level.
+Bool BaseContainer::AppendCopies(const BaseContainer& source, ULong flags, TransArray* translation)
+{
+  Long count = source.GetCount();
+  if (count > 0 && !AddBlock(count))
+    return false;
+  for (const Element* element = source.head_; element; element = element->next) {
+    Element* copy = NewElement(element->id);
+    if (!copy)
+      return false;
+    Append(copy);
+    if (element->value.type_ != kDataContainer) {
+      if (!copy->value.Assign(element->value, flags, translation))
+        return false;
+      continue;
+    }
+    const BaseContainer* nested = element->value.payload_.container;
+    if (!copy->value.SetType(kDataContainer))
+      return false;
+    copy->value.payload_.container->id_ = nested->id_;
+    if (!copy->value.payload_.container->AppendCopies(*nested, flags, translation))
+      return false;
+  }
+  return true;
+}
+
+// Works on the side first: either container may lie inside of the other.
+Bool BaseContainer::CopyTo(BaseContainer& destination, ULong flags, TransArray* translation) const
+{
+  if (&destination == this)
+    return true;
+  BaseContainer copy(id_);
+  if (!copy.AppendCopies(*this, flags, translation))
+    return false;
+  destination.dirty_ = static_cast<UWord>(destination.dirty_ + destination.GetCount() + copy.dirty_);
+  destination.id_ = copy.id_;
+  destination.Swap(copy);
+  return true;
+}
+
+BaseContainer* BaseContainer::GetClone(ULong flags, TransArray* translation) const
+{
+  BaseContainer* clone = NewObj<BaseContainer>();
+  if (clone && !CopyTo(*clone, flags, translation))
+    DeleteObj(clone);
+  return clone;
+}
+
+Bool BaseContainer::MergeFrom(const BaseContainer& source)
+{
+  if (&source == this)
+    return true;
+  for (const Element* element = source.head_; element; element = element->next) {
+    if (!SetData(element->id, element->value))
+      return false;
+  }
+  return true;
+}
+
+Bool BaseContainer::IsEqual(const BaseContainer& other) const
+{
+  const Element* a = head_;
+  const Element* b = other.head_;
+  Bool equal = id_ == other.id_;
+  for (; equal && a && b; a = a->next, b = b->next)
+    equal = a->id == b->id && a->value.GetType() == b->value.GetType() && a->value.IsEqual(b->value);
+  return equal && !a && !b;
+}
+
+// ---------------------------------------------------------------------------------------------------------------
+
+Bool BaseContainer::GetBool(Long id, Bool defaultValue) const
+{
+  const GeData* value = FindData(id);
+  return value ? value->GetBool() : defaultValue;
+}
+
+Long BaseContainer::GetLong(Long id, Long defaultValue) const
+{
+  const GeData* value = FindData(id);
+  return value ? value->GetLong() : defaultValue;
+}
+
+LLong BaseContainer::GetLLong(Long id, LLong defaultValue) const
+{
+  const GeData* value = FindData(id);
+  return value ? value->GetLLong() : defaultValue;
+}
+
+Real BaseContainer::GetReal(Long id, Real defaultValue) const
+{
+  const GeData* value = FindData(id);
+  return value ? value->GetReal() : defaultValue;
+}
+
+Vector BaseContainer::GetVector(Long id, const Vector& defaultValue) const
+{
+  const GeData* value = FindData(id);
+  return value ? value->GetVector() : defaultValue;
+}
+
+Matrix BaseContainer::GetMatrix(Long id, const Matrix& defaultValue) const
+{
+  const GeData* value = FindData(id);
+  return value ? value->GetMatrix() : defaultValue;
+}
+
+BaseTime BaseContainer::GetTime(Long id, const BaseTime& defaultValue) const
+{
+  const GeData* value = FindData(id);
+  return value ? value->GetTime() : defaultValue;
+}
+
+String BaseContainer::GetString(Long id, const String& defaultValue) const
+{
+  const GeData* value = FindData(id);
+  return value ? value->GetString() : defaultValue;
+}
+
+Filename BaseContainer::GetFilename(Long id, const Filename& defaultValue) const
+{
+  const GeData* value = FindData(id);
+  return value ? value->GetFilename() : defaultValue;
+}
+
+void* BaseContainer::GetPointer(Long id, void* defaultValue) const
+{
+  const GeData* value = FindData(id);
+  return value ? value->GetPointer() : defaultValue;
+}
+
+BaseContainer* BaseContainer::GetContainerInstance(Long id) const { return GetData(id).GetContainer(); }
+
+CustomData* BaseContainer::GetCustomDataType(Long id, Long type) const { return GetData(id).GetCustomDataType(type); }
+
+} // namespace _torvane_

@@ -1,0 +1,196 @@
+// The file form of a GeData: the type as a Long, then the value.
+#include "k2v_file/stream/raw_values.h"
+#include "torvane/links/alias.h"
+#include "torvane/stream/hyper_file.h"
+#include "torvane/values/base_container.h"
+#include "torvane/values/ge_data.h"
+
+namespace _torvane_
+{
+
+namespace
+{
+
+// The unknown custom types that are kept although the file is older than version 11600.
+constexpr Long kKeptOldTypes[] = {1000486, 1001053,   1009372,   1009617,   1011188,   1011190,   1019870,   1019918,
+                                  1020497, 180000106, 200000027, 200000044, 200000157, 200000266, 465001521, 465001527};
+
+// The level of a record that was dropped.
+constexpr Long kDropped = -1;
+
+Bool IsKept(const HyperFile& file, Long type)
+{
+  if (!file.IsBefore11600())
+    return true;
+  for (Long kept : kKeptOldTypes) {
+    if (kept == type)
+      return true;
+  }
+  return false;
+}
+
+// The types below 1000000 that a file may hold with a value of their own.
+Bool IsStoredType(Long type)
+{
+  switch (type) {
+  case kDataNil:
+  case kDataPointer:
+  case kDataLong:
+  case kDataReal:
+  case kDataTime:
+  case kDataVector:
+  case kDataMatrix:
+  case kDataLLong:
+  case kDataString:
+  case kDataFilename:
+  case kDataContainer:
+  case kDataLink:
+    return true;
+  default:
+    return false;
+  }
+}
+
+} // namespace
+
+Bool GeData::Read(HyperFile& file)
+{
+  Free();
+  Long type = 0;
+  if (!file.ReadLong(type))
+    return false;
+  // The two kinds that most elements of containers are.
+  if (type == kDataLong || type == kDataReal) {
+    type_ = type;
+    return Keep(type == kDataLong ? file.ReadLong(payload_.integer) : file.ReadReal(payload_.real));
+  }
+  if (type >= kDataFirstCustom)
+    return Keep(ReadCustom(file, type));
+  if (type == kDataOldMemory) {
+    UChar tag = 0;
+    return file.ReadValueHeader(tag) && file.SkipValue(tag);
+  }
+  if (!IsStoredType(type))
+    return false;
+  if (!SetType(type)) {
+    file.SetError(FILEERROR_MEMORY);
+    return false;
+  }
+  return Keep(ReadPayload(file));
+}
+
+Bool GeData::ReadPayload(HyperFile& file)
+{
+  switch (type_) {
+  case kDataLong:
+    return file.ReadLong(payload_.integer);
+  case kDataReal:
+    return file.ReadReal(payload_.real);
+  case kDataTime:
+    return file.ReadTime(*payload_.time);
+  case kDataVector:
+    return file.ReadVector(*payload_.vector);
+  case kDataMatrix:
+    return file.ReadMatrix(*payload_.matrix);
+  case kDataLLong:
+    return file.ReadLLong(payload_.wide);
+  case kDataString:
+    return file.ReadString(*payload_.string);
+  case kDataFilename:
+    return file.ReadFilename(*payload_.filename);
+  case kDataContainer:
+    return file.ReadContainer(*payload_.container, true);
+  case kDataLink:
+    return payload_.link->ReadLink(file);
+  default: // nil and pointer
+    return true;
+  }
+}
+
+Bool GeData::ReadCustom(HyperFile& file, Long type)
+{
+  Long id = 0;
+  Long level = 0;
+  if (!file.ExpectTag(kTagChunkStart) || !file.ReadChunkStart(id, level))
+    return false;
+  if (!FindCustomDataType(type))
+    return ReadUnknown(file, type, level);
+  if (!MakeCustom(type)) {
+    file.SetError(FILEERROR_MEMORY);
+    return false;
+  }
+  return payload_.custom->Read(file, level);
+}
+
+Bool GeData::ReadUnknown(HyperFile& file, Long type, Long level)
+{
+  if (!SetType(kDataUnknown)) {
+    file.SetError(FILEERROR_MEMORY);
+    return false;
+  }
+  UnknownRecord& record = *payload_.unknown;
+  record.type = type;
+  if (!IsKept(file, type)) {
+    record.level = kDropped;
+    return file.SkipToEndChunk();
+  }
+  record.level = level;
+  if (!file.ReadRawChunk(record.data, record.size, false))
+    return false;
+  if (!file.IsSinglePrecision() || WidenReals(record.data, record.size))
+    return true;
+  file.SetError(FILEERROR_MEMORY);
+  return false;
+}
+
+Bool GeData::Write(HyperFile& file) const
+{
+  if (type_ == kDataUnknown)
+    return WriteUnknown(file);
+  return file.WriteLong(type_) && WritePayload(file);
+}
+
+Bool GeData::WritePayload(HyperFile& file) const
+{
+  switch (type_) {
+  case kDataLong:
+    return file.WriteLong(payload_.integer);
+  case kDataReal:
+    return file.WriteReal(payload_.real);
+  case kDataTime:
+    return file.WriteTime(*payload_.time);
+  case kDataVector:
+    return file.WriteVector(*payload_.vector);
+  case kDataMatrix:
+    return file.WriteMatrix(*payload_.matrix);
+  case kDataLLong:
+    return file.WriteLLong(payload_.wide);
+  case kDataString:
+    return file.WriteString(*payload_.string);
+  case kDataFilename:
+    return file.WriteFilename(*payload_.filename);
+  case kDataContainer:
+    return file.WriteContainer(*payload_.container);
+  case kDataLink:
+    return payload_.link->WriteLink(file);
+  default:
+    break;
+  }
+  if (type_ < kDataFirstCustom)
+    return true;
+  if (!file.WriteChunkStart(0, payload_.custom->GetChunkLevel()))
+    return false;
+  payload_.custom->Write(file);
+  return file.WriteChunkEnd();
+}
+
+// The bytes hold the end tag that the file had; a dropped record has none.
+Bool GeData::WriteUnknown(HyperFile& file) const
+{
+  const UnknownRecord& record = *payload_.unknown;
+  if (!file.WriteLong(record.type) || !file.WriteChunkStart(0, record.level))
+    return false;
+  return record.level == kDropped ? file.WriteChunkEnd() : file.WriteRawChunk(record.data, record.size, false);
+}
+
+} // namespace _torvane_

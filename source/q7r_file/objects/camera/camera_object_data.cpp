@@ -1,0 +1,310 @@
+#include "torvane/objects/camera_object_data.h"
+
+#include <cmath>
+
+#include "q7r_file/types/object_data_makers.h"
+#include "torvane/document/base_document.h"
+#include "torvane/tags/base_tag.h"
+#include "torvane/values/ge_data.h"
+
+namespace _torvane_
+{
+
+namespace
+{
+
+enum class EntryKind : UChar
+{
+  kReal,
+  kLong,
+  kBool,
+  kLink, // empty
+};
+
+struct CameraDefault
+{
+  Long id;
+  EntryKind kind;
+  Real number = 0.0;
+};
+
+// In the order of a new camera's container.
+constexpr CameraDefault kCameraDefaults[] = {
+    {kCameraFocalLength, EntryKind::kReal, 36.0},
+    {kCameraZoom, EntryKind::kReal, 1.0},
+    {kCameraProjection, EntryKind::kLong, 0},
+    {kCameraApertureWidth, EntryKind::kReal, 36.0},
+    {1007, EntryKind::kBool, true},
+    {kCameraUseTarget, EntryKind::kBool, false},
+    {kCameraFocusDistance, EntryKind::kReal, 2000.0},
+    {1111, EntryKind::kBool, false},
+    {1114, EntryKind::kBool, false},
+    {1112, EntryKind::kReal, 0.0},
+    {1115, EntryKind::kReal, 0.0},
+    {1113, EntryKind::kReal, 1000.0},
+    {1116, EntryKind::kReal, 1000.0},
+    {kCameraOffsetX, EntryKind::kReal, 0.0},
+    {kCameraOffsetY, EntryKind::kReal, 0.0},
+    {1321, EntryKind::kReal, 0.0},
+    {1322, EntryKind::kReal, 0.0},
+    {1122, EntryKind::kReal, 0.0},
+    {1123, EntryKind::kBool, false},
+    {1128, EntryKind::kReal, 10000.0},
+    {1129, EntryKind::kBool, false},
+    {1130, EntryKind::kLink},
+    {kCameraApertureNumber, EntryKind::kReal, 8.0},
+    {kCameraExposureTime, EntryKind::kReal, 0.03333333333333333},
+    {1212, EntryKind::kReal, 3.141592653589793},
+    {1213, EntryKind::kReal, 0.0},
+    {1214, EntryKind::kReal, 0.7},
+    {1220, EntryKind::kBool, false},
+    {kCameraFilmSpeed, EntryKind::kReal, 200.0},
+    {1241, EntryKind::kReal, 0.0},
+    {1300, EntryKind::kBool, false},
+    {1301, EntryKind::kLong, 6},
+    {1302, EntryKind::kReal, 0.0},
+    {1303, EntryKind::kReal, 0.0},
+    {1306, EntryKind::kReal, 0.0},
+    {1305, EntryKind::kLink},
+    {kCameraTemperature, EntryKind::kReal, 6500.0},
+    {1312, EntryKind::kReal, 0.0},
+    {1331, EntryKind::kReal, 0.0},
+    {1333, EntryKind::kReal, 0.0},
+    {1341, EntryKind::kReal, 0.0},
+    {4200, EntryKind::kLong, 0},
+    {kCameraFocusBase, EntryKind::kReal, 6.5},
+    {kCameraFocusMode, EntryKind::kLong, 0},
+    {kCameraFocusNear, EntryKind::kReal, 800.0},
+    {kCameraFocusPlane, EntryKind::kReal, 1000.0},
+    {kCameraFocusFar, EntryKind::kReal, 1200.0},
+    {4207, EntryKind::kBool, true},
+};
+
+// A list of usual values for one stored entry.
+struct PresetList
+{
+  Long id;
+  Long storedId;
+  Real tolerance;
+  Bool refusesOthers; // setting a position outside the list gives false
+  Long count;
+  const Real* values;
+};
+
+constexpr Real kApertureWidths[] = {4.8, 9.6, 36.0, 22.0, 52.5};
+constexpr Real kFocalLengths[] = {15.0, 25.0, 36.0, 50.0, 80.0, 135.0, 300.0};
+constexpr Real kApertureNumbers[] = {1.0, 1.1, 1.2, 1.4, 1.6, 1.8, 2.0, 2.2,  2.5,  2.8,  3.2,  3.5,  4.0,  4.5,
+                                     5.0, 5.6, 6.3, 7.1, 8.0, 9.0, 10., 11.0, 13.0, 14.0, 16.0, 18.0, 20.0, 22.0};
+constexpr Real kExposureTimes[] = {
+    0.001, 0.002, 0.004, 0.008, 0.016666666666666666, 0.03333333333333333, 0.06666666666666667, 0.125, 0.25, 1.0, 2.0,
+    4.0,   8.0,   15.0,  30.0};
+constexpr Real kFilmSpeeds[] = {50.0, 100.0, 200.0, 400.0, 800.0, 1600.0, 3200.0, 6400.0};
+constexpr Real kTemperatures[] = {2000.0, 3000.0, 4500.0, 5500.0, 6500.0, 7500.0, 9000.0};
+
+template <std::size_t count>
+constexpr PresetList Presets(Long id, Long storedId, const Real (&values)[count], Real tolerance = 0.001)
+{
+  return {id, storedId, tolerance, id == kCameraTemperaturePreset, static_cast<Long>(count), values};
+}
+
+constexpr PresetList kPresetLists[] = {
+    Presets(kCameraApertureWidthPreset, kCameraApertureWidth, kApertureWidths),
+    Presets(kCameraFocalLengthPreset, kCameraFocalLength, kFocalLengths),
+    Presets(kCameraApertureNumberPreset, kCameraApertureNumber, kApertureNumbers),
+    Presets(kCameraExposureTimePreset, kCameraExposureTime, kExposureTimes, 0.0001),
+    Presets(kCameraFilmSpeedPreset, kCameraFilmSpeed, kFilmSpeeds),
+    Presets(kCameraTemperaturePreset, kCameraTemperature, kTemperatures),
+};
+
+const PresetList* FindPresets(Long id)
+{
+  for (const PresetList& list : kPresetLists) {
+    if (list.id == id)
+      return &list;
+  }
+  return nullptr;
+}
+
+Long PositionIn(const PresetList& list, Real value)
+{
+  for (Long i = 0; i < list.count; ++i) {
+    if (std::fabs(value - list.values[i]) < list.tolerance)
+      return i + 1;
+  }
+  return 0;
+}
+
+Bool StorePreset(const PresetList& list, Long position, BaseContainer& settings)
+{
+  if (position < 1 || position > list.count)
+    return !list.refusesOthers;
+  settings.SetReal(list.storedId, list.values[position - 1]);
+  return true;
+}
+
+// " 50 mm": what focal length gives the same view on 36 mm film, with up to three places.
+String EquivalentText(const BaseContainer& settings)
+{
+  Real length = 36.0 * settings.GetReal(kCameraFocalLength) / settings.GetReal(kCameraApertureWidth);
+  const String number = String::FromReal(length, -1, 3);
+  Long end = number.GetLength();
+  if (Long point = 0; number.FindFirst(UniChar{u'.'}, point)) {
+    while (end > point + 1 && number[end - 1] == u'0')
+      --end;
+    if (end == point + 1)
+      end = point;
+  }
+  return String(" ") + number.SubStr(0, end) + String(" mm");
+}
+
+// The angle over which a camera sees a width that stands at its focal length, all times `factor`; false for a length
+// that isn't positive.
+Bool GetFieldOfView(const BaseContainer& settings, Real factor, GeData& value)
+{
+  Real focalLength = settings.GetReal(kCameraFocalLength);
+  if (!(focalLength > 0.0))
+    return false;
+  value = GeData(2.0 * std::atan(0.5 * settings.GetReal(kCameraApertureWidth) / focalLength * factor));
+  return true;
+}
+
+// Brings the focus pair into line with what it is computed from.
+void UpdateFocusPair(BaseContainer& settings)
+{
+  const Long rule = settings.GetLong(kCameraFocusRule);
+  if (settings.GetLong(kCameraProjection) != 0 || rule == 0)
+    return;
+  const Real plane = settings.GetReal(kCameraFocusPlane);
+  const Real seen = settings.GetReal(kCameraApertureWidth) / settings.GetReal(kCameraFocalLength) * plane;
+  const Real part = rule == 1 ? 30.0 : 23.0;
+  const Real base = settings.GetReal(kCameraFocusBase);
+  if (settings.GetLong(kCameraFocusMode) != 0) {
+    const Real both = 2.0 * part;
+    const Real depth = seen * plane / (both * base * (1.0 + seen / both / base));
+    settings.SetReal(kCameraFocusNear, plane - depth);
+    settings.SetReal(kCameraFocusFar, plane + depth);
+  } else {
+    const Real result = base * part * seen / plane;
+    settings.SetReal(kCameraFocusNear, result);
+    settings.SetReal(kCameraFocusFar, result);
+  }
+}
+
+constexpr Long kRenderLensKind = 5033; // of render settings
+constexpr Long kRenderLensPlain = 1150;
+
+} // namespace
+
+NodeData* MakeCameraObjectData() { return NewObj<CameraObjectData>(); }
+
+BaseContainer& CameraObjectData::GetSettings() const { return node_->GetDataInstance(); }
+
+Bool CameraObjectData::Init()
+{
+  if (!node_)
+    return false;
+  BaseContainer& settings = GetSettings();
+  for (const CameraDefault& entry : kCameraDefaults) {
+    switch (entry.kind) {
+    case EntryKind::kReal:
+      settings.SetReal(entry.id, entry.number);
+      break;
+    case EntryKind::kLong:
+      settings.SetLong(entry.id, static_cast<Long>(entry.number));
+      break;
+    case EntryKind::kBool:
+      settings.SetBool(entry.id, entry.number != 0.0);
+      break;
+    case EntryKind::kLink:
+      settings.SetLink(entry.id, nullptr);
+      break;
+    }
+  }
+  return true;
+}
+
+// The relation of height to width in which the document is rendered.
+Real CameraObjectData::GetAspectFactor() const
+{
+  BaseDocument* document = node_->GetDocument();
+  const RenderData* active = document ? document->GetActiveRenderData() : nullptr;
+  if (!active || active->GetDataInstance().GetLong(kRenderLensKind) == kRenderLensPlain)
+    return 1.0;
+  return 1.0 / active->GetDataInstance().GetReal(kRenderFilmAspect);
+}
+
+Bool CameraObjectData::HasTarget() const
+{
+  // The data of a tag that claims a camera's type have a tag for a node.
+  if (!node_->IsInstanceOf(kObjectCamera))
+    return false;
+  const BaseTag* tag = static_cast<BaseObject*>(node_)->GetTag(kTagTarget);
+  return tag && tag->GetDataInstance().GetLink(kTargetLink);
+}
+
+void CameraObjectData::SetFieldOfView(Real angle, Real factor)
+{
+  const Real half = 0.5 * angle;
+  if (!(half > 0.0))
+    return;
+  BaseContainer& settings = GetSettings();
+  settings.SetReal(kCameraFocalLength, 0.5 * settings.GetReal(kCameraApertureWidth) / std::tan(half) * factor);
+}
+
+Bool CameraObjectData::GetParameter(const ParameterPath& path, GeData& value)
+{
+  if (!node_)
+    return false;
+  BaseContainer& settings = GetSettings();
+  const Long id = path[0].id;
+  if (const PresetList* list = FindPresets(id)) {
+    value = GeData(PositionIn(*list, settings.GetReal(list->storedId)));
+    return true;
+  }
+  switch (id) {
+  case kCameraFieldOfView:
+    GetFieldOfView(settings, 1.0, value);
+    return true;
+  case kCameraVerticalFieldOfView:
+    GetFieldOfView(settings, GetAspectFactor(), value);
+    return true;
+  case kCameraEquivalentText:
+    value = GeData(EquivalentText(settings));
+    return true;
+  case kCameraUseTarget:
+    if (!HasTarget())
+      settings.SetBool(kCameraUseTarget, false);
+    value = GeData(settings.GetBool(kCameraUseTarget));
+    return true;
+  default:
+    return NodeData::GetParameter(path, value);
+  }
+}
+
+Bool CameraObjectData::SetParameter(const ParameterPath& path, const GeData& value)
+{
+  if (!node_)
+    return false;
+  BaseContainer& settings = GetSettings();
+  const Long id = path[0].id;
+  if (const PresetList* list = FindPresets(id))
+    return StorePreset(*list, value.GetLong(), settings);
+  switch (id) {
+  case kCameraFieldOfView:
+    SetFieldOfView(value.GetReal(), 1.0);
+    return true;
+  case kCameraVerticalFieldOfView:
+    SetFieldOfView(value.GetReal(), GetAspectFactor());
+    return true;
+  case kCameraFocusBase:
+  case kCameraFocusPlane:
+  case kCameraFocusRule:
+    settings.SetReal(id, value.GetReal());
+    UpdateFocusPair(settings);
+    return true;
+  default:
+    return NodeData::SetParameter(path, value);
+  }
+}
+
+} // namespace _torvane_

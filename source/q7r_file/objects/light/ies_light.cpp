@@ -1,0 +1,247 @@
+// The measured distribution itself: its samples, its copy and its stored form.
+#include "torvane/objects/ies_light.h"
+
+#include <cmath>
+
+#include "k2v_file/stream/chunk_visitor.h"
+#include "torvane/math/ge_math.h"
+
+namespace _torvane_
+{
+
+namespace
+{
+
+constexpr Real kDegrees = 180.0 / kPi;
+
+// So little less than 1 that the poles lie within every table that reaches them.
+constexpr Real kPoleFactor = -0.999999;
+
+// The span of the horizontal angles, in degrees, below which a table stands for so much of the circle.
+constexpr Real kSpanOfSymmetry = 45.0; // the same all around
+constexpr Real kSpanOfQuadrant = 135.0;
+constexpr Real kSpanOfHalf = 225.0;
+
+constexpr Long kFluxSamples = 65536;
+constexpr ULong kFluxSeed = 117641;
+constexpr Real kFluxOfSample = 0.00019174759848570515; // 4 pi / kFluxSamples
+
+constexpr Long kRecordVersion = 4;
+constexpr Long kVersionTexts = 2;
+constexpr Long kVersionFlux = 3;
+constexpr Long kVersionReals = 4; // before it: numbers as LReal
+
+Real HermiteValue(Real p0, Real p1, Real m0, Real m1, Real t)
+{
+  const Real a = m1 + m0 - 2.0 * (p1 - p0);
+  return t * t * t * a + t * t * (p1 - p0 - m0 - a) + t * m0 + p0;
+}
+
+// A direction of length 1, evenly distributed.
+Vector DrawDirection(RandomGenerator& random)
+{
+  for (;;) {
+    Vector point;
+    point.x = random.Get11();
+    point.y = random.Get11();
+    point.z = random.Get11();
+    const Real square = Dot(point, point);
+    if (square <= 1.0 && square > 0.0)
+      return point * (1.0 / std::sqrt(square));
+  }
+}
+
+// A number of a stored distribution, whose form changed with the version.
+template <class Visitor, class Number>
+Bool VisitNumber(Visitor& v, Long version, Number& number)
+{
+  return version < kVersionReals ? v.LReal(number) : v.Real(number);
+}
+
+template <class Visitor>
+Bool VisitTable(Visitor& v, Long version, GeTempDynArray<Real>& table, Long count)
+{
+  if constexpr (Visitor::kReading) {
+    table.Flush();
+    for (Long i = 0; i < count && v.Good(); ++i) {
+      Real number = 0.0;
+      v.Note(VisitNumber(v, version, number) && table.Append(number)); // no count is trusted for memory
+    }
+  } else {
+    for (Real number : table)
+      VisitNumber(v, version, number);
+  }
+  return v.Good();
+}
+
+Bool CopyText(const String& source, String& destination)
+{
+  destination = source;
+  return destination.GetLength() == source.GetLength();
+}
+
+} // namespace
+
+// A place between two neighbours of a table of angles.
+struct IESLight::Interval
+{
+  Long low = 0;
+  Long high = 0;
+  Real fraction = 0.0;
+
+  // The first interval whose upper angle lies above `position`, or the last one. Angles count from `origin`.
+  Interval(const GeTempDynArray<Real>& angles, Real origin, Real position)
+  {
+    const Long count = angles.GetCount();
+    if (count < 2)
+      return;
+    while (low < count - 2 && !(angles[low + 1] - origin > position))
+      ++low;
+    high = low + 1;
+    const Real width = angles[high] - angles[low];
+    fraction = width != 0.0 ? (position - (angles[low] - origin)) / width : 0.0;
+  }
+};
+
+Bool IESLight::IsComplete() const
+{
+  return GetVerticalCount() <= kMaxIESAngles && GetHorizontalCount() <= kMaxIESAngles &&
+         GetVerticalCount() * GetHorizontalCount() == candela.GetCount();
+}
+
+// Where an angle from 0 to below 360 lies among the horizontal angles, which may cover a part of the circle only.
+Real IESLight::GetHorizontalPosition(Real angle) const
+{
+  const Real first = horizontalAngles[0];
+  const Real span = horizontalAngles[GetHorizontalCount() - 1] - first;
+  if (span < kSpanOfSymmetry)
+    return 0.0;
+  if (span < kSpanOfQuadrant) {
+    const Real half = angle > 180.0 ? 360.0 - angle : angle;
+    return half > 90.0 ? 180.0 - half : half;
+  }
+  if (span < kSpanOfHalf) {
+    const Real distance = std::fabs(angle - first);
+    return distance > 180.0 ? 360.0 - distance : distance;
+  }
+  return angle;
+}
+
+// A cubic through the row's values; its slopes are those between the neighbours on both sides, or at the ends of the
+// table between the last two.
+Real IESLight::SampleRow(Long row, const Interval& vertical) const
+{
+  const Long count = GetVerticalCount();
+  const Real* values = candela.Data() + static_cast<LLong>(row) * count;
+  const Real width = verticalAngles[vertical.high] - verticalAngles[vertical.low];
+  auto tangent = [&](Long before, Long behind) {
+    before = before < 0 ? 0 : before;
+    behind = behind > count - 1 ? count - 1 : behind;
+    const Real distance = verticalAngles[behind] - verticalAngles[before];
+    return distance != 0.0 ? (values[behind] - values[before]) / distance * width : 0.0;
+  };
+  return HermiteValue(values[vertical.low], values[vertical.high], tangent(vertical.low - 1, vertical.high),
+                      tangent(vertical.low, vertical.high + 1), vertical.fraction);
+}
+
+Real IESLight::SampleIESLight(const Vector& direction) const
+{
+  if (GetVerticalCount() == 0 || GetHorizontalCount() == 0 || !IsComplete())
+    return 0.0;
+  const Real vertical = SafeAcos(kPoleFactor * direction.z) * kDegrees;
+  if (!(vertical >= verticalAngles[0] && vertical <= verticalAngles[GetVerticalCount() - 1]))
+    return 0.0;
+  Real horizontal = 90.0;
+  if (direction.y != 0.0)
+    horizontal = std::atan2(direction.x, direction.y) * kDegrees;
+  else if (direction.x < 0.0)
+    horizontal = -90.0;
+  if (horizontal < 0.0)
+    horizontal += 360.0;
+  const Interval rows(horizontalAngles, horizontalAngles[0], GetHorizontalPosition(horizontal));
+  const Interval columns(verticalAngles, 0.0, vertical);
+  const Real low = SampleRow(rows.low, columns);
+  const Real high = SampleRow(rows.high, columns);
+  Real value = low + (high - low) * rows.fraction;
+  if (maxCandela > 0.0)
+    value /= maxCandela;
+  return value > 0.0 ? value : 0.0;
+}
+
+void IESLight::Normalise()
+{
+  maxCandela = candela.GetCount() > 0 ? candela[0] : 0.0;
+  for (Real value : candela)
+    maxCandela = value > maxCandela ? value : maxCandela;
+  RandomGenerator random(kFluxSeed);
+  Real sum = 0.0;
+  for (Long i = 0; i < kFluxSamples && candela.GetCount() > 0; ++i) // without a table every sample is 0
+    sum += SampleIESLight(DrawDirection(random));
+  totalFlux = sum * kFluxOfSample;
+}
+
+IESLight* CopyIESLight(const IESLight* source)
+{
+  IESLight* copy = source ? NewObj<IESLight>() : nullptr;
+  if (!copy)
+    return nullptr;
+  copy->fileVersion = source->fileVersion;
+  copy->tiltMode = source->tiltMode;
+  copy->shape = source->shape;
+  copy->size = source->size;
+  copy->maxCandela = source->maxCandela;
+  copy->totalFlux = source->totalFlux;
+  if (!CopyText(source->manufacturer, copy->manufacturer) ||
+      !CopyText(source->luminaireCatalogue, copy->luminaireCatalogue) ||
+      !CopyText(source->luminaire, copy->luminaire) || !CopyText(source->lampCatalogue, copy->lampCatalogue) ||
+      !CopyText(source->lamp, copy->lamp) || !source->verticalAngles.CopyTo(copy->verticalAngles) ||
+      !source->horizontalAngles.CopyTo(copy->horizontalAngles) || !source->candela.CopyTo(copy->candela))
+    DeleteObj(copy);
+  return copy;
+}
+
+template <class Visitor>
+Bool IESLight::VisitStored(Visitor& v)
+{
+  Long version = kRecordVersion;
+  Long verticalCount = GetVerticalCount();
+  Long horizontalCount = GetHorizontalCount();
+  v.Long(version);
+  v.Long(fileVersion);
+  v.Long(tiltMode);
+  VisitNumber(v, version, maxCandela);
+  v.Long(verticalCount);
+  v.Long(horizontalCount);
+  for (Long count : {verticalCount, horizontalCount})
+    v.Note(count >= 0 && count <= kMaxIESAngles);
+  if (!v.Good())
+    return false;
+  VisitTable(v, version, verticalAngles, verticalCount);
+  VisitTable(v, version, horizontalAngles, horizontalCount);
+  VisitTable(v, version, candela, verticalCount * horizontalCount);
+  if (version >= kVersionTexts) {
+    for (String* text : {&manufacturer, &luminaireCatalogue, &luminaire, &lampCatalogue, &lamp})
+      v.String(*text);
+    v.Long(shape);
+    v.Vector(size);
+  }
+  if (version >= kVersionFlux)
+    VisitNumber(v, version, totalFlux);
+  else if (v.Good())
+    Normalise();
+  return v.Good();
+}
+
+Bool IESLight::Write(HyperFile& file)
+{
+  ChunkWriter writer(file, 0);
+  return VisitStored(writer);
+}
+
+Bool IESLight::Read(HyperFile& file)
+{
+  ChunkReader reader(file, 0);
+  return VisitStored(reader);
+}
+
+} // namespace _torvane_

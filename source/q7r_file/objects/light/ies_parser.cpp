@@ -1,0 +1,480 @@
+// Photometric text files: lines of keywords and texts, then, behind the word "TILT", a run of numbers that takes no
+// notice of lines.
+#include <cmath>
+#include <cstring>
+#include <initializer_list>
+#include <iterator>
+
+#include "torvane/bytes/base_file.h"
+#include "torvane/objects/ies_light.h"
+
+namespace _torvane_
+{
+
+namespace
+{
+
+constexpr LLong kBufferSize = 1024;
+constexpr Long kMaxLine = 512;
+constexpr Long kMaxWord = 256;
+constexpr Long kMaxExponent = 9999;
+constexpr Real kFoot = 0.3048;
+constexpr Long kUnitFeet = 1;
+
+enum class Keyword : UChar
+{
+  kNone,
+  kVersion1991,
+  kVersion1995,
+  kTilt,
+  kTiltNone,
+  kTiltInclude,
+  kManufacturer,
+  kLuminaireCatalogue,
+  kLuminaire,
+  kLampCatalogue,
+  kLamp,
+};
+
+struct KeywordText
+{
+  const char* text;
+  Keyword keyword;
+};
+
+constexpr KeywordText kKeywords[] = {
+    {"IESNA91", Keyword::kVersion1991},
+    {"IESNA:LM-63-1995", Keyword::kVersion1995},
+    {"TILT", Keyword::kTilt},
+    {"NONE", Keyword::kTiltNone},
+    {"INCLUDE", Keyword::kTiltInclude},
+    {"[MANUFAC]", Keyword::kManufacturer},
+    {"[LUMCAT]", Keyword::kLuminaireCatalogue},
+    {"[LUMINAIRE]", Keyword::kLuminaire},
+    {"[LAMPCAT]", Keyword::kLampCatalogue},
+    {"[LAMP]", Keyword::kLamp},
+};
+
+Keyword FindKeyword(const char* word)
+{
+  for (const KeywordText& row : kKeywords) {
+    if (std::strcmp(row.text, word) == 0)
+      return row.keyword;
+  }
+  return Keyword::kNone;
+}
+
+Bool IsBlank(char c) { return c == ' ' || c == '\t'; }
+Bool EndsWord(char c) { return c == '\0' || IsBlank(c) || c == ',' || c == '='; }
+Bool IsDigit(char c) { return c >= '0' && c <= '9'; }
+
+// The digits from `text` on are added to `value`; gives how many there are.
+Long TakeDigits(const char*& text, Real& value)
+{
+  Long count = 0;
+  for (; IsDigit(*text); ++text, ++count)
+    value = value * 10.0 + (*text - '0');
+  return count;
+}
+
+// [-] digits [. digits] [e [+-] digits], with a digit before or behind the point. All of `text` must be the number, and
+// it must be finite.
+Bool ParseNumber(const char* text, Real& value)
+{
+  const Bool negative = *text == '-';
+  if (negative)
+    ++text;
+  Real mantissa = 0.0;
+  Long digits = TakeDigits(text, mantissa);
+  if (*text == '.') {
+    ++text;
+    const Long places = TakeDigits(text, mantissa);
+    mantissa /= std::pow(10.0, places);
+    digits += places;
+  }
+  if (digits == 0)
+    return false;
+  if (*text == 'e' || *text == 'E') {
+    ++text;
+    const Bool down = *text == '-';
+    if (*text == '+' || *text == '-')
+      ++text;
+    Real exponent = 0.0;
+    if (TakeDigits(text, exponent) == 0)
+      return false;
+    exponent = exponent > kMaxExponent ? kMaxExponent : exponent;
+    if (mantissa != 0.0)
+      mantissa *= std::pow(10.0, down ? -exponent : exponent);
+  }
+  if (*text != '\0' || !std::isfinite(mantissa))
+    return false;
+  value = negative ? -mantissa : mantissa;
+  return true;
+}
+
+// Which of the three dimensions a component of the size is, and with which sign.
+enum class SizeTerm : UChar
+{
+  kZero,
+  kX,
+  kL,
+  kH,
+  kMinusX,
+  kMinusL,
+  kMinusH,
+};
+
+// How a file tells the shape of the luminous opening: by the signs of its width x, length l and height h.
+struct ShapeRow
+{
+  int x, l, h;
+  Long shape;
+  SizeTerm size[3];
+};
+
+constexpr ShapeRow kShapes[] = {
+    {1, 1, 0, 1, {SizeTerm::kX, SizeTerm::kL, SizeTerm::kZero}},
+    {1, 0, 1, 1, {SizeTerm::kX, SizeTerm::kH, SizeTerm::kZero}},
+    {0, 1, 1, 1, {SizeTerm::kH, SizeTerm::kL, SizeTerm::kZero}},
+    {1, 1, 1, 4, {SizeTerm::kX, SizeTerm::kL, SizeTerm::kH}},
+    {-1, 0, 0, 0, {SizeTerm::kMinusX, SizeTerm::kMinusX, SizeTerm::kMinusX}},
+    {-1, 0, -1, 2, {SizeTerm::kMinusX, SizeTerm::kMinusX, SizeTerm::kMinusX}},
+    {-1, 0, 1, 3, {SizeTerm::kMinusX, SizeTerm::kMinusX, SizeTerm::kH}},
+    {0, 1, -1, 8, {SizeTerm::kL, SizeTerm::kMinusH, SizeTerm::kMinusH}},
+    {1, 0, -1, 8, {SizeTerm::kX, SizeTerm::kMinusH, SizeTerm::kMinusH}},
+    {-1, 1, 1, 0, {SizeTerm::kMinusX, SizeTerm::kL, SizeTerm::kZero}},
+    {1, -1, 1, 0, {SizeTerm::kX, SizeTerm::kMinusL, SizeTerm::kZero}},
+    {-1, 1, -1, 2, {SizeTerm::kMinusX, SizeTerm::kL, SizeTerm::kMinusH}},
+    {1, -1, -1, 2, {SizeTerm::kX, SizeTerm::kMinusL, SizeTerm::kMinusH}},
+};
+
+int Sign(Real value) { return value > 0.0 ? 1 : value < 0.0 ? -1 : 0; }
+
+// Any other opening has no shape and no size.
+void SetShape(IESLight& light, Real x, Real l, Real h)
+{
+  const Real terms[] = {0.0, x, l, h, -x, -l, -h};
+  light.shape = -1;
+  light.size = Vector();
+  for (const ShapeRow& row : kShapes) {
+    if (row.x != Sign(x) || row.l != Sign(l) || row.h != Sign(h))
+      continue;
+    auto term = [&](int component) { return terms[static_cast<int>(row.size[component])]; };
+    light.shape = row.shape;
+    light.size = Vector(term(0), term(1), term(2));
+  }
+}
+
+class IESParser
+{
+ public:
+  IESParser(BaseFile& file, IESLight& light) : file_(file), light_(light) {}
+
+  // Reads all of the file, or up to the end of the numbers.
+  Bool Parse();
+  Real GetWatts() const { return watts_; }
+
+ private:
+  Bool NextByte(char& byte);
+  Bool NextLine();
+  Bool TakeWord();
+  String TakeText();
+  Bool TakeNumber(Real& value);
+  Bool TakeInteger(Long& value);
+  Bool TakeNumbers(std::initializer_list<Real*> values);
+  Bool DropNumbers(Long count);
+  Bool TakeTable(GeTempDynArray<Real>& table, Long count);
+  Bool ParseTilt();
+  Bool ParseIncludedTilt();
+  Bool ParseNumbers();
+
+  BaseFile& file_;
+  IESLight& light_;
+  Real watts_ = 1.0; // the last factor of the table
+  char buffer_[kBufferSize];
+  LLong bufferCount_ = 0;
+  LLong bufferPosition_ = 0;
+  char line_[kMaxLine + 1];
+  Long linePosition_ = 0;
+  char word_[kMaxWord + 1];
+};
+
+Bool IESParser::NextByte(char& byte)
+{
+  if (bufferPosition_ == bufferCount_) {
+    bufferCount_ = file_.ReadBytes(buffer_, kBufferSize, true);
+    bufferPosition_ = 0;
+    if (bufferCount_ <= 0) {
+      bufferCount_ = 0;
+      return false;
+    }
+  }
+  byte = buffer_[bufferPosition_++];
+  return true;
+}
+
+// Empty lines are passed over; what goes beyond the longest line is a line of its own.
+Bool IESParser::NextLine()
+{
+  Long length = 0;
+  char byte = 0;
+  while (length < kMaxLine && NextByte(byte)) {
+    if (byte == '\n' && length > 0)
+      break;
+    if (byte != '\n' && byte != '\r')
+      line_[length++] = byte;
+  }
+  line_[length] = '\0';
+  linePosition_ = 0;
+  return length > 0;
+}
+
+// The next word of the line, with the separator behind it taken too. An empty word stands before a comma or an equals
+// sign that no word precedes. False at the end of the line.
+Bool IESParser::TakeWord()
+{
+  while (IsBlank(line_[linePosition_]))
+    ++linePosition_;
+  if (line_[linePosition_] == '\0')
+    return false;
+  Long length = 0;
+  for (; !EndsWord(line_[linePosition_]); ++linePosition_) {
+    if (length < kMaxWord)
+      word_[length++] = line_[linePosition_];
+  }
+  word_[length] = '\0';
+  if (line_[linePosition_] != '\0')
+    ++linePosition_;
+  return true;
+}
+
+String IESParser::TakeText()
+{
+  while (IsBlank(line_[linePosition_]))
+    ++linePosition_;
+  return String(line_ + linePosition_);
+}
+
+Bool IESParser::TakeNumber(Real& value)
+{
+  while (!TakeWord()) {
+    if (!NextLine())
+      return false;
+  }
+  return ParseNumber(word_, value);
+}
+
+Bool IESParser::TakeInteger(Long& value)
+{
+  constexpr Real kLargest = 2147483647.0;
+  Real number = 0.0;
+  if (!TakeNumber(number))
+    return false;
+  value = static_cast<Long>(number > kLargest ? kLargest : number < -kLargest ? -kLargest : number);
+  return true;
+}
+
+Bool IESParser::TakeNumbers(std::initializer_list<Real*> values)
+{
+  for (Real* value : values) {
+    if (!TakeNumber(*value))
+      return false;
+  }
+  return true;
+}
+
+Bool IESParser::DropNumbers(Long count)
+{
+  Real dropped = 0.0;
+  for (Long i = 0; i < count; ++i) {
+    if (!TakeNumber(dropped))
+      return false;
+  }
+  return true;
+}
+
+// No count is trusted for memory: the table grows as its numbers come.
+Bool IESParser::TakeTable(GeTempDynArray<Real>& table, Long count)
+{
+  Real value = 0.0;
+  for (Long i = 0; i < count; ++i) {
+    if (!TakeNumber(value) || !table.Append(value))
+      return false;
+  }
+  return true;
+}
+
+Bool IESParser::ParseIncludedTilt()
+{
+  Long geometry = 0;
+  Long count = 0;
+  return TakeInteger(geometry) && TakeInteger(count) && DropNumbers(count) && DropNumbers(count);
+}
+
+Bool IESParser::ParseNumbers()
+{
+  Long lampCount = 0;
+  Long verticalCount = 0;
+  Long horizontalCount = 0;
+  Long photometry = 0;
+  Long unit = 0;
+  Real lampLumens = 0.0;
+  Real multiplier = 0.0;
+  Real x = 0.0;
+  Real l = 0.0;
+  Real h = 0.0;
+  Real ballast = 0.0;
+  Real future = 0.0;
+  if (light_.tiltMode == kIESTiltInclude && !ParseIncludedTilt())
+    return false;
+  if (!TakeInteger(lampCount) || !TakeNumbers({&lampLumens, &multiplier}) || !TakeInteger(verticalCount) ||
+      !TakeInteger(horizontalCount) || !TakeInteger(photometry) || !TakeInteger(unit) || !TakeNumbers({&x, &l, &h}))
+    return false;
+  SetShape(light_, x, l, h);
+  if (unit == kUnitFeet)
+    light_.size *= kFoot;
+  if (!TakeNumbers({&ballast, &future, &watts_}))
+    return false;
+  for (Long count : {verticalCount, horizontalCount}) {
+    if (count < 0 || count > kMaxIESAngles)
+      return false;
+  }
+  if (!TakeTable(light_.verticalAngles, verticalCount) || !TakeTable(light_.horizontalAngles, horizontalCount) ||
+      !TakeTable(light_.candela, verticalCount * horizontalCount))
+    return false;
+  for (Real& value : light_.candela) {
+    value *= multiplier * ballast * watts_;
+    if (!std::isfinite(value))
+      return false;
+  }
+  light_.Normalise();
+  return true;
+}
+
+// The word behind "TILT" tells whether tilt data are included. Data in a file of their own can't be had.
+Bool IESParser::ParseTilt()
+{
+  if (!TakeWord())
+    return false;
+  switch (FindKeyword(word_)) {
+  case Keyword::kTiltNone:
+    light_.tiltMode = kIESTiltNone;
+    return ParseNumbers();
+  case Keyword::kTiltInclude:
+    light_.tiltMode = kIESTiltInclude;
+    return ParseNumbers();
+  default:
+    return false;
+  }
+}
+
+Bool IESParser::Parse()
+{
+  while (NextLine()) {
+    if (!TakeWord())
+      continue;
+    switch (FindKeyword(word_)) {
+    case Keyword::kVersion1991:
+      light_.fileVersion = kIESVersion1991;
+      break;
+    case Keyword::kVersion1995:
+      light_.fileVersion = kIESVersion1995;
+      break;
+    case Keyword::kManufacturer:
+      light_.manufacturer = TakeText();
+      break;
+    case Keyword::kLuminaireCatalogue:
+      light_.luminaireCatalogue = TakeText();
+      break;
+    case Keyword::kLuminaire:
+      light_.luminaire = TakeText();
+      break;
+    case Keyword::kLampCatalogue:
+      light_.lampCatalogue = TakeText();
+      break;
+    case Keyword::kLamp:
+      light_.lamp = TakeText();
+      break;
+    case Keyword::kTilt:
+      return ParseTilt() && file_.GetError() == FILEERROR_NONE;
+    default:
+      break;
+    }
+  }
+  return file_.GetError() == FILEERROR_NONE;
+}
+
+char ToUpper(char c) { return c >= 'a' && c <= 'z' ? static_cast<char>(c - 'a' + 'A') : c; }
+
+// Looks for a mark of photometric files. The last bytes are not looked at.
+Bool HoldsMark(const char* head, LLong count)
+{
+  constexpr const char* kMarks[] = {"IESN", "TILT"};
+  constexpr LLong kMarkSize = 4;
+  constexpr LLong kLeastBehind = 8;
+  for (LLong i = 0; i + kLeastBehind <= count; ++i) {
+    for (const char* mark : kMarks) {
+      LLong same = 0;
+      while (same < kMarkSize && ToUpper(head[i + same]) == mark[same])
+        ++same;
+      if (same == kMarkSize)
+        return true;
+    }
+  }
+  return false;
+}
+
+struct ResultText
+{
+  Long result;
+  const char* text;
+};
+
+constexpr ResultText kResultTexts[] = {
+    {kIESLoaded, "the photometric file was read"},
+    {kIESNotOpened, "the file can't be opened"},
+    {kIESNotPhotometric, "this is no photometric file: neither \"IESN\" nor \"TILT\" stands in its first 1024 bytes"},
+    {kIESNoMemory, "there is not enough memory to read the file"},
+    {kIESUnreadable, "the file can't be read, or its numbers are not those of a photometric file: one is missing, is "
+                     "malformed, or is a count above 1024"},
+};
+
+} // namespace
+
+Long LoadIESFile(IESLight*& light, const Filename& name, Real* watts)
+{
+  BaseFile file;
+  if (!file.Open(name, kFileRead))
+    return kIESNotOpened;
+  IESLight* loaded = NewObj<IESLight>();
+  if (!loaded)
+    return kIESNoMemory;
+  char head[kBufferSize];
+  const LLong count = file.ReadBytes(head, kBufferSize, true);
+  Long result = kIESUnreadable;
+  if (file.GetError() == FILEERROR_NONE && !HoldsMark(head, count))
+    result = kIESNotPhotometric;
+  IESParser parser(file, *loaded);
+  if (result == kIESUnreadable && file.Seek(0) && parser.Parse())
+    result = kIESLoaded;
+  if (result == kIESLoaded) {
+    if (watts)
+      *watts = parser.GetWatts();
+    DeleteObj(light);
+    light = loaded;
+  } else {
+    DeleteObj(loaded);
+  }
+  return result;
+}
+
+const char* GetIESResultText(Long result)
+{
+  for (const ResultText& row : kResultTexts) {
+    if (row.result == result)
+      return row.text;
+  }
+  return "an unknown result";
+}
+
+} // namespace _torvane_

@@ -1,0 +1,96 @@
+// A measured distribution on a light.
+#include "q7r_file/objects/unit_factors.h"
+#include "torvane/document/base_document.h"
+#include "torvane/objects/light_object_data.h"
+#include "torvane/values/ge_data.h"
+
+namespace _torvane_
+{
+
+namespace
+{
+
+// Entries of the light's object that tell of its distribution.
+constexpr Long kKeyShapeSizeX = 100010;
+constexpr Long kKeyShapeSizeY = 100011;
+constexpr Long kKeyShapeSizeZ = 100012;
+constexpr Long kKeyShape = 100015;
+constexpr Long kKeyIntensityUnit = 90037;
+constexpr Long kKeyPhotometric = 90042;
+constexpr Long kKeyIntensity = 90043;
+constexpr Long kKeyIESData = 90046;
+constexpr Long kKeyManufacturer = 90050; // and the four other texts behind it
+constexpr Long kShapeOfUnknown = 1;
+
+// Parameters of the light.
+constexpr Long kLightAreaRadius = 90013;
+constexpr Long kLightFalloffSamples = 90014;
+constexpr Long kLightFalloffDistance = 90025;
+
+LightObjectData* LightDataOf(const BaseObject* object)
+{
+  NodeData* data = object && object->GetType() == kObjectLight ? object->GetObjectData() : nullptr;
+  return data && data->IsInstanceOf(kObjectLight) ? static_cast<LightObjectData*>(data) : nullptr;
+}
+
+// From metres to the unit of a document.
+Real UnitFactor(const BaseDocument* document)
+{
+  if (!document)
+    return 1.0;
+  UnitScaleData metres(*FindCustomDataType(kCustomUnitScale));
+  metres.scale = 1.0;
+  metres.unit = kUnitMetre;
+  const CustomData* unit = document->GetDataInstance().GetCustomDataType(kKeyDocumentUnit, kCustomUnitScale);
+  return ConvertUnits(&metres, static_cast<const UnitScaleData*>(unit));
+}
+
+void SetEntries(BaseContainer& settings, const IESLight& light, const Vector& size)
+{
+  settings.SetBool(kKeyPhotometric, true);
+  settings.SetBool(kKeyIESData, true);
+  settings.SetLong(kKeyIntensityUnit, 1);
+  settings.SetReal(kKeyIntensity, light.maxCandela);
+  Long key = kKeyManufacturer;
+  for (const String* text :
+       {&light.manufacturer, &light.luminaireCatalogue, &light.luminaire, &light.lampCatalogue, &light.lamp})
+    settings.SetString(key++, *text);
+  settings.SetReal(kKeyShapeSizeX, size.x);
+  settings.SetReal(kKeyShapeSizeY, size.y);
+  settings.SetReal(kKeyShapeSizeZ, size.z);
+  settings.SetLong(kKeyShape, light.shape == -1 ? kShapeOfUnknown : light.shape);
+}
+
+} // namespace
+
+Bool SetIESLight(BaseObject* object, IESLight* parsed, BaseDocument* document)
+{
+  LightObjectData* data = LightDataOf(object);
+  if (!data)
+    return false;
+  if (parsed && parsed == data->GetIES()) // setting a light's own again
+    return true;
+  data->AdoptIES(nullptr);
+  if (!parsed)
+    return true;
+  parsed->Normalise();
+  IESLight* light = CopyIESLight(parsed);
+  if (!light)
+    return true;
+  data->AdoptIES(light);
+  data->SetParameter(kLightType, GeData(static_cast<Long>(kLightIES)));
+  const Vector size = light->size * UnitFactor(document);
+  SetEntries(object->GetDataInstance(), *light, size);
+  data->SetParameter(kLightAreaRadius, GeData(0.5 * size.x));
+  data->SetParameter(kLightFalloffSamples, GeData(static_cast<Long>(10)));
+  data->SetParameter(kLightFalloffDistance, GeData(1000.0));
+  return true;
+}
+
+IESLight* GetIESLight(const BaseObject* object)
+{
+  const LightObjectData* data = LightDataOf(object);
+  return data ? data->GetIES() : nullptr;
+}
+
+} // namespace _torvane_

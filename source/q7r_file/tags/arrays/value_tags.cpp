@@ -1,0 +1,358 @@
+#include "torvane/tags/value_tags.h"
+
+#include "k2v_file/stream/chunk_visitor.h"
+#include "q7r_file/nodes/node_tools.h"
+#include "q7r_file/types/tag_makers.h"
+
+namespace _torvane_
+{
+
+namespace
+{
+
+constexpr Long kColumnVersion = 11925; // older files hold legacy arrays
+constexpr Long kNameVersion = 7500;    // older files hold a vertex map's name with its array
+
+constexpr LLong kLeastVectorSize = 1 + 3 * 4; // a Vector of a file whose Reals are floats
+constexpr LLong kLeastSegmentSize = 5 + 2;    // Long, Bool
+
+// An array of floats may stand for one of doubles.
+constexpr ColumnLayout kPointLayout = {kArrayReal, 3, sizeof(Real), sizeof(Vector), 1, 3 * sizeof(SReal)};
+constexpr ColumnLayout kPolygonLayout = {kArrayLong, 4, sizeof(Long), sizeof(PolygonCorners), 1, 4 * sizeof(Long)};
+constexpr ColumnLayout kVertexMapLayout = {kArraySReal, 1, 0, sizeof(SReal), 1, sizeof(SReal)};
+constexpr ColumnLayout kNormalLayout = {kArrayWord, 1, 0, sizeof(Word), 12, 12 * sizeof(Word)};
+
+Word PackNormalComponent(Real component)
+{
+  const Real scaled = component * kNormalScale;
+  if (!(scaled > INT16_MIN)) // a NaN too
+    return scaled == scaled ? INT16_MIN : 0;
+  return scaled < INT16_MAX ? static_cast<Word>(scaled) : INT16_MAX;
+}
+
+} // namespace
+
+BaseArrayTag::~BaseArrayTag() { FreeEntries(); }
+
+const void* BaseArrayTag::GetEntryBytes(LLong& size) const
+{
+  size = count_ * entrySize_;
+  return block_;
+}
+
+Bool BaseArrayTag::ResizeTagArray(Long count)
+{
+  if (count < 0)
+    return false;
+  const LLong size = count * entrySize_;
+  void* block = count > count_ ? GeAlloc(size) : GeAllocNC(size);
+  if (!block && count > 0)
+    return false;
+  GeCopyMem(block, block_, (count < count_ ? count : count_) * entrySize_);
+  AdoptEntries(block, count);
+  return true;
+}
+
+void BaseArrayTag::AdoptEntries(void* block, LLong count)
+{
+  GeFree(block_);
+  block_ = block;
+  count_ = static_cast<Long>(count);
+  if (count == 0)
+    GeFree(block_);
+}
+
+Bool BaseArrayTag::MakeEntries(HyperFile& file, LLong count, LLong leastSize, void*& block) const
+{
+  block = nullptr;
+  if (!file.HasRoomFor(count, leastSize))
+    return false;
+  block = GeAlloc(count * entrySize_);
+  if (!block && count > 0)
+    file.SetError(FILEERROR_MEMORY);
+  return block || count == 0;
+}
+
+Bool BaseArrayTag::ReadChunk(HyperFile& file, Long id, Long level)
+{
+  if (BaseTag::ReadChunk(file, id, level))
+    return true;
+  return id == GetType() && (level < 0 || ReadEntries(file, level)) && file.SkipToEndChunk();
+}
+
+void BaseArrayTag::WriteChunks(HyperFile& file)
+{
+  BaseTag::WriteChunks(file);
+  WriteChunk(file, GetType(), GetEntriesLevel(), [&](ChunkWriter&) { WriteEntries(file); });
+}
+
+Bool BaseArrayTag::CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation)
+{
+  auto& target = static_cast<BaseArrayTag&>(destination);
+  return &target == this || (BaseTag::CopyTo(target, flags, translation) && CopyEntries(target));
+}
+
+Bool BaseArrayTag::CopyEntries(BaseArrayTag& target)
+{
+  if (!target.ResizeTagArray(count_))
+    return false;
+  GeCopyMem(target.block_, block_, count_ * entrySize_);
+  return true;
+}
+
+Bool BaseArrayTag::CopyEntriesOntoEmpty(BaseArrayTag& target)
+{
+  const Long count = count_;
+  if (target.block_)
+    FreeEntries();
+  target.FreeEntries();
+  if (!target.ResizeTagArray(count))
+    return false;
+  GeCopyMem(target.block_, block_, count_ * entrySize_);
+  return block_ != nullptr;
+}
+
+// ---------------------------------------------------------------------------------------------------------------
+
+template <class Visitor>
+Bool ColumnTag::VisitColumns(Visitor& v, void* block, LLong count) const
+{
+  const LLong elements = count * layout_.elementsPerEntry;
+  for (Long column = 0; v.Good() && column < layout_.columns; ++column) {
+    UChar* first = static_cast<UChar*>(block) + column * layout_.step;
+    if constexpr (Visitor::kReading)
+      v.Note(v.File().ReadArray(first, layout_.elementType, layout_.stride, elements));
+    else
+      v.Note(v.File().WriteArray(first, layout_.elementType, layout_.stride, elements));
+  }
+  return v.Good();
+}
+
+template <class Visitor>
+Bool ColumnTag::VisitEntries(Visitor& v)
+{
+  Long count = count_;
+  if (!v.Long(count) || count <= 0)
+    return v.Good();
+  if constexpr (Visitor::kReading) {
+    void* block = nullptr;
+    if (!MakeEntries(v.File(), count, layout_.leastEntrySize, block))
+      return false;
+    if (VisitColumns(v, block, count))
+      AdoptEntries(block, count);
+    else
+      GeFree(block);
+    return v.Good();
+  } else {
+    return VisitColumns(v, block_, count);
+  }
+}
+
+Bool ColumnTag::ReadEntries(HyperFile& file, Long level)
+{
+  ChunkReader reader(file, level);
+  return reader.VersionBelow(kColumnVersion) ? ReadOldEntries(file) : VisitEntries(reader);
+}
+
+void ColumnTag::WriteEntries(HyperFile& file)
+{
+  ChunkWriter writer(file, GetEntriesLevel());
+  VisitEntries(writer);
+}
+
+// ---------------------------------------------------------------------------------------------------------------
+
+PointTag::PointTag() : ArrayTag(kTagPoint, kPointLayout) {}
+
+Bool PointTag::ReadOldEntries(HyperFile& file)
+{
+  Vector* points = nullptr;
+  LLong count = 0;
+  if (!file.ReadLegacyPointArray(points, count))
+    return false;
+  AdoptEntries(points, count);
+  return true;
+}
+
+PolygonTag::PolygonTag() : ArrayTag(kTagPolygon, kPolygonLayout) {}
+
+Bool PolygonTag::ResizeTagArray(Long count) { return count < 1 || ColumnTag::ResizeTagArray(count); }
+
+Bool PolygonTag::ReadOldEntries(HyperFile& file)
+{
+  FreeEntries();
+  LegacyPolygon* polygons = nullptr;
+  LLong count = 0;
+  if (!file.ReadLegacyPolygonArray(polygons, count))
+    return false;
+  AdoptEntries(polygons, count);
+  return true;
+}
+
+VertexMapTag::VertexMapTag(Long type) : ArrayTag(type, kVertexMapLayout) {}
+
+GeListNode* VertexMapTag::MakeClone(ULong flags, TransArray* translation)
+{
+  return CloneNode(*this, NewObj<VertexMapTag>(GetType()), flags, translation);
+}
+
+Bool VertexMapTag::ReadOldEntries(HyperFile& file)
+{
+  if (GetType() == kTagOldVertexMap)
+    return true;
+  String name;
+  SReal* weights = nullptr;
+  LLong count = 0;
+  if (!file.ReadString(name))
+    return false;
+  if (file.GetFileVersion() < kNameVersion)
+    name_ = name;
+  if (!file.ReadLegacyFloatArray(weights, count))
+    return false;
+  AdoptEntries(weights, count);
+  return true;
+}
+
+NormalTag::NormalTag() : ArrayTag(kTagNormal, kNormalLayout) {}
+
+Bool NormalTag::ReadOldEntries(HyperFile& file)
+{
+  UWord* words = nullptr;
+  LLong count = 0;
+  if (!file.ReadLegacyWordArray(words, count))
+    return false;
+  AdoptEntries(words, count / kNormalLayout.elementsPerEntry);
+  return true;
+}
+
+Bool NormalTag::ReadPolygonNormals(Long index, Vector (&quad)[4]) const
+{
+  if (index < 0 || index >= count_)
+    return false;
+  const Word* component = GetArray()[index].components;
+  for (Vector& normal : quad) {
+    normal = {component[0] / kNormalScale, component[1] / kNormalScale, component[2] / kNormalScale};
+    component += 3;
+  }
+  return true;
+}
+
+Bool NormalTag::WritePolygonNormals(Long index, const Vector (&quad)[4])
+{
+  if (index < 0 || index >= count_)
+    return false;
+  Word* component = GetArray()[index].components;
+  for (const Vector& normal : quad) {
+    for (Real part : {normal.x, normal.y, normal.z})
+      *component++ = PackNormalComponent(part);
+  }
+  return true;
+}
+
+// ---------------------------------------------------------------------------------------------------------------
+
+SegmentTag::SegmentTag() : ArrayTag(kTagSegment) {}
+
+Bool SegmentTag::ResizeTagArray(Long count)
+{
+  if (count < 1 && count_ < 1)
+    return false;
+  return count == -1 || BaseArrayTag::ResizeTagArray(count);
+}
+
+template <class Visitor>
+Bool SegmentTag::VisitEntries(Visitor& v)
+{
+  for (Long i = 0; v.Good() && i < count_; ++i) {
+    v.Long(GetArray()[i].points);
+    v.Bool(GetArray()[i].closed);
+  }
+  return v.Good();
+}
+
+Bool SegmentTag::ReadEntries(HyperFile& file, Long level)
+{
+  FreeEntries();
+  Long count = 0;
+  void* block = nullptr;
+  if (!file.ReadLong(count) || !MakeEntries(file, count, kLeastSegmentSize, block))
+    return false;
+  AdoptEntries(block, count);
+  ChunkReader reader(file, level);
+  return VisitEntries(reader);
+}
+
+void SegmentTag::WriteEntries(HyperFile& file)
+{
+  ChunkWriter writer(file, GetEntriesLevel());
+  writer.Long(count_);
+  VisitEntries(writer);
+}
+
+Bool SegmentTag::CopyEntries(BaseArrayTag& target)
+{
+  auto& segments = static_cast<SegmentTag&>(target);
+  segments.FreeEntries();
+  return !block_ || BaseArrayTag::CopyEntries(target);
+}
+
+// ---------------------------------------------------------------------------------------------------------------
+
+TangentTag::TangentTag() : ArrayTag(kTagTangent) {}
+
+Bool TangentTag::ReplaceTagArray(Long count)
+{
+  if (count < 0)
+    return false;
+  void* block = GeAlloc(count * entrySize_);
+  if (!block && count > 0)
+    return false;
+  AdoptEntries(block, count);
+  return true;
+}
+
+template <class Visitor>
+Bool TangentTag::VisitEntries(Visitor& v)
+{
+  for (Long i = 0; v.Good() && i < count_; ++i) {
+    v.Vector(GetArray()[i].left);
+    v.Vector(GetArray()[i].right);
+  }
+  return v.Good();
+}
+
+Bool TangentTag::ReadEntries(HyperFile& file, Long level)
+{
+  Long count = 0;
+  void* block = nullptr;
+  if (!file.ReadLong(count) || !MakeEntries(file, count, 2 * kLeastVectorSize, block))
+    return false;
+  AdoptEntries(block, count);
+  ChunkReader reader(file, level);
+  return VisitEntries(reader);
+}
+
+void TangentTag::WriteEntries(HyperFile& file)
+{
+  ChunkWriter writer(file, GetEntriesLevel());
+  writer.Long(count_);
+  VisitEntries(writer);
+}
+
+Bool TangentTag::CopyEntries(BaseArrayTag& target)
+{
+  auto& tangents = static_cast<TangentTag&>(target);
+  tangents.FreeEntries();
+  return !block_ || BaseArrayTag::CopyEntries(target);
+}
+
+// ---------------------------------------------------------------------------------------------------------------
+
+BaseTag* MakePointTag() { return NewObj<PointTag>(); }
+BaseTag* MakePolygonTag() { return NewObj<PolygonTag>(); }
+BaseTag* MakeTangentTag() { return NewObj<TangentTag>(); }
+BaseTag* MakeSegmentTag() { return NewObj<SegmentTag>(); }
+BaseTag* MakeVertexMapTag() { return NewObj<VertexMapTag>(); }
+BaseTag* MakeNormalTag() { return NewObj<NormalTag>(); }
+
+} // namespace _torvane_

@@ -1,0 +1,81 @@
+// q7r check: walks and loads a scene file and says what is wrong and where.
+#include <cstdio>
+#include <memory>
+
+#include "listing/json_text.h"
+#include "scene_file.h"
+#include "stream_walker.h"
+#include "verbs.h"
+
+namespace q7r
+{
+
+using namespace _torvane_;
+
+namespace
+{
+
+constexpr const char* kHelp = R"(Walks every value of a scene file and loads it, and tells what is wrong and where.
+Prints one line for each problem; exit status 1 when there is one, 2 when the file is
+no scene file or can't be read at all.
+
+Example: q7r check shot.q7r)";
+
+struct Options
+{
+  std::string file;
+  bool json = false;
+};
+
+// Walks the values; the message of the first fault, or nothing.
+std::string WalkProblem(const std::string& file, long long& values)
+{
+  StreamWalker walker(file);
+  StreamValue value;
+  try {
+    while (walker.Next(value)) {
+      if (value.tag != kTagChunkStart && value.tag != kTagChunkEnd && walker.Path().empty())
+        return file + ": byte " + std::to_string(value.offset) + ": a value outside all chunks";
+      ++values;
+    }
+  } catch (const Failure& failure) {
+    return failure.what();
+  }
+  return {};
+}
+
+int Check(const Options& options)
+{
+  std::vector<std::string> problems;
+  long long values = 0;
+  std::string walk = WalkProblem(options.file, values);
+  if (!walk.empty())
+    problems.push_back(walk);
+  FileProblem problem;
+  DocumentPtr document(LoadDocument(ToFilename(options.file), LoadObjects | LoadMaterials, &problem));
+  if (!document)
+    problems.push_back(ProblemText(options.file, problem) + " (the scene can't be loaded)");
+  if (options.json) {
+    std::puts(
+        Json{{"values", values}, {"problems", problems}}.dump(1, ' ', false, Json::error_handler_t::replace).c_str());
+  } else {
+    for (const std::string& line : problems)
+      std::puts(line.c_str());
+    if (problems.empty())
+      std::printf("%s: good, %lld values\n", options.file.c_str(), values);
+  }
+  return problems.empty() ? kDone : kProblems;
+}
+
+} // namespace
+
+void AddCheck(CLI::App& program, int& status)
+{
+  auto options = std::make_shared<Options>();
+  CLI::App* verb = program.add_subcommand("check", kHelp);
+  verb->add_option("FILE", options->file, "the scene file")->required();
+  verb->add_flag("--json", options->json, "as one JSON object");
+  verb->callback([options, &status] { status = Check(*options); });
+}
+
+} // namespace q7r

@@ -1,0 +1,119 @@
+// q7r dump: every value of a scene file.
+#include <cstdio>
+#include <memory>
+
+#include <nlohmann/json.hpp>
+
+#include "listing/json_text.h"
+#include "stream_walker.h"
+#include "verbs.h"
+
+namespace q7r
+{
+
+namespace
+{
+
+constexpr const char* kHelp = R"(Lists every value of a scene file: its byte offset, the chunks around it, its kind
+and the value itself. Chunks that this program doesn't know are listed like all others.
+
+Use it to see what a file really holds, or to compare two files value by value.
+
+Example: q7r dump shot.q7r | less)";
+
+struct Options
+{
+  std::string file;
+  bool json = false;
+};
+
+const char* const kArrayNames[] = {"?", "byte", "16-bit", "32-bit", "64-bit", "float", "double"};
+
+std::string HexOf(const StreamValue& value)
+{
+  std::string text;
+  char buffer[4];
+  for (std::uint8_t byte : value.head) {
+    std::snprintf(buffer, sizeof buffer, " %02X", byte);
+    text += buffer;
+  }
+  return text;
+}
+
+std::string BodyText(const StreamValue& value)
+{
+  using namespace _torvane_;
+  switch (value.tag) {
+  case kTagChunkStart:
+    return std::to_string(value.chunk.id) + " level " + std::to_string(value.chunk.level);
+  case kTagChunkEnd:
+    return {};
+  case kTagString:
+  case kTagFilename:
+    return JsonText(value.text);
+  case kTagArray:
+    return std::to_string(value.size) + " x " +
+           (value.integer >= 1 && value.integer <= 6 ? kArrayNames[value.integer] : kArrayNames[0]) + HexOf(value);
+  default:
+    break;
+  }
+  if (value.tag >= kTagMemory)
+    return std::to_string(value.size) + " bytes" + HexOf(value);
+  if (value.reals.empty())
+    return value.tag == kTagULLong ? std::to_string(static_cast<std::uint64_t>(value.integer))
+                                   : std::to_string(value.integer);
+  std::string text;
+  for (double real : value.reals)
+    text += (text.empty() ? "" : " ") + JsonText(real);
+  return text;
+}
+
+void PrintJson(const StreamWalker& walker, const StreamValue& value)
+{
+  using namespace _torvane_;
+  nlohmann::json line = {{"offset", value.offset}, {"tag", value.tag}, {"kind", TagName(value.tag)}};
+  for (const ChunkPlace& chunk : walker.Path())
+    line["path"].push_back({chunk.id, chunk.level});
+  if (value.tag == kTagChunkStart)
+    line["chunk"] = {value.chunk.id, value.chunk.level};
+  else if (value.tag == kTagString || value.tag == kTagFilename)
+    line["value"] = value.text;
+  else if (value.tag >= kTagMemory)
+    line["size"] = value.size;
+  else if (value.reals.size() == 1)
+    line["value"] = value.reals[0];
+  else if (!value.reals.empty())
+    line["value"] = value.reals;
+  else if (value.tag != kTagChunkEnd)
+    line["value"] = value.integer;
+  std::puts(line.dump(-1, ' ', false, nlohmann::json::error_handler_t::replace).c_str());
+}
+
+int Dump(const Options& options)
+{
+  StreamWalker walker(options.file);
+  StreamValue value;
+  while (walker.Next(value)) {
+    if (options.json) {
+      PrintJson(walker, value);
+      continue;
+    }
+    int indent = static_cast<int>(2 * walker.Path().size());
+    std::printf("%10lld  %*s%s %s\n", static_cast<long long>(value.offset), indent, "", TagName(value.tag).c_str(),
+                BodyText(value).c_str());
+  }
+  return kDone;
+}
+
+} // namespace
+
+void AddDump(CLI::App& program, int& status)
+{
+  auto options = std::make_shared<Options>();
+  CLI::App* verb = program.add_subcommand("dump", kHelp);
+  verb->add_option("FILE", options->file, "the scene file")->required();
+  verb->add_flag("--json", options->json, "one JSON object a line, with offset, tag, chunk path and value");
+  verb->callback([options, &status] { status = Dump(*options); });
+}
+
+} // namespace q7r

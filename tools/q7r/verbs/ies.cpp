@@ -1,0 +1,177 @@
+// q7r ies: what a photometric file holds.
+#include <cstdio>
+#include <memory>
+
+#include "listing/ies_text.h"
+#include "scene_file.h"
+#include "verbs.h"
+
+namespace q7r
+{
+
+using namespace _torvane_;
+
+namespace
+{
+
+constexpr const char* kHelp =
+    R"(Reads a photometric file (a measured light distribution, as makers of luminaires publish
+them) and tells its version, texts, luminous opening, angles, largest intensity and light
+output.
+
+Use it to see whether a light can carry the file, and whether the output is the one that
+the maker tells. A light in a scene has all intensities multiplied by the power in watts
+as well; here they are without it. With --json the table of intensities is there too.
+
+Example: q7r ies downlight.ies)";
+
+struct Options
+{
+  std::string file;
+  bool json = false;
+};
+
+struct IESDeleter
+{
+  void operator()(IESLight* light) const { DeleteObj(light); }
+};
+using IESPtr = std::unique_ptr<IESLight, IESDeleter>;
+
+// Leaves the light alone in a table that was multiplied by the power, too.
+void TakeOut(Real watts, IESLight& light)
+{
+  if (watts == 0) // then nothing is left of the table
+    return;
+  for (Real& candela : light.candela)
+    candela /= watts;
+  light.Normalise();
+}
+
+IESPtr LoadIES(const std::string& path)
+{
+  IESLight* loaded = nullptr;
+  Real watts = 1;
+  const Long result = LoadIESFile(loaded, ToFilename(path), &watts);
+  if (result != kIESLoaded)
+    throw Failure(path + ": " + GetIESResultText(result));
+  IESPtr light(loaded);
+  TakeOut(watts, *light);
+  return light;
+}
+
+Json Numbers(const Real* numbers, Long count)
+{
+  Json json = Json::array();
+  for (Long i = 0; i < count; ++i)
+    json.push_back(numbers[i]);
+  return json;
+}
+
+Json Numbers(const GeTempDynArray<Real>& numbers) { return Numbers(numbers.Data(), numbers.GetCount()); }
+
+Json RowsJson(const IESLight& light)
+{
+  Json rows = Json::array();
+  for (Long i = 0; light.IsComplete() && i < light.GetHorizontalCount(); ++i)
+    rows.push_back(Numbers(light.candela.Data() + i * light.GetVerticalCount(), light.GetVerticalCount()));
+  return rows;
+}
+
+const char* VersionText(Long version)
+{
+  return version == kIESVersion1991 ? "IESNA91" : version == kIESVersion1995 ? "IESNA:LM-63-1995" : "another";
+}
+
+const char* TiltText(Long mode)
+{
+  return mode == kIESTiltNone ? "none" : mode == kIESTiltInclude ? "included" : "not told";
+}
+
+std::string NumberText(Real number)
+{
+  char text[40];
+  std::snprintf(text, sizeof text, "%.7g", number);
+  return text;
+}
+
+std::string SizeOf(const Vector& size)
+{
+  return NumberText(size.x) + " x " + NumberText(size.y) + " x " + NumberText(size.z) + " m";
+}
+
+// "74, 0 to 180 degrees".
+std::string AnglesText(const GeTempDynArray<Real>& angles)
+{
+  const Long count = angles.GetCount();
+  if (count == 0)
+    return "none";
+  return std::to_string(count) + ", " + NumberText(angles[0]) + " to " + NumberText(angles[count - 1]) + " degrees";
+}
+
+void Row(const char* label, const std::string& text)
+{
+  if (!text.empty())
+    std::printf("%-20s %s\n", label, text.c_str());
+}
+
+void PrintIES(const IESLight& light)
+{
+  Row("version", VersionText(light.fileVersion));
+  Row("tilt", TiltText(light.tiltMode));
+  Row("manufacturer", ToUtf8(light.manufacturer));
+  Row("luminaire catalogue", ToUtf8(light.luminaireCatalogue));
+  Row("luminaire", ToUtf8(light.luminaire));
+  Row("lamp catalogue", ToUtf8(light.lampCatalogue));
+  Row("lamp", ToUtf8(light.lamp));
+  Row("shape", light.shape == -1 ? "none" : std::to_string(light.shape));
+  Row("size", SizeOf(light.size));
+  Row("vertical angles", AnglesText(light.verticalAngles));
+  Row("horizontal angles", AnglesText(light.horizontalAngles));
+  Row("maxCandela", NumberText(light.maxCandela));
+  Row("totalFlux", NumberText(light.totalFlux));
+  Row("lumens", NumberText(light.GetLumens()));
+}
+
+int ShowIES(const Options& options)
+{
+  const IESPtr light = LoadIES(options.file);
+  if (options.json)
+    std::puts(IESJson(*light).dump(1, ' ', false, Json::error_handler_t::replace).c_str());
+  else
+    PrintIES(*light);
+  return kDone;
+}
+
+} // namespace
+
+Json IESJson(const IESLight& light)
+{
+  return {{"fileVersion", light.fileVersion},
+          {"tiltMode", light.tiltMode},
+          {"manufacturer", ToJson(light.manufacturer)},
+          {"luminaireCatalogue", ToJson(light.luminaireCatalogue)},
+          {"luminaire", ToJson(light.luminaire)},
+          {"lampCatalogue", ToJson(light.lampCatalogue)},
+          {"lamp", ToJson(light.lamp)},
+          {"shape", light.shape},
+          {"size", ToJson(light.size)},
+          {"verticalCount", light.GetVerticalCount()},
+          {"horizontalCount", light.GetHorizontalCount()},
+          {"verticalAngles", Numbers(light.verticalAngles)},
+          {"horizontalAngles", Numbers(light.horizontalAngles)},
+          {"candela", RowsJson(light)},
+          {"maxCandela", light.maxCandela},
+          {"totalFlux", light.totalFlux},
+          {"lumens", light.GetLumens()}};
+}
+
+void AddIES(CLI::App& program, int& status)
+{
+  auto options = std::make_shared<Options>();
+  CLI::App* verb = program.add_subcommand("ies", kHelp);
+  verb->add_option("FILE", options->file, "the photometric file")->required();
+  verb->add_flag("--json", options->json, "as one JSON object, with the table");
+  verb->callback([options, &status] { status = ShowIES(*options); });
+}
+
+} // namespace q7r

@@ -1,0 +1,173 @@
+// q7r info: what a scene file is and how much it holds.
+#include <cstdio>
+#include <filesystem>
+#include <map>
+#include <memory>
+
+#include "listing/json_text.h"
+#include "listing/type_names.h"
+#include "scene_file.h"
+#include "torvane/animation/ctrack.h"
+#include "torvane/tags/base_tag.h"
+#include "verbs.h"
+
+namespace q7r
+{
+
+using namespace _torvane_;
+
+namespace
+{
+
+constexpr const char* kHelp = R"(Tells a scene file's version, writer and dates, its frame rate and range, and how many
+objects, tags, materials, tracks and keys it holds.
+
+Example: q7r info shot.q7r)";
+
+struct Options
+{
+  std::string file;
+  bool json = false;
+};
+
+struct Counts
+{
+  std::map<Long, long long> objects; // by type
+  std::map<Long, long long> tags;
+  long long tracks = 0;
+  long long keys = 0;
+};
+
+void CountTracks(const BaseList2D& node, Counts& counts)
+{
+  for (CTrack* track = node.GetFirstTrack(); track; track = track->GetNext()) {
+    ++counts.tracks;
+    for (Long number = 1; number <= kCurveLast; ++number) {
+      if (CCurve* curve = track->GetCurve(number, 0))
+        counts.keys += curve->GetKeyCount();
+    }
+  }
+}
+
+void CountObjects(BaseObject* first, Counts& counts)
+{
+  for (BaseObject* object = first; object; object = object->GetNext()) {
+    ++counts.objects[object->GetType()];
+    CountTracks(*object, counts);
+    for (BaseTag* tag = object->GetFirstTag(); tag; tag = tag->GetNext()) {
+      ++counts.tags[tag->GetType()];
+      CountTracks(*tag, counts);
+    }
+    CountObjects(object->GetDown(), counts);
+  }
+}
+
+long long Sum(const std::map<Long, long long>& counts)
+{
+  long long sum = 0;
+  for (const auto& [type, count] : counts)
+    sum += count;
+  return sum;
+}
+
+std::string Parameter(BaseDocument& document, Long id)
+{
+  GeData value;
+  document.GetParameterById(id, value);
+  return value.GetType() == kDataString ? ToUtf8(value.GetString()) : std::string();
+}
+
+Json ByType(const std::map<Long, long long>& counts)
+{
+  Json json = Json::object();
+  for (const auto& [type, count] : counts)
+    json[std::to_string(type)] = count;
+  return json;
+}
+
+Json InfoJson(BaseDocument& document, const Counts& counts, std::uintmax_t size)
+{
+  const DocumentPref& pref = document.GetPref();
+  return {{"size", size},
+          {"version", document.GetLoadedVersion()},
+          {"name", ToJson(document.GetName())},
+          {"writer", Parameter(document, kDocumentWriterText)},
+          {"saved", Parameter(document, kDocumentSaveText)},
+          {"creator", Parameter(document, kDocumentCreatorText)},
+          {"created", Parameter(document, kDocumentCreationText)},
+          {"fps", pref.GetFps()},
+          {"min", ToJson(pref.GetMinTime())},
+          {"max", ToJson(pref.GetMaxTime())},
+          {"objects", Sum(counts.objects)},
+          {"objectTypes", ByType(counts.objects)},
+          {"tags", Sum(counts.tags)},
+          {"tagTypes", ByType(counts.tags)},
+          {"materials", document.GetMaterialRoot()->GetCount()},
+          {"layers", document.GetLayerRoot()->GetCount()},
+          {"renderSettings", document.GetRenderDataRoot()->GetCount()},
+          {"views", document.GetViewPanelRoot()->GetCount()},
+          {"tracks", counts.tracks},
+          {"keys", counts.keys}};
+}
+
+std::string TypesText(const std::map<Long, long long>& counts)
+{
+  std::string text;
+  for (const auto& [type, count] : counts)
+    text += (text.empty() ? "  (" : ", ") + std::to_string(count) + " " + TypeName(type);
+  return text.empty() ? text : text + ")";
+}
+
+void Row(const char* label, const std::string& text)
+{
+  if (!text.empty())
+    std::printf("%-16s %s\n", label, text.c_str());
+}
+
+void PrintInfo(const Json& info, const Counts& counts)
+{
+  auto number = [&info](const char* key) { return info[key].dump(); };
+  auto seconds = [&info](const char* key) { return info[key][0].get<double>() / info[key][1].get<double>(); };
+  char range[80];
+  std::snprintf(range, sizeof range, "%g to %g s", seconds("min"), seconds("max"));
+  Row("size", SizeText(info["size"].get<std::uintmax_t>()));
+  Row("version", number("version"));
+  for (const char* key : {"name", "writer", "saved", "creator", "created"})
+    Row(key, info[key].get<std::string>());
+  Row("frame rate", number("fps") + " fps");
+  Row("range", range);
+  Row("objects", number("objects") + TypesText(counts.objects));
+  Row("tags", number("tags") + TypesText(counts.tags));
+  Row("materials", number("materials"));
+  Row("layers", number("layers"));
+  Row("render settings", number("renderSettings"));
+  Row("views", number("views"));
+  Row("tracks", number("tracks"));
+  Row("keys", number("keys"));
+}
+
+int Info(const Options& options)
+{
+  DocumentPtr document = LoadScene(options.file);
+  Counts counts;
+  CountObjects(document->GetFirstObject(), counts);
+  Json info = InfoJson(*document, counts, std::filesystem::file_size(options.file));
+  if (options.json)
+    std::puts(info.dump(1, ' ', false, Json::error_handler_t::replace).c_str());
+  else
+    PrintInfo(info, counts);
+  return kDone;
+}
+
+} // namespace
+
+void AddInfo(CLI::App& program, int& status)
+{
+  auto options = std::make_shared<Options>();
+  CLI::App* verb = program.add_subcommand("info", kHelp);
+  verb->add_option("FILE", options->file, "the scene file")->required();
+  verb->add_flag("--json", options->json, "as one JSON object");
+  verb->callback([options, &status] { status = Info(*options); });
+}
+
+} // namespace q7r

@@ -1,0 +1,146 @@
+// q7r preview: takes a scene file's picture out, or puts one in.
+#include <cstdio>
+#include <filesystem>
+#include <fstream>
+#include <memory>
+
+#include "scene_file.h"
+#include "torvane/pictures/bitmap_filters.h"
+#include "verbs.h"
+
+namespace q7r
+{
+
+using namespace _torvane_;
+
+namespace
+{
+
+constexpr const char* kHelp = R"(Takes the preview picture out of a scene file, or puts one in with --set.
+
+Use it to see what is in a scene without opening it: only the start of the file is read.
+The suffix of the picture's name tells its format, .jpg, .jpeg or .bmp. A JPEG comes out
+byte for byte as the scene holds it. BMP (24 bits a pixel) and JPEG files can be put in.
+
+Examples: q7r preview shot.q7r -o shot.jpg
+          q7r preview shot.q7r --set still.bmp -o new.q7r)";
+
+struct Options
+{
+  std::string scene;
+  std::string picture; // to put in; empty to take out
+  std::string output;
+  bool force = false;
+};
+
+const char* PictureProblem(Long result)
+{
+  switch (result) {
+  case IMAGERESULT_OPEN:
+    return "can't be opened";
+  case IMAGERESULT_FORMAT:
+    return "this kind isn't read: a BMP needs 24 bits a pixel, a JPEG one or three components";
+  case IMAGERESULT_LARGE:
+    return "larger than the format allows";
+  case IMAGERESULT_FILE:
+    return "can't be read or written to its end";
+  default:
+    return "damaged, or too large for the memory";
+  }
+}
+
+void RequireGood(const std::string& path, Long result)
+{
+  if (result != IMAGERESULT_OK)
+    throw Failure(path + ": " + PictureProblem(result));
+}
+
+// The format that a picture's name asks for.
+Long FormatOf(const std::string& path)
+{
+  Filename name = ToFilename(path);
+  if (name.CheckSuffix("bmp"))
+    return kImageFormatBmp;
+  if (name.CheckSuffix("jpg") || name.CheckSuffix("jpeg"))
+    return kImageFormatJpeg;
+  throw Failure(path + ": the name of a picture ends with .jpg, .jpeg or .bmp");
+}
+
+Long WriteBytes(const std::string& path, const void* data, LLong size)
+{
+  std::ofstream file(std::filesystem::path(path), std::ios::binary);
+  file.write(static_cast<const char*>(data), static_cast<std::streamsize>(size));
+  file.close();
+  return file ? IMAGERESULT_OK : IMAGERESULT_FILE;
+}
+
+int TakeOut(const Options& options)
+{
+  Long format = FormatOf(options.output);
+  FileProblem problem;
+  DocumentPtr document(LoadDocument(ToFilename(options.scene), LoadPreviewOnly, &problem));
+  if (!document)
+    throw Failure(ProblemText(options.scene, problem));
+  Bitmap& preview = document->GetPreview();
+  if (preview.GetBw() < 1)
+    throw Failure(options.scene + ": holds no preview picture");
+  RequireReplaceable(options.output, options.force);
+  WriteWhole(options.output, [&](const std::string& partial) {
+    const Bitmap& stored = document->GetStoredPreview();
+    RequireGood(options.output, format == kImageFormatJpeg
+                                    ? WriteBytes(partial, stored.GetEncoded(), stored.GetEncodedSize())
+                                    : preview.Save(ToFilename(partial), format, nullptr, 0));
+  });
+  std::printf("%s: %d x %d pixels, %s\n", options.output.c_str(), preview.GetBw(), preview.GetBh(),
+              SizeText(std::filesystem::file_size(options.output)).c_str());
+  return kDone;
+}
+
+void LoadPicture(const std::string& path, Bitmap& bitmap)
+{
+  std::ifstream file(std::filesystem::path(path), std::ios::binary);
+  char first[4096];
+  file.read(first, sizeof first);
+  auto count = static_cast<LLong>(file.gcount());
+  if (count < 1)
+    throw Failure(path + ": can't be read, or is empty");
+  Filename name = ToFilename(path);
+  const BmpLoader bmp;
+  const JpgLoader jpeg;
+  for (const BitmapLoaderData* loader :
+       {static_cast<const BitmapLoaderData*>(&bmp), static_cast<const BitmapLoaderData*>(&jpeg)}) {
+    if (loader->Identify(name, first, count))
+      return RequireGood(path, loader->Load(name, bitmap, kFirstFrame));
+  }
+  throw Failure(path + ": is neither a JPEG file nor a BMP file of the common kind");
+}
+
+int PutIn(const Options& options)
+{
+  DocumentPtr document = LoadScene(options.scene);
+  Bitmap& preview = document->GetPreview();
+  LoadPicture(options.picture, preview);
+  // A scene file holds its preview as JPEG.
+  Long most = JpgSaver().GetMaxResolution();
+  if (preview.GetBw() > most || preview.GetBh() > most)
+    RequireGood(options.picture, IMAGERESULT_LARGE);
+  RequireReplaceable(options.output, options.force);
+  WriteScene(*document, options.output);
+  return kDone;
+}
+
+} // namespace
+
+void AddPreview(CLI::App& program, int& status)
+{
+  auto options = std::make_shared<Options>();
+  CLI::App* verb = program.add_subcommand("preview", kHelp);
+  verb->add_option("FILE", options->scene, "the scene file")->required();
+  verb->add_option("--set", options->picture, "put this picture in")->option_text("IMAGE");
+  verb->add_option("-o,--output", options->output, "the picture to write; with --set the scene file to write")
+      ->required();
+  verb->add_flag("--force", options->force, "replace an existing file without asking");
+  verb->callback([options, &status] { status = options->picture.empty() ? TakeOut(*options) : PutIn(*options); });
+}
+
+} // namespace q7r
