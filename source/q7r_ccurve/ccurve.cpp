@@ -50,7 +50,7 @@ Bool CCurve::CopyTo(PrivateChunk& destination, ULong flags, TransArray* translat
 
 GeListNode* CCurve::MakeClone(ULong flags, TransArray* translation)
 {
-  return CloneNode(*this, new CCurve, flags, translation);
+  return CloneNode(*this, NewObj<CCurve>(), flags, translation);
 }
 
 // Keys beyond the range of times stay in the list, but not in the index.
@@ -70,7 +70,7 @@ CKey* CCurve::AddKey(const BaseTime& time, Long* index)
     *index = -1;
   if (!IsKeyTime(time))
     return nullptr;
-  auto* key = new CKey;
+  auto* key = NewObj<CKey>();
   if (!key)
     return nullptr;
   key->SetTime(time);

@@ -82,7 +82,7 @@ Bool CKey::CopyTo(PrivateChunk& destination, ULong flags, TransArray* translatio
 
 GeListNode* CKey::MakeClone(ULong flags, TransArray* translation)
 {
-  return CloneNode(*this, new CKey, flags, translation);
+  return CloneNode(*this, NewObj<CKey>(), flags, translation);
 }
 
 Bool CKey::GetParameter(const ParameterPath& path, GeData& value)
@@ -197,6 +197,6 @@ Bool CKey::IsEqual(const CKey& other) const
          interpolation_ == other.interpolation_ && keyData_.IsEqual(other.keyData_);
 }
 
-BaseList2D* MakeEmptyKey() { return new CKey; }
+BaseList2D* MakeEmptyKey() { return NewObj<CKey>(); }
 
 } // namespace _torvane_

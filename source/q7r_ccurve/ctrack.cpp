@@ -32,13 +32,14 @@ CTrack::~CTrack()
 
 CTrack* CTrack::Alloc(BaseList2D* node, const ParameterPath& path, const String& name)
 {
-  auto* track = node ? new CTrack : nullptr;
+  AllocationWatch watch;
+  auto* track = node ? NewObj<CTrack>() : nullptr;
   if (!track)
     return nullptr;
   track->SetName(name);
   if (!track->InitPath(*node, path))
     DeleteObj(track);
-  return track;
+  return watch.Whole(track);
 }
 
 Bool CTrack::InitPath(BaseList2D& node, const ParameterPath& path)
@@ -81,7 +82,7 @@ CCurve* CTrack::GetCurve(Long number, Long create)
     return &curve_;
   CCurve*& curve = *SlotOf(number);
   if (!curve && create)
-    curve = new CCurve;
+    curve = NewObj<CCurve>();
   return curve;
 }
 
@@ -115,7 +116,7 @@ Bool CTrack::ReadCurve(HyperFile& file, CCurve*& curve)
     return false;
   }
   if (!curve)
-    curve = new CCurve;
+    curve = NewObj<CCurve>();
   if (!curve) {
     file.SetError(FILEERROR_MEMORY);
     return false;
@@ -233,7 +234,7 @@ Bool CTrack::CopyTo(PrivateChunk& destination, ULong flags, TransArray* translat
 
 GeListNode* CTrack::MakeClone(ULong flags, TransArray* translation)
 {
-  return CloneNode(*this, new CTrack, flags, translation);
+  return CloneNode(*this, NewObj<CTrack>(), flags, translation);
 }
 
 Bool CTrack::GetParameter(const ParameterPath& path, GeData& value)
@@ -282,6 +283,6 @@ Bool CTrack::SetParameter(const ParameterPath& path, const GeData& value)
   }
 }
 
-BaseList2D* MakeEmptyTrack() { return new CTrack; }
+BaseList2D* MakeEmptyTrack() { return NewObj<CTrack>(); }
 
 } // namespace _torvane_

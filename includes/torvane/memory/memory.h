@@ -50,14 +50,6 @@ struct GeMemory
   static void operator delete(void*, void*) noexcept {}
 };
 
-// A new T in memory of the client's hooks, or null. The one way to make an object in the library.
-template <class T, class... Args>
-[[nodiscard]] T* NewObj(Args&&... args) noexcept
-{
-  void* place = GeAllocNC(static_cast<LLong>(sizeof(T)));
-  return place ? ::new (place) T(std::forward<Args>(args)...) : nullptr;
-}
-
 // Destroys an object made by NewObj and sets the pointer to null; a null pointer does nothing. A derived object may
 // be deleted through its base when the base has a virtual destructor.
 template <class T>
@@ -71,6 +63,42 @@ void DeleteObj(T*& object) noexcept
     detail::FreeBlock(const_cast<std::remove_cv_t<T>*>(object));
   }
   object = nullptr;
+}
+
+// How many allocations of the calling thread the client's hooks have refused since it began. Sizes that are turned down
+// before the hooks are asked don't count.
+ULong CountFailedAllocations() noexcept;
+
+// Tells whether an allocation of this thread failed since the watch began. What is built of many parts (a load, a copy,
+// a node with its defaults) asks it at its end: a part that came out empty somewhere below then makes the whole fail,
+// whatever the function that met the null did with it.
+class AllocationWatch
+{
+ public:
+  AllocationWatch() noexcept : start_(CountFailedAllocations()) {}
+
+  Bool Failed() const noexcept { return CountFailedAllocations() != start_; }
+  // `object` if nothing failed; otherwise deletes it and gives null. Null stays null.
+  template <class T>
+  [[nodiscard]] T* Whole(T* object) const noexcept
+  {
+    if (object && Failed())
+      DeleteObj(object);
+    return object;
+  }
+
+ private:
+  ULong start_;
+};
+
+// A new T in memory of the client's hooks, or null: also when its constructor could not get all that it asked for. The
+// one way to make an object in the library.
+template <class T, class... Args>
+[[nodiscard]] T* NewObj(Args&&... args) noexcept
+{
+  AllocationWatch watch;
+  void* place = GeAllocNC(static_cast<LLong>(sizeof(T)));
+  return place ? watch.Whole(::new (place) T(std::forward<Args>(args)...)) : nullptr;
 }
 
 } // namespace _torvane_

@@ -126,6 +126,10 @@ class HyperFile : public GeMemory
   Long GetError() const { return error_; }
   // Overwrites the sticky error and reports to the assertion log; only Open clears it.
   void SetError(Long error);
+  // False once a part of what was read or written since Open could not be held in memory, which then is the error of
+  // the file, or after any other error. Loops over chunks ask it behind each chunk, so that nothing is left out of a
+  // file without an error.
+  Bool HasMemory();
   // Why and where the stream failed first. Code 0 while all is well.
   const FileProblem& GetProblem() const { return problem_; }
 
@@ -350,6 +354,7 @@ class HyperFile : public GeMemory
   BaseFile file_;
   Long error_ = FILEERROR_NONE;
   FileProblem problem_;
+  AllocationWatch memory_; // since Open
   Bool singlePrecision_ = false;
   Long mode_ = kHyperFileRead;
   LLong length_ = 0;

@@ -7,11 +7,27 @@
 namespace _torvane_
 {
 
-void* GeAlloc(LLong size) noexcept { return size > 0 ? MemAllocClear(size) : nullptr; }
+namespace
+{
 
-void* GeAllocNC(LLong size) noexcept { return size > 0 ? MemAlloc(size) : nullptr; }
+thread_local ULong gFailedAllocations = 0;
 
-void* GeRealloc(void* block, LLong size) noexcept { return MemRealloc(block, size); }
+void* Counted(void* block) noexcept
+{
+  if (!block)
+    ++gFailedAllocations;
+  return block;
+}
+
+} // namespace
+
+void* GeAlloc(LLong size) noexcept { return size > 0 ? Counted(MemAllocClear(size)) : nullptr; }
+
+void* GeAllocNC(LLong size) noexcept { return size > 0 ? Counted(MemAlloc(size)) : nullptr; }
+
+void* GeRealloc(void* block, LLong size) noexcept { return size > 0 ? Counted(MemRealloc(block, size)) : nullptr; }
+
+ULong CountFailedAllocations() noexcept { return gFailedAllocations; }
 
 void GeCopyMem(void* destination, const void* source, LLong size) noexcept
 {

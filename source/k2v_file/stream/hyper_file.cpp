@@ -65,6 +65,7 @@ Bool HyperFile::Open(ULong ident, const Filename& name, Long mode, Bool errorDia
 {
   error_ = FILEERROR_NONE;
   problem_ = FileProblem();
+  memory_ = AllocationWatch();
   ticks_ = 0;
   readTicks_ = 0;
   length_ = 0;
@@ -122,19 +123,29 @@ Bool HyperFile::Close()
 {
   EndTranslation();
   LLong position = file_.GetPosition();
+  HasMemory();
   if (!file_.Close() && error_ == FILEERROR_NONE)
     FailFromFile(position);
   return error_ == FILEERROR_NONE;
 }
 
-// The one place that every failure passes.
+// The one place that every failure passes. What goes wrong after a failed allocation went wrong by it.
 Bool HyperFile::Fail(Long error, LLong position)
 {
+  if (memory_.Failed())
+    error = FILEERROR_MEMORY;
   if (problem_.code == FILEERROR_NONE)
     problem_ = FileProblem{error, position};
   error_ = error;
   ReportAssertion("k2v_file", __LINE__, GetFileErrorText(error));
   return false;
+}
+
+Bool HyperFile::HasMemory()
+{
+  if (error_ == FILEERROR_NONE && memory_.Failed())
+    Fail(FILEERROR_MEMORY, file_.GetPosition());
+  return error_ == FILEERROR_NONE;
 }
 
 Bool HyperFile::FailFromFile(LLong position)

@@ -229,7 +229,7 @@ Bool HyperFile::ReadContainer(BaseContainer& container, Bool flush)
       Fail(FILEERROR_WRONG_VALUE, start);
   }
   LeaveLoop();
-  return read;
+  return read && HasMemory();
 }
 
 Bool HyperFile::ReadContainerChunk(BaseContainer& container, Bool flush)

@@ -80,7 +80,7 @@ BaseDocument::BaseDocument()
       materials_(AllocRootMaterial()),
       layers_(AllocRootLayer()),
       renderData_(AllocRootRenderData()),
-      viewPanels_(new RootViewPanel)
+      viewPanels_(NewObj<RootViewPanel>())
 {
   for (RootList2D* root :
        {static_cast<RootList2D*>(objects_), static_cast<RootList2D*>(materials_), static_cast<RootList2D*>(layers_),
@@ -118,7 +118,7 @@ void BaseDocument::SetContainerDefaults()
 
 BaseDocument* BaseDocument::Alloc()
 {
-  auto* document = new BaseDocument;
+  auto* document = NewObj<BaseDocument>();
   if (document && !document->IsComplete())
     DeleteObj(document);
   return document;
@@ -311,6 +311,7 @@ Bool BaseDocument::SetParameter(const ParameterPath& path, const GeData& value)
 Bool BaseDocument::CopyTo(PrivateChunk& destination, ULong flags, TransArray*)
 {
   auto& target = static_cast<BaseDocument&>(destination);
+  AllocationWatch watch;
   AliasTranslator translator;
   if (!translator.MakeTranslator() || !BaseList2D::CopyTo(destination, flags, translator.GetArray()))
     return false;
@@ -322,14 +323,14 @@ Bool BaseDocument::CopyTo(PrivateChunk& destination, ULong flags, TransArray*)
   Bool copied = preview_.CopyTo(target.preview_);
   for (Long i = 0; i < kSettingsCount && copied; ++i)
     copied = settings_[i].CopyTo(target.settings_[i], flags, translator.GetArray());
-  if (!copied || !CopyRoots(target, flags, translator.GetArray())) {
+  if (!copied || !CopyRoots(target, flags, translator.GetArray()) || watch.Failed()) {
     target.materials_->FreeAll();
     target.objects_->FreeAll();
     target.layers_->FreeAll();
     return false;
   }
   translator.Finish(true);
-  return true;
+  return !watch.Failed();
 }
 
 Bool BaseDocument::CopyRoots(BaseDocument& target, ULong flags, TransArray* translation)

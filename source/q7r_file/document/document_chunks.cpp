@@ -267,10 +267,11 @@ Bool BaseDocument::ReadChunk(HyperFile& file, Long id, Long level)
 
 BaseDocument* CreateDocument()
 {
+  AllocationWatch watch;
   BaseDocument* document = BaseDocument::Alloc();
   if (document)
     StampInfo(document->GetDataInstance(), kInfoCreatorName, kInfoCreatorId, kInfoCreationDate);
-  return document;
+  return watch.Whole(document);
 }
 
 Bool SaveDocument(BaseDocument* document, const Filename& name, Long, FileProblem* problem)
@@ -312,6 +313,7 @@ BaseDocument* LoadDocument(const Filename& name, Long loadFlags, FileProblem* pr
 {
   if (problem)
     *problem = {FILEERROR_MEMORY, 0};
+  AllocationWatch watch;
   BaseDocument* document = BaseDocument::Alloc();
   if (!document)
     return nullptr;
@@ -324,7 +326,10 @@ BaseDocument* LoadDocument(const Filename& name, Long loadFlags, FileProblem* pr
       *problem = {FILEERROR_PREMATURE_END, file.GetPosition()};
   }
   file.Close();
-  if (!read)
+  // What failed outside of the file, in names and links, makes the load fail as well.
+  if (watch.Failed() && problem)
+    problem->code = FILEERROR_MEMORY;
+  if (!read || watch.Failed())
     DeleteObj(document);
   return document;
 }

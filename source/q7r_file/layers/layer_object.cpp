@@ -95,6 +95,6 @@ GeListNode* LayerObject::MakeClone(ULong flags, TransArray* translation)
   return CloneNode(*this, AllocLayer(), flags, translation);
 }
 
-LayerObject* AllocLayer() { return new LayerObject; }
+LayerObject* AllocLayer() { return NewObj<LayerObject>(); }
 
 } // namespace _torvane_

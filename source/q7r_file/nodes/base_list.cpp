@@ -127,7 +127,7 @@ Bool BaseList2D::ReadUniqueIds(HyperFile& file)
     if (uniqueIds_)
       uniqueIds_->FreeEntries();
     else
-      uniqueIds_ = new UniqueIDArray;
+      uniqueIds_ = NewObj<UniqueIDArray>();
     if (!uniqueIds_)
       return false;
   }
@@ -255,7 +255,7 @@ Bool BaseList2D::AddUniqueID(Long appId, const void* data, LLong size)
     return true;
   }
   if (!uniqueIds_)
-    uniqueIds_ = new UniqueIDArray;
+    uniqueIds_ = NewObj<UniqueIDArray>();
   return uniqueIds_ && uniqueIds_->SetEntry(appId, data, size);
 }
 

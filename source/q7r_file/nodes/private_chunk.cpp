@@ -92,7 +92,12 @@ Bool PrivateChunk::ReadOneChunk(HyperFile& file, Bool keepGoing, Bool& finished)
   if (!file.ReadChunkStart(id, level))
     return false;
   const LLong body = file.GetPosition();
-  if (!ReadChunk(file, id, level) && !(keepGoing && file.GetPosition() == body && KeepChunk(file, id, level))) {
+  const Bool taken = ReadChunk(file, id, level);
+  if (!file.HasMemory()) {
+    finished = true;
+    return false;
+  }
+  if (!taken && !(keepGoing && file.GetPosition() == body && KeepChunk(file, id, level))) {
     Bool skipped = file.SkipToEndChunk();
     if (!keepGoing) {
       finished = true;
@@ -105,7 +110,7 @@ Bool PrivateChunk::ReadOneChunk(HyperFile& file, Bool keepGoing, Bool& finished)
     finished = true;
     return true;
   }
-  finished = file.GetError() != FILEERROR_NONE;
+  finished = !file.HasMemory();
   return false;
 }
 
@@ -137,13 +142,14 @@ void PrivateChunk::WriteAsChunk(HyperFile& file, Long id)
 
 Bool PrivateChunk::CopyWithTranslation(PrivateChunk& destination, ULong flags, TransArray* translation)
 {
+  AllocationWatch watch;
   if (translation || (flags & kCopyNoTranslation))
-    return CopyTo(destination, flags, translation);
+    return CopyTo(destination, flags, translation) && !watch.Failed();
   AliasTranslator translator;
   if (!translator.MakeTranslator() || !CopyTo(destination, flags, translator.GetArray()))
     return false;
   translator.Finish(true);
-  return true;
+  return !watch.Failed();
 }
 
 Bool PrivateChunk::GetParameterById(Long id, GeData& value) { return GetParameter(ParameterPath(id), value); }

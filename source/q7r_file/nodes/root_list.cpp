@@ -159,7 +159,7 @@ BaseObject* RootObject::AllocMember(Long type)
     return object;
   }
   case kObjectGeneric:
-    return new BaseObject(kObjectGeneric);
+    return NewObj<BaseObject>(kObjectGeneric);
   case kObjectPoint: // a label alone; the object's chunks tell its type
     return MakePointObject();
   case kObjectPolygonLabel:

@@ -82,7 +82,7 @@ void RenderData::SetDocument(BaseDocument* document)
   SetDocumentOfMembers(&multipasses_, document);
 }
 
-RenderData* AllocRenderData() { return new RenderData; }
+RenderData* AllocRenderData() { return NewObj<RenderData>(); }
 
 MultipassObject::MultipassObject() : BaseList4D(kTypeMultipass) { data_.SetLong(1002, 1); }
 
@@ -108,10 +108,10 @@ Bool MultipassObject::CopyTo(PrivateChunk& destination, ULong flags, TransArray*
 
 GeListNode* MultipassObject::MakeClone(ULong flags, TransArray* translation)
 {
-  return CloneNode(*this, new MultipassObject, flags, translation);
+  return CloneNode(*this, NewObj<MultipassObject>(), flags, translation);
 }
 
-BaseList2D* MakeMultipass() { return new MultipassObject; }
+BaseList2D* MakeMultipass() { return NewObj<MultipassObject>(); }
 
 BaseVideoPost::BaseVideoPost() : BaseList2D(kTypeVideoPost) {}
 
@@ -160,9 +160,9 @@ Bool BaseVideoPost::CopyTo(PrivateChunk& destination, ULong flags, TransArray* t
 
 GeListNode* BaseVideoPost::MakeClone(ULong flags, TransArray* translation)
 {
-  return CloneNode(*this, new BaseVideoPost, flags, translation);
+  return CloneNode(*this, NewObj<BaseVideoPost>(), flags, translation);
 }
 
-BaseList2D* MakeVideoPost() { return new BaseVideoPost; }
+BaseList2D* MakeVideoPost() { return NewObj<BaseVideoPost>(); }
 
 } // namespace _torvane_

@@ -110,6 +110,7 @@ const ObjectClass* FindObjectClass(Long type)
 
 BaseObject* AllocObject(Long type)
 {
+  AllocationWatch watch;
   const ObjectClass* row = FindObjectClass(type);
   BaseObject* object = row ? row->makeObject(type) : nullptr;
   if (!object || !row->makeData)
@@ -118,7 +119,7 @@ BaseObject* AllocObject(Long type)
   object->SetObjectData(data);
   if (!data || !data->Init())
     DeleteObj(object);
-  return object;
+  return watch.Whole(object);
 }
 
 NodeData* AllocObjectDataOfType(Long type, Bool& known)

@@ -67,6 +67,7 @@ const TagClass* FindTagClass(Long type)
 
 BaseTag* MakeTag(Long type)
 {
+  AllocationWatch watch;
   const TagClass* row = FindTagClass(type);
   BaseTag* tag = row ? row->make(type) : NewObj<BaseTag>(type);
   if (!tag || !row || !row->makeData)
@@ -75,7 +76,7 @@ BaseTag* MakeTag(Long type)
   tag->SetNodeData(data);
   if (!data || !data->Init())
     DeleteObj(tag);
-  return tag;
+  return watch.Whole(tag);
 }
 
 NodeData* AllocTagDataOfType(Long pluginId, Bool& known)
