@@ -13,7 +13,6 @@ using namespace _torvane_;
 namespace
 {
 
-constexpr Long kManualFrameRange = 2;
 constexpr Real kMostFrames = 2147483647.0;
 
 BaseTime ToBaseTime(const A_Time& time) { return BaseTime(time.value, time.scale == 0 ? 1.0 : time.scale); }
@@ -87,7 +86,7 @@ bool ReadCompositionSettings(ExportContext& context, AEGP_CompH composition, AEG
   settings->SetParameterById(kRenderFrameTo, end);
   settings->SetParameterById(kRenderPixelAspect, context.pixelAspect);
   settings->SetParameterById(kRenderFilmAspect, filmAspect);
-  settings->SetParameterById(kRenderFrameSequence, kManualFrameRange);
+  settings->SetParameterById(kRenderFrameMode, Long{2});
   return true;
 }
 

@@ -27,7 +27,7 @@ inline constexpr Real kPixelsPerInch = 72.0;
 inline constexpr Real kPixelsPerMillimetre = 2.834645669291339;
 constexpr Real PixelsToMillimetres(Real pixels) { return pixels * kMillimetresPerInch / kPixelsPerInch; }
 
-constexpr Real DegreesToRadians(Real degrees) { return degrees * _torvane_::kPi / 180.0; }
+using _torvane_::DegreesToRadians;
 
 // The host's y axis points down.
 constexpr Vector FlipY(const Vector& v) { return {v.x, -v.y, v.z}; }

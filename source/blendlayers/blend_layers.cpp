@@ -320,9 +320,9 @@ void iBlendDataType::Write(HyperFile& file) const
 // The layer that a path's first level addresses, or null; `sub` becomes the number within the layer.
 BlendLayer* iBlendDataType::FindLayer(const ParameterPath& path, Long& sub) const
 {
-  const Long place = path[0].id - kBlendFirstId;
   if (path[0].id < kBlendFirstId)
     return nullptr;
+  const Long place = path[0].id - kBlendFirstId;
   sub = place % kBlendIdsPerLayer;
   return layers_.FindById(place / kBlendIdsPerLayer);
 }

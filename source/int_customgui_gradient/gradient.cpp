@@ -17,9 +17,6 @@ namespace
 constexpr const char* kModule = "int_customgui_gradient";
 constexpr Long kLineStaleCache = 107;
 
-// Up to this version the colours of the transparency hold what the brightness tells now.
-constexpr Long kLastVersionWithColoredAlpha = 11004;
-
 constexpr Vector kWhite(1.0, 1.0, 1.0);
 
 // The entry of a knot that a field stands for; -1 for a number that is no field.
@@ -165,7 +162,7 @@ Bool GradientData::ReadGradient(HyperFile& file, Long level)
     return true;
   FreeGradientCache();
   DropAlpha();
-  const Bool old = file.GetFileVersion() <= kLastVersionWithColoredAlpha;
+  const Bool old = file.GetFileVersion() < kVersionGreyAlpha;
   fromOldFile_ = old ? 1 : 0;
   Bool hasAlpha = false;
   if (!file.ReadContainer(settings_, true) || !file.ReadBool(hasAlpha))

@@ -97,7 +97,7 @@ TEST(CompositionSettings, GoToTheDocumentAndTheRenderSettings)
     ExpectTime(Setting(render, kRenderFrameTo), c.end.numerator, c.end.denominator, c.what);
     EXPECT_EQ(Setting(render, kRenderPixelAspect).GetReal(), c.pixelAspect) << c.what;
     EXPECT_EQ(Setting(render, kRenderFilmAspect).GetReal(), c.filmAspect) << c.what;
-    EXPECT_EQ(Setting(render, kRenderFrameSequence).GetLong(), 2) << c.what;
+    EXPECT_EQ(Setting(render, kRenderFrameMode).GetLong(), 2) << c.what;
     EXPECT_EQ(document->GetFirstRenderData()->GetNext(), nullptr) << c.what;
   }
 }

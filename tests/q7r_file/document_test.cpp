@@ -352,10 +352,10 @@ TEST(Document, AnswersItsParameters)
 
   document->SetParameterById(kDocumentInverseSwitch, GeData(false));
   EXPECT_TRUE(document->GetDataInstance().GetBool(100004828));
-  document->GetParameter({{kDocumentBackColor, kDataVector, 0}, {kVectorY, 0, 0}}, value);
+  document->GetParameter({{kDocumentColor, kDataVector, 0}, {kVectorY, 0, 0}}, value);
   EXPECT_EQ(value.GetReal(), 0.38);
   document->GetDataInstance().SetLong(2113, 0);
-  document->GetParameterById(kDocumentBackColor, value);
+  document->GetParameterById(kDocumentColor, value);
   EXPECT_TRUE(value.GetVector() == Vector(0.8, 0.8, 0.8));
 }
 

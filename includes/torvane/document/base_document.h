@@ -41,7 +41,7 @@ inline constexpr Long kDocumentCreatorText = 2002;
 inline constexpr Long kDocumentWriterText = 2005;
 inline constexpr Long kDocumentCreationText = 2021;
 inline constexpr Long kDocumentSaveText = 2023;
-inline constexpr Long kDocumentBackColor = 2112;
+inline constexpr Long kDocumentColor = 2112; // read only; which one it is tells the entry 2113
 
 // Entries of the document container that tell who made and wrote the file, and when (a Julian day whose bits stand in
 // an LLong).
@@ -218,7 +218,7 @@ class BaseDocument : public BaseList2D
   BaseContainer settings_[kSettingsCount];
   Long viewNumber_ = 1;
   Bool viewFlags_[kViewFlagCount] = {false, false, true, false, true, false, false, false, false, false, false, false};
-  Long loadedVersion_ = kCurrentFileVersion;
+  Long loadedVersion_ = kVersionCurrent;
 };
 
 // A new document with its creation information; null when memory is short. The caller owns it.

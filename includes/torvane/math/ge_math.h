@@ -11,6 +11,9 @@ inline constexpr Real kPi = 3.14159265358979323846;
 inline constexpr Real kTwoPi = 2.0 * kPi;
 inline constexpr Real kHalfPi = 0.5 * kPi;
 
+constexpr Real DegreesToRadians(Real degrees) { return degrees * kPi / 180.0; }
+constexpr Real RadiansToDegrees(Real radians) { return radians * (180.0 / kPi); }
+
 // Rotation orders: 0 to 5 are the six sequences of the axes. In the scene's own order, which every other number
 // stands for too, the first angle turns about y, the second about x, the third about z.
 inline constexpr Long kRotationOrderScene = 6;

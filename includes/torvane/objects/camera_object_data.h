@@ -9,27 +9,23 @@ namespace _torvane_
 
 class BaseContainer;
 
-// Entries of a camera's container. Lengths are millimetres, angles radians, times seconds.
+// Entries of a camera's container that have a known meaning; the others stand by number among the defaults in
+// camera_object_data.cpp. Lengths are millimetres, angles radians, times seconds.
 inline constexpr Long kCameraFocalLength = 500;     // Real
-inline constexpr Long kCameraZoom = 1000;           // Real
-inline constexpr Long kCameraProjection = 1001;     // Long: 0 perspective, 4 parallel; others are views along an axis
+inline constexpr Long kCameraProjection = 1001;     // Long: the two below, or one of others known by number
 inline constexpr Long kCameraApertureWidth = 1006;  // Real
 inline constexpr Long kCameraUseTarget = 1009;      // Bool: false without a target tag whose link is set
 inline constexpr Long kCameraFocusDistance = 1010;  // Real
-inline constexpr Long kCameraOffsetX = 1118;        // Real
-inline constexpr Long kCameraOffsetY = 1119;        // Real
 inline constexpr Long kCameraFilmSpeed = 1231;      // Real
 inline constexpr Long kCameraApertureNumber = 1201; // Real
 inline constexpr Long kCameraExposureTime = 1211;   // Real
 inline constexpr Long kCameraTemperature = 1311;    // Real, kelvin
 
-// The focus pair: two distances on both sides of a plane, or one value for both, computed whenever an input is set.
-inline constexpr Long kCameraFocusBase = 4201;  // Real, input
-inline constexpr Long kCameraFocusMode = 4202;  // Long: 0 gives one value
-inline constexpr Long kCameraFocusNear = 4204;  // Real, result
-inline constexpr Long kCameraFocusPlane = 4205; // Real, input
-inline constexpr Long kCameraFocusFar = 4206;   // Real, result
-inline constexpr Long kCameraFocusRule = 4208;  // Real, input; 0 or absent: nothing is computed
+inline constexpr Long kProjectionPerspective = 0;
+inline constexpr Long kProjectionParallel = 4;
+
+// The pair of distances 4204 and 4206 is computed from the entries 4201, 4202, 4205 and 4208, whenever one of these but
+// 4202 is set through SetParameter, for the perspective projection and a 4208 other than 0.
 
 // Computed parameters.
 inline constexpr Long kCameraFieldOfView = 1008;         // Real, horizontal; setting stores the focal length

@@ -15,13 +15,13 @@ enum class LightKind : UChar
   kVector,
 };
 
-// Parameters with a known meaning. Lengths are in the document's unit, angles radians.
+// Parameters with a known meaning; the others are known by number alone. Angles are radians.
 inline constexpr Long kLightKnotCount = 80013;     // Long, 0 to kMaxLightKnots
 inline constexpr Long kLightShadowDensity = 50001; // Real, 1.0 is 100 %
 inline constexpr Long kLightColor = 90000;         // Vector, components from 0 to 1
 inline constexpr Long kLightBrightness = 90001;    // Real, 1.0 is 100 %
-inline constexpr Long kLightType = 90002;          // Long, one of LightType
-inline constexpr Long kLightShadow = 90003;        // Long: 0 none, 1 on
+inline constexpr Long kLightType = 90002;          // Long, a LightType or another number
+inline constexpr Long kLightShadow = 90003;        // Long: kLightShadowNone or kLightShadowOn
 inline constexpr Long kLightInnerAngle = 90010;    // Real
 inline constexpr Long kLightOuterAngle = 90011;    // Real
 
@@ -29,9 +29,12 @@ enum LightType : Long
 {
   kLightPoint = 0,
   kLightSpot = 1,
-  kLightParallel = 4, // and all that is neither point nor spot
-  kLightIES = 9,      // by a measured distribution
+  kLightOther = 4, // parallel, ambient, and all else that an export meets
+  kLightIES = 9,   // by a measured distribution
 };
+
+inline constexpr Long kLightShadowNone = 0;
+inline constexpr Long kLightShadowOn = 1;
 
 // The ids from `first` to `last`. The default stands for every component of a Vector.
 struct LightParameterRange

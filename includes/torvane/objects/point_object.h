@@ -6,7 +6,6 @@
 #pragma once
 
 #include "torvane/objects/base_object.h"
-#include "torvane/tags/base_select.h"
 
 namespace _torvane_
 {
@@ -23,14 +22,6 @@ class PointObject : public BaseObject
 
   Bool IsInstanceOf(Long type) const override { return type == kObjectPoint || BaseObject::IsInstanceOf(type); }
   Long GetDiskType() const override { return kObjectPoint; }
-
-  // Sets for a program that shows the object; they are in no file and not copied. Those of the object data are.
-  BaseSelect& GetShownPoints() { return shownPoints_; }
-  BaseSelect& GetMarkedPoints() { return markedPoints_; }
-
- private:
-  BaseSelect shownPoints_;
-  BaseSelect markedPoints_;
 };
 
 // Its object data come from the client (PolygonObjectData or a class derived from it) and give the label in a file.

@@ -6,15 +6,15 @@
 namespace _torvane_
 {
 
-// Settings that the exporter gives a meaning to.
-inline constexpr Long kRenderWidth = 5008;         // Real, pixels
-inline constexpr Long kRenderHeight = 5009;        // Real, pixels
-inline constexpr Long kRenderFrameSequence = 5016; // how the frame range is chosen
-inline constexpr Long kRenderFrameFrom = 5017;     // BaseTime
-inline constexpr Long kRenderFrameTo = 5018;       // BaseTime
-inline constexpr Long kRenderFrameRate = 5020;     // Real, frames per second
-inline constexpr Long kRenderFilmAspect = 6006;    // Real
-inline constexpr Long kRenderPixelAspect = 6008;   // Real
+// Settings with a known meaning; the others stand by number among the defaults in render_defaults.cpp.
+inline constexpr Long kRenderWidth = 5008;       // Real, pixels
+inline constexpr Long kRenderHeight = 5009;      // Real, pixels
+inline constexpr Long kRenderFrameMode = 5016;   // Long, the mode of the frame range: 1, and 2 in exported scenes
+inline constexpr Long kRenderFrameFrom = 5017;   // BaseTime
+inline constexpr Long kRenderFrameTo = 5018;     // BaseTime
+inline constexpr Long kRenderFrameRate = 5020;   // Real, frames per second
+inline constexpr Long kRenderFilmAspect = 6006;  // Real
+inline constexpr Long kRenderPixelAspect = 6008; // Real
 
 // Chunks of render settings.
 inline constexpr Long kChunkVideoPosts = 110130;

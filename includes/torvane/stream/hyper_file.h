@@ -7,6 +7,7 @@
 #include "torvane/bytes/file_errors.h"
 #include "torvane/math/vector.h"
 #include "torvane/memory/memory.h"
+#include "torvane/stream/file_versions.h"
 #include "torvane/text/ge_string.h"
 #include "torvane/time/base_time.h"
 
@@ -31,9 +32,6 @@ constexpr ULong FourCharacters(const char (&text)[5])
 inline constexpr ULong kSceneIdent = FourCharacters("Q7R6");        // scene files
 inline constexpr ULong kPaintTextureIdent = FourCharacters("Vlek"); // paint texture files
 inline constexpr ULong kBugsIdent = FourCharacters("bugs");         // asks a writer for the short header
-
-inline constexpr Long kCurrentFileVersion = 13000;
-inline constexpr Long kUnknownFileVersion = 6000; // files whose header tells none, until chunk 110024 does
 
 // True for one of the six numbers that a file may begin with.
 Bool IsFileMagic(ULong magic);
@@ -136,8 +134,8 @@ class HyperFile : public GeMemory
   Long GetMode() const { return mode_; }
   Long GetFileVersion() const { return version_; }
   void SetFileVersion(Long version) { version_ = version; }
-  Bool IsBefore7500() const { return version_ < 7500; }
-  Bool IsBefore11600() const { return version_ < 11600; }
+  Bool IsBefore7500() const { return version_ < kVersionNodeHeader; }
+  Bool IsBefore11600() const { return version_ < kVersionTransform; }
   Bool IsSinglePrecision() const { return singlePrecision_; }
   BaseDocument* GetDocument() const { return document_; }
   LLong GetPosition() const { return file_.GetPosition(); }
@@ -362,7 +360,7 @@ class HyperFile : public GeMemory
   LLong readTicks_ = 0; // length / 500
   void* extraData_ = nullptr;
   BaseDocument* document_;
-  Long version_ = kUnknownFileVersion;
+  Long version_ = kVersionUnknown;
   Long chunkDepth_ = 0;
   Long loopDepth_ = 0;
   ReadProgressHook readHook_ = nullptr;
@@ -459,7 +457,7 @@ inline Bool HyperFile::ReadReal(Real& value)
 inline Bool HyperFile::ReadFloat(SReal& value)
 {
   ULong bits = 0;
-  if (!GetBits(static_cast<UChar>(version_ < 11925 ? kTagReal : kTagSReal), bits))
+  if (!GetBits(static_cast<UChar>(version_ < kVersionColumns ? kTagReal : kTagSReal), bits))
     return false;
   value = bytes::CleanReal(bits);
   return true;

@@ -12,17 +12,14 @@ class BaseDocument;
 class BaseMaterial;
 class ChunkReader;
 
-// Entries of a texture tag's container.
+// Entries of a texture tag's container that have a known meaning; 1005, 1007 to 1009 and 1200 to 1202 stand by number
+// among the defaults in texture_tag.cpp.
 inline constexpr Long kTextureOffsetX = 1000;     // Real
 inline constexpr Long kTextureOffsetY = 1001;     // Real
 inline constexpr Long kTextureLengthX = 1002;     // Real
 inline constexpr Long kTextureLengthY = 1003;     // Real
-inline constexpr Long kTextureMode1 = 1004;       // Long
-inline constexpr Long kTextureMode2 = 1005;       // Long
+inline constexpr Long kTextureProjection = 1004;  // Long
 inline constexpr Long kTextureOldName = 1006;     // String, from old files alone
-inline constexpr Long kTextureSwitch1 = 1007;     // Bool
-inline constexpr Long kTextureSwitch2 = 1008;     // Bool
-inline constexpr Long kTextureSwitch3 = 1009;     // Bool
 inline constexpr Long kTextureMaterial = 1010;    // link
 inline constexpr Long kTexturePosition = 1011;    // Vector, of the projection
 inline constexpr Long kTextureSize = 1012;        // Vector
@@ -30,9 +27,8 @@ inline constexpr Long kTextureRotation = 1013;    // Vector, radians, in the sce
 inline constexpr Long kTextureSecondLink = 1017;  // link
 inline constexpr Long kTextureFilmAspect = 1018;  // Real
 inline constexpr Long kTexturePixelAspect = 1020; // Real
-inline constexpr Long kTextureSwitch4 = 1200;     // Bool
-inline constexpr Long kTextureReal1 = 1201;       // Real
-inline constexpr Long kTextureReal2 = 1202;       // Real
+
+inline constexpr Long kTextureProjectionUVW = 6; // of kTextureProjection: by the UVW tag of the object
 
 // Computed parameters. Setting one also leaves the value as an entry of its own, but for 0 tiles, which change nothing.
 inline constexpr Long kTextureTilesX = 1014; // Real: 1 / length; 0 for a length of next to nothing

@@ -94,7 +94,7 @@ Bool HyperFile::WriteHeader(ULong ident)
   singlePrecision_ = ident == kBugsIdent;
   if (singlePrecision_)
     return file_.WriteULong(kMagicBugs) && file_.WriteULong(0);
-  return file_.WriteULong(kMagicCurrent) && file_.WriteULong(ident) && file_.WriteLong(kCurrentFileVersion) &&
+  return file_.WriteULong(kMagicCurrent) && file_.WriteULong(ident) && file_.WriteLong(kVersionCurrent) &&
          file_.WriteUChar(0);
 }
 

@@ -180,7 +180,7 @@ Long BaseDocument::AxisLockRow() const
 Bool BaseDocument::GetParameter(const ParameterPath& path, GeData& value)
 {
   Long id = path[0].id;
-  if (id == kDocumentBackColor && GetBackColor(path, value))
+  if (id == kDocumentColor && GetBackColor(path, value))
     return true;
   return GetOwnParameter(id, value) || BaseList2D::GetParameter(path, value);
 }

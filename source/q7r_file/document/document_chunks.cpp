@@ -51,15 +51,13 @@ Long CurrentTool(Long tool)
   return tool;
 }
 
-constexpr Long kRequiredVersion = 12600;
-
 } // namespace
 
 // The picture is read or written by the caller, behind the flag that announces it.
 template <class Visitor>
 Bool BaseDocument::VisitFileInfo(Visitor& v, Bool& hasPreview)
 {
-  Long version = kCurrentFileVersion;
+  Long version = kVersionCurrent;
   v.Long(version);
   if constexpr (Visitor::kReading) {
     if (v.Good())
@@ -138,7 +136,7 @@ Bool BaseDocument::VisitState(Visitor& v)
   v.EmptyFilename();
   v.ConstantLong(0);
   VisitOldSettings(v);
-  if (v.Level() >= 1 || v.VersionBelow(7500))
+  if (v.Level() >= 1 || v.VersionBelow(kVersionNodeHeader))
     v.EmptyContainer();
   for (Long i = 0; v.Level() >= 2 && i < 3; ++i)
     v.ConstantVector(Vector());
@@ -299,7 +297,7 @@ Bool ReadDocument(BaseDocument& document, HyperFile& file, const Filename& name,
   document.SetLoadFlags(loadFlags);
   if (!file.Open(kSceneIdent, name, kHyperFileRead))
     return false;
-  if ((loadFlags & LoadRequireCurrent) && file.GetFileVersion() < kRequiredVersion)
+  if ((loadFlags & LoadRequireCurrent) && file.GetFileVersion() < kVersionRequired)
     return false;
   if (!document.ReadChunks(file, true))
     return false;

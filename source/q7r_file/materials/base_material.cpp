@@ -43,7 +43,7 @@ Bool BaseMaterial::IsInstanceOf(Long type) const { return type == GetType() || B
 template <class Visitor>
 Bool BaseMaterial::VisitPreview(Visitor& v)
 {
-  if (v.VersionBelow(7500) || !Visitor::kReading)
+  if (v.VersionBelow(kVersionNodeHeader) || !Visitor::kReading)
     v.String(name_);
   else
     v.EmptyString(); // the node's header has told it
@@ -57,7 +57,7 @@ Bool BaseMaterial::VisitPreview(Visitor& v)
     for (Bitmap* image : {&preview_, static_cast<Bitmap*>(nullptr), static_cast<Bitmap*>(nullptr)})
       v.Note(v.Good() && v.File().WriteImage(image, kImageFormatJpeg, &settings, 0));
   }
-  if (v.Level() >= 1 && v.VersionBelow(7500))
+  if (v.Level() >= 1 && v.VersionBelow(kVersionNodeHeader))
     v.template Skip<BaseContainer>();
   if (v.Level() >= 2)
     v.ConstantBool(false);

@@ -15,7 +15,6 @@ constexpr Long kChunkOldChannelEntry = 5706; // known and empty
 constexpr Long kChunkOldChannelList = 5707;  // known and empty
 
 // Files below this version have no channel in the last place.
-constexpr Long kFirstVersionWithLastChannel = 9400;
 
 constexpr Long kChannelAtStart[] = {0, 8};
 
@@ -40,7 +39,7 @@ Bool BaseChannel::ReadChunk(HyperFile& file, Long id, Long level)
     return false;
   return ReadChunkBody(file, level, [](ChunkReader& v) {
     v.Skip<Vector, Real, String, Real, Long, Long, Vector, Real, Real>();
-    if (!v.VersionBelow(7500)) {
+    if (!v.VersionBelow(kVersionNodeHeader)) {
       v.Skip<Bool, Bool>();
       if (v.Level() >= 1)
         v.Skip<Filename>();
@@ -71,7 +70,7 @@ template <class Visitor>
 Bool Material::VisitChannels(Visitor& v)
 {
   for (Long i = 0; i < kMaterialChannelCount && v.Good(); ++i) {
-    if (i == kMaterialChannelCount - 1 && v.VersionBelow(kFirstVersionWithLastChannel))
+    if (i == kMaterialChannelCount - 1 && v.VersionBelow(kVersionLastChannel))
       break;
     v.Bool(channelState_[i]);
     if constexpr (Visitor::kReading)

@@ -72,7 +72,7 @@ Bool BaseList2D::VisitHeader(Visitor& v)
 {
   v.LongInto(info_);
   v.ConstantLong(0);
-  if (v.VersionBelow(7500))
+  if (v.VersionBelow(kVersionNodeHeader))
     return v.Good();
   v.Container(data_);
   v.Goal(goal_);
@@ -93,7 +93,7 @@ Bool BaseList2D::VisitHeader(Visitor& v)
     for (Long i = 0; i < count && v.Good(); ++i)
       v.Note(SkipOneChunk(v.File()));
   }
-  if (v.VersionBelow(11600)) {
+  if (v.VersionBelow(kVersionTransform)) {
     if (v.Level() >= 3)
       v.template Skip<Long>();
     Long count = 0;
@@ -187,7 +187,7 @@ Bool BaseList2D::ReadChunk(HyperFile& file, Long id, Long level)
 
 Bool BaseList2D::KeepChunk(HyperFile& file, Long id, Long level)
 {
-  return !IsLibraryChunk(id) && file.GetFileVersion() >= kCurrentFileVersion && keptChunks_.Read(file, id, level);
+  return !IsLibraryChunk(id) && file.GetFileVersion() >= kVersionCurrent && keptChunks_.Read(file, id, level);
 }
 
 Bool BaseList2D::CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation)

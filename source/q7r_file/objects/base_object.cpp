@@ -13,10 +13,6 @@ namespace _torvane_
 namespace
 {
 
-// From this version on the transform chunk holds all its values whatever its level, and no matrices of old.
-constexpr Long kVersionFullTransform = 11600;
-// Below this version the transform chunk also holds the node's container and name.
-constexpr Long kVersionNodeHeader = 7500;
 // In matrices of old files an axis below this is a mirrored one.
 constexpr Real kMirroredBelow = -0.9;
 
@@ -90,12 +86,12 @@ void BaseObject::SetObjectData(NodeData* data)
     data->SetNode(this);
 }
 
-// The transform chunk. Files from kVersionFullTransform on hold every value; in older ones the level tells how far the
+// The transform chunk. Files from kVersionTransform on hold every value; in older ones the level tells how far the
 // values reach.
 template <class Visitor>
 Bool BaseObject::VisitTransform(Visitor& v)
 {
-  const Bool old = v.VersionBelow(kVersionFullTransform);
+  const Bool old = v.VersionBelow(kVersionTransform);
   const Bool oldest = v.VersionBelow(kVersionNodeHeader);
   if (oldest)
     v.Container(data_);
@@ -147,7 +143,7 @@ void BaseObject::VisitMirroring(Visitor& v)
 template <class Visitor>
 void BaseObject::VisitDisplay(Visitor& v)
 {
-  const Bool old = v.VersionBelow(kVersionFullTransform);
+  const Bool old = v.VersionBelow(kVersionTransform);
   auto holds = [&](Long level) { return !old || v.Level() >= level; };
   if (holds(1)) {
     v.Bool(displayFlag_);
@@ -209,7 +205,7 @@ void BaseObject::VisitFrozen(Visitor& v)
 Bool BaseObject::ReadTransform(HyperFile& file, Long level)
 {
   ReadChunkBody(file, level, [this](ChunkReader& v) { return VisitTransform(v); });
-  const Bool hasOrder = file.GetFileVersion() >= kVersionFullTransform && level >= 8;
+  const Bool hasOrder = file.GetFileVersion() >= kVersionTransform && level >= 8;
   const Long order = hasOrder ? rotationOrder_ : kRotationOrderScene;
   rotationMatrix_ = AnglesToMatrix(relRot_, order);
   if (HasFrozenTransform()) {

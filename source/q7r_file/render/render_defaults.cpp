@@ -1,5 +1,7 @@
 #include "q7r_file/render/render_defaults.h"
 
+#include "torvane/math/ge_math.h"
+
 namespace _torvane_
 {
 
@@ -15,7 +17,7 @@ enum class Form
   kVector,
   kFilename,
   kContainer, // an empty one
-  kFlags,     // a container that holds the number under kSaverFlags
+  kFlags,     // a container that holds the number under 10024
 };
 
 struct Default
@@ -25,10 +27,6 @@ struct Default
   Real number;
   Vector vector;
 };
-
-constexpr Long kSaverFlags = 10024;
-
-constexpr Real Degrees(Real angle) { return angle * 3.141592653589793 / 180.0; }
 
 constexpr Default kRenderDefaults[] = {
     {6014, Form::kBool, 1, {}},
@@ -91,10 +89,10 @@ constexpr Default kRenderDefaults[] = {
     {5042, Form::kFilename, 0, {}},
     {5043, Form::kLong, 36, {}},
     {5044, Form::kReal, 0.0, {}},
-    {5045, Form::kReal, Degrees(360.0), {}},
+    {5045, Form::kReal, DegreesToRadians(360.0), {}},
     {5046, Form::kLong, 19, {}},
-    {5047, Form::kReal, Degrees(90.0), {}},
-    {5048, Form::kReal, Degrees(-90.0), {}},
+    {5047, Form::kReal, DegreesToRadians(90.0), {}},
+    {5048, Form::kReal, DegreesToRadians(-90.0), {}},
     {5050, Form::kBool, 1, {}},
     {5051, Form::kBool, 1, {}},
     {5052, Form::kBool, 1, {}},
@@ -187,7 +185,7 @@ GeData ValueOf(const Default& row)
     break;
   }
   BaseContainer flags;
-  flags.SetLong(kSaverFlags, static_cast<Long>(row.number));
+  flags.SetLong(10024, static_cast<Long>(row.number));
   return GeData(flags);
 }
 

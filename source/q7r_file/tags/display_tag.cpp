@@ -11,7 +11,6 @@ namespace
 {
 
 // From this version on no file holds chunk kChunkOldDisplay.
-constexpr Long kVersionNoOldDisplay = 11611;
 
 constexpr EntryDefault ColorDefault(Long id, Real red, Real green, Real blue)
 {
@@ -142,7 +141,7 @@ Bool DisplayTag::ReadChunk(HyperFile& file, Long id, Long level)
     NothingInside nothing;
     return ReadInnerChunk(file, nothing);
   }
-  if (id != kChunkOldDisplay || file.GetFileVersion() >= kVersionNoOldDisplay)
+  if (id != kChunkOldDisplay || file.GetFileVersion() >= kVersionDisplay)
     return false;
   return ReadChunkBody(file, level, [&](ChunkReader& v) {
     EntryReader entries(v, data_);

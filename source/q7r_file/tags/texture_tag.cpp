@@ -35,19 +35,19 @@ constexpr Default kTextureDefaults[] = {
     {kTextureOffsetY, Form::kReal, 0.0},
     {kTextureLengthX, Form::kReal, 1.0},
     {kTextureLengthY, Form::kReal, 1.0},
-    {kTextureMode1, Form::kLong, 0.0},
-    {kTextureMode2, Form::kLong, 0.0},
-    {kTextureSwitch1, Form::kBool, 1.0},
-    {kTextureSwitch2, Form::kBool, 0.0},
-    {kTextureSwitch3, Form::kBool, 0.0},
+    {kTextureProjection, Form::kLong, 0.0},
+    {1005, Form::kLong, 0.0},
+    {1007, Form::kBool, 1.0},
+    {1008, Form::kBool, 0.0},
+    {1009, Form::kBool, 0.0},
     {kTextureMaterial, Form::kLink, 0.0},
     {kTextureSize, Form::kVector, 100.0},
     {kTextureSecondLink, Form::kLink, 0.0},
     {kTextureFilmAspect, Form::kReal, 1.3333333333},
     {kTexturePixelAspect, Form::kReal, 1.0},
-    {kTextureSwitch4, Form::kBool, 1.0},
-    {kTextureReal1, Form::kReal, 0.0},
-    {kTextureReal2, Form::kReal, 0.0},
+    {1200, Form::kBool, 1.0},
+    {1201, Form::kReal, 0.0},
+    {1202, Form::kReal, 0.0},
 };
 
 GeData MakeDefault(const Default& row)
@@ -132,7 +132,6 @@ Long LengthOfTiles(Long id)
 Bool IsPlace(Long id) { return id == kTexturePosition || id == kTextureSize || id == kTextureRotation; }
 
 // Files below this version hold values that were dropped then.
-constexpr Long kShorterVersion = 11600;
 
 Real QuotientOrOne(Real a, Real b) { return b != 0.0 ? a / b : 1.0; }
 
@@ -269,7 +268,7 @@ Bool TextureTag::ReadOldChunk(HyperFile& file, Long level)
 {
   ChunkReader v(file, level);
   EntryReader entries(v, data_);
-  const Bool old = v.VersionBelow(kShorterVersion);
+  const Bool old = v.VersionBelow(kVersionTransform);
   for (Long id : {kTexturePosition, kTextureSize, kTextureRotation}) {
     Vector part;
     if (v.Vector(part))
@@ -279,10 +278,10 @@ Bool TextureTag::ReadOldChunk(HyperFile& file, Long level)
     v.Skip<Matrix, Matrix>();
   for (Long id : {kTextureOffsetX, kTextureOffsetY, kTextureLengthX, kTextureLengthY})
     entries.Real(id);
-  for (Long id : {kTextureSwitch1, kTextureSwitch2, kTextureSwitch3})
+  for (Long id : {1007, 1008, 1009})
     entries.Bool(id);
-  entries.Long(kTextureMode1);
-  entries.Long(kTextureMode2);
+  entries.Long(kTextureProjection);
+  entries.Long(1005);
   if (old)
     v.Skip<Long, Long>();
   String name;
@@ -297,7 +296,7 @@ Bool TextureTag::ReadOldChunk(HyperFile& file, Long level)
   if (level >= 5)
     ReadOldAspects(v);
   if (level >= 6)
-    entries.Bool(kTextureSwitch4);
+    entries.Bool(1200);
   return v.Good();
 }
 

@@ -13,9 +13,8 @@ namespace
 {
 
 constexpr Long kKeyCameraOfDraw = 1123; // of a camera's container: set where the camera is a draw's own
-constexpr Real kDegree = kPi / 180.0;
 constexpr Vector kEditorPos(600.0001, 300.0, -600.0);
-constexpr Vector kEditorRot(45.0 * kDegree, -20.0 * kDegree, 0.0);
+constexpr Vector kEditorRot(DegreesToRadians(45.0), DegreesToRadians(-20.0), 0.0);
 
 } // namespace
 

@@ -132,9 +132,9 @@ void SetViewOfIndex(BaseDraw& draw, Long index)
   if (index == 0) {
     camera.SetReal(kCameraFocalLength, kPerspectiveFocalLength);
   } else {
-    camera.SetReal(kCameraZoom, 1.0);
-    camera.SetReal(kCameraOffsetX, 0.0);
-    camera.SetReal(kCameraOffsetY, 0.0);
+    camera.SetReal(1000, 1.0);
+    camera.SetReal(1118, 0.0);
+    camera.SetReal(1119, 0.0);
   }
   for (Long i = 0; i < 4; ++i)
     draw.GetDataInstance().SetLong(kDrawViewIds[i], view.values[i]);

@@ -17,8 +17,6 @@ using namespace _torvane_;
 namespace
 {
 
-constexpr Real kDegrees = 180.0 / 3.141592653589793;
-
 LightObjectData* LightDataOf(BaseObject& object)
 {
   NodeData* data = object.GetObjectData();
@@ -62,7 +60,7 @@ std::string CameraWords(BaseObject& camera)
   words += Labelled("aperture", settings.GetReal(kCameraApertureWidth), " mm");
   const GeData field = Parameter(camera, kCameraFieldOfView);
   if (field.GetType() == kDataReal) // none without a focal length
-    words += Labelled("field of view", field.GetReal() * kDegrees, " degrees");
+    words += Labelled("field of view", RadiansToDegrees(field.GetReal()), " degrees");
   return words + Labelled("focus", settings.GetReal(kCameraFocusDistance), "");
 }
 
@@ -73,7 +71,7 @@ std::string LightTypeText(Long type)
     return "point";
   case kLightSpot:
     return "spot";
-  case kLightParallel:
+  case kLightOther:
     return "parallel";
   case kLightIES:
     return "measured";
@@ -90,8 +88,8 @@ std::string LightWords(BaseObject& light)
   if (Parameter(light, kLightShadow).GetLong() != 0)
     words += Labelled("shadow", 100.0 * Parameter(light, kLightShadowDensity).GetReal(), " %");
   if (type == kLightSpot) {
-    words += Labelled("inner", kDegrees * Parameter(light, kLightInnerAngle).GetReal(), " degrees");
-    words += Labelled("outer", kDegrees * Parameter(light, kLightOuterAngle).GetReal(), " degrees");
+    words += Labelled("inner", RadiansToDegrees(Parameter(light, kLightInnerAngle).GetReal()), " degrees");
+    words += Labelled("outer", RadiansToDegrees(Parameter(light, kLightOuterAngle).GetReal()), " degrees");
   }
   if (const IESLight* ies = GetIESLight(&light)) {
     const std::string name = ToUtf8(ies->luminaire.Content() ? ies->luminaire : ies->luminaireCatalogue);

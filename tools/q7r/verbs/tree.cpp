@@ -27,8 +27,6 @@ to the last key, for programs.
 
 Example: q7r tree shot.q7r)";
 
-constexpr Real kDegrees = 180.0 / 3.141592653589793;
-
 struct Options
 {
   std::string file;
@@ -62,7 +60,7 @@ std::string ObjectLine(BaseObject& object)
   std::string line =
       TypeName(object.GetType()) + " " + Quoted(object.GetName()) + "  pos " + Numbers(object.GetRelPos());
   if (!(object.GetRelRot() == Vector()))
-    line += "  rot " + Numbers(object.GetRelRot(), kDegrees);
+    line += "  rot " + Numbers(object.GetRelRot(), RadiansToDegrees(1.0));
   if (!(object.GetRelScale() == Vector(1.0, 1.0, 1.0)))
     line += "  scale " + Numbers(object.GetRelScale());
   if (object.GetRenderMode() == kObjectModeOff)

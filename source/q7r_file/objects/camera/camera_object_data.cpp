@@ -31,7 +31,7 @@ struct CameraDefault
 // In the order of a new camera's container.
 constexpr CameraDefault kCameraDefaults[] = {
     {kCameraFocalLength, EntryKind::kReal, 36.0},
-    {kCameraZoom, EntryKind::kReal, 1.0},
+    {1000, EntryKind::kReal, 1.0},
     {kCameraProjection, EntryKind::kLong, 0},
     {kCameraApertureWidth, EntryKind::kReal, 36.0},
     {1007, EntryKind::kBool, true},
@@ -43,8 +43,8 @@ constexpr CameraDefault kCameraDefaults[] = {
     {1115, EntryKind::kReal, 0.0},
     {1113, EntryKind::kReal, 1000.0},
     {1116, EntryKind::kReal, 1000.0},
-    {kCameraOffsetX, EntryKind::kReal, 0.0},
-    {kCameraOffsetY, EntryKind::kReal, 0.0},
+    {1118, EntryKind::kReal, 0.0},
+    {1119, EntryKind::kReal, 0.0},
     {1321, EntryKind::kReal, 0.0},
     {1322, EntryKind::kReal, 0.0},
     {1122, EntryKind::kReal, 0.0},
@@ -72,11 +72,11 @@ constexpr CameraDefault kCameraDefaults[] = {
     {1333, EntryKind::kReal, 0.0},
     {1341, EntryKind::kReal, 0.0},
     {4200, EntryKind::kLong, 0},
-    {kCameraFocusBase, EntryKind::kReal, 6.5},
-    {kCameraFocusMode, EntryKind::kLong, 0},
-    {kCameraFocusNear, EntryKind::kReal, 800.0},
-    {kCameraFocusPlane, EntryKind::kReal, 1000.0},
-    {kCameraFocusFar, EntryKind::kReal, 1200.0},
+    {4201, EntryKind::kReal, 6.5},
+    {4202, EntryKind::kLong, 0},
+    {4204, EntryKind::kReal, 800.0},
+    {4205, EntryKind::kReal, 1000.0},
+    {4206, EntryKind::kReal, 1200.0},
     {4207, EntryKind::kBool, true},
 };
 
@@ -168,30 +168,27 @@ Bool GetFieldOfView(const BaseContainer& settings, Real factor, GeData& value)
   return true;
 }
 
-// Brings the focus pair into line with what it is computed from.
-void UpdateFocusPair(BaseContainer& settings)
+// Brings 4204 and 4206 into line with what they are computed from.
+void UpdateDistancePair(BaseContainer& settings)
 {
-  const Long rule = settings.GetLong(kCameraFocusRule);
-  if (settings.GetLong(kCameraProjection) != 0 || rule == 0)
+  const Long choice = settings.GetLong(4208);
+  if (settings.GetLong(kCameraProjection) != 0 || choice == 0)
     return;
-  const Real plane = settings.GetReal(kCameraFocusPlane);
-  const Real seen = settings.GetReal(kCameraApertureWidth) / settings.GetReal(kCameraFocalLength) * plane;
-  const Real part = rule == 1 ? 30.0 : 23.0;
-  const Real base = settings.GetReal(kCameraFocusBase);
-  if (settings.GetLong(kCameraFocusMode) != 0) {
+  const Real distance = settings.GetReal(4205);
+  const Real seen = settings.GetReal(kCameraApertureWidth) / settings.GetReal(kCameraFocalLength) * distance;
+  const Real part = choice == 1 ? 30.0 : 23.0;
+  const Real base = settings.GetReal(4201);
+  if (settings.GetLong(4202) != 0) {
     const Real both = 2.0 * part;
-    const Real depth = seen * plane / (both * base * (1.0 + seen / both / base));
-    settings.SetReal(kCameraFocusNear, plane - depth);
-    settings.SetReal(kCameraFocusFar, plane + depth);
+    const Real depth = seen * distance / (both * base * (1.0 + seen / both / base));
+    settings.SetReal(4204, distance - depth);
+    settings.SetReal(4206, distance + depth);
   } else {
-    const Real result = base * part * seen / plane;
-    settings.SetReal(kCameraFocusNear, result);
-    settings.SetReal(kCameraFocusFar, result);
+    const Real result = base * part * seen / distance;
+    settings.SetReal(4204, result);
+    settings.SetReal(4206, result);
   }
 }
-
-constexpr Long kRenderLensKind = 5033; // of render settings
-constexpr Long kRenderLensPlain = 1150;
 
 } // namespace
 
@@ -228,7 +225,7 @@ Real CameraObjectData::GetAspectFactor() const
 {
   BaseDocument* document = node_->GetDocument();
   const RenderData* active = document ? document->GetActiveRenderData() : nullptr;
-  if (!active || active->GetDataInstance().GetLong(kRenderLensKind) == kRenderLensPlain)
+  if (!active || active->GetDataInstance().GetLong(5033) == 1150)
     return 1.0;
   return 1.0 / active->GetDataInstance().GetReal(kRenderFilmAspect);
 }
@@ -296,11 +293,11 @@ Bool CameraObjectData::SetParameter(const ParameterPath& path, const GeData& val
   case kCameraVerticalFieldOfView:
     SetFieldOfView(value.GetReal(), GetAspectFactor());
     return true;
-  case kCameraFocusBase:
-  case kCameraFocusPlane:
-  case kCameraFocusRule:
+  case 4201:
+  case 4205:
+  case 4208:
     settings.SetReal(id, value.GetReal());
-    UpdateFocusPair(settings);
+    UpdateDistancePair(settings);
     return true;
   default:
     return NodeData::SetParameter(path, value);

@@ -12,8 +12,6 @@ namespace _torvane_
 namespace
 {
 
-constexpr Real kDegrees = 180.0 / kPi;
-
 // So little less than 1 that the poles lie within every table that reaches them.
 constexpr Real kPoleFactor = -0.999999;
 
@@ -148,12 +146,12 @@ Real IESLight::SampleIESLight(const Vector& direction) const
 {
   if (GetVerticalCount() == 0 || GetHorizontalCount() == 0 || !IsComplete())
     return 0.0;
-  const Real vertical = SafeAcos(kPoleFactor * direction.z) * kDegrees;
+  const Real vertical = RadiansToDegrees(SafeAcos(kPoleFactor * direction.z));
   if (!(vertical >= verticalAngles[0] && vertical <= verticalAngles[GetVerticalCount() - 1]))
     return 0.0;
   Real horizontal = 90.0;
   if (direction.y != 0.0)
-    horizontal = std::atan2(direction.x, direction.y) * kDegrees;
+    horizontal = RadiansToDegrees(std::atan2(direction.x, direction.y));
   else if (direction.x < 0.0)
     horizontal = -90.0;
   if (horizontal < 0.0)

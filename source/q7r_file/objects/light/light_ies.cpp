@@ -11,21 +11,13 @@ namespace
 {
 
 // Entries of the light's object that tell of its distribution.
-constexpr Long kKeyShapeSizeX = 100010;
-constexpr Long kKeyShapeSizeY = 100011;
-constexpr Long kKeyShapeSizeZ = 100012;
+constexpr Long kKeySizeX = 100010;
+constexpr Long kKeySizeY = 100011;
+constexpr Long kKeySizeZ = 100012;
 constexpr Long kKeyShape = 100015;
-constexpr Long kKeyIntensityUnit = 90037;
-constexpr Long kKeyPhotometric = 90042;
-constexpr Long kKeyIntensity = 90043;
-constexpr Long kKeyIESData = 90046;
+constexpr Long kKeyMaxCandela = 90043;
 constexpr Long kKeyManufacturer = 90050; // and the four other texts behind it
 constexpr Long kShapeOfUnknown = 1;
-
-// Parameters of the light.
-constexpr Long kLightAreaRadius = 90013;
-constexpr Long kLightFalloffSamples = 90014;
-constexpr Long kLightFalloffDistance = 90025;
 
 LightObjectData* LightDataOf(const BaseObject* object)
 {
@@ -47,17 +39,17 @@ Real UnitFactor(const BaseDocument* document)
 
 void SetEntries(BaseContainer& settings, const IESLight& light, const Vector& size)
 {
-  settings.SetBool(kKeyPhotometric, true);
-  settings.SetBool(kKeyIESData, true);
-  settings.SetLong(kKeyIntensityUnit, 1);
-  settings.SetReal(kKeyIntensity, light.maxCandela);
+  settings.SetBool(90042, true);
+  settings.SetBool(90046, true);
+  settings.SetLong(90037, 1);
+  settings.SetReal(kKeyMaxCandela, light.maxCandela);
   Long key = kKeyManufacturer;
   for (const String* text :
        {&light.manufacturer, &light.luminaireCatalogue, &light.luminaire, &light.lampCatalogue, &light.lamp})
     settings.SetString(key++, *text);
-  settings.SetReal(kKeyShapeSizeX, size.x);
-  settings.SetReal(kKeyShapeSizeY, size.y);
-  settings.SetReal(kKeyShapeSizeZ, size.z);
+  settings.SetReal(kKeySizeX, size.x);
+  settings.SetReal(kKeySizeY, size.y);
+  settings.SetReal(kKeySizeZ, size.z);
   settings.SetLong(kKeyShape, light.shape == -1 ? kShapeOfUnknown : light.shape);
 }
 
@@ -81,9 +73,9 @@ Bool SetIESLight(BaseObject* object, IESLight* parsed, BaseDocument* document)
   data->SetParameter(kLightType, GeData(static_cast<Long>(kLightIES)));
   const Vector size = light->size * UnitFactor(document);
   SetEntries(object->GetDataInstance(), *light, size);
-  data->SetParameter(kLightAreaRadius, GeData(0.5 * size.x));
-  data->SetParameter(kLightFalloffSamples, GeData(static_cast<Long>(10)));
-  data->SetParameter(kLightFalloffDistance, GeData(1000.0));
+  data->SetParameter(90013, GeData(0.5 * size.x));
+  data->SetParameter(90014, GeData(static_cast<Long>(10)));
+  data->SetParameter(90025, GeData(1000.0));
   return true;
 }
 

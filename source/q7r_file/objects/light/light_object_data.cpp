@@ -12,8 +12,6 @@ namespace _torvane_
 namespace
 {
 
-constexpr Long kVersionExtraBlock = 7500; // older files end with the numbered groups
-constexpr Long kVersionSizeInObject = 9420;
 constexpr Long kLevelLeast = 5;
 
 // Entries of the light's object.
@@ -195,7 +193,7 @@ void LightObjectData::VisitKnots(Visitor& v)
 template <class Visitor>
 void LightObjectData::VisitFirstGroups(Visitor& v)
 {
-  const Bool oldest = v.VersionBelow(kVersionExtraBlock);
+  const Bool oldest = v.VersionBelow(kVersionNodeHeader);
   VisitFields<80002, 80003, 80000, 80001, kLightKnotCount, 80014, 80015, 80007, 80008, 80009, 80010>(v);
   if (oldest)
     v.template Skip<Real, Real, Vector, Long>();
@@ -304,7 +302,7 @@ Bool LightObjectData::VisitBody(Visitor& v, OldFactor& factor)
   VisitFirstGroups(v);
   VisitMainGroup(v);
   VisitLaterGroups(v, factor);
-  if (v.VersionBelow(kVersionExtraBlock))
+  if (v.VersionBelow(kVersionNodeHeader))
     return v.Good();
   VisitExtraBlock(v);
   VisitFields<50000, 70027>(v);
@@ -351,9 +349,9 @@ Bool LightObjectData::ReadData(HyperFile& file, Long id, Long level)
   ChunkReader reader(file, level);
   OldFactor factor;
   const Bool read = VisitBody(reader, factor);
-  if (factor.present && file.GetFileVersion() < kVersionSizeInObject)
+  if (factor.present && file.GetFileVersion() < kVersionLightSize)
     TakeOldFactor(factor.value);
-  if (read && file.GetFileVersion() < kVersionExtraBlock)
+  if (read && file.GetFileVersion() < kVersionNodeHeader)
     SplitOldVector();
   return read;
 }

@@ -10,9 +10,6 @@ namespace _torvane_
 namespace
 {
 
-constexpr Long kColumnVersion = 11925; // older files hold legacy arrays
-constexpr Long kNameVersion = 7500;    // older files hold a vertex map's name with its array
-
 constexpr LLong kLeastVectorSize = 1 + 3 * 4; // a Vector of a file whose Reals are floats
 constexpr LLong kLeastSegmentSize = 5 + 2;    // Long, Bool
 
@@ -151,7 +148,7 @@ Bool ColumnTag::VisitEntries(Visitor& v)
 Bool ColumnTag::ReadEntries(HyperFile& file, Long level)
 {
   ChunkReader reader(file, level);
-  return reader.VersionBelow(kColumnVersion) ? ReadOldEntries(file) : VisitEntries(reader);
+  return reader.VersionBelow(kVersionColumns) ? ReadOldEntries(file) : VisitEntries(reader);
 }
 
 void ColumnTag::WriteEntries(HyperFile& file)
@@ -205,7 +202,7 @@ Bool VertexMapTag::ReadOldEntries(HyperFile& file)
   LLong count = 0;
   if (!file.ReadString(name))
     return false;
-  if (file.GetFileVersion() < kNameVersion)
+  if (file.GetFileVersion() < kVersionNodeHeader)
     name_ = name;
   if (!file.ReadLegacyFloatArray(weights, count))
     return false;

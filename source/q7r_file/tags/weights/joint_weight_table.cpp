@@ -12,7 +12,6 @@ namespace
 {
 
 constexpr Real kFullWeight = 65535.0;
-constexpr Long kArrayVersion = 11600; // older files hold Memory values in place of Arrays
 
 UWord PackWeight(Real weight)
 {
@@ -52,8 +51,8 @@ Bool VisitElements(Visitor& v, Array& array, LLong count, Long type, Long perEle
       v.File().SetError(FILEERROR_MEMORY);
       return v.Note(false);
     }
-    return v.Note(v.VersionBelow(kArrayVersion) ? ReadOldElements(v.File(), array.Data(), type, count * perElement)
-                                                : v.File().ReadArray(array.Data(), type, size, count * perElement));
+    return v.Note(v.VersionBelow(kVersionTransform) ? ReadOldElements(v.File(), array.Data(), type, count * perElement)
+                                                    : v.File().ReadArray(array.Data(), type, size, count * perElement));
   } else {
     return v.Note(v.File().WriteArray(array.Data(), type, size, count * perElement));
   }
