@@ -1,5 +1,7 @@
 #include "blendlayers/blend_fields.h"
 
+#include <type_traits>
+
 #include "k2v_file/stream/chunk_visitor.h"
 #include "k2v_file/values/vector_component.h"
 #include "torvane/memory/assertion.h"
@@ -34,6 +36,38 @@ Bool TakeGradient(const GeData* value, GradientData& gradient)
   return CopyGradient(static_cast<const GradientData&>(*source), gradient);
 }
 
+// Calls the operation with the field's value as what it is: the one place that tells kinds apart.
+template <class Operation>
+Bool Visit(const BlendField& field, const Operation& operation)
+{
+  switch (field.kind) {
+  case BlendField::kLong:
+    return operation(field.As<Long>());
+  case BlendField::kBool:
+    return operation(field.As<Bool>());
+  case BlendField::kReal:
+    return operation(field.As<Real>());
+  case BlendField::kVector:
+    return operation(field.As<Vector>());
+  case BlendField::kLink:
+    return operation(field.As<GeAliasLink>());
+  case BlendField::kGradient:
+    return operation(field.As<GradientData>());
+  case BlendField::kLayers:
+    return operation(field.As<CBlendLayers>());
+  }
+  return false;
+}
+
+// Operations by overloads: the template takes what has no form of its own.
+template <class... Overloads>
+struct Choose : Overloads...
+{
+  using Overloads::operator()...;
+};
+template <class... Overloads>
+Choose(Overloads...) -> Choose<Overloads...>;
+
 Bool ReadGradientField(HyperFile& file, GradientData& gradient)
 {
   BaseContainer container;
@@ -51,235 +85,141 @@ Bool WriteGradientField(HyperFile& file, const GradientData& gradient)
   return file.WriteContainer(container);
 }
 
-} // namespace
-
-// ---------------------------------------------------------------------------------------------------------------
-
-BlendField::BlendField(Long& value, Long fieldId, Long fieldSub, Real lowest, Real highest)
-    : integer(&value), kind(kLong), id(fieldId), sub(fieldSub), low(lowest), high(highest)
-{}
-
-BlendField::BlendField(Bool& value, Long fieldId, Long fieldSub, Long level)
-    : flag(&value), kind(kBool), id(fieldId), sub(fieldSub), sinceLevel(level)
-{}
-
-BlendField::BlendField(Real& value, Long fieldId, Long fieldSub, Real lowest, Real highest)
-    : real(&value), kind(kReal), id(fieldId), sub(fieldSub), low(lowest), high(highest)
-{}
-
-BlendField::BlendField(Vector& value, Long fieldId, Long fieldSub)
-    : vector(&value), kind(kVector), id(fieldId), sub(fieldSub)
-{}
-
-BlendField::BlendField(GeAliasLink& value, Long fieldId) : link(&value), kind(kLink), id(fieldId) {}
-
-BlendField::BlendField(GradientData& value, Long fieldId, Long fieldSub)
-    : gradient(&value), kind(kGradient), id(fieldId), sub(fieldSub)
-{}
-
-BlendField::BlendField(CBlendLayers& value, Long fieldId) : layers(&value), kind(kLayers), id(fieldId) {}
-
-BlendFields::BlendFields(std::initializer_list<BlendField> list)
+Bool CopyToLink(const GeData& value, GeAliasLink* target)
 {
-  for (const BlendField& field : list)
-    fields[count++] = field;
+  const GeAliasLink* source = value.GetAliasLink();
+  return source && target && source->CopyLinkTo(target, nullptr);
 }
+
+} // namespace
 
 // ---------------------------------------------------------------------------------------------------------------
 
 Bool ReadField(HyperFile& file, Long level, const BlendField& field)
 {
-  switch (field.kind) {
-  case BlendField::kLong:
-    return ReadValue(file, *field.integer);
-  case BlendField::kBool:
-    *field.flag = level >= field.sinceLevel && *field.flag;
-    return level < field.sinceLevel || ReadValue(file, *field.flag);
-  case BlendField::kReal:
-    return ReadValue(file, *field.real);
-  case BlendField::kVector:
-    return ReadValue(file, *field.vector);
-  case BlendField::kLink:
-    return ReadValue(file, *field.link);
-  case BlendField::kGradient:
-    return ReadGradientField(file, *field.gradient);
-  case BlendField::kLayers:
-    return field.layers->ReadList(file, true);
-  }
-  return false;
+  return Visit(field, Choose{[&](auto& value) { return ReadValue(file, value); },
+                             [&](Bool& value) {
+                               value = level >= field.sinceLevel && value;
+                               return level < field.sinceLevel || ReadValue(file, value);
+                             },
+                             [&](GradientData& value) { return ReadGradientField(file, value); },
+                             [&](CBlendLayers& value) { return value.ReadList(file, true); }});
 }
 
 Bool WriteField(HyperFile& file, const BlendField& field)
 {
-  switch (field.kind) {
-  case BlendField::kLong:
-    return WriteValue(file, *field.integer);
-  case BlendField::kBool:
-    return WriteValue(file, *field.flag);
-  case BlendField::kReal:
-    return WriteValue(file, *field.real);
-  case BlendField::kVector:
-    return WriteValue(file, *field.vector);
-  case BlendField::kLink:
-    return WriteValue(file, *field.link);
-  case BlendField::kGradient:
-    return WriteGradientField(file, *field.gradient);
-  case BlendField::kLayers:
-    return field.layers->WriteList(file, kBlendListLevel);
-  }
-  return false;
+  return Visit(field, Choose{[&](auto& value) { return WriteValue(file, value); },
+                             [&](GradientData& value) { return WriteGradientField(file, value); },
+                             [&](CBlendLayers& value) { return value.WriteList(file, kBlendListLevel); }});
 }
 
 Bool FieldsDiffer(const BlendField& a, const BlendField& b)
 {
-  switch (a.kind) {
-  case BlendField::kLong:
-    return *a.integer != *b.integer;
-  case BlendField::kBool:
-    return *a.flag != *b.flag;
-  case BlendField::kReal:
-    return *a.real != *b.real;
-  case BlendField::kVector:
-    return !(*a.vector == *b.vector);
-  case BlendField::kLink:
-    return !a.link->IsEqual(*b.link);
-  case BlendField::kGradient:
-    return GradientsDiffer(*a.gradient, *b.gradient);
-  case BlendField::kLayers:
-    return !a.layers->CompareLayers(*b.layers);
-  }
-  return true;
+  return Visit(a, Choose{[&](auto& value) { return !(value == b.As<std::decay_t<decltype(value)>>()); },
+                         [&](GeAliasLink& value) { return !value.IsEqual(b.As<GeAliasLink>()); },
+                         [&](GradientData& value) { return GradientsDiffer(value, b.As<GradientData>()); },
+                         [&](CBlendLayers& value) { return !value.CompareLayers(b.As<CBlendLayers>()); }});
 }
 
 Bool CopyField(const BlendField& source, const BlendField& destination, TransArray* translation)
 {
-  switch (source.kind) {
-  case BlendField::kLong:
-    *destination.integer = *source.integer;
-    return true;
-  case BlendField::kBool:
-    *destination.flag = *source.flag;
-    return true;
-  case BlendField::kReal:
-    *destination.real = *source.real;
-    return true;
-  case BlendField::kVector:
-    *destination.vector = *source.vector;
-    return true;
-  case BlendField::kLink:
-    return source.link->CopyLinkTo(destination.link, translation);
-  case BlendField::kGradient:
-    destination.gradient->FreeGradientCache();
-    return CopyGradient(*source.gradient, *destination.gradient, translation);
-  case BlendField::kLayers:
-    return source.layers->CopyLayersTo(*destination.layers, translation);
-  }
-  return false;
+  return Visit(
+      source,
+      Choose{[&](auto& value) {
+               destination.As<std::decay_t<decltype(value)>>() = value;
+               return true;
+             },
+             [&](GeAliasLink& value) { return value.CopyLinkTo(&destination.As<GeAliasLink>(), translation); },
+             [&](GradientData& value) {
+               auto& copy = destination.As<GradientData>();
+               copy.FreeGradientCache();
+               return CopyGradient(value, copy, translation);
+             },
+             [&](CBlendLayers& value) { return value.CopyLayersTo(destination.As<CBlendLayers>(), translation); }});
 }
 
 // ---------------------------------------------------------------------------------------------------------------
 
 Bool GetField(const BlendField& field, GeData& value)
 {
-  switch (field.kind) {
-  case BlendField::kLong:
-    value = GeData(*field.integer);
-    return true;
-  case BlendField::kBool:
-    value = GeData(*field.flag);
-    return true;
-  case BlendField::kReal:
-    value = GeData(*field.real);
-    return true;
-  case BlendField::kVector:
-    value = GeData(*field.vector);
-    return true;
-  case BlendField::kLink:
-    value = GeData(*field.link);
-    return true;
-  case BlendField::kGradient:
-    value = GeData(kCustomGradient, *field.gradient);
-    return true;
-  case BlendField::kLayers: {
-    const GeAliasLink* link = field.layers->GetFirstLink();
-    value = link ? GeData(*link) : GeData(GeAliasLink());
-    return true;
-  }
-  }
-  return false;
+  return Visit(field, Choose{[&](auto& own) {
+                               value = GeData(own);
+                               return true;
+                             },
+                             [&](GradientData& own) {
+                               value = GeData(kCustomGradient, own);
+                               return true;
+                             },
+                             [&](CBlendLayers& own) {
+                               const GeAliasLink* link = own.GetFirstLink();
+                               value = link ? GeData(*link) : GeData(GeAliasLink());
+                               return true;
+                             }});
 }
 
 Bool SetField(const BlendField& field, const GeData& value)
 {
-  switch (field.kind) {
-  case BlendField::kLong:
-    *field.integer = value.GetLong();
+  auto take = [](auto& own, auto taken) {
+    own = taken;
     return true;
-  case BlendField::kBool:
-    *field.flag = value.GetBool();
-    return true;
-  case BlendField::kReal:
-    *field.real = value.GetReal();
-    return true;
-  case BlendField::kVector:
-    *field.vector = value.GetVector();
-    return true;
-  case BlendField::kLink:
-  case BlendField::kLayers: {
-    const GeAliasLink* source = value.GetAliasLink();
-    GeAliasLink* target = field.kind == BlendField::kLink ? field.link : field.layers->GetFirstLink();
-    return source && target && source->CopyLinkTo(target, nullptr);
-  }
-  case BlendField::kGradient:
-    return TakeGradient(&value, *field.gradient);
-  }
-  return false;
+  };
+  return Visit(field, Choose{[&](Long& own) { return take(own, value.GetLong()); },
+                             [&](Bool& own) { return take(own, value.GetBool()); },
+                             [&](Real& own) { return take(own, value.GetReal()); },
+                             [&](Vector& own) { return take(own, value.GetVector()); },
+                             [&](GeAliasLink& own) { return CopyToLink(value, &own); },
+                             [&](GradientData& own) { return TakeGradient(&value, own); },
+                             [&](CBlendLayers& own) { return CopyToLink(value, own.GetFirstLink()); }});
 }
 
 Bool GetFieldPart(const BlendField& field, const ParameterPath& path, GeData& value)
 {
-  if (field.kind == BlendField::kGradient) {
-    ULong flags = 0;
-    if (field.gradient->GetGradientValue(path, value, flags))
-      return true;
-    ReportAssertion(kBlendModule, kLineGradientGet, "a layer's gradient lacks the parameter that was asked for");
-    return false;
-  }
-  if (field.kind != BlendField::kVector || path[0].id == 0)
-    return GetField(field, value);
-  const Real* component = ComponentOf(*field.vector, path[0].id);
-  if (component)
-    value = GeData(*component);
-  return component != nullptr;
+  return Visit(field, Choose{[&](auto&) { return GetField(field, value); },
+                             [&](GradientData& own) {
+                               ULong flags = 0;
+                               const Bool known = own.GetGradientValue(path, value, flags);
+                               if (!known)
+                                 ReportAssertion(kBlendModule, kLineGradientGet,
+                                                 "a layer's gradient lacks the parameter that was asked for");
+                               return known;
+                             },
+                             [&](Vector& own) {
+                               if (path[0].id == 0)
+                                 return GetField(field, value);
+                               const Real* component = ComponentOf(own, path[0].id);
+                               if (component)
+                                 value = GeData(*component);
+                               return component != nullptr;
+                             }});
 }
 
 Bool SetFieldPart(const BlendField& field, const ParameterPath& path, const GeData& value)
 {
-  switch (field.kind) {
-  case BlendField::kLong:
-    *field.integer = static_cast<Long>(IntoRange(field, value.GetLong()));
-    return true;
-  case BlendField::kReal:
-    *field.real = IntoRange(field, value.GetReal());
-    return true;
-  case BlendField::kGradient: {
-    ULong flags = 0;
-    if (field.gradient->SetGradientValue(path, value, flags))
-      return true;
-    ReportAssertion(kBlendModule, kLineGradientSet, "a layer's gradient lacks the parameter that was to be set");
-    return false;
-  }
-  case BlendField::kVector:
-    if (path[0].id != 0) {
-      Real* component = ComponentOf(*field.vector, path[0].id);
-      if (component)
-        *component = value.GetReal();
-      return component != nullptr;
-    }
-    [[fallthrough]];
-  default:
-    return SetField(field, value);
-  }
+  return Visit(field, Choose{[&](auto&) { return SetField(field, value); },
+                             [&](Long& own) {
+                               own = static_cast<Long>(IntoRange(field, value.GetLong()));
+                               return true;
+                             },
+                             [&](Real& own) {
+                               own = IntoRange(field, value.GetReal());
+                               return true;
+                             },
+                             [&](GradientData& own) {
+                               ULong flags = 0;
+                               const Bool known = own.SetGradientValue(path, value, flags);
+                               if (!known)
+                                 ReportAssertion(kBlendModule, kLineGradientSet,
+                                                 "a layer's gradient lacks the parameter that was to be set");
+                               return known;
+                             },
+                             [&](Vector& own) {
+                               if (path[0].id == 0)
+                                 return SetField(field, value);
+                               Real* component = ComponentOf(own, path[0].id);
+                               if (component)
+                                 *component = value.GetReal();
+                               return component != nullptr;
+                             }});
 }
 
 } // namespace _torvane_

@@ -6,6 +6,8 @@
 namespace _torvane_
 {
 
+BlendFields BlendLayer::FieldsOf() const { return const_cast<BlendLayer*>(this)->Fields(); }
+
 Bool BlendLayer::CopyLayerTo(BlendLayer& destination, TransArray* translation) const
 {
   if (destination.layerType_ != layerType_)

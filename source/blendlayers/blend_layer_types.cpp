@@ -53,38 +53,42 @@ void BlendShader::ReleaseLinked()
 
 BlendFields BlendEffectBC::Fields()
 {
-  return {{brightness_, 2000, 0, -1.0, 1.0}, {contrast_, 2001, 1, -1.0, 1.0}, {gamma_, 2002, 2, 0.1, 10.0}};
+  return {{first_, 2000, 0, -1.0, 1.0}, {second_, 2001, 1, -1.0, 1.0}, {third_, 2002, 2, 0.1, 10.0}};
 }
 
 BlendFields BlendEffectHSL::Fields()
 {
-  const Real lowestHue = absolute_ ? 0.0 : -180.0;
-  const Real highestHue = absolute_ ? 360.0 : 180.0;
-  return {{hue_, 2000, 0, lowestHue, highestHue},
-          {second_, 2001, 1, absolute_ ? 0.0 : -1.0, 1.0},
+  const Real lowest = flag_ ? 0.0 : -180.0;
+  const Real highest = flag_ ? 360.0 : 180.0;
+  return {{first_, 2000, 0, lowest, highest},
+          {second_, 2001, 1, flag_ ? 0.0 : -1.0, 1.0},
           {third_, 2002, 2, -1.0, 1.0},
-          {absolute_, 2003, 3}};
+          {flag_, 2003, 3}};
 }
 
-BlendFields BlendEffectPosterize::Fields() { return {{width_, 2001, 0, 0.0, 1.0}, {levels_, 2000, 1, 1.0, 255.0}}; }
+BlendFields BlendEffectPosterize::Fields() { return {{part_, 2001, 0, 0.0, 1.0}, {number_, 2000, 1, 1.0, 255.0}}; }
 
 BlendFields BlendEffectColorize::Fields()
 {
-  return {{input_, 2000, 0, 0.0, 6.0}, {gradient_, 2001, 1}, {first_, 2002}, {second_, 2003, 2, 1}};
+  return {{number_, 2000, 0, 0.0, 6.0}, {gradient_, 2001, 1}, {first_, 2002}, {second_, 2003, 2, 0.0, -1.0, 1}};
 }
 
-BlendFields BlendEffectLimits::Fields() { return {{low_, 2000, 0, 0.0, 1000.0}, {high_, 2001, 1, 0.0, 1000.0}}; }
+BlendFields BlendEffectLimits::Fields() { return {{first_, 2000, 0, 0.0, 1000.0}, {second_, 2001, 1, 0.0, 1000.0}}; }
 
 BlendFields BlendEffectDistorter::Fields()
 {
-  return {{noise_, 2000},    {strength_, 2001, 0, -1.0, 1.0}, {wrap_, 2006},
-          {flag_, 2005},     {second_, 2002, 1, 0.0, 20.0},   {third_, 2003, 2},
+  return {{firstNumber_, 2000}, {first_, 2001, 0, -1.0, 1.0},  {secondNumber_, 2006},
+          {flag_, 2005},        {second_, 2002, 1, 0.0, 20.0}, {third_, 2003, 2},
           {fourth_, 2004, 3}};
 }
 
 BlendFields BlendEffectTransform::Fields()
 {
-  return {{angle_, 2000, 0}, {mirror_, 2001, 1}, {flip_, 2002, 2}, {scale_, 2003, 3}, {offset_, 2004, 4}};
+  return {{real_, 2000, 0},
+          {firstFlag_, 2001, 1},
+          {secondFlag_, 2002, 2},
+          {firstVector_, 2003, 3},
+          {secondVector_, 2004, 4}};
 }
 
 } // namespace _torvane_

@@ -3,6 +3,7 @@
 
 #include <limits>
 
+#include "int_customgui_gradient/gradient_knots.h"
 #include "k2v_file/values/vector_component.h"
 #include "torvane/memory/assertion.h"
 #include "torvane/stream/hyper_file.h"
@@ -24,21 +25,6 @@ Long EntryOf(Long field)
 {
   constexpr Long kEntries[] = {kKnotColor, kKnotBrightness, kKnotPosition, kKnotBias};
   return field >= kFieldColor && field <= kFieldBias ? kEntries[field] : -1;
-}
-
-// Calls `visit` with each knot of a gradient, in their order, until it gives false.
-template <class Visit>
-void ForEachKnot(const GradientData& gradient, Visit&& visit)
-{
-  const BaseContainer* knots = gradient.GetSettings().GetContainerInstance(kGradientKnots);
-  BaseContainer::Iterator iterator;
-  Long id = 0;
-  GeData* value = nullptr;
-  for (Bool more = knots && knots->BrowseFirst(iterator, id, value); more;
-       more = knots->BrowseNext(iterator, id, value)) {
-    if (value->GetRawType() == kDataContainer && !visit(*value->GetContainer()))
-      return;
-  }
 }
 
 Bool GetKnotValue(const BaseContainer& knot, Long field, const ParameterPath& path, GeData& value)
@@ -107,12 +93,17 @@ Bool CopyGradient(const GradientData& source, GradientData& destination, TransAr
     ReportAssertion(kModule, kLineStaleCache, "a gradient was copied onto one that is in use");
     destination.FreeGradientCache();
   }
-  destination.DropAlpha();
-  if (!source.settings_.CopyTo(destination.settings_, 0, translation))
-    return false;
-  destination.isAlpha_ = source.isAlpha_;
-  destination.fromOldFile_ = source.fromOldFile_;
-  return !source.alpha_ || (destination.NeedAlpha() && CopyGradient(*source.alpha_, *destination.alpha_, translation));
+  GradientData* replaced = destination.alpha_; // it may be the source
+  destination.alpha_ = nullptr;
+  Bool copied = source.settings_.CopyTo(destination.settings_, 0, translation);
+  if (copied) {
+    destination.isAlpha_ = source.isAlpha_;
+    destination.fromOldFile_ = source.fromOldFile_;
+    copied =
+        !source.alpha_ || (destination.NeedAlpha() && CopyGradient(*source.alpha_, *destination.alpha_, translation));
+  }
+  DeleteObj(replaced);
+  return copied;
 }
 
 Bool GradientsDiffer(const GradientData& a, const GradientData& b)
@@ -140,12 +131,12 @@ Bool GradientData::CopyTo(CustomData& destination, TransArray* translation) cons
 void NumberKnots(GradientData& gradient, Bool convertAlpha)
 {
   Long last = 0;
-  ForEachKnot(gradient, [&](const BaseContainer& knot) {
+  ForEachKnot(gradient, [&](const BaseContainer& knot, ULong) {
     const Long id = knot.GetLong(kKnotId);
     last = id > last ? id : last;
     return true;
   });
-  ForEachKnot(gradient, [&](BaseContainer& knot) {
+  ForEachKnot(gradient, [&](BaseContainer& knot, ULong) {
     if (knot.GetLong(kKnotId) == 0 && last < std::numeric_limits<Long>::max())
       knot.SetLong(kKnotId, ++last);
     if (convertAlpha && gradient.IsAlpha()) {
@@ -198,7 +189,7 @@ void GradientData::Write(HyperFile& file) const { WriteGradient(file); }
 BaseContainer* GradientData::FindKnot(Long knotId) const
 {
   BaseContainer* found = nullptr;
-  ForEachKnot(*this, [&](BaseContainer& knot) {
+  ForEachKnot(*this, [&](BaseContainer& knot, ULong) {
     if (knot.GetLong(kKnotId) == knotId)
       found = &knot;
     return found == nullptr;

@@ -1,7 +1,6 @@
 // The colours of a gradient: its sorted knots, the blend between two of them, and the mirrored gradient.
+#include "int_customgui_gradient/gradient_knots.h"
 #include "int_customgui_gradient/gradient_sort.h"
-#include "torvane/shaders/gradient.h"
-#include "torvane/values/ge_data.h"
 
 namespace _torvane_
 {
@@ -56,22 +55,14 @@ void GradientData::FreeGradientCache()
     alpha_->FreeGradientCache();
 }
 
-// Takes the knots out of their container in its order.
-Bool GradientData::FillCache(const BaseContainer& knots)
+// Takes `count` knots out of their container, in its order.
+Bool GradientData::FillCache(Long count)
 {
-  knotCache_ = static_cast<GradientKnot*>(
-      GeAlloc(static_cast<LLong>(knots.GetCount()) * static_cast<LLong>(sizeof(GradientKnot))));
+  knotCache_ =
+      static_cast<GradientKnot*>(GeAlloc(static_cast<LLong>(count) * static_cast<LLong>(sizeof(GradientKnot))));
   if (!knotCache_)
     return false;
-  BaseContainer::Iterator iterator;
-  Long id = 0;
-  GeData* value = nullptr;
-  ULong index = 0;
-  for (Bool more = knots.BrowseFirst(iterator, id, value); more;
-       more = knots.BrowseNext(iterator, id, value), ++index) {
-    if (value->GetRawType() != kDataContainer)
-      continue; // no knot
-    const BaseContainer& source = *value->GetContainer();
+  ForEachKnot(*this, [&](const BaseContainer& source, ULong place) {
     GradientKnot& knot = knotCache_[knotCount_++];
     knot.color = source.GetVector(kKnotColor);
     if (IsAlpha())
@@ -79,8 +70,9 @@ Bool GradientData::FillCache(const BaseContainer& knots)
     knot.brightness = source.GetReal(kKnotBrightness);
     knot.position = source.GetReal(kKnotPosition);
     knot.bias = source.GetReal(kKnotBias);
-    knot.index = index;
-  }
+    knot.index = place;
+    return true;
+  });
   return true;
 }
 
@@ -89,10 +81,10 @@ Bool GradientData::PrepareGradient()
   FreeGradientCache();
   if (alpha_ && !alpha_->PrepareGradient())
     return false;
-  const BaseContainer* knots = settings_.GetContainerInstance(kGradientKnots);
-  if (!knots || knots->GetCount() == 0)
+  const Long count = CountKnots(*this);
+  if (count == 0)
     return true;
-  if (!FillCache(*knots)) {
+  if (!FillCache(count)) {
     FreeGradientCache();
     return false;
   }
@@ -139,30 +131,22 @@ Bool GradientData::EvaluateGradient(Real position, Vector& color) const
 void GradientData::StoreCache()
 {
   CShellSort<GradientKnot, PlaceOrder>::Sort(knotCache_, knotCount_);
-  const BaseContainer* knots = settings_.GetContainerInstance(kGradientKnots);
   const GradientKnot* knot = knotCache_;
-  BaseContainer::Iterator iterator;
-  Long id = 0;
-  GeData* value = nullptr;
-  for (Bool more = knots->BrowseFirst(iterator, id, value); more; more = knots->BrowseNext(iterator, id, value)) {
-    if (value->GetRawType() != kDataContainer)
-      continue;
-    BaseContainer& target = *value->GetContainer();
+  ForEachKnot(*this, [&](BaseContainer& target, ULong) {
     target.SetVector(kKnotColor, knot->color);
     target.SetReal(kKnotBrightness, knot->brightness);
     target.SetReal(kKnotPosition, knot->position);
     target.SetReal(kKnotBias, knot->bias);
     ++knot;
-  }
+    return true;
+  });
 }
 
 // The bias of a stretch belongs to the knot at its lower end. Mirrored, that is the knot which was its upper end and
 // now stands before it: so each bias moves one knot forward, and the first one's, which rules no stretch, to the last.
 void GradientData::MirrorGradient()
 {
-  const BaseContainer* knots = settings_.GetContainerInstance(kGradientKnots);
-  // Entries may be something else than knots.
-  if (!knots || knots->GetCount() < 2 || !PrepareGradient() || knotCount_ < 1)
+  if (CountKnots(*this) < 2 || !PrepareGradient())
     return;
   for (Long low = 0, high = knotCount_ - 1; low < high; ++low, --high)
     SwapKnots(knotCache_[low], knotCache_[high]);

@@ -82,7 +82,7 @@ KeyTangents CCurve::AutomaticTangents(Long index) const
   Step step = behind ? StepBetween(*key, *behind) : StepBetween(*before, *key);
   if (before && behind) {
     Step back = StepBetween(*before, *key);
-    Real span = back.time + step.time;
+    Real span = behind->GetTime().Get() - before->GetTime().Get(); // not the sum of the two, which is rounded twice
     Real weight = span == 0.0 ? 0.0 : back.time / span;
     step.time = step.time * weight + back.time * (1.0 - weight);
     step.value = step.value * weight + back.value * (1.0 - weight);

@@ -305,18 +305,28 @@ TEST(Gradient, MirrorsItsKnotsAndTheirBiases)
   for (int i = 0; i < 4; ++i)
     EXPECT_NEAR(after[i], before[i], 1e-12);
 
-  // A file may have other things among the knots, and nothing else.
-  GradientData strange;
-  BaseContainer numbers;
-  numbers.SetLong(1, 1);
-  numbers.SetLong(2, 2);
-  strange.GetSettings().SetContainer(kGradientKnots, numbers);
-  strange.MirrorGradient();
-  EXPECT_EQ(strange.GetSettings().GetContainerInstance(kGradientKnots)->GetLong(2), 2);
+  // A file may have other things among the knots, and nothing else: only knots count.
+  for (const bool hasKnot : {true, false}) {
+    GradientData single;
+    if (hasKnot)
+      AddKnots(single, {{0.25, 0.25, kWhite}});
+    single.GetSettings().GetContainerInstance(kGradientKnots)->SetLong(9, 2);
+    ASSERT_TRUE(single.PrepareGradient());
+    EXPECT_EQ(single.GetKnotCache() != nullptr, hasKnot);
+    single.MirrorGradient();
+    EXPECT_EQ(single.GetSettings().GetContainerInstance(kGradientKnots)->GetLong(9), 2);
+    EXPECT_TRUE(!hasKnot || KnotAt(single, 0).GetReal(kKnotPosition) == 0.25);
+    EXPECT_TRUE(!hasKnot || KnotAt(single, 0).GetReal(kKnotBias) == 0.25);
+  }
+}
 
-  GradientData single;
-  AddKnots(single, {{0.25, 0.25, kWhite}});
-  single.MirrorGradient();
-  EXPECT_EQ(KnotAt(single, 0).GetReal(kKnotPosition), 0.25);
-  EXPECT_EQ(KnotAt(single, 0).GetReal(kKnotBias), 0.25);
+TEST(Gradient, TakesItsOwnTransparencyAsTheWhole)
+{
+  const counting_memory::BalanceCheck balance;
+  GradientData gradient;
+  AddKnots(gradient, {{0.5, 0, kBlack}});
+  AddKnots(*gradient.NeedAlpha(), {{0.25, 0, kWhite}});
+  EXPECT_TRUE(CopyGradient(*gradient.GetAlpha(), gradient));
+  EXPECT_EQ(KnotAt(gradient, 0).GetReal(kKnotPosition), 0.25);
+  EXPECT_TRUE(gradient.IsAlpha() && !gradient.GetAlpha());
 }

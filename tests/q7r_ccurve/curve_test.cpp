@@ -234,6 +234,14 @@ TEST(CurveValue, SolvesTheSplineForTheTime)
   }
 }
 
+TEST(CurveTangents, WeighTheStepsByOneSpan)
+{
+  CCurve curve;
+  for (const auto& [time, value] : {std::pair<Real, Real>{0.3, 0}, {2.0, 1}, {2.6, 3}})
+    Add(curve, time, value)->ChangeNBit(46, 1);
+  EXPECT_EQ(curve.GetTangents(1).rightValue, 0.4347826086956521); // with the sum of both steps: ...522
+}
+
 TEST(CurveTangents, FollowTheBitsOfTheKey)
 {
   constexpr ULong kAuto = 0x4000, kClamp = 0x200, kFlat = 0x10000, kNone = 0x20000;

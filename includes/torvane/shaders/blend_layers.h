@@ -3,8 +3,6 @@
 // compares and copies it, and gives each layer's settings as parameters.
 #pragma once
 
-#include <initializer_list>
-
 #include "torvane/links/alias.h"
 #include "torvane/memory/private_ge_mtools.h"
 #include "torvane/shaders/gradient.h"
@@ -115,63 +113,8 @@ class CBlendLayers
 };
 
 inline constexpr Long kBlendListLevel = 3; // of the layers that are written
-inline constexpr Long kNoBlendSub = -1;
 
-// One setting of a layer: where it lies and how it is reached.
-struct BlendField
-{
-  enum Kind : UChar
-  {
-    kLong,
-    kBool,
-    kReal,
-    kVector,
-    kLink,
-    kGradient,
-    kLayers,
-  };
-
-  BlendField() = default;
-  BlendField(Long& value, Long fieldId, Long fieldSub = kNoBlendSub, Real lowest = 0.0, Real highest = -1.0);
-  BlendField(Bool& value, Long fieldId, Long fieldSub = kNoBlendSub, Long level = 0);
-  BlendField(Real& value, Long fieldId, Long fieldSub, Real lowest = 0.0, Real highest = -1.0);
-  BlendField(Vector& value, Long fieldId, Long fieldSub);
-  BlendField(GeAliasLink& value, Long fieldId);
-  BlendField(GradientData& value, Long fieldId, Long fieldSub);
-  BlendField(CBlendLayers& value, Long fieldId); // the parameter is the link of the first layer
-
-  Bool HasRange() const { return low <= high; }
-
-  union
-  {
-    Long* integer = nullptr;
-    Bool* flag;
-    Real* real;
-    Vector* vector;
-    GeAliasLink* link;
-    GradientData* gradient;
-    CBlendLayers* layers;
-  };
-  Kind kind = kLong;
-  Long id = 0;            // of GetLayerParameter; 0: none
-  Long sub = kNoBlendSub; // of GetLayerValue
-  Real low = 0.0;         // the range to which SetLayerValue clamps
-  Real high = -1.0;
-  Long sinceLevel = 0; // lower levels don't hold the field: it becomes false
-};
-
-// The settings of a layer in file order.
-struct BlendFields
-{
-  static constexpr Long kMost = 7;
-
-  BlendFields(std::initializer_list<BlendField> list);
-  const BlendField* begin() const { return fields; }
-  const BlendField* end() const { return fields + count; }
-
-  BlendField fields[kMost];
-  Long count = 0;
-};
+struct BlendFields;
 
 class BlendLayer : public GeMemory
 {
@@ -227,14 +170,13 @@ class BlendLayer : public GeMemory
   Long GetLayerMark() const { return layerMark_; }
 
  protected:
-  // The class's own settings. Pointers lead into this layer.
+  // The class's own settings, in file order. Pointers lead into this layer.
   virtual BlendFields Fields() = 0;
-
-  // What Fields gives, for reading.
-  BlendFields FieldsOf() const { return const_cast<BlendLayer*>(this)->Fields(); }
 
  private:
   friend class CBlendLayers;
+
+  BlendFields FieldsOf() const; // what Fields gives, for reading
 
   CBlendLayers* parent_ = nullptr; // not owned
   Long layerType_;
@@ -296,7 +238,7 @@ class BlendShader : public BlendLayer
   GeAliasLink link_;
 };
 
-// Brightness, contrast, gamma.
+// The layer "B/C/G".
 class BlendEffectBC : public BlendLayer
 {
  public:
@@ -306,12 +248,12 @@ class BlendEffectBC : public BlendLayer
   BlendFields Fields() override;
 
  private:
-  Real brightness_ = 0.0;
-  Real contrast_ = 0.0;
-  Real gamma_ = 1.0;
+  Real first_ = 0.0;
+  Real second_ = 0.0;
+  Real third_ = 1.0;
 };
 
-// Hue, lightness, saturation. The flag widens the ranges of the first two from differences to absolute values.
+// The layer "HLS". Its flag changes the ranges of the first two.
 class BlendEffectHSL : public BlendLayer
 {
  public:
@@ -321,10 +263,10 @@ class BlendEffectHSL : public BlendLayer
   BlendFields Fields() override;
 
  private:
-  Real hue_ = 0.0; // degrees
+  Real first_ = 0.0;
   Real second_ = 0.0;
   Real third_ = 0.0;
-  Bool absolute_ = false;
+  Bool flag_ = false;
 };
 
 class BlendEffectPosterize : public BlendLayer
@@ -336,8 +278,8 @@ class BlendEffectPosterize : public BlendLayer
   BlendFields Fields() override;
 
  private:
-  Real width_ = 0.1;
-  Long levels_ = 5;
+  Real part_ = 0.1;
+  Long number_ = 5;
 };
 
 // Colours by a gradient.
@@ -352,7 +294,7 @@ class BlendEffectColorize : public BlendLayer
   BlendFields Fields() override;
 
  private:
-  Long input_ = 0;
+  Long number_ = 0;
   GradientData gradient_;
   Bool first_ = false;
   Bool second_ = false;
@@ -366,8 +308,8 @@ class BlendEffectLimits : public BlendLayer
   BlendFields Fields() override;
 
  private:
-  Real low_ = 0.0;
-  Real high_ = 1.0;
+  Real first_ = 0.0;
+  Real second_ = 1.0;
 };
 
 class BlendEffectClamp : public BlendEffectLimits
@@ -391,9 +333,9 @@ class BlendEffectDistorter : public BlendLayer
   BlendFields Fields() override;
 
  private:
-  Long noise_ = 13;
-  Real strength_ = 0.1;
-  Long wrap_ = 3;
+  Long firstNumber_ = 13;
+  Real first_ = 0.1;
+  Long secondNumber_ = 3;
   Bool flag_ = false;
   Real second_ = 5.0;
   Real third_ = 1.0;
@@ -409,11 +351,11 @@ class BlendEffectTransform : public BlendLayer
   BlendFields Fields() override;
 
  private:
-  Real angle_ = 0.0;
-  Bool mirror_ = false;
-  Bool flip_ = false;
-  Vector scale_{1.0, 1.0, 1.0};
-  Vector offset_;
+  Real real_ = 0.0;
+  Bool firstFlag_ = false;
+  Bool secondFlag_ = false;
+  Vector firstVector_{1.0, 1.0, 1.0};
+  Vector secondVector_;
 };
 
 // The custom value: a stack and its version.

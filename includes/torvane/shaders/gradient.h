@@ -111,7 +111,7 @@ class GradientData : public CustomData
 
   BaseContainer* FindKnot(Long knotId) const;
   const GradientData* PartOf(Long& id) const;
-  Bool FillCache(const BaseContainer& knots);
+  Bool FillCache(Long count);
   void StoreCache();
   Long FindLowerKnot(Real position) const;
 
