@@ -19,10 +19,15 @@ struct FreeDocument
   void operator()(BaseDocument* document) const { BaseDocument::Free(document); }
 };
 
+FileProblem lastProblem;
+
 } // namespace
+
+const FileProblem& GetSceneFileProblem() { return lastProblem; }
 
 bool WriteSceneFile(const char* path)
 {
+  lastProblem = FileProblem();
   if (!path)
     return false;
   if (!String(path, STRINGENCODING_UTF8).Content())
@@ -38,6 +43,7 @@ bool WriteSceneFile(const char* path)
     document->WriteChunks(file);
   }
   file.Close();
+  lastProblem = file.GetProblem();
   return opened;
 }
 

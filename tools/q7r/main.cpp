@@ -1,7 +1,12 @@
 // q7r: scene files from compositions, and tools for scene files.
 #include <cstdio>
 #include <exception>
+#include <iostream>
+#include <new>
+#include <sstream>
 
+#include "output/standard_output.h"
+#include "output/temporary_file.h"
 #include "torvane/memory/assertion.h"
 #include "verbs/verbs.h"
 
@@ -26,7 +31,10 @@ int Run(int argc, char** argv)
   try {
     program.parse(argc, argv);
   } catch (const CLI::ParseError& error) {
-    return program.exit(error) == 0 ? q7r::kDone : q7r::kNotDone;
+    std::ostringstream help;
+    const int result = program.exit(error, help, std::cerr);
+    q7r::Print(help.str());
+    return result == 0 ? q7r::kDone : q7r::kNotDone;
   }
   return status;
 }
@@ -37,8 +45,14 @@ int main(int argc, char** argv)
 {
   // The library's own reports are for its developers; what matters to a user comes as an error.
   _torvane_::SetAssertionLog(nullptr);
+  q7r::PrepareProcess();
   try {
-    return Run(argc, argv);
+    const int status = Run(argc, argv);
+    q7r::FlushStandardOutput();
+    return status;
+  } catch (const std::bad_alloc&) {
+    std::fputs("q7r: not enough memory\n", stderr);
+    return q7r::kNotDone;
   } catch (const std::exception& error) {
     std::fprintf(stderr, "q7r: %s\n", error.what());
     return q7r::kNotDone;

@@ -1,16 +1,14 @@
 #include "scene_file.h"
 
+#include <cerrno>
 #include <cstdio>
 #include <filesystem>
-#include <iostream>
+#include <system_error>
 
-#ifdef _WIN32
-#include <io.h>
-#else
-#include <unistd.h>
+#ifndef _WIN32
+#include <fcntl.h>
 #endif
 
-#include "torvane/stream/hyper_file.h"
 #include "verbs/verbs.h"
 
 namespace q7r
@@ -40,13 +38,16 @@ void AppendUtf8(std::string& out, char32_t code)
   }
 }
 
-bool IsTerminal()
+// A name in plain characters for a file whose own name isn't text.
+std::string OpenedName(const std::filesystem::path& path)
 {
-#ifdef _WIN32
-  return _isatty(0) != 0;
-#else
-  return isatty(0) != 0 && isatty(2) != 0;
+#ifndef _WIN32
+  // Open until the program ends: nobody knows how often the name is used.
+  const int descriptor = ::open(path.c_str(), O_RDONLY | O_CLOEXEC);
+  if (descriptor >= 0)
+    return "/dev/fd/" + std::to_string(descriptor);
 #endif
+  throw Failure(path.string() + ": " + std::generic_category().message(errno));
 }
 
 } // namespace
@@ -55,7 +56,13 @@ Filename ToFilename(const std::string& path)
 {
   // UTF-8 to UTF-16 by code points: the library's own decoder knows characters of the basic plane alone. The path is
   // made absolute because one that begins with "?" could stand for a connection or a stream.
-  std::u16string wide = std::filesystem::absolute(std::filesystem::path(path)).u16string();
+  const std::filesystem::path absolute = std::filesystem::absolute(std::filesystem::path(path));
+  std::u16string wide;
+  try {
+    wide = absolute.u16string();
+  } catch (const std::filesystem::filesystem_error&) {
+    wide = std::filesystem::path(OpenedName(absolute)).u16string();
+  }
   Filename name;
   name.SetString(String(reinterpret_cast<const UniChar*>(wide.data()), static_cast<Long>(wide.size())));
   return name;
@@ -78,6 +85,8 @@ std::string ToUtf8(const String& text)
 std::string ProblemText(const std::string& path, const FileProblem& problem)
 {
   std::string text = path + ": ";
+  if (problem.systemError != 0)
+    return text + std::generic_category().message(problem.systemError);
   if (problem.code != FILEERROR_OPEN)
     text += "byte " + std::to_string(problem.position) + ": ";
   return text + GetFileErrorText(problem.code);
@@ -90,50 +99,6 @@ DocumentPtr LoadScene(const std::string& path)
   if (!document)
     throw Failure(ProblemText(path, problem));
   return document;
-}
-
-void WriteWhole(const std::string& path, const std::function<void(const std::string& partial)>& write)
-{
-  std::string partial = path + ".part";
-  std::error_code error;
-  try {
-    write(partial);
-  } catch (const Failure&) {
-    std::filesystem::remove(partial, error);
-    throw;
-  }
-  std::filesystem::rename(partial, path, error);
-  if (error) {
-    std::string reason = error.message();
-    std::filesystem::remove(partial, error);
-    throw Failure(path + ": " + reason);
-  }
-}
-
-void WriteScene(BaseDocument& document, const std::string& path)
-{
-  WriteWhole(path, [&](const std::string& partial) {
-    FileProblem problem;
-    if (!SaveDocument(&document, ToFilename(partial), 0, &problem) || problem.code != FILEERROR_NONE)
-      throw Failure(ProblemText(path, problem));
-  });
-  std::printf("%s: %s\n", path.c_str(), SizeText(std::filesystem::file_size(path)).c_str());
-}
-
-void VerifyScene(const std::string& path)
-{
-  HyperFile file;
-  Bool good = file.Open(kSceneIdent, ToFilename(path), kHyperFileRead);
-  LLong depth = 0;
-  while (good && file.GetPosition() < file.GetLength()) {
-    UChar tag = 0;
-    good = file.ReadValueHeader(tag) && file.SkipValue(tag);
-    depth += tag == kTagChunkStart ? 1 : tag == kTagChunkEnd ? -1 : 0;
-  }
-  if (!good)
-    throw Failure(ProblemText(path, file.GetProblem()));
-  if (depth != 0)
-    throw Failure(path + ": byte " + std::to_string(file.GetPosition()) + ": the file ends inside a chunk");
 }
 
 std::string SizeText(std::uintmax_t bytes)
@@ -150,21 +115,6 @@ std::string SizeText(std::uintmax_t bytes)
   char buffer[40];
   std::snprintf(buffer, sizeof buffer, "%.1f %s", size, units[unit]);
   return buffer;
-}
-
-bool AskReplace(const std::string& path)
-{
-  if (!IsTerminal())
-    return false;
-  std::cerr << path << " exists already. Replace it? [y/N] " << std::flush;
-  std::string answer;
-  return std::getline(std::cin, answer) && (answer == "y" || answer == "Y" || answer == "yes");
-}
-
-void RequireReplaceable(const std::string& path, bool force)
-{
-  if (!force && std::filesystem::exists(path) && !AskReplace(path))
-    throw Failure(path + ": exists already; --force replaces it");
 }
 
 } // namespace q7r

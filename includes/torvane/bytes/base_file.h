@@ -176,6 +176,8 @@ class BaseFile : public GeMemory
   void SetOrder(Long order) { order_ = order; }
   Long GetOrder() const { return order_; }
   Long GetError() const { return error_; }
+  // The operating system's number (errno) of the failure on a disk; 0 when the failure is of another kind.
+  Long GetSystemError() const { return systemError_; }
   Long GetMode() const { return mode_; }
   const Filename& GetName() const { return name_; }
 
@@ -269,6 +271,7 @@ class BaseFile : public GeMemory
   Long CloseDisk();
   Long CloseNetwork();
 
+  void NoteSystemError();
   Bool MeasureDisk();
   Bool FlushDisk();
   Bool MoveHandle(LLong position, HandleUse use);
@@ -288,6 +291,7 @@ class BaseFile : public GeMemory
 
   Filename name_;
   Long error_ = FILEERROR_NONE;
+  Long systemError_ = 0;
   Long order_ = kByteOrderBig;
   Long mode_ = kFileRead;
   LLong capacity_ = 0;      // a memory target's size, or the size of a network connection's block buffer

@@ -22,7 +22,8 @@ inline constexpr Long FILEERROR_PREMATURE_END = -104;   // the walk to a chunk's
 struct FileProblem
 {
   Long code = FILEERROR_NONE;
-  LLong position = 0; // byte position at which the failure was met
+  LLong position = 0;   // byte position at which the failure was met
+  Long systemError = 0; // what the operating system answered (errno), if it was the one that failed, else 0
 };
 
 // A short English phrase for an error code, such as "a read came short".

@@ -49,6 +49,7 @@ Bool BaseFile::Open(const Filename& name, Long mode, Bool /*errorDialog*/, Long 
   Close();
   name_ = name;
   error_ = FILEERROR_NONE;
+  systemError_ = 0;
   order_ = order;
   mode_ = mode == kFileReadAlias || mode == kFileReadShared ? Long{kFileRead} : mode;
   cachedLength_ = -1;

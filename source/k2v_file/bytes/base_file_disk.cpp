@@ -1,5 +1,7 @@
 // The disk target of BaseFile: a C stream without a buffer of its own under a buffer that this layer keeps, except
 // where a file is both read and written.
+#include <cerrno>
+
 #include "k2v_file/bytes/disk_file.h"
 #include "torvane/bytes/base_file.h"
 
@@ -15,11 +17,20 @@ constexpr LLong kSpare = 2;                      // a shorter file's buffer is l
 
 } // namespace
 
+// To be called right behind the call that failed. The first failure counts: those that follow are its consequences.
+void BaseFile::NoteSystemError()
+{
+  if (systemError_ == 0)
+    systemError_ = errno;
+}
+
 Long BaseFile::OpenDisk(Long mode)
 {
   handle_ = OpenDiskFile(name_.GetString(), mode);
-  if (!handle_)
+  if (!handle_) {
+    NoteSystemError();
     return FILEERROR_OPEN;
+  }
   target_ = Target::kDisk;
   if (mode_ == kFileReadWrite) {
     std::setvbuf(handle_, nullptr, _IOFBF, kStreamBufferSize);
@@ -45,8 +56,10 @@ Bool BaseFile::MeasureDisk()
   if (cachedLength_ >= 0)
     return true;
   LLong length = 0;
-  if (!MeasureDiskFile(handle_, length))
+  if (!MeasureDiskFile(handle_, length)) {
+    NoteSystemError();
     return false;
+  }
   cachedLength_ = length;
   handlePosition_ = length;
   handleUse_ = HandleUse::kNone;
@@ -58,8 +71,10 @@ Bool BaseFile::MoveHandle(LLong position, HandleUse use)
 {
   const Bool turned = handleUse_ != HandleUse::kNone && use != handleUse_;
   if (handlePosition_ != position || turned) {
-    if (!SeekDiskFile(handle_, position))
+    if (!SeekDiskFile(handle_, position)) {
+      NoteSystemError();
       return false;
+    }
     handlePosition_ = position;
   }
   handleUse_ = use;
@@ -79,8 +94,10 @@ LLong BaseFile::ReadHandle(void* destination, LLong position, LLong count, Long&
   }
   const auto got = static_cast<LLong>(std::fread(destination, 1, static_cast<std::size_t>(wanted), handle_));
   handlePosition_ += got;
-  if (got < wanted && std::ferror(handle_))
+  if (got < wanted && std::ferror(handle_)) {
+    NoteSystemError();
     problem = FILEERROR_READ;
+  }
   return got;
 }
 
@@ -90,6 +107,8 @@ LLong BaseFile::WriteHandle(const void* source, LLong position, LLong count)
     return 0;
   const auto written = static_cast<LLong>(std::fwrite(source, 1, static_cast<std::size_t>(count), handle_));
   handlePosition_ += written;
+  if (written < count)
+    NoteSystemError();
   return written;
 }
 
@@ -151,8 +170,10 @@ Long BaseFile::SeekDisk(LLong position)
   if (buffer_ && !FlushDisk())
     return FILEERROR_WRITE;
   handleUse_ = HandleUse::kNone;
-  if (!SeekDiskFile(handle_, position))
+  if (!SeekDiskFile(handle_, position)) {
+    NoteSystemError();
     return FILEERROR_SEEK;
+  }
   handlePosition_ = position;
   windowPosition_ = position;
   return FILEERROR_NONE;
@@ -163,8 +184,11 @@ Long BaseFile::CloseDisk()
   Long problem = FILEERROR_NONE;
   if (mode_ != kFileRead && buffer_ && !FlushDisk())
     problem = FILEERROR_WRITE;
-  if (std::fclose(handle_) != 0 && problem == FILEERROR_NONE)
-    problem = FILEERROR_CLOSE;
+  if (std::fclose(handle_) != 0) {
+    NoteSystemError();
+    if (problem == FILEERROR_NONE)
+      problem = FILEERROR_CLOSE;
+  }
   handle_ = nullptr;
   return problem;
 }

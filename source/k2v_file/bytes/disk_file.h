@@ -10,8 +10,9 @@
 namespace _torvane_
 {
 
-// Opens `path` in a FileMode. The stream is not inherited by child processes. Null when that fails, for a directory
-// and for a path that holds a character 0. The caller closes the stream with fclose.
+// Opens `path` in a FileMode. The stream is not inherited by child processes. Null, with the
+// cause in errno, when that fails, for a directory and for a path that holds a character 0. The caller closes the
+// stream with fclose.
 std::FILE* OpenDiskFile(const String& path, Long mode);
 
 // Positions the stream, from its start.

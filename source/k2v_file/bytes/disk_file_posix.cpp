@@ -117,10 +117,13 @@ int OpenDescriptor(const char* path, int flags)
 }
 
 // Opening a directory for reading works; only reading from it would fail.
-Bool IsDirectory(int descriptor)
+Bool MayBeOpened(int descriptor)
 {
   struct stat status = {};
-  return ::fstat(descriptor, &status) != 0 || S_ISDIR(status.st_mode);
+  if (::fstat(descriptor, &status) != 0)
+    return false;
+  errno = EISDIR;
+  return !S_ISDIR(status.st_mode);
 }
 
 } // namespace
@@ -128,15 +131,20 @@ Bool IsDirectory(int descriptor)
 std::FILE* OpenDiskFile(const String& path, Long mode)
 {
   const SystemPath systemPath(path);
-  if (!systemPath.Get())
+  if (!systemPath.Get()) {
+    errno = EINVAL;
     return nullptr;
+  }
   const OpenRule& rule = kOpenRules[mode];
   const int descriptor = OpenDescriptor(systemPath.Get(), rule.flags);
   if (descriptor < 0)
     return nullptr;
-  std::FILE* file = IsDirectory(descriptor) ? nullptr : ::fdopen(descriptor, rule.mode);
-  if (!file)
+  std::FILE* file = MayBeOpened(descriptor) ? ::fdopen(descriptor, rule.mode) : nullptr;
+  if (!file) {
+    const int cause = errno;
     ::close(descriptor);
+    errno = cause;
+  }
   return file;
 }
 

@@ -6,6 +6,7 @@
 #define NOMINMAX
 #endif
 #define WIN32_LEAN_AND_MEAN
+#include <cerrno>
 #include <cstring>
 #include <cwchar>
 #include <share.h>
@@ -132,8 +133,10 @@ PathKind LookUp(const wchar_t* path)
 std::FILE* OpenDiskFile(const String& path, Long mode)
 {
   const SystemPath systemPath(path);
-  if (!systemPath.Get())
+  if (!systemPath.Get()) {
+    errno = EINVAL;
     return nullptr;
+  }
   const OpenRule& rule = kOpenRules[mode];
   const Bool exists = LookUp(systemPath.Get()) != PathKind::kNothing;
   return ::_wfsopen(systemPath.Get(), exists ? rule.mode : rule.newMode, rule.share);

@@ -135,7 +135,7 @@ Bool HyperFile::Fail(Long error, LLong position)
   if (memory_.Failed())
     error = FILEERROR_MEMORY;
   if (problem_.code == FILEERROR_NONE)
-    problem_ = FileProblem{error, position};
+    problem_ = FileProblem{error, position, file_.GetSystemError()};
   error_ = error;
   ReportAssertion("k2v_file", __LINE__, GetFileErrorText(error));
   return false;

@@ -3,6 +3,7 @@
 #include <memory>
 
 #include "listing/json_text.h"
+#include "output/standard_output.h"
 #include "scene_file.h"
 #include "stream_walker.h"
 #include "verbs.h"
@@ -56,13 +57,12 @@ int Check(const Options& options)
   if (!document)
     problems.push_back(ProblemText(options.file, problem) + " (the scene can't be loaded)");
   if (options.json) {
-    std::puts(
-        Json{{"values", values}, {"problems", problems}}.dump(1, ' ', false, Json::error_handler_t::replace).c_str());
+    PrintLine(Json{{"values", values}, {"problems", problems}}.dump(1, ' ', false, Json::error_handler_t::replace));
   } else {
     for (const std::string& line : problems)
-      std::puts(line.c_str());
+      PrintLine(line);
     if (problems.empty())
-      std::printf("%s: good, %lld values\n", options.file.c_str(), values);
+      PrintFormatted("%s: good, %lld values\n", options.file.c_str(), values);
   }
   return problems.empty() ? kDone : kProblems;
 }

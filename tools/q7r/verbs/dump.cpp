@@ -5,6 +5,7 @@
 #include <nlohmann/json.hpp>
 
 #include "listing/json_text.h"
+#include "output/standard_output.h"
 #include "stream_walker.h"
 #include "verbs.h"
 
@@ -86,7 +87,7 @@ void PrintJson(const StreamWalker& walker, const StreamValue& value)
     line["value"] = value.reals;
   else if (value.tag != kTagChunkEnd)
     line["value"] = value.integer;
-  std::puts(line.dump(-1, ' ', false, nlohmann::json::error_handler_t::replace).c_str());
+  PrintLine(line.dump(-1, ' ', false, nlohmann::json::error_handler_t::replace));
 }
 
 int Dump(const Options& options)
@@ -99,8 +100,8 @@ int Dump(const Options& options)
       continue;
     }
     int indent = static_cast<int>(2 * walker.Path().size());
-    std::printf("%10lld  %*s%s %s\n", static_cast<long long>(value.offset), indent, "", TagName(value.tag).c_str(),
-                BodyText(value).c_str());
+    PrintFormatted("%10lld  %*s%s %s\n", static_cast<long long>(value.offset), indent, "", TagName(value.tag).c_str(),
+                   BodyText(value).c_str());
   }
   return kDone;
 }

@@ -1,12 +1,15 @@
 // q7r export: plays the host for the exporter.
+#include <algorithm>
+#include <cctype>
 #include <cstdio>
 #include <filesystem>
 #include <memory>
 
+#include "exporter/entry/scene_writer.h"
 #include "exporter/host_api/aegp_entry.h"
 #include "host/standalone_host.h"
+#include "output/output_file.h"
 #include "progress_bar.h"
-#include "scene_file.h"
 #include "verbs.h"
 
 namespace q7r
@@ -34,36 +37,28 @@ struct Options
 };
 
 // The exporter forces the suffix of the path that the save dialog gives. Here the path is given beforehand, so it is
-// brought to that form at once: then the question about an existing file is about the file that is written.
+// brought to that form at once: then the question about an existing file is about the file that is written. Bytes, not
+// text: a name on the disk need not be UTF-8.
 std::string WithSuffix(const std::string& path)
 {
-  _torvane_::Filename output = ToFilename(path);
-  if (!output.CheckSuffix(kSuffix))
-    output.SetSuffix(kSuffix);
-  return (std::filesystem::path(path).parent_path() / ToUtf8(output.GetFileString())).string(); // as it was given
+  constexpr std::size_t kLongest = 4; // a dot further from the end belongs to the name
+  const std::size_t dot = path.find_last_of("./");
+  if (!HasFileName(path) || IsDevice(path))
+    return path;
+  if (dot == std::string::npos || path[dot] != '.' || path.size() - dot > kLongest)
+    return path + "." + kSuffix;
+  std::string suffix = path.substr(dot + 1);
+  std::transform(suffix.begin(), suffix.end(), suffix.begin(), [](unsigned char c) { return std::tolower(c); });
+  return suffix == kSuffix ? path : path.substr(0, dot + 1) + kSuffix;
 }
 
-// What must hold before the exporter is asked, since it answers all of it with a number.
-void RequireWritable(const std::string& output)
-{
-  std::filesystem::path folder = std::filesystem::path(output).parent_path();
-  if (!folder.empty() && !std::filesystem::is_directory(folder))
-    throw Failure(output + ": there is no folder " + folder.string());
-  if (std::filesystem::is_directory(output))
-    throw Failure(output + ": is a folder");
-}
-
-// Plays one export. True if the exporter showed no message.
-bool PlayExport(host::StandaloneHost& player, const Options& options, const std::string& output)
+// Plays one export into the file `partial`. True if the exporter showed no message.
+bool PlayExport(host::StandaloneHost& player, const std::string& output, const std::string& partial)
 {
   ProgressBar bar("reading layers");
   bool quiet = true;
-  bool refused = false;
-  player.SetOutputPath(std::filesystem::absolute(output).string());
-  player.OnAskOverwrite([&] {
-    refused = !options.force && !AskReplace(output);
-    return !refused;
-  });
+  player.SetOutputPath(partial);
+  player.OnAskOverwrite([] { return true; }); // the user was asked before
   player.OnReport([&](const std::string& message) {
     quiet = false;
     bar.Clear();
@@ -77,8 +72,9 @@ bool PlayExport(host::StandaloneHost& player, const Options& options, const std:
   if (!command || !player.IsCommandEnabled(command))
     throw Failure(output + ": the exporter offers no export for this composition");
   host::CommandResult result = player.CallCommandHook(command);
-  if (refused)
-    throw Failure(output + ": exists already; --force replaces it");
+  const _torvane_::FileProblem& problem = exporter::GetSceneFileProblem();
+  if (problem.code != _torvane_::FILEERROR_NONE)
+    throw Failure(ProblemText(output, problem));
   if (result.error != 0)
     throw Failure(output + ": can't be written (error " + std::to_string(result.error) + ")");
   return quiet;
@@ -86,17 +82,20 @@ bool PlayExport(host::StandaloneHost& player, const Options& options, const std:
 
 int Export(const Options& options)
 {
+  const std::string output = WithSuffix(options.output);
+  RequireWritable(output, options.force);
   host::Project project = host::LoadComposition(options.composition);
   for (const std::string& warning : project.warnings)
     std::fprintf(stderr, "warning: %s\n", warning.c_str());
   host::StandaloneHost player(std::move(project));
   if (!options.name.empty() && !player.ActivateComposition(options.name))
     throw Failure(options.composition + ": there is no composition \"" + options.name + "\"");
-  std::string output = WithSuffix(options.output);
-  RequireWritable(output);
-  bool quiet = PlayExport(player, options, output);
-  VerifyScene(output);
-  std::printf("%s: %s\n", output.c_str(), SizeText(std::filesystem::file_size(output)).c_str());
+  bool quiet = true;
+  WriteOutput(output, [&](const std::string& partial) {
+    quiet = PlayExport(player, output, partial);
+    RequireReadable(partial, output);
+    return std::string();
+  });
   return quiet ? kDone : kProblems;
 }
 

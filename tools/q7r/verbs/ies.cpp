@@ -3,6 +3,7 @@
 #include <memory>
 
 #include "listing/ies_text.h"
+#include "output/standard_output.h"
 #include "scene_file.h"
 #include "verbs.h"
 
@@ -111,7 +112,7 @@ std::string AnglesText(const GeTempDynArray<Real>& angles)
 void Row(const char* label, const std::string& text)
 {
   if (!text.empty())
-    std::printf("%-20s %s\n", label, text.c_str());
+    PrintFormatted("%-20s %s\n", label, text.c_str());
 }
 
 void PrintIES(const IESLight& light)
@@ -136,7 +137,7 @@ int ShowIES(const Options& options)
 {
   const IESPtr light = LoadIES(options.file);
   if (options.json)
-    std::puts(IESJson(*light).dump(1, ' ', false, Json::error_handler_t::replace).c_str());
+    PrintLine(IESJson(*light).dump(1, ' ', false, Json::error_handler_t::replace));
   else
     PrintIES(*light);
   return kDone;

@@ -6,6 +6,7 @@
 
 #include "listing/json_text.h"
 #include "listing/type_names.h"
+#include "output/standard_output.h"
 #include "scene_file.h"
 #include "torvane/animation/ctrack.h"
 #include "torvane/tags/base_tag.h"
@@ -121,7 +122,7 @@ std::string TypesText(const std::map<Long, long long>& counts)
 void Row(const char* label, const std::string& text)
 {
   if (!text.empty())
-    std::printf("%-16s %s\n", label, text.c_str());
+    PrintFormatted("%-16s %s\n", label, text.c_str());
 }
 
 void PrintInfo(const Json& info, const Counts& counts)
@@ -153,7 +154,7 @@ int Info(const Options& options)
   CountObjects(document->GetFirstObject(), counts);
   Json info = InfoJson(*document, counts, std::filesystem::file_size(options.file));
   if (options.json)
-    std::puts(info.dump(1, ' ', false, Json::error_handler_t::replace).c_str());
+    PrintLine(info.dump(1, ' ', false, Json::error_handler_t::replace));
   else
     PrintInfo(info, counts);
   return kDone;

@@ -1,10 +1,11 @@
 // q7r preview: takes a scene file's picture out, or puts one in.
-#include <cstdio>
+#include <algorithm>
+#include <cctype>
 #include <filesystem>
 #include <fstream>
 #include <memory>
 
-#include "scene_file.h"
+#include "output/output_file.h"
 #include "torvane/pictures/bitmap_filters.h"
 #include "verbs.h"
 
@@ -58,25 +59,33 @@ void RequireGood(const std::string& path, Long result)
 // The format that a picture's name asks for.
 Long FormatOf(const std::string& path)
 {
-  Filename name = ToFilename(path);
-  if (name.CheckSuffix("bmp"))
+  std::string suffix = std::filesystem::path(path).extension().string();
+  std::transform(suffix.begin(), suffix.end(), suffix.begin(), [](unsigned char c) { return std::tolower(c); });
+  if (suffix == ".bmp")
     return kImageFormatBmp;
-  if (name.CheckSuffix("jpg") || name.CheckSuffix("jpeg"))
+  if (suffix == ".jpg" || suffix == ".jpeg")
     return kImageFormatJpeg;
   throw Failure(path + ": the name of a picture ends with .jpg, .jpeg or .bmp");
 }
 
-Long WriteBytes(const std::string& path, const void* data, LLong size)
+// The picture as a file of a format.
+std::string PictureBytes(BaseDocument& document, Long format)
 {
-  std::ofstream file(std::filesystem::path(path), std::ios::binary);
-  file.write(static_cast<const char*>(data), static_cast<std::streamsize>(size));
-  file.close();
-  return file ? IMAGERESULT_OK : IMAGERESULT_FILE;
+  const Bitmap& stored = document.GetStoredPreview();
+  if (format == kImageFormatJpeg)
+    return {static_cast<const char*>(stored.GetEncoded()), static_cast<std::size_t>(stored.GetEncodedSize())};
+  MemoryDescription written;
+  Filename name;
+  name.SetMemoryWrite(&written);
+  if (document.GetPreview().Save(name, format, nullptr, 0) != IMAGERESULT_OK || !written.Join())
+    throw std::bad_alloc();
+  return {static_cast<const char*>(written.data), static_cast<std::size_t>(written.size)};
 }
 
 int TakeOut(const Options& options)
 {
   Long format = FormatOf(options.output);
+  RequireWritable(options.output, options.force);
   FileProblem problem;
   DocumentPtr document(LoadDocument(ToFilename(options.scene), LoadPreviewOnly, &problem));
   if (!document)
@@ -84,15 +93,8 @@ int TakeOut(const Options& options)
   Bitmap& preview = document->GetPreview();
   if (preview.GetBw() < 1)
     throw Failure(options.scene + ": holds no preview picture");
-  RequireReplaceable(options.output, options.force);
-  WriteWhole(options.output, [&](const std::string& partial) {
-    const Bitmap& stored = document->GetStoredPreview();
-    RequireGood(options.output, format == kImageFormatJpeg
-                                    ? WriteBytes(partial, stored.GetEncoded(), stored.GetEncodedSize())
-                                    : preview.Save(ToFilename(partial), format, nullptr, 0));
-  });
-  std::printf("%s: %d x %d pixels, %s\n", options.output.c_str(), preview.GetBw(), preview.GetBh(),
-              SizeText(std::filesystem::file_size(options.output)).c_str());
+  const std::string words = std::to_string(preview.GetBw()) + " x " + std::to_string(preview.GetBh()) + " pixels";
+  WriteOutput(options.output, PictureBytes(*document, format), words);
   return kDone;
 }
 
@@ -117,6 +119,7 @@ void LoadPicture(const std::string& path, Bitmap& bitmap)
 
 int PutIn(const Options& options)
 {
+  RequireWritable(options.output, options.force);
   DocumentPtr document = LoadScene(options.scene);
   Bitmap& preview = document->GetPreview();
   LoadPicture(options.picture, preview);
@@ -124,7 +127,6 @@ int PutIn(const Options& options)
   Long most = JpgSaver().GetMaxResolution();
   if (preview.GetBw() > most || preview.GetBh() > most)
     RequireGood(options.picture, IMAGERESULT_LARGE);
-  RequireReplaceable(options.output, options.force);
   WriteScene(*document, options.output);
   return kDone;
 }

@@ -2,7 +2,7 @@
 #include <memory>
 #include <vector>
 
-#include "scene_file.h"
+#include "output/output_file.h"
 #include "verbs.h"
 
 namespace q7r
@@ -37,21 +37,21 @@ struct Options
 
 int Resave(const Options& options)
 {
+  RequireWritable(options.output, options.force);
   DocumentPtr document = LoadScene(options.input);
-  RequireReplaceable(options.output, options.force);
   WriteScene(*document, options.output);
   return kDone;
 }
 
 int Merge(const Options& options)
 {
+  RequireWritable(options.output, options.force);
   DocumentPtr document = LoadScene(options.input);
   for (const std::string& other : options.others) {
     FileProblem problem;
     if (!MergeDocument(document.get(), ToFilename(other), LoadObjects | LoadMaterials, &problem))
       throw Failure(ProblemText(other, problem));
   }
-  RequireReplaceable(options.output, options.force);
   WriteScene(*document, options.output);
   return kDone;
 }

@@ -5,6 +5,7 @@
 #include "listing/node_details.h"
 #include "listing/scene_json.h"
 #include "listing/type_names.h"
+#include "output/standard_output.h"
 #include "scene_file.h"
 #include "torvane/animation/ctrack.h"
 #include "torvane/materials/base_material.h"
@@ -43,7 +44,10 @@ std::string Numbers(const Vector& v, Real factor = 1.0)
   return buffer;
 }
 
-void PrintLine(int depth, const std::string& text) { std::printf("%*s%s\n", 2 * depth, "", text.c_str()); }
+void PrintIndented(int depth, const std::string& text)
+{
+  PrintLine(std::string(2 * static_cast<std::size_t>(depth), ' ') + text);
+}
 
 // Words with a space in front, or nothing.
 std::string Behind(const std::string& words) { return words.empty() ? words : " " + words; }
@@ -51,8 +55,8 @@ std::string Behind(const std::string& words) { return words.empty() ? words : " 
 void PrintTracks(const BaseList2D& node, int depth)
 {
   for (CTrack* track = node.GetFirstTrack(); track; track = track->GetNext())
-    PrintLine(depth, "track " + Quoted(track->GetName()) + " " + std::to_string(track->GetCurve(1, 0)->GetKeyCount()) +
-                         " keys");
+    PrintIndented(depth, "track " + Quoted(track->GetName()) + " " +
+                             std::to_string(track->GetCurve(1, 0)->GetKeyCount()) + " keys");
 }
 
 std::string ObjectLine(BaseObject& object)
@@ -72,11 +76,11 @@ std::string ObjectLine(BaseObject& object)
 
 void PrintObject(BaseObject& object, int depth)
 {
-  PrintLine(depth, ObjectLine(object));
+  PrintIndented(depth, ObjectLine(object));
   for (BaseTag* tag = object.GetFirstTag(); tag; tag = tag->GetNext())
-    PrintLine(depth + 1, "tag " + TypeName(tag->GetType()) +
-                             (tag->GetName().Content() ? " " + Quoted(tag->GetName()) : std::string()) +
-                             Behind(TagWords(*tag)));
+    PrintIndented(depth + 1, "tag " + TypeName(tag->GetType()) +
+                                 (tag->GetName().Content() ? " " + Quoted(tag->GetName()) : std::string()) +
+                                 Behind(TagWords(*tag)));
   PrintTracks(object, depth + 1);
   for (BaseObject* child = object.GetDown(); child; child = child->GetNext())
     PrintObject(*child, depth + 1);
@@ -87,7 +91,7 @@ void PrintLayer(LayerObject& layer, int depth)
   std::string flags;
   for (Long i = 0; i < kLayerFlagCount; ++i)
     flags += layer.GetFlag(i) ? '1' : '0';
-  PrintLine(depth, Quoted(layer.GetName()) + "  flags " + flags + "  color " + Numbers(layer.GetColor()));
+  PrintIndented(depth, Quoted(layer.GetName()) + "  flags " + flags + "  color " + Numbers(layer.GetColor()));
   for (LayerObject* child = layer.GetDown(); child; child = child->GetNext())
     PrintLayer(*child, depth + 1);
 }
@@ -99,7 +103,7 @@ void PrintRenderData(RenderData& data, int depth)
   std::snprintf(size, sizeof size, "%g x %g, %g fps, %g to %g s", settings.GetReal(kRenderWidth),
                 settings.GetReal(kRenderHeight), settings.GetReal(kRenderFrameRate),
                 settings.GetTime(kRenderFrameFrom).Get(), settings.GetTime(kRenderFrameTo).Get());
-  PrintLine(depth, Quoted(data.GetName()) + "  " + size);
+  PrintIndented(depth, Quoted(data.GetName()) + "  " + size);
   for (RenderData* child = data.GetDown(); child; child = child->GetNext())
     PrintRenderData(*child, depth + 1);
 }
@@ -107,30 +111,30 @@ void PrintRenderData(RenderData& data, int depth)
 void PrintScene(BaseDocument& document)
 {
   const DocumentPref& pref = document.GetPref();
-  std::printf("document %s  %d fps, %g to %g s\n", Quoted(document.GetName()).c_str(), pref.GetFps(),
-              pref.GetMinTime().Get(), pref.GetMaxTime().Get());
-  std::puts("objects");
+  PrintFormatted("document %s  %d fps, %g to %g s\n", Quoted(document.GetName()).c_str(), pref.GetFps(),
+                 pref.GetMinTime().Get(), pref.GetMaxTime().Get());
+  PrintLine("objects");
   for (BaseObject* object = document.GetFirstObject(); object; object = object->GetNext())
     PrintObject(*object, 1);
-  std::puts("materials");
+  PrintLine("materials");
   for (const std::string& line : MaterialLines(document))
-    PrintLine(1, line);
-  std::puts("layers");
+    PrintIndented(1, line);
+  PrintLine("layers");
   for (LayerObject* layer = document.GetFirstLayer(); layer; layer = layer->GetNext())
     PrintLayer(*layer, 1);
-  std::puts("render settings");
+  PrintLine("render settings");
   for (RenderData* data = document.GetFirstRenderData(); data; data = data->GetNext())
     PrintRenderData(*data, 1);
-  std::puts("views");
+  PrintLine("views");
   for (const std::string& line : ViewLines(document))
-    PrintLine(1, line);
+    PrintIndented(1, line);
 }
 
 int Tree(const Options& options)
 {
   DocumentPtr document = LoadScene(options.file);
   if (options.json)
-    std::puts(SceneJson(*document).dump(1, ' ', false, Json::error_handler_t::replace).c_str());
+    PrintLine(SceneJson(*document).dump(1, ' ', false, Json::error_handler_t::replace));
   else
     PrintScene(*document);
   return kDone;

@@ -1,0 +1,255 @@
+#include "output_file.h"
+
+#include <algorithm>
+#include <cerrno>
+#include <cstdio>
+#include <iostream>
+#include <memory>
+#include <system_error>
+
+#ifdef _WIN32
+#include <io.h>
+#else
+#include <unistd.h>
+#endif
+
+#include "standard_output.h"
+#include "temporary_file.h"
+#include "verbs/verbs.h"
+
+namespace q7r
+{
+
+using namespace _torvane_;
+
+namespace
+{
+
+namespace fs = std::filesystem;
+
+constexpr int kMaxLinks = 40; // as the system follows
+
+bool IsTerminal()
+{
+#ifdef _WIN32
+  return _isatty(0) != 0;
+#else
+  return isatty(0) != 0 && isatty(2) != 0;
+#endif
+}
+
+[[noreturn]] void Fail(const std::string& path, const std::error_code& error)
+{
+  throw Failure(path + ": " + error.message());
+}
+
+// Where an output belongs.
+struct Place
+{
+  fs::path file; // no link, unless it is a device
+  fs::file_status status;
+  int descriptor = -1; // of an output that is open already
+
+  bool Exists() const { return fs::exists(status); }
+  // Something that is written to, and not replaced.
+  bool IsDevice() const { return descriptor >= 0 || (Exists() && !fs::is_regular_file(status)); }
+  fs::path Folder() const { return file.has_parent_path() ? file.parent_path() : fs::path("."); }
+};
+
+// The status of what a path leads to; throws unless it is there or certainly isn't.
+fs::file_status StatusOf(const std::string& path, const fs::path& file, bool followLinks)
+{
+  std::error_code error;
+  const fs::file_status status = followLinks ? fs::status(file, error) : fs::symlink_status(file, error);
+  if (status.type() == fs::file_type::none)
+    Fail(path, error);
+  return status;
+}
+
+// Follows the links by hand: the last one may lead to a file that doesn't exist yet.
+fs::path FollowLinks(const std::string& path)
+{
+  fs::path file(path);
+  for (int links = 0; fs::is_symlink(StatusOf(path, file, false)); ++links) {
+    std::error_code error;
+    const fs::path target = fs::read_symlink(file, error);
+    if (error || links == kMaxLinks)
+      Fail(path, error ? error : std::make_error_code(std::errc::too_many_symbolic_link_levels));
+    file = file.parent_path() / target;
+  }
+  return file;
+}
+
+Place FindPlace(const std::string& path)
+{
+  Place place;
+  place.descriptor = DescriptorOf(path);
+  if (place.descriptor >= 0)
+    return place;
+  place.file = path;
+  place.status = StatusOf(path, path, true);
+  if (place.IsDevice())
+    return place;
+  place.file = FollowLinks(path);
+  return place;
+}
+
+// A path that the library's every way of reading a path takes as it stands.
+bool IsPlain(const fs::path& path)
+{
+  const auto& text = path.native();
+  return std::all_of(text.begin(), text.end(), [](auto c) { return c >= 0x20 && c < 0x7F; });
+}
+
+// A temporary file whose path is plain, where there is room for one.
+std::unique_ptr<TemporaryFile> MakePlainFile()
+{
+  std::error_code problem = std::make_error_code(std::errc::no_such_file_or_directory);
+  for (const fs::path& folder : TemporaryFolders()) {
+    if (folder.empty() || !IsPlain(folder))
+      continue;
+    try {
+      return std::make_unique<TemporaryFile>(folder, true);
+    } catch (const std::system_error& error) {
+      problem = error.code();
+    }
+  }
+  throw std::system_error(problem);
+}
+
+void Copy(const fs::path& source, RawOutput& output)
+{
+  const std::unique_ptr<std::FILE, int (*)(std::FILE*)> file(std::fopen(source.string().c_str(), "rb"), std::fclose);
+  std::string block(1 << 16, '\0');
+  for (bool more = file != nullptr; more;) {
+    const std::size_t count = std::fread(block.data(), 1, block.size(), file.get());
+    more = count == block.size();
+    output.Write(block.data(), count);
+  }
+  if (!file || std::ferror(file.get()))
+    throw std::system_error(errno, std::generic_category());
+  output.Close();
+}
+
+// "shot.q7r: 640 x 480 pixels, 12.3 KB".
+void TellWritten(const std::string& path, const fs::path& partial, const std::string& words)
+{
+  PrintLine(path + ": " + (words.empty() ? "" : words + ", ") + SizeText(fs::file_size(partial)));
+  FlushStandardOutput();
+}
+
+void WriteDevice(const Place& place, const std::string& path, const FileWriter& write)
+{
+  const std::unique_ptr<TemporaryFile> partial = MakePlainFile();
+  const std::string words = write(partial->Path().string());
+  const bool isTaken = place.descriptor >= 0 || IsStandardOutput(place.file);
+  const auto output =
+      place.descriptor >= 0 ? std::make_unique<RawOutput>(place.descriptor) : std::make_unique<RawOutput>(place.file);
+  Copy(partial->Path(), *output);
+  if (!isTaken)
+    TellWritten(path, partial->Path(), words);
+}
+
+void ReplaceFile(const Place& place, const std::string& path, const FileWriter& write)
+{
+  std::optional<unsigned> mode;
+  if (place.Exists())
+    mode = static_cast<unsigned>(place.status.permissions()) & 0777U;
+  TemporaryFile file(fs::absolute(place.Folder()), place.Exists());
+  std::string words;
+  if (IsPlain(file.Path())) {
+    words = write(file.Path().string());
+  } else {
+    const std::unique_ptr<TemporaryFile> partial = MakePlainFile();
+    words = write(partial->Path().string());
+    RawOutput output(file.Path());
+    Copy(partial->Path(), output);
+  }
+  file.Finish(mode);
+  // Said before, so that a full standard output is found while the old file is still there.
+  TellWritten(path, file.Path(), words);
+  file.MoveTo(place.file);
+}
+
+bool AskReplace(const std::string& path)
+{
+  if (!IsTerminal())
+    return false;
+  std::cerr << path << " exists already. Replace it? [y/N] " << std::flush;
+  std::string answer;
+  return std::getline(std::cin, answer) && (answer == "y" || answer == "Y" || answer == "yes");
+}
+
+} // namespace
+
+bool HasFileName(const std::string& path)
+{
+  const fs::path name = fs::path(path).filename();
+  return !name.empty() && name != "." && name != "..";
+}
+
+bool IsDevice(const std::string& path)
+{
+  std::error_code error;
+  const fs::file_status status = fs::status(path, error);
+  return DescriptorOf(path) >= 0 || (fs::exists(status) && !fs::is_regular_file(status) && !fs::is_directory(status));
+}
+
+void RequireWritable(const std::string& path, bool force)
+{
+  if (!HasFileName(path))
+    throw Failure(path + ": is no file name");
+  const Place place = FindPlace(path);
+  if (fs::is_directory(place.status))
+    throw Failure(path + ": is a folder");
+  if (place.IsDevice())
+    return;
+  if (!place.Exists() && !fs::is_directory(StatusOf(path, place.Folder(), true)))
+    throw Failure(path + ": there is no folder " + place.Folder().string());
+  if (place.Exists() && !force && !AskReplace(path))
+    throw Failure(path + ": exists already; --force replaces it");
+}
+
+void WriteOutput(const std::string& path, const FileWriter& write)
+{
+  try {
+    const Place place = FindPlace(path);
+    if (place.IsDevice())
+      WriteDevice(place, path, write);
+    else
+      ReplaceFile(place, path, write);
+  } catch (const std::system_error& error) {
+    Fail(path, error.code());
+  }
+}
+
+void WriteOutput(const std::string& path, std::string_view bytes, const std::string& words)
+{
+  WriteOutput(path, [&](const std::string& partial) {
+    RawOutput output{fs::path(partial)};
+    output.Write(bytes.data(), bytes.size());
+    output.Close();
+    return words;
+  });
+}
+
+void RequireReadable(const std::string& partial, const std::string& path)
+{
+  FileProblem problem;
+  const DocumentPtr document(LoadDocument(ToFilename(partial), LoadObjects | LoadMaterials, &problem));
+  if (!document)
+    throw Failure(ProblemText(path, problem) + " (what was written can't be read back)");
+}
+
+void WriteScene(BaseDocument& document, const std::string& path)
+{
+  WriteOutput(path, [&](const std::string& partial) {
+    FileProblem problem;
+    if (!SaveDocument(&document, ToFilename(partial), 0, &problem) || problem.code != FILEERROR_NONE)
+      throw Failure(ProblemText(path, problem));
+    RequireReadable(partial, path);
+    return std::string();
+  });
+}
+
+} // namespace q7r

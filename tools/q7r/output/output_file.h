@@ -1,0 +1,42 @@
+// How every verb writes a file: beside its place under a name of its own, checked, and then moved there, so that a
+// failure of any kind leaves what was there before. Everything here throws Failure, with the system's own words for
+// the cause.
+#pragma once
+
+#include <functional>
+#include <string>
+#include <string_view>
+
+#include "scene_file.h"
+
+namespace q7r
+{
+
+// False for "", ".", ".." and what ends with a separator.
+bool HasFileName(const std::string& path);
+
+// Something that exists and is written to, never replaced: a device, a pipe, standard output.
+bool IsDevice(const std::string& path);
+
+// Refuses a path that no file can be written to: a folder, one without a file name or in a folder that isn't there,
+// and an existing file unless `force` is set; on a terminal the user is asked. To be called before the work begins.
+void RequireWritable(const std::string& path, bool force);
+
+// Fills the file `partial`, whose path is plain ASCII, checks what it wrote, and gives words about it for the user, or
+// none. Throws Failure.
+using FileWriter = std::function<std::string(const std::string& partial)>;
+
+// Lets `write` make the file and puts it in its place. A link stays a link, and a file that is replaced hands on its
+// rights. A device or pipe is written to. What was written is told in one line: "shot.q7r: 640 x 480 pixels, 12.3 KB".
+void WriteOutput(const std::string& path, const FileWriter& write);
+
+// The same for bytes that are in memory.
+void WriteOutput(const std::string& path, std::string_view bytes, const std::string& words = {});
+
+// Reads a written scene back; `path` is the name that the user knows it by.
+void RequireReadable(const std::string& partial, const std::string& path);
+
+// Saves a document so.
+void WriteScene(_torvane_::BaseDocument& document, const std::string& path);
+
+} // namespace q7r
