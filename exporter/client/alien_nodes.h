@@ -75,6 +75,7 @@ class AlienPrimitiveObjectData : public _torvane_::NodeData
 {
  public:
   explicit AlienPrimitiveObjectData(Long type) : type_(type) {}
+  const _torvane_::NodeKind& GetOwnerKind() const override { return BaseObject::kNodeKind; }
   Long GetPrimitiveType() const { return type_; }
   Bool Execute() override { return true; }
 

@@ -30,11 +30,11 @@ BaseObject* AlienRootObject::AllocMember(Long type)
 
 Bool AlienPolygonObjectData::Execute()
 {
-  if (!GetNode() || !GetNode()->IsInstanceOf(kObjectPolygon))
+  const auto* object = NodeCast<BaseObject>(GetNode());
+  if (!object)
     return false;
-  const auto& object = static_cast<const BaseObject&>(*GetNode());
-  const PointTag* points = GetPointTag(object);
-  const PolygonTag* polygons = GetPolygonTag(object);
+  const PointTag* points = GetPointTag(*object);
+  const PolygonTag* polygons = GetPolygonTag(*object);
   const Bool noPoints = !points || points->GetCount() == 0;
   const Bool noPolygons = !polygons || polygons->GetCount() == 0;
   return noPolygons || !noPoints;

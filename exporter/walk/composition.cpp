@@ -248,7 +248,7 @@ bool LinkLayerObject(ExportContext& context, BaseObject* parentObject, LayerObje
   if (!object)
     return host.Good();
   BaseTag* targetTag = object->GetTag(kTagTarget);
-  auto* target = targetTag ? static_cast<BaseObject*>(targetTag->GetDataInstance().GetLink(kTargetLink)) : nullptr;
+  auto* target = targetTag ? NodeCast<BaseObject>(targetTag->GetDataInstance().GetLink(kTargetLink)) : nullptr;
   for (BaseObject* node : {target, object}) {
     if (node && sceneLayer)
       node->SetLayer(sceneLayer);

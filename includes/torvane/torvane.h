@@ -27,6 +27,7 @@
 #include "torvane/memory/spin_lock.h"
 #include "torvane/nodes/base_list.h"
 #include "torvane/nodes/kept_chunks.h"
+#include "torvane/nodes/node_kind.h"
 #include "torvane/nodes/private_chunk.h"
 #include "torvane/nodes/root_list.h"
 #include "torvane/objects/base_object.h"

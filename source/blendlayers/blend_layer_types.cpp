@@ -28,9 +28,7 @@ BlendFields BlendShader::Fields() { return {{mode_, 2000}, {opacity_, 2001, 0, 0
 
 BaseShader* BlendShader::GetShader() const
 {
-  GeListNode* target = link_.GetLink();
-  // A link of a file may name a thing that is no named node.
-  return target && target->GoalIsWrittenElsewhere() ? static_cast<BaseList2D*>(target)->AsShader() : nullptr;
+  return NodeCast<BaseShader>(link_.GetLink()); // a file may link anything
 }
 
 void BlendShader::GetLayerName(String& name)

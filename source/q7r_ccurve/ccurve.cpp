@@ -42,10 +42,12 @@ Bool CCurve::ReadChunk(HyperFile& file, Long id, Long level)
 
 Bool CCurve::CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation)
 {
-  auto& target = static_cast<CCurve&>(destination);
-  target.keys_.Reset();
-  return BaseList2D::CopyTo(destination, flags, translation) && keyRoot_.CopyTo(target.keyRoot_, flags, translation) &&
-         target.RebuildIndex();
+  auto* target = NodeCast<CCurve>(&destination);
+  if (!target)
+    return false;
+  target->keys_.Reset();
+  return BaseList2D::CopyTo(destination, flags, translation) && keyRoot_.CopyTo(target->keyRoot_, flags, translation) &&
+         target->RebuildIndex();
 }
 
 GeListNode* CCurve::MakeClone(ULong flags, TransArray* translation)
@@ -57,7 +59,7 @@ GeListNode* CCurve::MakeClone(ULong flags, TransArray* translation)
 Bool CCurve::RebuildIndex()
 {
   keys_.Reset();
-  for (auto* key = static_cast<CKey*>(keyRoot_.GetFirst()); key; key = key->GetNext()) {
+  for (auto* key = NodeCast<CKey>(keyRoot_.GetFirst()); key; key = key->GetNext()) {
     if (IsKeyTime(key->GetTime()) && !keys_.Append(key))
       return false;
   }

@@ -2,7 +2,6 @@
 
 #include "k2v_file/stream/chunk_visitor.h"
 #include "q7r_file/nodes/node_tools.h"
-#include "q7r_file/types/member_makers.h"
 #include "torvane/animation/animation_ids.h"
 
 namespace _torvane_
@@ -69,15 +68,17 @@ Bool CKey::ReadChunk(HyperFile& file, Long id, Long level)
 
 Bool CKey::CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation)
 {
-  auto& target = static_cast<CKey&>(destination);
-  target.time_ = time_;
-  target.value_ = value_;
-  target.leftValue_ = leftValue_;
-  target.rightValue_ = rightValue_;
-  target.leftTime_ = leftTime_;
-  target.rightTime_ = rightTime_;
-  target.interpolation_ = interpolation_;
-  return target.keyData_.CopyFrom(keyData_, flags, translation) && BaseList2D::CopyTo(destination, flags, translation);
+  auto* target = NodeCast<CKey>(&destination);
+  if (!target)
+    return false;
+  target->time_ = time_;
+  target->value_ = value_;
+  target->leftValue_ = leftValue_;
+  target->rightValue_ = rightValue_;
+  target->leftTime_ = leftTime_;
+  target->rightTime_ = rightTime_;
+  target->interpolation_ = interpolation_;
+  return target->keyData_.CopyFrom(keyData_, flags, translation) && BaseList2D::CopyTo(destination, flags, translation);
 }
 
 GeListNode* CKey::MakeClone(ULong flags, TransArray* translation)
@@ -196,7 +197,5 @@ Bool CKey::IsEqual(const CKey& other) const
          rightValue_ == other.rightValue_ && leftTime_ == other.leftTime_ && rightTime_ == other.rightTime_ &&
          interpolation_ == other.interpolation_ && keyData_.IsEqual(other.keyData_);
 }
-
-BaseList2D* MakeEmptyKey() { return NewObj<CKey>(); }
 
 } // namespace _torvane_

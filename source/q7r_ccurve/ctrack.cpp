@@ -2,7 +2,6 @@
 
 #include "k2v_file/stream/chunk_visitor.h"
 #include "q7r_file/nodes/node_tools.h"
-#include "q7r_file/types/member_makers.h"
 #include "torvane/animation/animation_ids.h"
 
 namespace _torvane_
@@ -209,26 +208,28 @@ Bool CTrack::ReadChunk(HyperFile& file, Long id, Long level)
 
 Bool CTrack::CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation)
 {
-  auto& target = static_cast<CTrack&>(destination);
+  auto* target = NodeCast<CTrack>(&destination);
+  if (!target)
+    return false;
   if (!BaseList2D::CopyTo(destination, flags, translation) ||
-      !curve_.CopyWithTranslation(target.curve_, flags, translation))
+      !curve_.CopyWithTranslation(target->curve_, flags, translation))
     return false;
   for (Long slot = 0; slot < kExtraCurves; ++slot) {
-    DeleteObj(target.extraCurves_[slot]);
+    DeleteObj(target->extraCurves_[slot]);
     if (!extraCurves_[slot])
       continue;
-    target.extraCurves_[slot] = static_cast<CCurve*>(extraCurves_[slot]->MakeClone(flags, translation));
-    if (!target.extraCurves_[slot])
+    target->extraCurves_[slot] = NodeCast<CCurve>(extraCurves_[slot]->MakeClone(flags, translation));
+    if (!target->extraCurves_[slot])
       return false;
   }
-  trackLink_.CopyLinkTo(&target.trackLink_, translation);
-  target.path_ = path_;
-  target.before_ = before_;
-  target.after_ = after_;
-  target.id_ = id_;
+  trackLink_.CopyLinkTo(&target->trackLink_, translation);
+  target->path_ = path_;
+  target->before_ = before_;
+  target->after_ = after_;
+  target->id_ = id_;
   for (Long i = 0; i < kExtraNumbers; ++i)
-    target.extra_[i] = extra_[i];
-  target.kind_ = kind_;
+    target->extra_[i] = extra_[i];
+  target->kind_ = kind_;
   return true;
 }
 
@@ -282,7 +283,5 @@ Bool CTrack::SetParameter(const ParameterPath& path, const GeData& value)
     return BaseList2D::SetParameter(path, value);
   }
 }
-
-BaseList2D* MakeEmptyTrack() { return NewObj<CTrack>(); }
 
 } // namespace _torvane_

@@ -24,7 +24,7 @@ Material* MaterialOf(const BaseObject& object)
 {
   BaseTag* tag = object.GetTag(5616);
   BaseList2D* node = tag ? tag->GetDataInstance().GetLink(1010) : nullptr;
-  return node ? static_cast<BaseMaterial*>(node)->AsMaterial() : nullptr;
+  return NodeCast<Material>(node);
 }
 
 TEST(Planes, HaveTheSizeOfTheirSourceAndNullsNone)

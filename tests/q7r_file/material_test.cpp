@@ -382,7 +382,7 @@ TEST(Material, IsMadeAndClonedByItsType)
     for (BaseMaterial* each : {material, clone}) {
       EXPECT_EQ(each->GetType(), seen);
       EXPECT_EQ(each->GetDiskType(), disk);
-      EXPECT_EQ(each->AsMaterial() != nullptr, type == 5703);
+      EXPECT_EQ(NodeCast<Material>(each) != nullptr, type == 5703);
       EXPECT_TRUE(each->Execute());
     }
     DeleteObj(material);
@@ -423,7 +423,7 @@ TEST(Material, SurvivesTheLackOfMemoryAtEveryStep)
   for (LLong step = 0; !done && step < 2000; ++step) {
     counting_memory::FailAfter(step);
     BaseMaterial* material = MakeMaterial(kMaterialStandard);
-    Material* standard = material ? material->AsMaterial() : nullptr;
+    Material* standard = NodeCast<Material>(material);
     BaseShader* bitmap = standard ? standard->BindChannelBitmap(8000, Filename("a.png")) : nullptr;
     BaseShader* other = standard ? standard->BindChannelShader(8001, kUnknownType) : nullptr;
     GeListNode* clone = other && bitmap ? material->MakeClone(0, nullptr) : nullptr;

@@ -23,6 +23,9 @@ struct KeyTangents
 class CCurve : public BaseList2D
 {
  public:
+  static constexpr NodeKindOf<CCurve> kNodeKind{"curve", &BaseList2D::kNodeKind};
+  const NodeKind& GetNodeKind() const override { return kNodeKind; }
+
   CCurve() = default;
   ~CCurve() override = default;
 

@@ -33,6 +33,9 @@ inline constexpr ULong kKeyMaskZero = 0x20000;      // the tangents are zero
 class CKey : public BaseList2D
 {
  public:
+  static constexpr NodeKindOf<CKey> kNodeKind{"key", &BaseList2D::kNodeKind};
+  const NodeKind& GetNodeKind() const override { return kNodeKind; }
+
   CKey();
 
   Bool ReadChunk(HyperFile& file, Long id, Long level) override;
@@ -43,7 +46,7 @@ class CKey : public BaseList2D
   GeListNode* MakeClone(ULong flags, TransArray* translation) override;
   Bool ChangeNBit(Long bit, Long mode) override;
 
-  CKey* GetNext() const { return static_cast<CKey*>(BaseList2D::GetNext()); }
+  CKey* GetNext() const { return NodeCast<CKey>(BaseList2D::GetNext()); }
 
   const BaseTime& GetTime() const { return time_; }
   // Only for a key that is in no curve: a curve is sorted by the times of its keys.

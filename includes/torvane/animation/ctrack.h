@@ -24,6 +24,9 @@ inline constexpr Long kCurveLast = 10;
 class CTrack : public BaseList2D
 {
  public:
+  static constexpr NodeKindOf<CTrack> kNodeKind{"track", &BaseList2D::kNodeKind};
+  const NodeKind& GetNodeKind() const override { return kNodeKind; }
+
   CTrack();
   ~CTrack() override;
 
@@ -38,7 +41,7 @@ class CTrack : public BaseList2D
   Bool SetParameter(const ParameterPath& path, const GeData& value) override;
   GeListNode* MakeClone(ULong flags, TransArray* translation) override;
 
-  CTrack* GetNext() const { return static_cast<CTrack*>(BaseList2D::GetNext()); }
+  CTrack* GetNext() const { return NodeCast<CTrack>(BaseList2D::GetNext()); }
 
   // The curve of a number from 2 to 10; any other number gives the main curve. With `create` a missing one is made.
   CCurve* GetCurve(Long number, Long create);

@@ -59,6 +59,9 @@ class ViewPanel;
 class DocumentPref : public GeListNode
 {
  public:
+  static constexpr NodeKindOf<DocumentPref> kNodeKind{"document preferences", &GeListNode::kNodeKind};
+  const NodeKind& GetNodeKind() const override { return kNodeKind; }
+
   DocumentPref();
 
   Long GetDiskType() const override { return kChunkDocumentPref; }
@@ -106,6 +109,9 @@ class DocumentPref : public GeListNode
 class BaseDocument : public BaseList2D
 {
  public:
+  static constexpr NodeKindOf<BaseDocument> kNodeKind{"document", &BaseList2D::kNodeKind};
+  const NodeKind& GetNodeKind() const override { return kNodeKind; }
+
   // With its root lists, one set of render settings and every default. The roots come from the client's hooks; see
   // IsComplete.
   BaseDocument();

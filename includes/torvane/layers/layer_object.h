@@ -14,6 +14,9 @@ inline constexpr Long kLayerColor = 1009;
 class LayerObject : public BaseList4D
 {
  public:
+  static constexpr NodeKindOf<LayerObject> kNodeKind{"layer", &BaseList4D::kNodeKind};
+  const NodeKind& GetNodeKind() const override { return kNodeKind; }
+
   // Makes its (empty) child list through the client's hook.
   LayerObject();
 
@@ -27,8 +30,8 @@ class LayerObject : public BaseList4D
   // A hook for clients.
   virtual Bool Execute() { return false; }
 
-  LayerObject* GetDown() const { return static_cast<LayerObject*>(BaseList4D::GetDown()); }
-  LayerObject* GetNext() const { return static_cast<LayerObject*>(BaseList4D::GetNext()); }
+  LayerObject* GetDown() const { return NodeCast<LayerObject>(BaseList4D::GetDown()); }
+  LayerObject* GetNext() const { return NodeCast<LayerObject>(BaseList4D::GetNext()); }
 
   Bool GetFlag(Long index) const { return flags_[index]; } // 0 to 8
   void SetFlag(Long index, Bool value) { flags_[index] = value; }

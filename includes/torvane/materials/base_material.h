@@ -14,6 +14,9 @@ class Material;
 class BaseMaterial : public BaseList2D
 {
  public:
+  static constexpr NodeKindOf<BaseMaterial> kNodeKind{"material", &BaseList2D::kNodeKind};
+  const NodeKind& GetNodeKind() const override { return kNodeKind; }
+
   // The node type `type` is kMaterialStandard or kMaterialPlugin; `pluginType` is the real type behind the latter.
   explicit BaseMaterial(Long type, Long pluginType = -1);
 
@@ -30,10 +33,8 @@ class BaseMaterial : public BaseList2D
   // A hook for clients.
   virtual Bool Execute() { return true; }
 
-  // This material if it has the standard channels, else null.
-  virtual Material* AsMaterial() { return nullptr; }
-  BaseMaterial* GetNext() const { return static_cast<BaseMaterial*>(BaseList2D::GetNext()); }
-  BaseMaterial* GetPrev() const { return static_cast<BaseMaterial*>(BaseList2D::GetPrev()); }
+  BaseMaterial* GetNext() const { return NodeCast<BaseMaterial>(BaseList2D::GetNext()); }
+  BaseMaterial* GetPrev() const { return NodeCast<BaseMaterial>(BaseList2D::GetPrev()); }
 
   // The picture that is written with the material; empty on a new one.
   Bitmap& GetPreview() { return preview_; }

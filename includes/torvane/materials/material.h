@@ -41,6 +41,9 @@ class BaseChannel : public PrivateChunk
 class Material : public BaseMaterial
 {
  public:
+  static constexpr NodeKindOf<Material> kNodeKind{"standard material", &BaseMaterial::kNodeKind};
+  const NodeKind& GetNodeKind() const override { return kNodeKind; }
+
   // With every default; the channels 0 and 8 are on.
   Material();
 
@@ -49,7 +52,6 @@ class Material : public BaseMaterial
   void WriteChunks(HyperFile& file) override;
   // Channel objects are not copied.
   Bool CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation) override;
-  Material* AsMaterial() override { return this; }
 
   // The switch of a channel; 0 for a number that no channel has.
   Long ChannelIsOn(Long channel) const;

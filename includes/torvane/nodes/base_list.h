@@ -46,6 +46,9 @@ class UniqueIDArray : public GeTempDynSortSearchArray<UniqueIDEntry, Long, GeMem
 class BaseList2D : public GeListNode
 {
  public:
+  static constexpr NodeKindOf<BaseList2D> kNodeKind{"node", &GeListNode::kNodeKind};
+  const NodeKind& GetNodeKind() const override { return kNodeKind; }
+
   explicit BaseList2D(Long type = 0);
   ~BaseList2D() override;
 
@@ -63,10 +66,8 @@ class BaseList2D : public GeListNode
   Bool GetParameter(const ParameterPath& path, GeData& value) override;
   Bool SetParameter(const ParameterPath& path, const GeData& value) override;
   Bool GoalIsWrittenElsewhere() const override { return true; }
+  // Outside of a list the node and all that it owns have no document, and the node no list head.
   void RemoveFromList() override;
-
-  // This node if it is a shader, else null: what a link names may be a node of any class.
-  virtual BaseShader* AsShader() { return nullptr; }
 
   const String& GetName() const { return name_; }
   void SetName(const String& name) { name_ = name; }
@@ -83,8 +84,8 @@ class BaseList2D : public GeListNode
   virtual void SetDocument(BaseDocument* document);
   RootList2D* GetListHead() const { return listHead_; }
   void SetListHead(RootList2D* head) { listHead_ = head; }
-  BaseList2D* GetNext() const { return static_cast<BaseList2D*>(PrivateChunk::GetNext()); }
-  BaseList2D* GetPrev() const { return static_cast<BaseList2D*>(PrivateChunk::GetPrev()); }
+  BaseList2D* GetNext() const { return NodeCast<BaseList2D>(PrivateChunk::GetNext()); }
+  BaseList2D* GetPrev() const { return NodeCast<BaseList2D>(PrivateChunk::GetPrev()); }
 
   // Info bits: a mask of one or more bits.
   void SetBit(ULong mask) { info_ |= mask; }
@@ -169,17 +170,19 @@ inline constexpr Long kDynamicParameters = 700; // first level of a dynamic para
 class BaseList4D : public BaseList2D
 {
  public:
+  static constexpr NodeKindOf<BaseList4D> kNodeKind{"node with children", &BaseList2D::kNodeKind};
+  const NodeKind& GetNodeKind() const override { return kNodeKind; }
+
   explicit BaseList4D(Long type = 0) : BaseList2D(type) {}
   ~BaseList4D() override;
 
-  void RemoveFromList() override; // also clears the document and the list head
   void SetDocument(BaseDocument* document) override;
 
   BaseList4D* GetUp() const;
   BaseList4D* GetDown() const;
   BaseList4D* GetDownLast() const;
-  BaseList4D* GetNext() const { return static_cast<BaseList4D*>(BaseList2D::GetNext()); }
-  BaseList4D* GetPrev() const { return static_cast<BaseList4D*>(BaseList2D::GetPrev()); }
+  BaseList4D* GetNext() const { return NodeCast<BaseList4D>(BaseList2D::GetNext()); }
+  BaseList4D* GetPrev() const { return NodeCast<BaseList4D>(BaseList2D::GetPrev()); }
 
   // Put this node beside `reference`, into its list; nothing happens if it is null or in no list. The node must be in
   // no list.

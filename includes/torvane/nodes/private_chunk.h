@@ -5,6 +5,7 @@
 #include "torvane/links/alias.h"
 #include "torvane/memory/memory.h"
 #include "torvane/memory/private_ge_mtools.h"
+#include "torvane/nodes/node_kind.h"
 #include "torvane/types.h"
 #include "torvane/values/parameter_path.h"
 
@@ -19,6 +20,9 @@ class TransArray;
 class PrivateChunk : public GeTempPublicNode2D<PrivateChunk>
 {
  public:
+  static constexpr NodeKindOf<PrivateChunk> kNodeKind{"chunk", nullptr};
+  virtual const NodeKind& GetNodeKind() const { return kNodeKind; }
+
   PrivateChunk() = default;
   ~PrivateChunk() override = default;
   PrivateChunk(const PrivateChunk&) = delete;
@@ -68,6 +72,9 @@ class PrivateChunk : public GeTempPublicNode2D<PrivateChunk>
 class GeListNode : public PrivateChunk
 {
  public:
+  static constexpr NodeKindOf<GeListNode> kNodeKind{"list node", &PrivateChunk::kNodeKind};
+  const NodeKind& GetNodeKind() const override { return kNodeKind; }
+
   GeListNode() : goal_(this) {}
   ~GeListNode() override = default;
 
@@ -105,7 +112,13 @@ class GeListNode : public PrivateChunk
 class NodeData : public PrivateChunk
 {
  public:
-  // Called after creation, with the node set; false makes the creation fail.
+  static constexpr NodeKindOf<NodeData> kNodeKind{"node data", &PrivateChunk::kNodeKind};
+  const NodeKind& GetNodeKind() const override { return kNodeKind; }
+
+  // The class of the nodes that these data are for; any node by default. The library gives data to no other node: what
+  // a file says of a node's type is no promise of its class. Data that look into their node say so here.
+  virtual const NodeKind& GetOwnerKind() const;
+  // Called once after creation, with the node set; false makes the creation fail.
   virtual Bool Init() { return true; }
   // Reads the body of the node data chunk, and other chunks of a polygon object. False: not read; the caller skips.
   virtual Bool ReadData(HyperFile& file, Long id, Long level);

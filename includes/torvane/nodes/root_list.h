@@ -15,6 +15,9 @@ class BaseTag;
 class RootList2D : public PrivateChunk
 {
  public:
+  static constexpr NodeKindOf<RootList2D> kNodeKind{"root list", &PrivateChunk::kNodeKind};
+  const NodeKind& GetNodeKind() const override { return kNodeKind; }
+
   RootList2D() = default;
   ~RootList2D() override;
 
@@ -27,7 +30,10 @@ class RootList2D : public PrivateChunk
   BaseList2D* GetLast() const;
   Bool IsEmpty() const { return GetFirst() == nullptr; }
 
-  // Inserting sets the member's list head and document. Always true; a null node is ignored.
+  // The class of the members; a node of another one is refused.
+  virtual const NodeKind& GetMemberKind() const;
+  // Inserting takes the node out of the list that it stands in, and sets its list head and document. False, with
+  // nothing changed, for a node of another class than the members'; a null node is ignored.
   Bool InsertFirst(BaseList2D* node);
   Bool InsertLast(BaseList2D* node);
   Bool InsertAfter(BaseList2D* node, BaseList2D* reference);  // first when the reference is null
@@ -53,10 +59,12 @@ class RootList2D : public PrivateChunk
   // Reads a new member through the chunk loop and appends it; a member that reads badly is deleted. True if appended.
   // Some lists leave the list head of the members that they read unset.
   Bool ReadMember(HyperFile& file, BaseList2D* member, Bool setListHead);
-  // Appends behind the last member.
-  void Append(BaseList2D* node, Bool setListHead);
+  // Appends behind the last member; false for a node of another class.
+  Bool Append(BaseList2D* node, Bool setListHead);
 
  private:
+  Bool Takes(const BaseList2D& node) const;
+
   GeTempPublicList2D<PrivateChunk> list_;
   BaseList2D* owner_ = nullptr;
   BaseDocument* document_ = nullptr;
@@ -66,8 +74,10 @@ class RootList2D : public PrivateChunk
 class RootObject : public RootList2D
 {
  public:
+  const NodeKind& GetMemberKind() const override;
   Bool ReadChunk(HyperFile& file, Long id, Long level) override;
-  // A new object for a label, or null for one that can't be made.
+  // Called while a list is read, for each label in it: a new object that the list then owns, or null for a label that
+  // can't be made, which is passed over. A client may give objects of its own classes.
   virtual BaseObject* AllocMember(Long type);
 };
 
@@ -76,6 +86,7 @@ class RootTag : public RootList2D
 {
  public:
   explicit RootTag(BaseObject* tagOwner) : tagOwner_(tagOwner) {}
+  const NodeKind& GetMemberKind() const override;
   Bool ReadChunk(HyperFile& file, Long id, Long level) override;
 
  private:
@@ -86,7 +97,9 @@ class RootTag : public RootList2D
 class RootMaterial : public RootList2D
 {
  public:
+  const NodeKind& GetMemberKind() const override;
   Bool ReadChunk(HyperFile& file, Long id, Long level) override;
+  // As that of RootObject, for the labels kMaterialStandard and kMaterialPlugin. A node that is no material is refused.
   virtual BaseList2D* AllocMember(Long type);
 };
 
@@ -94,7 +107,9 @@ class RootMaterial : public RootList2D
 class RootRenderData : public RootList2D
 {
  public:
+  const NodeKind& GetMemberKind() const override;
   Bool ReadChunk(HyperFile& file, Long id, Long level) override;
+  // New render settings that the caller owns, or null when memory is short. Also called for a new document's first set.
   virtual BaseList2D* AllocMember();
 };
 
@@ -102,7 +117,9 @@ class RootRenderData : public RootList2D
 class RootLayer : public RootList2D
 {
  public:
+  const NodeKind& GetMemberKind() const override;
   Bool ReadChunk(HyperFile& file, Long id, Long level) override;
+  // A new layer that the caller owns, or null when memory is short.
   virtual BaseList2D* AllocMember();
 };
 
@@ -110,6 +127,7 @@ class RootLayer : public RootList2D
 class RootViewPanel : public RootList2D
 {
  public:
+  const NodeKind& GetMemberKind() const override;
   Bool ReadChunk(HyperFile& file, Long id, Long level) override;
 
  protected:
@@ -120,6 +138,7 @@ class RootViewPanel : public RootList2D
 class RootBaseDraw : public RootList2D
 {
  public:
+  const NodeKind& GetMemberKind() const override;
   Bool ReadChunk(HyperFile& file, Long id, Long level) override;
 
  protected:
@@ -130,7 +149,10 @@ class RootBaseDraw : public RootList2D
 class FixedLabelRoot : public RootList2D
 {
  public:
-  FixedLabelRoot(Long label, BaseList2D* (*makeMember)()) : label_(label), makeMember_(makeMember) {}
+  FixedLabelRoot(Long label, const NodeKind& memberKind, BaseList2D* (*makeMember)())
+      : label_(label), memberKind_(memberKind), makeMember_(makeMember)
+  {}
+  const NodeKind& GetMemberKind() const override { return memberKind_; }
   Bool ReadChunk(HyperFile& file, Long id, Long level) override;
 
  protected:
@@ -139,6 +161,7 @@ class FixedLabelRoot : public RootList2D
 
  private:
   Long label_;
+  const NodeKind& memberKind_;
   BaseList2D* (*makeMember_)();
 };
 

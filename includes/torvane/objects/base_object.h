@@ -46,6 +46,9 @@ inline constexpr ULong kFrozenScale = 8;
 class BaseObject : public BaseList4D
 {
  public:
+  static constexpr NodeKindOf<BaseObject> kNodeKind{"object", &BaseList4D::kNodeKind};
+  const NodeKind& GetNodeKind() const override { return kNodeKind; }
+
   // Makes its child list through the client's hook.
   explicit BaseObject(Long type);
   ~BaseObject() override;
@@ -62,11 +65,11 @@ class BaseObject : public BaseList4D
   // The object data's Execute; false without object data.
   virtual Bool Execute();
 
-  BaseObject* GetUp() const { return static_cast<BaseObject*>(BaseList4D::GetUp()); }
-  BaseObject* GetDown() const { return static_cast<BaseObject*>(BaseList4D::GetDown()); }
-  BaseObject* GetDownLast() const { return static_cast<BaseObject*>(BaseList4D::GetDownLast()); }
-  BaseObject* GetNext() const { return static_cast<BaseObject*>(BaseList4D::GetNext()); }
-  BaseObject* GetPrev() const { return static_cast<BaseObject*>(BaseList4D::GetPrev()); }
+  BaseObject* GetUp() const { return NodeCast<BaseObject>(BaseList4D::GetUp()); }
+  BaseObject* GetDown() const { return NodeCast<BaseObject>(BaseList4D::GetDown()); }
+  BaseObject* GetDownLast() const { return NodeCast<BaseObject>(BaseList4D::GetDownLast()); }
+  BaseObject* GetNext() const { return NodeCast<BaseObject>(BaseList4D::GetNext()); }
+  BaseObject* GetPrev() const { return NodeCast<BaseObject>(BaseList4D::GetPrev()); }
 
   RootTag& GetTagRoot() { return tags_; }
   BaseTag* GetFirstTag() const;

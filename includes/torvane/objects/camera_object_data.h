@@ -42,6 +42,10 @@ inline constexpr Long kCameraTemperaturePreset = 1310;
 class CameraObjectData : public NodeData
 {
  public:
+  static constexpr NodeKindOf<CameraObjectData> kNodeKind{"camera data", &NodeData::kNodeKind};
+  const NodeKind& GetNodeKind() const override { return kNodeKind; }
+  const NodeKind& GetOwnerKind() const override;
+
   Bool IsInstanceOf(Long type) const override { return type == kObjectCamera || NodeData::IsInstanceOf(type); }
   // Sets every default in the container of the node; false without a node.
   Bool Init() override;

@@ -46,6 +46,10 @@ struct LightExtraBlock
 class LightObjectData : public NodeData
 {
  public:
+  static constexpr NodeKindOf<LightObjectData> kNodeKind{"light data", &NodeData::kNodeKind};
+  const NodeKind& GetNodeKind() const override { return kNodeKind; }
+  const NodeKind& GetOwnerKind() const override;
+
   // With the defaults of kLightParameters.
   LightObjectData();
   ~LightObjectData() override;

@@ -18,6 +18,9 @@ class PolygonTag;
 class PointObject : public BaseObject
 {
  public:
+  static constexpr NodeKindOf<PointObject> kNodeKind{"point object", &BaseObject::kNodeKind};
+  const NodeKind& GetNodeKind() const override { return kNodeKind; }
+
   explicit PointObject(Long type = kObjectPoint) : BaseObject(type) {}
 
   Bool IsInstanceOf(Long type) const override { return type == kObjectPoint || BaseObject::IsInstanceOf(type); }
@@ -28,6 +31,9 @@ class PointObject : public BaseObject
 class PolygonObject : public PointObject
 {
  public:
+  static constexpr NodeKindOf<PolygonObject> kNodeKind{"polygon object", &PointObject::kNodeKind};
+  const NodeKind& GetNodeKind() const override { return kNodeKind; }
+
   PolygonObject() : PointObject(kObjectPolygon) {}
 
   Bool IsInstanceOf(Long type) const override { return type == kObjectPolygon || PointObject::IsInstanceOf(type); }

@@ -71,6 +71,10 @@ struct SelectionChunk
 class PointObjectData : public NodeData
 {
  public:
+  static constexpr NodeKindOf<PointObjectData> kNodeKind{"point data", &NodeData::kNodeKind};
+  const NodeKind& GetNodeKind() const override { return kNodeKind; }
+  const NodeKind& GetOwnerKind() const override;
+
   Bool IsInstanceOf(Long type) const override { return type == kObjectPoint || NodeData::IsInstanceOf(type); }
   Long GetDiskType() const override { return kObjectPoint; }
   // A chunk for each selection that isn't empty.
@@ -93,6 +97,9 @@ class PointObjectData : public NodeData
 class PolygonObjectData : public PointObjectData
 {
  public:
+  static constexpr NodeKindOf<PolygonObjectData> kNodeKind{"polygon data", &PointObjectData::kNodeKind};
+  const NodeKind& GetNodeKind() const override { return kNodeKind; }
+
   ~PolygonObjectData() override { DeleteObj(ngons_); }
 
   Bool IsInstanceOf(Long type) const override { return type == kObjectPolygon || PointObjectData::IsInstanceOf(type); }

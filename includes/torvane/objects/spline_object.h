@@ -19,6 +19,9 @@ inline constexpr Long kMaxSplinePoints = 100000000;
 class SplineObject : public PointObject
 {
  public:
+  static constexpr NodeKindOf<SplineObject> kNodeKind{"spline", &PointObject::kNodeKind};
+  const NodeKind& GetNodeKind() const override { return kNodeKind; }
+
   // Sets the defaults of the container.
   SplineObject();
 

@@ -26,6 +26,9 @@ inline constexpr Long kChunkVideoPostData = 300001060;
 class RenderData : public BaseList4D
 {
  public:
+  static constexpr NodeKindOf<RenderData> kNodeKind{"render settings", &BaseList4D::kNodeKind};
+  const NodeKind& GetNodeKind() const override { return kNodeKind; }
+
   // With every default, in the order in which a file holds them.
   RenderData();
 
@@ -35,8 +38,8 @@ class RenderData : public BaseList4D
   GeListNode* MakeClone(ULong flags, TransArray* translation) override;
   void SetDocument(BaseDocument* document) override;
 
-  RenderData* GetNext() const { return static_cast<RenderData*>(BaseList4D::GetNext()); }
-  RenderData* GetDown() const { return static_cast<RenderData*>(BaseList4D::GetDown()); }
+  RenderData* GetNext() const { return NodeCast<RenderData>(BaseList4D::GetNext()); }
+  RenderData* GetDown() const { return NodeCast<RenderData>(BaseList4D::GetDown()); }
   RootVideoPost& GetVideoPosts() { return videoPosts_; }
   RootMultipass& GetMultipasses() { return multipasses_; }
   BaseContainer& GetExtraData() { return extraData_; }
@@ -52,6 +55,9 @@ class RenderData : public BaseList4D
 class MultipassObject : public BaseList4D
 {
  public:
+  static constexpr NodeKindOf<MultipassObject> kNodeKind{"multipass", &BaseList4D::kNodeKind};
+  const NodeKind& GetNodeKind() const override { return kNodeKind; }
+
   MultipassObject();
 
   Bool ReadChunk(HyperFile& file, Long id, Long level) override;
@@ -68,6 +74,9 @@ class MultipassObject : public BaseList4D
 class BaseVideoPost : public BaseList2D
 {
  public:
+  static constexpr NodeKindOf<BaseVideoPost> kNodeKind{"video post", &BaseList2D::kNodeKind};
+  const NodeKind& GetNodeKind() const override { return kNodeKind; }
+
   BaseVideoPost();
 
   Bool ReadChunk(HyperFile& file, Long id, Long level) override;

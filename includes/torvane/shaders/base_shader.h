@@ -18,6 +18,9 @@ inline constexpr Long kBitmapLastFrame = 2001;
 class BaseShader : public BaseList4D
 {
  public:
+  static constexpr NodeKindOf<BaseShader> kNodeKind{"shader", &BaseList4D::kNodeKind};
+  const NodeKind& GetNodeKind() const override { return kNodeKind; }
+
   // Makes the list of children.
   explicit BaseShader(Long type = kShaderBitmap);
 
@@ -28,12 +31,11 @@ class BaseShader : public BaseList4D
   Bool CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation) override;
   // Copies the children too unless kCopyNoChildren is set.
   GeListNode* MakeClone(ULong flags, TransArray* translation) override;
-  BaseShader* AsShader() override { return this; }
 
   BaseShader* GetUp() const; // null for a shader that isn't below another one
-  BaseShader* GetDown() const { return static_cast<BaseShader*>(BaseList4D::GetDown()); }
-  BaseShader* GetNext() const { return static_cast<BaseShader*>(BaseList4D::GetNext()); }
-  BaseShader* GetPrev() const { return static_cast<BaseShader*>(BaseList4D::GetPrev()); }
+  BaseShader* GetDown() const { return NodeCast<BaseShader>(BaseList4D::GetDown()); }
+  BaseShader* GetNext() const { return NodeCast<BaseShader>(BaseList4D::GetNext()); }
+  BaseShader* GetPrev() const { return NodeCast<BaseShader>(BaseList4D::GetPrev()); }
 
   // The file of a bitmap shader; an empty name for any other type.
   Filename BitmapFilename() const;

@@ -18,6 +18,9 @@ inline constexpr Long kTargetFlag = 1003;
 class BaseTag : public BaseList2D
 {
  public:
+  static constexpr NodeKindOf<BaseTag> kNodeKind{"tag", &BaseList2D::kNodeKind};
+  const NodeKind& GetNodeKind() const override { return kNodeKind; }
+
   // `type` is the node type; `pluginId` the real type where the node type is kTagPlugin, else -1. A target tag (5676)
   // gets its two empty links and its flag.
   explicit BaseTag(Long type, Long pluginId = -1);
@@ -32,8 +35,9 @@ class BaseTag : public BaseList2D
   Bool GetParameter(const ParameterPath& path, GeData& value) override;
   Bool SetParameter(const ParameterPath& path, const GeData& value) override;
   GeListNode* MakeClone(ULong flags, TransArray* translation) override;
+  void RemoveFromList() override; // the tag then has no object
 
-  BaseTag* GetNext() const { return static_cast<BaseTag*>(BaseList2D::GetNext()); }
+  BaseTag* GetNext() const { return NodeCast<BaseTag>(BaseList2D::GetNext()); }
   BaseObject* GetObject() const { return object_; }
   void SetObject(BaseObject* object) { object_ = object; }
   Long GetPluginId() const { return pluginId_; }

@@ -11,6 +11,9 @@ inline constexpr Long kCompositingClock = 1157; // Long: milliseconds of a clock
 class CompositingTag : public BaseTag
 {
  public:
+  static constexpr NodeKindOf<CompositingTag> kNodeKind{"compositing tag", &BaseTag::kNodeKind};
+  const NodeKind& GetNodeKind() const override { return kNodeKind; }
+
   // Sets every default.
   CompositingTag();
 

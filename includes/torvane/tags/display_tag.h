@@ -13,6 +13,9 @@ inline constexpr Long kChunkOldDisplay = 110009;
 class DisplayTag : public BaseTag
 {
  public:
+  static constexpr NodeKindOf<DisplayTag> kNodeKind{"display tag", &BaseTag::kNodeKind};
+  const NodeKind& GetNodeKind() const override { return kNodeKind; }
+
   // Sets every default.
   DisplayTag();
 

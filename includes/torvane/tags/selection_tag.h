@@ -10,6 +10,9 @@ namespace _torvane_
 class SelectionTag : public BaseTag
 {
  public:
+  static constexpr NodeKindOf<SelectionTag> kNodeKind{"selection tag", &BaseTag::kNodeKind};
+  const NodeKind& GetNodeKind() const override { return kNodeKind; }
+
   // `type` tells of what: kTagPolygonSelection, kTagPointSelection or kTagEdgeSelection.
   explicit SelectionTag(Long type) : BaseTag(type) {}
 

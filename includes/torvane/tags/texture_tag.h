@@ -44,6 +44,9 @@ inline constexpr Long kChunkOldTexture = 110010;
 class TextureTag : public BaseTag
 {
  public:
+  static constexpr NodeKindOf<TextureTag> kNodeKind{"texture tag", &BaseTag::kNodeKind};
+  const NodeKind& GetNodeKind() const override { return kNodeKind; }
+
   TextureTag();
 
   Bool ReadChunk(HyperFile& file, Long id, Long level) override;

@@ -12,6 +12,9 @@ namespace _torvane_
 class BaseArrayTag : public BaseTag
 {
  public:
+  static constexpr NodeKindOf<BaseArrayTag> kNodeKind{"value tag", &BaseTag::kNodeKind};
+  const NodeKind& GetNodeKind() const override { return kNodeKind; }
+
   ~BaseArrayTag() override;
 
   // Takes the chunk whose id is the tag's type. A count that the file cannot hold is an error before memory is taken.
@@ -105,6 +108,9 @@ class ArrayTag : public Base
 class PointTag : public ArrayTag<Vector, ColumnTag>
 {
  public:
+  static constexpr NodeKindOf<PointTag> kNodeKind{"point tag", &BaseArrayTag::kNodeKind};
+  const NodeKind& GetNodeKind() const override { return kNodeKind; }
+
   PointTag();
 
  protected:
@@ -118,6 +124,9 @@ using PolygonCorners = LegacyPolygon;
 class PolygonTag : public ArrayTag<PolygonCorners, ColumnTag>
 {
  public:
+  static constexpr NodeKindOf<PolygonTag> kNodeKind{"polygon tag", &BaseArrayTag::kNodeKind};
+  const NodeKind& GetNodeKind() const override { return kNodeKind; }
+
   PolygonTag();
 
   // A count below 1 does nothing and gives true.
@@ -138,6 +147,9 @@ struct SplineSegment
 class SegmentTag : public ArrayTag<SplineSegment, BaseArrayTag>
 {
  public:
+  static constexpr NodeKindOf<SegmentTag> kNodeKind{"segment tag", &BaseArrayTag::kNodeKind};
+  const NodeKind& GetNodeKind() const override { return kNodeKind; }
+
   SegmentTag();
 
   // False when the tag has no entries and gets none; -1 leaves the entries of a filled tag as they are.
@@ -164,6 +176,9 @@ struct TangentPair
 class TangentTag : public ArrayTag<TangentPair, BaseArrayTag>
 {
  public:
+  static constexpr NodeKindOf<TangentTag> kNodeKind{"tangent tag", &BaseArrayTag::kNodeKind};
+  const NodeKind& GetNodeKind() const override { return kNodeKind; }
+
   TangentTag();
 
   // Drops the entries and makes `count` new ones of zeros. False, with the old ones kept, when memory is short and for
@@ -184,6 +199,9 @@ class TangentTag : public ArrayTag<TangentPair, BaseArrayTag>
 class VertexMapTag : public ArrayTag<SReal, ColumnTag>
 {
  public:
+  static constexpr NodeKindOf<VertexMapTag> kNodeKind{"vertex map", &BaseArrayTag::kNodeKind};
+  const NodeKind& GetNodeKind() const override { return kNodeKind; }
+
   // The other type is kTagOldVertexMap, which holds no array in files below version 11925.
   explicit VertexMapTag(Long type = kTagVertexMap);
 
@@ -208,6 +226,9 @@ inline constexpr Real kNormalScale = 32000.0;
 class NormalTag : public ArrayTag<PackedNormals, ColumnTag>
 {
  public:
+  static constexpr NodeKindOf<NormalTag> kNodeKind{"normal tag", &BaseArrayTag::kNodeKind};
+  const NodeKind& GetNodeKind() const override { return kNodeKind; }
+
   NormalTag();
 
   // The normals of polygon `index`; false for an index out of range. Writing truncates toward zero; what lies outside
@@ -246,6 +267,9 @@ inline constexpr Long kUVWParameter = 1000; // Long: a field of the tag
 class UVWTag : public ArrayTag<PackedUVWQuad, BaseArrayTag>
 {
  public:
+  static constexpr NodeKindOf<UVWTag> kNodeKind{"texture coordinates", &BaseArrayTag::kNodeKind};
+  const NodeKind& GetNodeKind() const override { return kNodeKind; }
+
   UVWTag();
 
   Bool ReadChunk(HyperFile& file, Long id, Long level) override;

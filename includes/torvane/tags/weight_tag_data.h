@@ -70,6 +70,10 @@ struct JointRecord
 class WeightTagData : public NodeData
 {
  public:
+  static constexpr NodeKindOf<WeightTagData> kNodeKind{"weight data", &NodeData::kNodeKind};
+  const NodeKind& GetNodeKind() const override { return kNodeKind; }
+  const NodeKind& GetOwnerKind() const override;
+
   ~WeightTagData() override;
 
   Bool IsInstanceOf(Long type) const override { return type == kTagWeight || NodeData::IsInstanceOf(type); }

@@ -22,6 +22,9 @@ class BaseDrawPref : public PrivateChunk
 class BaseDraw : public BaseList2D
 {
  public:
+  static constexpr NodeKindOf<BaseDraw> kNodeKind{"draw", &BaseList2D::kNodeKind};
+  const NodeKind& GetNodeKind() const override { return kNodeKind; }
+
   // With every default display setting, and an editor camera of its own; see IsComplete.
   BaseDraw();
   ~BaseDraw() override;
@@ -35,7 +38,7 @@ class BaseDraw : public BaseList2D
   GeListNode* MakeClone(ULong flags, TransArray* translation) override;
   void SetDocument(BaseDocument* document) override;
 
-  BaseDraw* GetNext() const { return static_cast<BaseDraw*>(BaseList2D::GetNext()); }
+  BaseDraw* GetNext() const { return NodeCast<BaseDraw>(BaseList2D::GetNext()); }
   GeAliasLink& GetSceneCamera() { return sceneCamera_; }
   BaseObject* GetEditorCamera() const { return editorCamera_; } // the draw owns it
 
@@ -51,6 +54,9 @@ class BaseDraw : public BaseList2D
 class ViewPanel : public BaseList2D
 {
  public:
+  static constexpr NodeKindOf<ViewPanel> kNodeKind{"view panel", &BaseList2D::kNodeKind};
+  const NodeKind& GetNodeKind() const override { return kNodeKind; }
+
   ViewPanel();
 
   Bool ReadChunk(HyperFile& file, Long id, Long level) override;
@@ -59,7 +65,7 @@ class ViewPanel : public BaseList2D
   GeListNode* MakeClone(ULong flags, TransArray* translation) override;
   void SetDocument(BaseDocument* document) override;
 
-  ViewPanel* GetNext() const { return static_cast<ViewPanel*>(BaseList2D::GetNext()); }
+  ViewPanel* GetNext() const { return NodeCast<ViewPanel>(BaseList2D::GetNext()); }
   RootBaseDraw& GetDraws() { return draws_; }
   BaseContainer& GetSettings() { return settings_; }
 

@@ -128,22 +128,22 @@ Bool BaseDocument::IsComplete() const { return objects_ && materials_ && layers_
 
 BaseObject* BaseDocument::GetFirstObject() const
 {
-  return objects_ ? static_cast<BaseObject*>(objects_->GetFirst()) : nullptr;
+  return objects_ ? NodeCast<BaseObject>(objects_->GetFirst()) : nullptr;
 }
 
 BaseMaterial* BaseDocument::GetFirstMaterial() const
 {
-  return materials_ ? static_cast<BaseMaterial*>(materials_->GetFirst()) : nullptr;
+  return materials_ ? NodeCast<BaseMaterial>(materials_->GetFirst()) : nullptr;
 }
 
 LayerObject* BaseDocument::GetFirstLayer() const
 {
-  return layers_ ? static_cast<LayerObject*>(layers_->GetFirst()) : nullptr;
+  return layers_ ? NodeCast<LayerObject>(layers_->GetFirst()) : nullptr;
 }
 
 RenderData* BaseDocument::GetFirstRenderData() const
 {
-  return renderData_ ? static_cast<RenderData*>(renderData_->GetFirst()) : nullptr;
+  return renderData_ ? NodeCast<RenderData>(renderData_->GetFirst()) : nullptr;
 }
 
 RenderData* BaseDocument::GetActiveRenderData() const
@@ -310,23 +310,25 @@ Bool BaseDocument::SetParameter(const ParameterPath& path, const GeData& value)
 
 Bool BaseDocument::CopyTo(PrivateChunk& destination, ULong flags, TransArray*)
 {
-  auto& target = static_cast<BaseDocument&>(destination);
+  auto* target = NodeCast<BaseDocument>(&destination);
+  if (!target)
+    return false;
   AllocationWatch watch;
   AliasTranslator translator;
   if (!translator.MakeTranslator() || !BaseList2D::CopyTo(destination, flags, translator.GetArray()))
     return false;
-  target.fileName_ = fileName_;
-  pref_.CopyTo(target.pref_, flags, translator.GetArray());
-  target.time_ = time_;
-  target.mode_ = mode_;
-  target.tool_ = tool_;
-  Bool copied = preview_.CopyTo(target.preview_);
+  target->fileName_ = fileName_;
+  pref_.CopyTo(target->pref_, flags, translator.GetArray());
+  target->time_ = time_;
+  target->mode_ = mode_;
+  target->tool_ = tool_;
+  Bool copied = preview_.CopyTo(target->preview_);
   for (Long i = 0; i < kSettingsCount && copied; ++i)
-    copied = settings_[i].CopyTo(target.settings_[i], flags, translator.GetArray());
-  if (!copied || !CopyRoots(target, flags, translator.GetArray()) || watch.Failed()) {
-    target.materials_->FreeAll();
-    target.objects_->FreeAll();
-    target.layers_->FreeAll();
+    copied = settings_[i].CopyTo(target->settings_[i], flags, translator.GetArray());
+  if (!copied || !CopyRoots(*target, flags, translator.GetArray()) || watch.Failed()) {
+    target->materials_->FreeAll();
+    target->objects_->FreeAll();
+    target->layers_->FreeAll();
     return false;
   }
   translator.Finish(true);

@@ -65,16 +65,18 @@ Bool DocumentPref::ReadChunk(HyperFile& file, Long id, Long level)
 
 Bool DocumentPref::CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation)
 {
-  auto& target = static_cast<DocumentPref&>(destination);
-  target.fps_ = fps_;
-  target.minTime_ = minTime_;
-  target.maxTime_ = maxTime_;
-  target.loopMin_ = loopMin_;
-  target.loopMax_ = loopMax_;
+  auto* target = NodeCast<DocumentPref>(&destination);
+  if (!target)
+    return false;
+  target->fps_ = fps_;
+  target->minTime_ = minTime_;
+  target->maxTime_ = maxTime_;
+  target->loopMin_ = loopMin_;
+  target->loopMax_ = loopMax_;
   for (Long i = 0; i < 4; ++i)
-    target.bools_[i] = bools_[i];
-  target.real_ = real_;
-  target.lastBool_ = lastBool_;
+    target->bools_[i] = bools_[i];
+  target->real_ = real_;
+  target->lastBool_ = lastBool_;
   return GeListNode::CopyTo(destination, flags, translation);
 }
 

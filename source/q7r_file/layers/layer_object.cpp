@@ -49,23 +49,25 @@ Bool LayerObject::ReadChunk(HyperFile& file, Long id, Long level)
 
 Bool LayerObject::CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation)
 {
-  auto& target = static_cast<LayerObject&>(destination);
+  auto* target = NodeCast<LayerObject>(&destination);
+  if (!target)
+    return false;
   if (!BaseList4D::CopyTo(destination, flags, translation))
     return false;
   for (Long i = 0; i < kLayerFlagCount; ++i)
-    target.flags_[i] = flags_[i];
-  target.color_ = color_;
+    target->flags_[i] = flags_[i];
+  target->color_ = color_;
   if ((flags & kCopyNoChildren) || !children_)
     return true;
   for (LayerObject* child = GetDown(); child; child = child->GetNext()) {
-    auto* clone = static_cast<LayerObject*>(child->MakeClone(flags, translation));
+    auto* clone = NodeCast<LayerObject>(child->MakeClone(flags, translation));
     if (!clone)
       return false;
-    if (!target.MakeChildList()) {
+    if (!target->MakeChildList()) {
       DeleteObj(clone);
       return false;
     }
-    clone->InsertUnderLast(&target);
+    clone->InsertUnderLast(target);
   }
   return true;
 }

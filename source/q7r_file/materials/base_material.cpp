@@ -114,15 +114,17 @@ void BaseMaterial::WriteChunks(HyperFile& file)
 
 Bool BaseMaterial::CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation)
 {
-  auto& target = static_cast<BaseMaterial&>(destination);
-  if (!(flags & kCopyNoMaterialExtra) && !preview_.CopyTo(target.preview_))
+  auto* target = NodeCast<BaseMaterial>(&destination);
+  if (!target)
+    return false;
+  if (!(flags & kCopyNoMaterialExtra) && !preview_.CopyTo(target->preview_))
     return false;
   if (!BaseList2D::CopyTo(destination, flags, translation))
     return false;
   if (type_ != kMaterialPlugin)
     return true;
-  target.pluginType_ = pluginType_;
-  return raw_.CopyTo(target.raw_);
+  target->pluginType_ = pluginType_;
+  return raw_.CopyTo(target->raw_);
 }
 
 GeListNode* BaseMaterial::MakeClone(ULong flags, TransArray* translation)

@@ -124,9 +124,11 @@ void Material::WriteChunks(HyperFile& file)
 
 Bool Material::CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation)
 {
-  auto& target = static_cast<Material&>(destination);
+  auto* target = NodeCast<Material>(&destination);
+  if (!target)
+    return false;
   for (Long i = 0; i < kMaterialChannelCount; ++i)
-    target.channelState_[i] = channelState_[i];
+    target->channelState_[i] = channelState_[i];
   return BaseMaterial::CopyTo(destination, flags, translation);
 }
 
@@ -161,11 +163,7 @@ void Material::ChannelParameterIds(Long channel, Long& colorId, Long& brightness
 // ---------------------------------------------------------------------------------------------------------------
 // Shader slots
 
-BaseShader* Material::ChannelShaderOf(Long id) const
-{
-  BaseList2D* target = data_.GetLink(id);
-  return target ? target->AsShader() : nullptr;
-}
+BaseShader* Material::ChannelShaderOf(Long id) const { return NodeCast<BaseShader>(data_.GetLink(id)); }
 
 BaseShader* Material::BindChannelBitmap(Long id, const Filename& filename)
 {
@@ -197,7 +195,7 @@ Material* AllocMaterial() { return NewObj<Material>(); }
 
 BaseShader* SetMaterialBitmap(BaseMaterial* material, Long id, const Filename& filename)
 {
-  Material* standard = material ? material->AsMaterial() : nullptr;
+  Material* standard = NodeCast<Material>(material);
   return standard ? standard->BindChannelBitmap(id, filename) : nullptr;
 }
 

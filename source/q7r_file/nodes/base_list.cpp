@@ -4,6 +4,7 @@
 
 #include "k2v_file/stream/chunk_visitor.h"
 #include "torvane/animation/ctrack.h"
+#include "torvane/layers/layer_object.h"
 #include "torvane/shaders/base_shader.h"
 #include "torvane/time/uuid.h"
 
@@ -192,32 +193,35 @@ Bool BaseList2D::KeepChunk(HyperFile& file, Long id, Long level)
 
 Bool BaseList2D::CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation)
 {
-  auto& target = static_cast<BaseList2D&>(destination);
+  auto* target = NodeCast<BaseList2D>(&destination);
+  if (!target)
+    return false;
   if (!(flags & kCopyNoInfo))
-    target.info_ = info_;
-  if (!data_.CopyTo(target.data_, flags, translation))
+    target->info_ = info_;
+  if (!data_.CopyTo(target->data_, flags, translation))
     return false;
-  target.markerDrawn_ = false; // a copy is never the same node
-  if (!keptChunks_.CopyTo(target.keptChunks_))
+  target->markerDrawn_ = false; // a copy is never the same node
+  if (!keptChunks_.CopyTo(target->keptChunks_))
     return false;
-  link_.CopyLinkTo(&target.link_, translation);
-  target.name_ = name_;
+  link_.CopyLinkTo(&target->link_, translation);
+  target->name_ = name_;
   if (!GeListNode::CopyTo(destination, flags, translation))
     return false;
-  if (!dynamicParameters_.CopyTo(target.dynamicParameters_, flags, translation))
+  if (!dynamicParameters_.CopyTo(target->dynamicParameters_, flags, translation))
     return false;
-  if (!(flags & kCopyNoBranches) && !CopyRoot(shaders_, target, target.shaders_, flags, translation))
+  if (!(flags & kCopyNoBranches) && !CopyRoot(shaders_, *target, target->shaders_, flags, translation))
     return false;
-  return (flags & kCopyNoTracks) || CopyRoot(tracks_, target, target.tracks_, flags, translation);
+  return (flags & kCopyNoTracks) || CopyRoot(tracks_, *target, target->tracks_, flags, translation);
 }
 
-void BaseList2D::RemoveFromList() { Remove(); }
-
-BaseList2D* BaseList2D::GetLayer() const
+void BaseList2D::RemoveFromList()
 {
-  auto* node = static_cast<BaseList2D*>(link_.GetLink());
-  return node && node->IsInstanceOf(kTypeLayer) ? node : nullptr;
+  Remove();
+  listHead_ = nullptr;
+  SetDocument(nullptr);
 }
+
+BaseList2D* BaseList2D::GetLayer() const { return NodeCast<LayerObject>(link_.GetLink()); }
 
 void BaseList2D::SetDocument(BaseDocument* document)
 {
@@ -284,10 +288,7 @@ Bool BaseList2D::GetUniqueIDByIndex(Long index, Long& appId, const void*& data, 
   return FindUniqueID(appId, data, size);
 }
 
-BaseShader* BaseList2D::GetShaders() const
-{
-  return shaders_ ? static_cast<BaseShader*>(shaders_->GetFirst()) : nullptr;
-}
+BaseShader* BaseList2D::GetShaders() const { return shaders_ ? NodeCast<BaseShader>(shaders_->GetFirst()) : nullptr; }
 
 Bool BaseList2D::InsertShader(BaseShader* shader, BaseShader* after)
 {
@@ -296,7 +297,7 @@ Bool BaseList2D::InsertShader(BaseShader* shader, BaseShader* after)
 
 Bool BaseList2D::InsertShaderLast(BaseShader* shader) { return NeedRoot(shaders_) && shaders_->InsertLast(shader); }
 
-CTrack* BaseList2D::GetFirstTrack() const { return tracks_ ? static_cast<CTrack*>(tracks_->GetFirst()) : nullptr; }
+CTrack* BaseList2D::GetFirstTrack() const { return tracks_ ? NodeCast<CTrack>(tracks_->GetFirst()) : nullptr; }
 
 Bool BaseList2D::InsertTrackLast(CTrack* track) { return NeedRoot(tracks_) && tracks_->InsertLast(track); }
 
@@ -305,7 +306,7 @@ CTrack* BaseList2D::FindTrack(const ParameterPath& path) const
   Long count = path.GetLevelCount();
   if (count < 1)
     return nullptr;
-  for (CTrack* track = GetFirstTrack(); track; track = static_cast<CTrack*>(track->GetNext())) {
+  for (CTrack* track = GetFirstTrack(); track; track = track->GetNext()) {
     Long level = 0;
     while (level < count && track->GetPath()[level].id == path[level].id)
       ++level;
@@ -317,13 +318,6 @@ CTrack* BaseList2D::FindTrack(const ParameterPath& path) const
 
 BaseList4D::~BaseList4D() { DeleteObj(children_); }
 
-void BaseList4D::RemoveFromList()
-{
-  Remove();
-  document_ = nullptr;
-  listHead_ = nullptr;
-}
-
 void BaseList4D::SetDocument(BaseDocument* document)
 {
   if (document_ == document)
@@ -333,17 +327,11 @@ void BaseList4D::SetDocument(BaseDocument* document)
     SetDocumentOfMembers(children_, document);
 }
 
-BaseList4D* BaseList4D::GetUp() const { return listHead_ ? static_cast<BaseList4D*>(listHead_->GetOwner()) : nullptr; }
+BaseList4D* BaseList4D::GetUp() const { return listHead_ ? NodeCast<BaseList4D>(listHead_->GetOwner()) : nullptr; }
 
-BaseList4D* BaseList4D::GetDown() const
-{
-  return children_ ? static_cast<BaseList4D*>(children_->GetFirst()) : nullptr;
-}
+BaseList4D* BaseList4D::GetDown() const { return children_ ? NodeCast<BaseList4D>(children_->GetFirst()) : nullptr; }
 
-BaseList4D* BaseList4D::GetDownLast() const
-{
-  return children_ ? static_cast<BaseList4D*>(children_->GetLast()) : nullptr;
-}
+BaseList4D* BaseList4D::GetDownLast() const { return children_ ? NodeCast<BaseList4D>(children_->GetLast()) : nullptr; }
 
 void BaseList4D::InsertBefore(BaseList4D* reference)
 {

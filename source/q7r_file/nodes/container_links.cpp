@@ -16,12 +16,9 @@ void BaseContainer::SetLink(Long id, BaseList2D* target)
 
 BaseList2D* BaseContainer::GetLink(Long id, const BaseDocument* document) const
 {
-  GeListNode* target = GetData(id).GetLink();
   // A file may point a link at a thing that has a goal but is no named node, such as the document's preferences.
-  if (!target || !target->GoalIsWrittenElsewhere())
-    return nullptr;
-  auto* node = static_cast<BaseList2D*>(target);
-  const BaseDocument* owner = node->GetDocument();
+  auto* node = NodeCast<BaseList2D>(GetData(id).GetLink());
+  const BaseDocument* owner = node ? node->GetDocument() : nullptr;
   return document && owner && owner != document ? nullptr : node;
 }
 

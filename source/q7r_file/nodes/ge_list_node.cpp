@@ -58,14 +58,16 @@ void GeListNode::WriteChunks(HyperFile& file)
 
 Bool GeListNode::CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation)
 {
-  auto& target = static_cast<GeListNode&>(destination);
+  auto* target = NodeCast<GeListNode>(&destination);
+  if (!target)
+    return false;
   if (!PrivateChunk::CopyTo(destination, flags, translation))
     return false;
   for (Long i = 0; i < kWordCount; ++i)
-    target.nbits_[i] = nbits_[i];
+    target->nbits_[i] = nbits_[i];
   if ((flags & kCopyNoGoal) || !translation)
     return true;
-  return goal_.CopyGoalTo(target.goal_, translation);
+  return goal_.CopyGoalTo(target->goal_, translation);
 }
 
 ULong GeListNode::GetNBit(Long bit) const

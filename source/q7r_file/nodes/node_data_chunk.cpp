@@ -21,10 +21,20 @@ Bool AttachNodeData(NodeData* data, NodeDataSlot slot)
   return false;
 }
 
+NodeData* AllocNodeDataFor(const BaseList2D& node, Long type, Bool& known)
+{
+  NodeData* data = AllocNodeData(type, known);
+  if (!data || node.GetNodeKind().Is(data->GetOwnerKind()))
+    return data;
+  DeleteObj(data);
+  known = false;
+  return nullptr;
+}
+
 Bool ReadNodeDataBody(HyperFile& file, Long id, Long level, Long type, NodeDataSlot slot)
 {
   Bool known = false;
-  NodeData* data = AllocNodeData(type, known);
+  NodeData* data = AllocNodeDataFor(slot.node, type, known);
   if (known && !data) {
     DeleteObj(slot.data);
     slot.raw.Free();

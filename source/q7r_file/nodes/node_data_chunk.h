@@ -29,6 +29,10 @@ struct NodeDataSlot
   RawChunkBody& raw;
 };
 
+// What the client's hook gives for a node of a type; data that are for nodes of another class count as none, and the
+// type as unknown.
+NodeData* AllocNodeDataFor(const BaseList2D& node, Long type, Bool& known);
+
 // Reads the rest of the chunk behind its opening values, the end tag included, into a NodeData of `type` that the
 // client makes, or as bytes if the client doesn't know the type. What was there before goes. False when a NodeData
 // can't be made or doesn't take the content: the stream then stands inside the chunk, for the caller to skip.

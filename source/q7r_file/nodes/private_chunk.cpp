@@ -156,6 +156,8 @@ Bool PrivateChunk::GetParameterById(Long id, GeData& value) { return GetParamete
 
 Bool PrivateChunk::SetParameterById(Long id, const GeData& value) { return SetParameter(ParameterPath(id), value); }
 
+const NodeKind& NodeData::GetOwnerKind() const { return BaseList2D::kNodeKind; }
+
 Bool NodeData::ReadData(HyperFile&, Long, Long) { return false; }
 
 } // namespace _torvane_

@@ -2,11 +2,15 @@
 
 #include "k2v_file/stream/chunk_visitor.h"
 #include "q7r_file/types/member_makers.h"
+#include "torvane/animation/ctrack.h"
 #include "torvane/layers/layer_object.h"
 #include "torvane/materials/base_material.h"
+#include "torvane/memory/assertion.h"
 #include "torvane/objects/base_object.h"
 #include "torvane/render/render_data.h"
+#include "torvane/shaders/base_shader.h"
 #include "torvane/tags/base_tag.h"
+#include "torvane/views/base_draw.h"
 
 namespace _torvane_
 {
@@ -17,33 +21,49 @@ RootList2D::~RootList2D()
   owner_ = nullptr;
 }
 
-BaseList2D* RootList2D::GetFirst() const { return static_cast<BaseList2D*>(list_.GetFirst()); }
+const NodeKind& RootList2D::GetMemberKind() const { return BaseList2D::kNodeKind; }
+const NodeKind& RootObject::GetMemberKind() const { return BaseObject::kNodeKind; }
+const NodeKind& RootTag::GetMemberKind() const { return BaseTag::kNodeKind; }
+const NodeKind& RootMaterial::GetMemberKind() const { return BaseMaterial::kNodeKind; }
+const NodeKind& RootRenderData::GetMemberKind() const { return RenderData::kNodeKind; }
+const NodeKind& RootLayer::GetMemberKind() const { return LayerObject::kNodeKind; }
+const NodeKind& RootViewPanel::GetMemberKind() const { return ViewPanel::kNodeKind; }
+const NodeKind& RootBaseDraw::GetMemberKind() const { return BaseDraw::kNodeKind; }
 
-BaseList2D* RootList2D::GetLast() const { return static_cast<BaseList2D*>(list_.GetLast()); }
+Bool RootList2D::Takes(const BaseList2D& node) const
+{
+  if (node.GetNodeKind().Is(GetMemberKind()))
+    return true;
+  ReportAssertion("q7r_file", __LINE__, "a node was to be put into a list of nodes of another class");
+  return false;
+}
+
+BaseList2D* RootList2D::GetFirst() const { return NodeCast<BaseList2D>(list_.GetFirst()); }
+
+BaseList2D* RootList2D::GetLast() const { return NodeCast<BaseList2D>(list_.GetLast()); }
 
 BaseDocument* RootList2D::GetDocument() const { return owner_ ? owner_->GetDocument() : document_; }
 
-void RootList2D::Append(BaseList2D* node, Bool setListHead)
+Bool RootList2D::Append(BaseList2D* node, Bool setListHead)
 {
+  if (!Takes(*node))
+    return false;
   list_.InsertLast(node);
-  if (setListHead)
-    node->SetListHead(this);
+  node->SetListHead(setListHead ? this : nullptr);
   node->SetDocument(GetDocument());
+  return true;
 }
 
 Bool RootList2D::InsertFirst(BaseList2D* node) { return InsertAfter(node, nullptr); }
 
-Bool RootList2D::InsertLast(BaseList2D* node)
-{
-  if (node)
-    Append(node, true);
-  return true;
-}
+Bool RootList2D::InsertLast(BaseList2D* node) { return !node || Append(node, true); }
 
 Bool RootList2D::InsertAfter(BaseList2D* node, BaseList2D* reference)
 {
-  if (!node)
+  if (!node || node == reference)
     return true;
+  if (!Takes(*node))
+    return false;
   if (reference)
     node->GeToolNode2D::InsertAfter(reference);
   else
@@ -108,29 +128,31 @@ Bool RootList2D::ReadMember(HyperFile& file, BaseList2D* member, Bool setListHea
   if (!member)
     return false;
   member->SetDocument(GetDocument());
-  if (!member->ReadChunkLoop(file, true)) {
+  if (!Takes(*member) || !member->ReadChunkLoop(file, true)) {
     DeleteObj(member);
     return false;
   }
-  Append(member, setListHead);
-  return true;
+  return Append(member, setListHead);
 }
 
 Bool RootList2D::CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation)
 {
   if (flags & kCopyNoBranches)
     return true;
-  auto& target = static_cast<RootList2D&>(destination);
+  auto* target = NodeCast<RootList2D>(&destination);
+  if (!target)
+    return false;
   // Members of a copied list always take their children along.
   flags &= ~kCopyNoChildren;
-  target.FreeAll();
+  target->FreeAll();
   for (BaseList2D* member = GetFirst(); member; member = member->GetNext()) {
-    auto* clone = static_cast<BaseList2D*>(member->MakeClone(flags, translation));
-    if (!clone) {
-      target.FreeAll();
+    GeListNode* clone = member->MakeClone(flags, translation);
+    auto* node = NodeCast<BaseList2D>(clone);
+    if (!node || !target->Append(node, true)) {
+      DeleteObj(clone);
+      target->FreeAll();
       return false;
     }
-    target.Append(clone, true);
   }
   return true;
 }
@@ -221,7 +243,7 @@ Bool RootViewPanel::ReadChunk(HyperFile& file, Long id, Long level)
 {
   if (RootList2D::ReadChunk(file, id, level))
     return true;
-  return id == kTypeViewPanel && ReadMember(file, MakeViewPanel(), false);
+  return id == kTypeViewPanel && ReadMember(file, NewObj<ViewPanel>(), false);
 }
 
 Bool RootBaseDraw::ReadChunk(HyperFile& file, Long id, Long level)
@@ -243,18 +265,28 @@ Bool FixedLabelRoot::ReadChunk(HyperFile& file, Long id, Long level)
   member->SetDocument(GetDocument());
   // The file's sticky error stops whatever follows a member that reads badly; the member itself stays.
   member->ReadChunkLoop(file, true);
-  Append(member, true);
-  return true;
+  return Append(member, true);
 }
 
-RootMultipass::RootMultipass() : FixedLabelRoot(kTypeMultipass, MakeMultipass) {}
+namespace
+{
 
-RootVideoPost::RootVideoPost() : FixedLabelRoot(kTypeVideoPost, MakeVideoPost) {}
+template <class Node>
+BaseList2D* Make()
+{
+  return NewObj<Node>();
+}
 
-RootShader::RootShader() : FixedLabelRoot(kShaderLabel, MakeEmptyShader) {}
+} // namespace
 
-RootCTrack::RootCTrack() : FixedLabelRoot(kLabelTrack, MakeEmptyTrack) {}
+RootMultipass::RootMultipass() : FixedLabelRoot(kTypeMultipass, MultipassObject::kNodeKind, Make<MultipassObject>) {}
 
-RootCKey::RootCKey() : FixedLabelRoot(kLabelKey, MakeEmptyKey) {}
+RootVideoPost::RootVideoPost() : FixedLabelRoot(kTypeVideoPost, BaseVideoPost::kNodeKind, Make<BaseVideoPost>) {}
+
+RootShader::RootShader() : FixedLabelRoot(kShaderLabel, BaseShader::kNodeKind, Make<BaseShader>) {}
+
+RootCTrack::RootCTrack() : FixedLabelRoot(kLabelTrack, CTrack::kNodeKind, Make<CTrack>) {}
+
+RootCKey::RootCKey() : FixedLabelRoot(kLabelKey, CKey::kNodeKind, Make<CKey>) {}
 
 } // namespace _torvane_

@@ -51,7 +51,7 @@ void BaseObject::SetDocument(BaseDocument* document)
     SetDocumentOfMembers(list, document);
 }
 
-BaseTag* BaseObject::GetFirstTag() const { return static_cast<BaseTag*>(tags_.GetFirst()); }
+BaseTag* BaseObject::GetFirstTag() const { return NodeCast<BaseTag>(tags_.GetFirst()); }
 
 BaseTag* BaseObject::GetTag(Long type) const
 {
@@ -369,16 +369,18 @@ void BaseObject::CopyTransform(BaseObject& destination) const
 
 Bool BaseObject::CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation)
 {
-  auto& target = static_cast<BaseObject&>(destination);
-  if (!CopyObjectData(target, flags, translation))
+  auto* target = NodeCast<BaseObject>(&destination);
+  if (!target)
     return false;
-  if (!BaseList2D::CopyTo(target, flags, translation) || !tags_.CopyWithTranslation(target.tags_, flags, translation))
+  if (!CopyObjectData(*target, flags, translation))
     return false;
-  for (BaseTag* tag = target.GetFirstTag(); tag; tag = tag->GetNext())
-    tag->SetObject(&target);
-  if (GetType() != target.GetType() && !(flags & kCopyNoBranches))
+  if (!BaseList2D::CopyTo(*target, flags, translation) || !tags_.CopyWithTranslation(target->tags_, flags, translation))
+    return false;
+  for (BaseTag* tag = target->GetFirstTag(); tag; tag = tag->GetNext())
+    tag->SetObject(target);
+  if (GetType() != target->GetType() && !(flags & kCopyNoBranches))
     ReportAssertion("q7r_file", __LINE__, "an object was copied onto an object of another type");
-  CopyTransform(target);
+  CopyTransform(*target);
   return true;
 }
 
@@ -386,7 +388,7 @@ Bool BaseObject::CloneChildren(BaseObject& destination, ULong flags, TransArray*
 {
   BaseObject* last = nullptr;
   for (BaseObject* child = GetDown(); child; child = child->GetNext()) {
-    auto* clone = destination.children_ ? static_cast<BaseObject*>(child->MakeClone(flags, translation)) : nullptr;
+    auto* clone = destination.children_ ? NodeCast<BaseObject>(child->MakeClone(flags, translation)) : nullptr;
     if (!clone)
       return false;
     if (last)

@@ -1,14 +1,18 @@
 #include "q7r_file/objects/opaque_object_data.h"
 
 #include "torvane/ids.h"
+#include "torvane/objects/base_object.h"
 #include "torvane/stream/hyper_file.h"
 
 namespace _torvane_
 {
 
+const NodeKind& OpaqueObjectData::GetOwnerKind() const { return BaseObject::kNodeKind; }
+
 Bool OpaqueObjectData::CopyTo(PrivateChunk& destination, ULong, TransArray*)
 {
-  return destination.IsInstanceOf(type_) && body_.CopyTo(static_cast<OpaqueObjectData&>(destination).body_);
+  auto* target = NodeCast<OpaqueObjectData>(&destination);
+  return target && target->type_ == type_ && body_.CopyTo(target->body_);
 }
 
 Bool OpaqueObjectData::ReadData(HyperFile& file, Long id, Long level)

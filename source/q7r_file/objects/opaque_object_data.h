@@ -10,6 +10,10 @@ namespace _torvane_
 class OpaqueObjectData : public NodeData
 {
  public:
+  static constexpr NodeKindOf<OpaqueObjectData> kNodeKind{"opaque data", &NodeData::kNodeKind};
+  const NodeKind& GetNodeKind() const override { return kNodeKind; }
+  const NodeKind& GetOwnerKind() const override;
+
   // `type` is that of the owner object; `level` and an empty body are what a new object writes.
   OpaqueObjectData(Long type, Long level, Long diskType) : type_(type), diskType_(diskType) { body_.SetLevel(level); }
 

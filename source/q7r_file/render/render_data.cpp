@@ -3,7 +3,6 @@
 #include "k2v_file/stream/chunk_visitor.h"
 #include "q7r_file/nodes/node_tools.h"
 #include "q7r_file/render/render_defaults.h"
-#include "q7r_file/types/member_makers.h"
 #include "torvane/hooks.h"
 
 namespace _torvane_
@@ -57,15 +56,17 @@ Bool RenderData::ReadChunk(HyperFile& file, Long id, Long level)
 
 Bool RenderData::CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation)
 {
-  auto& target = static_cast<RenderData&>(destination);
+  auto* target = NodeCast<RenderData>(&destination);
+  if (!target)
+    return false;
   if (!BaseList4D::CopyTo(destination, flags, translation) ||
-      !videoPosts_.CopyTo(target.videoPosts_, flags, translation) ||
-      !multipasses_.CopyTo(target.multipasses_, flags, translation) ||
-      !extraData_.CopyTo(target.extraData_, flags, translation))
+      !videoPosts_.CopyTo(target->videoPosts_, flags, translation) ||
+      !multipasses_.CopyTo(target->multipasses_, flags, translation) ||
+      !extraData_.CopyTo(target->extraData_, flags, translation))
     return false;
   if ((flags & kCopyNoChildren) || !children_ || children_->IsEmpty())
     return true;
-  return target.MakeChildList() && children_->CopyTo(*target.children_, flags, translation);
+  return target->MakeChildList() && children_->CopyTo(*target->children_, flags, translation);
 }
 
 GeListNode* RenderData::MakeClone(ULong flags, TransArray* translation)
@@ -102,16 +103,16 @@ Bool MultipassObject::ReadChunk(HyperFile& file, Long id, Long level)
 
 Bool MultipassObject::CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation)
 {
-  auto& target = static_cast<MultipassObject&>(destination);
-  return BaseList4D::CopyTo(destination, flags, translation) && settings_.CopyTo(target.settings_, flags, translation);
+  auto* target = NodeCast<MultipassObject>(&destination);
+  if (!target)
+    return false;
+  return BaseList4D::CopyTo(destination, flags, translation) && settings_.CopyTo(target->settings_, flags, translation);
 }
 
 GeListNode* MultipassObject::MakeClone(ULong flags, TransArray* translation)
 {
   return CloneNode(*this, NewObj<MultipassObject>(), flags, translation);
 }
-
-BaseList2D* MakeMultipass() { return NewObj<MultipassObject>(); }
 
 BaseVideoPost::BaseVideoPost() : BaseList2D(kTypeVideoPost) {}
 
@@ -153,16 +154,16 @@ Bool BaseVideoPost::ReadChunk(HyperFile& file, Long id, Long level)
 
 Bool BaseVideoPost::CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation)
 {
-  auto& target = static_cast<BaseVideoPost&>(destination);
-  target.pluginId_ = pluginId_;
-  return BaseList2D::CopyTo(destination, flags, translation) && settings_.CopyTo(target.settings_, flags, translation);
+  auto* target = NodeCast<BaseVideoPost>(&destination);
+  if (!target)
+    return false;
+  target->pluginId_ = pluginId_;
+  return BaseList2D::CopyTo(destination, flags, translation) && settings_.CopyTo(target->settings_, flags, translation);
 }
 
 GeListNode* BaseVideoPost::MakeClone(ULong flags, TransArray* translation)
 {
   return CloneNode(*this, NewObj<BaseVideoPost>(), flags, translation);
 }
-
-BaseList2D* MakeVideoPost() { return NewObj<BaseVideoPost>(); }
 
 } // namespace _torvane_

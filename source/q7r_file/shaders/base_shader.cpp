@@ -2,7 +2,6 @@
 
 #include "k2v_file/stream/chunk_visitor.h"
 #include "q7r_file/nodes/node_data_chunk.h"
-#include "q7r_file/types/member_makers.h"
 
 namespace _torvane_
 {
@@ -39,11 +38,7 @@ Bool BaseShader::MakeChildList()
 Bool BaseShader::IsInstanceOf(Long type) const { return type == kShaderLabel || BaseList4D::IsInstanceOf(type); }
 
 // The list of a material has an owner too.
-BaseShader* BaseShader::GetUp() const
-{
-  BaseList2D* owner = listHead_ ? listHead_->GetOwner() : nullptr;
-  return owner ? owner->AsShader() : nullptr;
-}
+BaseShader* BaseShader::GetUp() const { return listHead_ ? NodeCast<BaseShader>(listHead_->GetOwner()) : nullptr; }
 
 Bool BaseShader::ReadTypeData(HyperFile& file, Long level)
 {
@@ -98,16 +93,18 @@ void BaseShader::WriteChunks(HyperFile& file)
 
 Bool BaseShader::CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation)
 {
-  auto& target = static_cast<BaseShader&>(destination);
-  target.SetType(GetType());
-  target.hasReadLevel_ = hasReadLevel_;
-  return raw_.CopyTo(target.raw_) && BaseList4D::CopyTo(destination, flags, translation);
+  auto* target = NodeCast<BaseShader>(&destination);
+  if (!target)
+    return false;
+  target->SetType(GetType());
+  target->hasReadLevel_ = hasReadLevel_;
+  return raw_.CopyTo(target->raw_) && BaseList4D::CopyTo(destination, flags, translation);
 }
 
 Bool BaseShader::CloneChildren(BaseShader& clone, ULong flags, TransArray* translation)
 {
   for (BaseShader* child = GetDown(); child; child = child->GetNext()) {
-    auto* copy = clone.children_ ? static_cast<BaseShader*>(child->MakeClone(flags, translation)) : nullptr;
+    auto* copy = clone.children_ ? NodeCast<BaseShader>(child->MakeClone(flags, translation)) : nullptr;
     if (!copy)
       return false;
     clone.children_->InsertLast(copy);
@@ -148,7 +145,5 @@ void BaseShader::SetBitmapFilename(const Filename& filename)
 }
 
 BaseShader* MakeShader(Long type) { return NewObj<BaseShader>(type); }
-
-BaseList2D* MakeEmptyShader() { return NewObj<BaseShader>(); }
 
 } // namespace _torvane_

@@ -19,6 +19,12 @@ BaseTag::BaseTag(Long type, Long pluginId) : BaseList2D(type), pluginId_(pluginI
 
 BaseTag::~BaseTag() { DeleteObj(nodeData_); }
 
+void BaseTag::RemoveFromList()
+{
+  BaseList2D::RemoveFromList();
+  object_ = nullptr;
+}
+
 const void* BaseTag::GetEntryBytes(LLong& size) const
 {
   size = 0;
@@ -74,7 +80,7 @@ Bool BaseTag::CopyPluginData(BaseTag& destination, ULong flags, TransArray* tran
     return raw_.CopyTo(destination.raw_);
   }
   Bool known = false;
-  NodeData* data = AllocNodeData(pluginId_, known);
+  NodeData* data = AllocNodeDataFor(destination, pluginId_, known);
   if (!known && !data)
     data = AllocTagDataOfType(pluginId_, known);
   if (known && !data)
@@ -86,15 +92,17 @@ Bool BaseTag::CopyPluginData(BaseTag& destination, ULong flags, TransArray* tran
 
 Bool BaseTag::CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation)
 {
-  auto& target = static_cast<BaseTag&>(destination);
-  if (!BaseList2D::CopyTo(target, flags, translation))
+  auto* target = NodeCast<BaseTag>(&destination);
+  if (!target)
     return false;
-  // A plug-in tag may bear the number of another class.
-  if (GetType() != target.GetType() || GetDiskType() != target.GetDiskType())
+  if (GetType() != target->GetType() || GetDiskType() != target->GetDiskType() ||
+      !target->GetNodeKind().Is(GetNodeKind()))
     return false;
-  if (!CopyTagData(target, flags, translation))
+  if (!BaseList2D::CopyTo(*target, flags, translation))
     return false;
-  return GetDiskType() != kTagPlugin || CopyPluginData(target, flags, translation);
+  if (!CopyTagData(*target, flags, translation))
+    return false;
+  return GetDiskType() != kTagPlugin || CopyPluginData(*target, flags, translation);
 }
 
 Bool BaseTag::GetParameter(const ParameterPath& path, GeData& value)

@@ -151,9 +151,11 @@ Bool DisplayTag::ReadChunk(HyperFile& file, Long id, Long level)
 
 Bool DisplayTag::CopyTagData(BaseTag& destination, ULong, TransArray*)
 {
-  auto& target = static_cast<DisplayTag&>(destination);
-  GeCopyMem(target.longs_, longs_, sizeof longs_);
-  GeCopyMem(target.reals_, reals_, sizeof reals_);
+  auto* target = NodeCast<DisplayTag>(&destination);
+  if (!target)
+    return false;
+  GeCopyMem(target->longs_, longs_, sizeof longs_);
+  GeCopyMem(target->reals_, reals_, sizeof reals_);
   return true;
 }
 

@@ -22,7 +22,8 @@ void SelectionTag::WriteChunks(HyperFile& file)
 
 Bool SelectionTag::CopyTagData(BaseTag& destination, ULong, TransArray*)
 {
-  return select_.CopySelect(static_cast<SelectionTag&>(destination).select_);
+  auto* target = NodeCast<SelectionTag>(&destination);
+  return target && select_.CopySelect(target->select_);
 }
 
 } // namespace _torvane_

@@ -147,9 +147,11 @@ BaseTag* MakeTextureTag() { return NewObj<TextureTag>(); }
 
 Bool TextureTag::CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation)
 {
-  auto& target = static_cast<TextureTag&>(destination);
-  target.matrixValid_ = false;
-  target.textureMatrix_ = Matrix();
+  auto* target = NodeCast<TextureTag>(&destination);
+  if (!target)
+    return false;
+  target->matrixValid_ = false;
+  target->textureMatrix_ = Matrix();
   return BaseTag::CopyTo(destination, flags, translation);
 }
 

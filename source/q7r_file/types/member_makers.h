@@ -7,17 +7,11 @@
 namespace _torvane_
 {
 
-class BaseList2D;
+class BaseDraw;
 class BaseObject;
 class NodeData;
 
-BaseList2D* MakeViewPanel();
-BaseList2D* MakeBaseDraw();
-BaseList2D* MakeMultipass();
-BaseList2D* MakeVideoPost();
-BaseList2D* MakeEmptyShader();
-BaseList2D* MakeEmptyTrack();
-BaseList2D* MakeEmptyKey();
+BaseDraw* MakeBaseDraw();
 BaseObject* MakePointObject();
 NodeData* MakePointObjectData();
 

@@ -30,7 +30,7 @@ BaseDraw::BaseDraw() : BaseList2D(kTypeBaseDraw), editorCamera_(AllocObject(kObj
 
 BaseDraw::~BaseDraw() { DeleteObj(editorCamera_); }
 
-BaseList2D* MakeBaseDraw()
+BaseDraw* MakeBaseDraw()
 {
   BaseDraw* draw = NewObj<BaseDraw>();
   if (draw && !draw->IsComplete())
@@ -87,20 +87,20 @@ Bool BaseDraw::ReadChunk(HyperFile& file, Long id, Long level)
 
 Bool BaseDraw::CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation)
 {
-  auto& target = static_cast<BaseDraw&>(destination);
-  return BaseList2D::CopyTo(destination, flags, translation) && IsComplete() && target.IsComplete() &&
-         editorCamera_->CopyWithTranslation(*target.editorCamera_, flags, translation) &&
-         sceneCamera_.CopyLinkTo(&target.sceneCamera_, translation);
+  auto* target = NodeCast<BaseDraw>(&destination);
+  if (!target)
+    return false;
+  return BaseList2D::CopyTo(destination, flags, translation) && IsComplete() && target->IsComplete() &&
+         editorCamera_->CopyWithTranslation(*target->editorCamera_, flags, translation) &&
+         sceneCamera_.CopyLinkTo(&target->sceneCamera_, translation);
 }
 
 GeListNode* BaseDraw::MakeClone(ULong flags, TransArray* translation)
 {
-  return CloneNode(*this, static_cast<BaseDraw*>(MakeBaseDraw()), flags, translation);
+  return CloneNode(*this, MakeBaseDraw(), flags, translation);
 }
 
 ViewPanel::ViewPanel() : BaseList2D(kTypeViewPanel) { draws_.SetOwner(this); }
-
-BaseList2D* MakeViewPanel() { return NewObj<ViewPanel>(); }
 
 void ViewPanel::SetDocument(BaseDocument* document)
 {
@@ -134,9 +134,11 @@ Bool ViewPanel::ReadChunk(HyperFile& file, Long id, Long level)
 
 Bool ViewPanel::CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation)
 {
-  auto& target = static_cast<ViewPanel&>(destination);
-  return BaseList2D::CopyTo(destination, flags, translation) && draws_.CopyTo(target.draws_, flags, translation) &&
-         settings_.CopyTo(target.settings_, flags, translation);
+  auto* target = NodeCast<ViewPanel>(&destination);
+  if (!target)
+    return false;
+  return BaseList2D::CopyTo(destination, flags, translation) && draws_.CopyTo(target->draws_, flags, translation) &&
+         settings_.CopyTo(target->settings_, flags, translation);
 }
 
 GeListNode* ViewPanel::MakeClone(ULong flags, TransArray* translation)
@@ -149,7 +151,7 @@ Bool ViewPanel::MakeDraws()
 {
   BaseDraw* draws[kDrawCount] = {};
   for (BaseDraw*& draw : draws) {
-    draw = static_cast<BaseDraw*>(MakeBaseDraw());
+    draw = MakeBaseDraw();
     if (draw)
       continue;
     for (BaseDraw*& made : draws)
@@ -168,7 +170,7 @@ BaseDraw* ViewPanel::GetBaseDraw(Long index)
   if (draws_.GetCount() < kDrawCount && !MakeDraws())
     return nullptr;
   index = index < 0 ? 0 : index >= kDrawCount ? kDrawCount - 1 : index;
-  auto* draw = static_cast<BaseDraw*>(draws_.GetFirst());
+  auto* draw = NodeCast<BaseDraw>(draws_.GetFirst());
   for (Long i = 0; draw && i < index; ++i)
     draw = draw->GetNext();
   return draw;
@@ -176,9 +178,9 @@ BaseDraw* ViewPanel::GetBaseDraw(Long index)
 
 Bool BaseDocument::SetSceneCamera(BaseObject* camera)
 {
-  if (!camera || camera->GetDiskType() != kObjectGeneric || camera->GetType() != kObjectCamera || !viewPanels_)
+  if (!camera || camera->GetType() != kObjectCamera || !viewPanels_)
     return false;
-  auto* panel = static_cast<ViewPanel*>(viewPanels_->GetFirst());
+  auto* panel = NodeCast<ViewPanel>(viewPanels_->GetFirst());
   if (!panel) {
     panel = NewObj<ViewPanel>();
     viewPanels_->InsertFirst(panel);

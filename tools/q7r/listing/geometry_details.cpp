@@ -45,49 +45,49 @@ Json SelectionJson(const BaseSelect& selection)
   return ArrayJson(selection.SegmentArray(), selection.SegmentCount());
 }
 
+Json ValuesOf(const SelectionTag& tag) { return SelectionJson(tag.GetSelect()); }
+LLong CountOf(const SelectionTag& tag) { return tag.GetSelect().SelectedCount(); }
+
 template <class Tag>
-Json ValuesOf(BaseTag& tag)
+Json ValuesOf(const Tag& tag)
 {
-  const auto& valueTag = static_cast<const Tag&>(tag);
-  return ArrayJson(valueTag.GetArray(), valueTag.GetCount());
+  return ArrayJson(tag.GetArray(), tag.GetCount());
 }
 
-template <>
-Json ValuesOf<SelectionTag>(BaseTag& tag)
+template <class Tag>
+LLong CountOf(const Tag& tag)
 {
-  return SelectionJson(static_cast<SelectionTag&>(tag).GetSelect());
+  return tag.GetCount();
 }
-
-LLong CountOf(BaseTag& tag) { return static_cast<BaseArrayTag&>(tag).GetCount(); }
-LLong SelectedOf(BaseTag& tag) { return static_cast<SelectionTag&>(tag).GetSelect().SelectedCount(); }
 
 struct ArrayKind
 {
-  Long type; // of the node: a tag of a plug-in may bear the same number
-  Json (*values)(BaseTag& tag);
-  LLong (*count)(BaseTag& tag);
+  const NodeKind& kind;
+  Json (*values)(const BaseTag& tag);
+  LLong (*count)(const BaseTag& tag);
   const char* one;
   const char* many;
 };
 
+template <class Tag>
+constexpr ArrayKind KindOf(const char* one, const char* many)
+{
+  return {Tag::kNodeKind, [](const BaseTag& tag) { return ValuesOf(*NodeCast<Tag>(&tag)); },
+          [](const BaseTag& tag) { return CountOf(*NodeCast<Tag>(&tag)); }, one, many};
+}
+
 constexpr ArrayKind kArrayKinds[] = {
-    {kTagPoint, ValuesOf<PointTag>, CountOf, "point", "points"},
-    {kTagPolygon, ValuesOf<PolygonTag>, CountOf, "polygon", "polygons"},
-    {kTagTangent, ValuesOf<TangentTag>, CountOf, "point", "points"},
-    {kTagUVW, ValuesOf<UVWTag>, CountOf, "polygon", "polygons"},
-    {kTagSegment, ValuesOf<SegmentTag>, CountOf, "segment", "segments"},
-    {kTagPolygonSelection, ValuesOf<SelectionTag>, SelectedOf, "selected", "selected"},
-    {kTagPointSelection, ValuesOf<SelectionTag>, SelectedOf, "selected", "selected"},
-    {kTagEdgeSelection, ValuesOf<SelectionTag>, SelectedOf, "selected", "selected"},
-    {kTagVertexMap, ValuesOf<VertexMapTag>, CountOf, "weight", "weights"},
-    {kTagNormal, ValuesOf<NormalTag>, CountOf, "polygon", "polygons"},
+    KindOf<PointTag>("point", "points"),       KindOf<PolygonTag>("polygon", "polygons"),
+    KindOf<TangentTag>("point", "points"),     KindOf<UVWTag>("polygon", "polygons"),
+    KindOf<SegmentTag>("segment", "segments"), KindOf<SelectionTag>("selected", "selected"),
+    KindOf<VertexMapTag>("weight", "weights"), KindOf<NormalTag>("polygon", "polygons"),
 };
 
 const ArrayKind* FindKind(const BaseTag& tag)
 {
-  for (const ArrayKind& kind : kArrayKinds) {
-    if (kind.type == tag.GetDiskType())
-      return &kind;
+  for (const ArrayKind& row : kArrayKinds) {
+    if (tag.GetNodeKind().Is(row.kind))
+      return &row;
   }
   return nullptr;
 }
@@ -109,11 +109,9 @@ struct NamedSelection
 std::vector<NamedSelection> SelectionsOf(const BaseObject& object)
 {
   std::vector<NamedSelection> all;
-  NodeData* data = object.GetObjectData();
-  if (data && data->IsInstanceOf(kObjectPoint)) {
-    auto& points = static_cast<PointObjectData&>(*data);
-    all = {{"pointSelection", "point selected", "points selected", &points.GetPointSelection()},
-           {"hiddenPoints", "point hidden", "points hidden", &points.GetHiddenPoints()}};
+  if (auto* points = NodeCast<PointObjectData>(object.GetObjectData())) {
+    all = {{"pointSelection", "point selected", "points selected", &points->GetPointSelection()},
+           {"hiddenPoints", "point hidden", "points hidden", &points->GetHiddenPoints()}};
   }
   if (PolygonObjectData* polygons = GetPolygonData(object)) {
     all.insert(all.end(),

@@ -21,7 +21,7 @@ std::string Quoted(const String& text) { return "\"" + ToUtf8(text) + "\""; }
 Json ChannelsJson(BaseMaterial& material)
 {
   Json states = Json::array();
-  const Material* standard = material.AsMaterial();
+  const Material* standard = NodeCast<Material>(&material);
   for (Long channel = 0; standard && channel <= kLastChannel; ++channel)
     states.push_back(standard->ChannelIsOn(channel));
   if (standard)
@@ -85,7 +85,7 @@ std::vector<std::string> MaterialLines(BaseDocument& document)
 {
   std::vector<std::string> lines;
   for (BaseMaterial* material = document.GetFirstMaterial(); material; material = material->GetNext()) {
-    const Material* standard = material->AsMaterial();
+    const Material* standard = NodeCast<Material>(material);
     std::string line = TypeName(material->GetType()) + " " + Quoted(material->GetName());
     lines.push_back(standard ? line + SurfaceText(*standard) : line);
     AddShaderLines(lines, material->GetShaders(), 1);

@@ -17,11 +17,7 @@ using namespace _torvane_;
 namespace
 {
 
-LightObjectData* LightDataOf(BaseObject& object)
-{
-  NodeData* data = object.GetObjectData();
-  return data && data->IsInstanceOf(kObjectLight) ? static_cast<LightObjectData*>(data) : nullptr;
-}
+LightObjectData* LightDataOf(BaseObject& object) { return NodeCast<LightObjectData>(object.GetObjectData()); }
 
 GeData Parameter(BaseObject& object, Long id)
 {
@@ -110,12 +106,9 @@ Json DrawJson(BaseDraw& draw)
           {"camera", std::move(camera)}};
 }
 
-BaseDraw* FirstDraw(ViewPanel& panel) { return static_cast<BaseDraw*>(panel.GetDraws().GetFirst()); }
+BaseDraw* FirstDraw(ViewPanel& panel) { return NodeCast<BaseDraw>(panel.GetDraws().GetFirst()); }
 
-ViewPanel* FirstPanel(BaseDocument& document)
-{
-  return static_cast<ViewPanel*>(document.GetViewPanelRoot()->GetFirst());
-}
+ViewPanel* FirstPanel(BaseDocument& document) { return NodeCast<ViewPanel>(document.GetViewPanelRoot()->GetFirst()); }
 
 } // namespace
 
@@ -163,7 +156,7 @@ std::vector<std::string> ViewLines(BaseDocument& document)
     lines.push_back("panel");
     for (BaseDraw* draw = FirstDraw(*panel); draw; draw = draw->GetNext()) {
       const Long projection = draw->GetEditorCamera()->GetDataInstance().GetLong(kCameraProjection);
-      const auto* camera = static_cast<const BaseList2D*>(draw->GetSceneCamera().GetLink());
+      const auto* camera = NodeCast<BaseList2D>(draw->GetSceneCamera().GetLink());
       lines.push_back("  " + ProjectionText(projection) +
                       (camera ? " through \"" + ToUtf8(camera->GetName()) + "\"" : std::string()));
     }

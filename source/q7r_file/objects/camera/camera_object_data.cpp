@@ -194,6 +194,8 @@ void UpdateDistancePair(BaseContainer& settings)
 
 NodeData* MakeCameraObjectData() { return NewObj<CameraObjectData>(); }
 
+const NodeKind& CameraObjectData::GetOwnerKind() const { return BaseObject::kNodeKind; }
+
 BaseContainer& CameraObjectData::GetSettings() const { return node_->GetDataInstance(); }
 
 Bool CameraObjectData::Init()
@@ -232,10 +234,8 @@ Real CameraObjectData::GetAspectFactor() const
 
 Bool CameraObjectData::HasTarget() const
 {
-  // The data of a tag that claims a camera's type have a tag for a node.
-  if (!node_->IsInstanceOf(kObjectCamera))
-    return false;
-  const BaseTag* tag = static_cast<BaseObject*>(node_)->GetTag(kTagTarget);
+  const auto* camera = NodeCast<BaseObject>(node_);
+  const BaseTag* tag = camera ? camera->GetTag(kTagTarget) : nullptr;
   return tag && tag->GetDataInstance().GetLink(kTargetLink);
 }
 

@@ -14,7 +14,7 @@ Tag* FindTagFrom(BaseTag* tag, Long type)
 {
   while (tag && tag->GetDiskType() != type)
     tag = tag->GetNext();
-  return static_cast<Tag*>(tag);
+  return NodeCast<Tag>(tag);
 }
 
 template <class Tag>
@@ -28,7 +28,7 @@ template <class Tag>
 Tag* NeedTag(BaseObject& object, Long type)
 {
   Tag* tag = FindTag<Tag>(object, type);
-  return tag ? tag : static_cast<Tag*>(object.MakeTag(type));
+  return tag ? tag : NodeCast<Tag>(object.MakeTag(type));
 }
 
 // Gives every tag of this type `count` entries. False when one can't be resized; those behind it stay as they are.

@@ -17,8 +17,7 @@ PolygonTag* GetPolygonTag(const BaseObject& object) { return FindTag<PolygonTag>
 
 PolygonObjectData* GetPolygonData(const BaseObject& object)
 {
-  NodeData* data = object.GetObjectData();
-  return data && data->IsInstanceOf(kObjectPolygon) ? static_cast<PolygonObjectData*>(data) : nullptr;
+  return NodeCast<PolygonObjectData>(object.GetObjectData());
 }
 
 Long GetPointCount(const BaseObject& object)
@@ -70,7 +69,7 @@ Bool ResizePolygons(BaseObject& object, Long points, Long polygons, Long ngons)
 
 Bool AddUVWTag(BaseObject& object)
 {
-  auto* tag = static_cast<UVWTag*>(MakeTag(kTagUVW));
+  auto* tag = NodeCast<UVWTag>(MakeTag(kTagUVW));
   if (tag && !tag->ResizeTagArray(GetPolygonCount(object)))
     DeleteObj(tag);
   object.InsertTag(tag);

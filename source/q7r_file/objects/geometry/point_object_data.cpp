@@ -3,6 +3,7 @@
 #include "k2v_file/stream/chunk_visitor.h"
 #include "q7r_file/nodes/node_tools.h"
 #include "q7r_file/types/object_data_makers.h"
+#include "torvane/objects/base_object.h"
 
 namespace _torvane_
 {
@@ -59,6 +60,8 @@ constexpr SelectionChunk<PolygonObjectData> PolygonObjectData::kSelections[] = {
     {kChunkPhongBreakEdges, &PolygonObjectData::phongBreakEdges_},
 };
 
+const NodeKind& PointObjectData::GetOwnerKind() const { return BaseObject::kNodeKind; }
+
 void PointObjectData::WriteChunks(HyperFile& file)
 {
   NodeData::WriteChunks(file);
@@ -75,9 +78,10 @@ Bool PointObjectData::CopyTo(PrivateChunk& destination, ULong flags, TransArray*
 {
   if (!NodeData::CopyTo(destination, flags, translation))
     return false;
-  const Bool alike = destination.IsInstanceOf(kObjectPoint) &&
-                     destination.IsInstanceOf(kObjectPolygon) == IsInstanceOf(kObjectPolygon);
-  return !alike || CopySelections(*this, static_cast<PointObjectData&>(destination), kSelections);
+  auto* target = NodeCast<PointObjectData>(&destination);
+  const Bool bothPolygons = NodeCast<PolygonObjectData>(target) && NodeCast<PolygonObjectData>(this);
+  const Bool neither = !NodeCast<PolygonObjectData>(target) && !NodeCast<PolygonObjectData>(this);
+  return !target || (!bothPolygons && !neither) || CopySelections(*this, *target, kSelections);
 }
 
 void PolygonObjectData::WriteChunks(HyperFile& file)
@@ -124,14 +128,14 @@ Bool PolygonObjectData::CopyTo(PrivateChunk& destination, ULong flags, TransArra
 {
   if (!PointObjectData::CopyTo(destination, flags, translation))
     return false;
-  if (!destination.IsInstanceOf(kObjectPolygon))
+  auto* target = NodeCast<PolygonObjectData>(&destination);
+  if (!target)
     return true;
-  auto& target = static_cast<PolygonObjectData&>(destination);
-  if (!CopySelections(*this, target, kSelections))
+  if (!CopySelections(*this, *target, kSelections))
     return false;
   if ((flags & kCopyNoNgons) || !ngons_ || ngons_->GetCount() == 0)
     return true;
-  return target.MakeNgons() && ngons_->CopyTo(*target.ngons_);
+  return target->MakeNgons() && ngons_->CopyTo(*target->ngons_);
 }
 
 } // namespace _torvane_

@@ -2,6 +2,7 @@
 
 #include "q7r_file/objects/geometry/geometry_tags.h"
 #include "q7r_file/types/object_data_makers.h"
+#include "torvane/objects/point_object_data.h"
 
 namespace _torvane_
 {
@@ -50,8 +51,8 @@ SplineObject::SplineObject() : PointObject(kObjectSpline)
 Bool SplineObject::ReadChunk(HyperFile& file, Long id, Long level)
 {
   if (!PointObject::ReadChunk(file, id, level)) {
-    const Bool hasPointData = objectData_ && objectData_->IsInstanceOf(kObjectPoint);
-    return hasPointData && objectData_->ReadData(file, id, level);
+    auto* points = NodeCast<PointObjectData>(objectData_);
+    return points && points->ReadData(file, id, level);
   }
   if (id == kChunkNodeHeader && !name_.Content())
     name_ = String("Spline");
@@ -90,7 +91,7 @@ SplineObject* AllocSpline(Long points, Long type)
 {
   if (points > kMaxSplinePoints)
     return nullptr;
-  auto* spline = static_cast<SplineObject*>(AllocObject(kObjectSpline));
+  auto* spline = NodeCast<SplineObject>(AllocObject(kObjectSpline));
   if (spline && (!SetSplineType(*spline, type) || (points >= 1 && !ResizeSpline(*spline, points, -1))))
     DeleteObj(spline);
   return spline;

@@ -21,8 +21,7 @@ constexpr Long kShapeOfUnknown = 1;
 
 LightObjectData* LightDataOf(const BaseObject* object)
 {
-  NodeData* data = object && object->GetType() == kObjectLight ? object->GetObjectData() : nullptr;
-  return data && data->IsInstanceOf(kObjectLight) ? static_cast<LightObjectData*>(data) : nullptr;
+  return object && object->GetType() == kObjectLight ? NodeCast<LightObjectData>(object->GetObjectData()) : nullptr;
 }
 
 // From metres to the unit of a document.
@@ -54,6 +53,8 @@ void SetEntries(BaseContainer& settings, const IESLight& light, const Vector& si
 }
 
 } // namespace
+
+const NodeKind& LightObjectData::GetOwnerKind() const { return BaseObject::kNodeKind; }
 
 Bool SetIESLight(BaseObject* object, IESLight* parsed, BaseDocument* document)
 {

@@ -358,14 +358,14 @@ Bool LightObjectData::ReadData(HyperFile& file, Long id, Long level)
 
 Bool LightObjectData::CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation)
 {
-  if (!destination.IsInstanceOf(kObjectLight) || !NodeData::CopyTo(destination, flags, translation))
+  auto* target = NodeCast<LightObjectData>(&destination);
+  if (!target || !NodeData::CopyTo(destination, flags, translation))
     return false;
-  auto& target = static_cast<LightObjectData&>(destination);
-  if (&target == this)
+  if (target == this)
     return true;
-  target.settings_ = settings_;
-  target.AdoptIES(CopyIESLight(iesLight_));
-  return !iesLight_ || target.iesLight_;
+  target->settings_ = settings_;
+  target->AdoptIES(CopyIESLight(iesLight_));
+  return !iesLight_ || target->iesLight_;
 }
 
 } // namespace _torvane_

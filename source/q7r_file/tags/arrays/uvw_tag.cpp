@@ -138,9 +138,11 @@ Bool UVWTag::SetParameter(const ParameterPath& path, const GeData& value)
 
 Bool UVWTag::CopyEntries(BaseArrayTag& target)
 {
-  auto& coordinates = static_cast<UVWTag&>(target);
-  coordinates.parameter_ = parameter_;
-  return BaseArrayTag::CopyEntries(target) && block_ && coordinates.block_;
+  auto* coordinates = NodeCast<UVWTag>(&target);
+  if (!coordinates)
+    return false;
+  coordinates->parameter_ = parameter_;
+  return BaseArrayTag::CopyEntries(target) && block_ && coordinates->block_;
 }
 
 // ---------------------------------------------------------------------------------------------------------------

@@ -85,8 +85,10 @@ void BaseArrayTag::WriteChunks(HyperFile& file)
 
 Bool BaseArrayTag::CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation)
 {
-  auto& target = static_cast<BaseArrayTag&>(destination);
-  return &target == this || (BaseTag::CopyTo(target, flags, translation) && CopyEntries(target));
+  auto* target = NodeCast<BaseArrayTag>(&destination);
+  if (!target)
+    return false;
+  return target == this || (BaseTag::CopyTo(*target, flags, translation) && CopyEntries(*target));
 }
 
 Bool BaseArrayTag::CopyEntries(BaseArrayTag& target)
@@ -288,8 +290,10 @@ void SegmentTag::WriteEntries(HyperFile& file)
 
 Bool SegmentTag::CopyEntries(BaseArrayTag& target)
 {
-  auto& segments = static_cast<SegmentTag&>(target);
-  segments.FreeEntries();
+  auto* segments = NodeCast<SegmentTag>(&target);
+  if (!segments)
+    return false;
+  segments->FreeEntries();
   return !block_ || BaseArrayTag::CopyEntries(target);
 }
 
@@ -338,8 +342,10 @@ void TangentTag::WriteEntries(HyperFile& file)
 
 Bool TangentTag::CopyEntries(BaseArrayTag& target)
 {
-  auto& tangents = static_cast<TangentTag&>(target);
-  tangents.FreeEntries();
+  auto* tangents = NodeCast<TangentTag>(&target);
+  if (!tangents)
+    return false;
+  tangents->FreeEntries();
   return !block_ || BaseArrayTag::CopyEntries(target);
 }
 

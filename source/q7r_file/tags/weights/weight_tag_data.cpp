@@ -301,22 +301,26 @@ Bool WeightTagData::ReadRestPose(HyperFile& file, JointRecord& record)
 
 // ---------------------------------------------------------------------------------------------------------------
 
+const NodeKind& WeightTagData::GetOwnerKind() const { return BaseTag::kNodeKind; }
+
 Bool WeightTagData::CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation)
 {
-  auto& target = static_cast<WeightTagData&>(destination);
-  if (&target == this)
-    return true;
-  if (!target.node_ || target.node_->GetType() != kTagWeight || !NodeData::CopyTo(destination, flags, translation))
+  auto* target = NodeCast<WeightTagData>(&destination);
+  if (!target)
     return false;
-  target.globalMatrix_ = globalMatrix_;
-  target.globalInverse_ = globalInverse_;
-  target.FlushJoints();
+  if (target == this)
+    return true;
+  if (!target->node_ || target->node_->GetType() != kTagWeight || !NodeData::CopyTo(destination, flags, translation))
+    return false;
+  target->globalMatrix_ = globalMatrix_;
+  target->globalInverse_ = globalInverse_;
+  target->FlushJoints();
   for (const JointRecord* record : joints_) {
-    JointRecord* copy = target.AppendJoint();
+    JointRecord* copy = target->AppendJoint();
     if (!copy || !record->CopyTo(*copy, translation))
       return false;
   }
-  return target.joints_.GetCount() == joints_.GetCount();
+  return target->joints_.GetCount() == joints_.GetCount();
 }
 
 // The one joint that is selected; null when none or more than one is.
@@ -358,8 +362,8 @@ Bool WeightTagData::SetParameter(const ParameterPath& path, const GeData& value)
 
 BaseObject* WeightTagData::GetTagObject() const
 {
-  // The data may hang on an object that claims the type of the tag.
-  return node_ && node_->GetDiskType() == kTagPlugin ? static_cast<BaseTag*>(node_)->GetObject() : nullptr;
+  const auto* tag = NodeCast<BaseTag>(node_);
+  return tag ? tag->GetObject() : nullptr;
 }
 
 Long WeightTagData::FindJoint(const BaseObject* joint) const
@@ -417,7 +421,7 @@ BaseObject* WeightTagData::FindObject(const JointRecord& record) const
   while (top && top->GetUp())
     top = top->GetUp();
   if (top && top->GetListHead())
-    top = static_cast<BaseObject*>(top->GetListHead()->GetFirst());
+    top = NodeCast<BaseObject>(top->GetListHead()->GetFirst());
   return FindInTree(top, target);
 }
 

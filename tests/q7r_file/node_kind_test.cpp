@@ -1,0 +1,115 @@
+// Classes of nodes: what a number of type promises and a class doesn't hold.
+#include <gtest/gtest.h>
+
+#include "q7r_file/node_bytes.h"
+#include "support/assertion_counter.h"
+#include "support/counting_memory.h"
+#include "torvane/torvane.h"
+
+namespace
+{
+
+using namespace _torvane_;
+
+// A plug-in's tag of a type, with content that only the plug-in knows.
+Bytes PluginTagChunk(Long type)
+{
+  return ByteWriter().Start(110064, 3).Long(type).Long(0).String(u"t").Long(42).Start(7, 1).Real(1.5).End().End().bytes;
+}
+
+} // namespace
+
+TEST(NodeKind, ATagGetsNoDataThatAreMadeForObjects)
+{
+  counting_memory::BalanceCheck balance;
+  for (Long type : {kObjectPolygon, kObjectLight, kObjectCamera, kObjectPlane}) {
+    SCOPED_TRACE(type);
+    BaseObject object(kObjectNull);
+    BaseTag* tag = object.MakeTag(kTagPlugin);
+    ASSERT_TRUE(ReadInto(*tag, PluginTagChunk(type)));
+    EXPECT_EQ(tag->GetNodeData(), nullptr);
+    GeData value;
+    for (Long id : {kCameraFieldOfView, kCameraUseTarget, kLightType}) {
+      tag->SetParameterById(id, GeData(1.0));
+      EXPECT_TRUE(tag->GetParameterById(id, value)); // of the tag's container
+    }
+    GeListNode* clone = tag->MakeClone(0, nullptr);
+    ASSERT_NE(clone, nullptr);
+    for (BaseList2D* each : {static_cast<BaseList2D*>(tag), NodeCast<BaseList2D>(clone)})
+      EXPECT_NE(ToHex(BytesOf(*each)).find(ToHex(PluginTagChunk(type))), std::string::npos);
+    DeleteObj(clone);
+  }
+  // Data that were given by hand all the same find no object behind their node.
+  BaseTag tag(kTagPlugin, kObjectCamera);
+  tag.SetNodeData(NewObj<CameraObjectData>());
+  GeData value;
+  EXPECT_TRUE(tag.GetParameterById(kCameraUseTarget, value));
+  EXPECT_FALSE(value.GetBool());
+}
+
+TEST(NodeKind, ACopyOntoAnotherClassOfTheSameNumberFailsAndTouchesNothing)
+{
+  counting_memory::BalanceCheck balance;
+  TextureTag texture;
+  DisplayTag display;
+  SelectionTag selection(kTagPointSelection);
+  VertexMapTag oldMap(kTagOldVertexMap);
+  ASSERT_TRUE(oldMap.ResizeTagArray(3));
+  PointTag points;
+  Material material;
+  LayerObject layer;
+  BaseList2D* const sources[] = {&texture, &display, &selection, &oldMap, &points, &material, &layer};
+  for (BaseList2D* source : sources) {
+    SCOPED_TRACE(source->GetNodeKind().name);
+    BaseTag tag(source->GetType());
+    BaseMaterial plain(source->GetType());
+    BaseObject object(source->GetType());
+    for (BaseList2D* target : std::initializer_list<BaseList2D*>{&tag, &plain, &object}) {
+      SetCountingMarker(*target);
+      BytesOf(*target); // the first write leaves its marks
+      const Bytes before = BytesOf(*target);
+      EXPECT_FALSE(source->CopyWithTranslation(*target, 0, nullptr)) << target->GetNodeKind().name;
+      EXPECT_EQ(BytesOf(*target), before) << target->GetNodeKind().name;
+    }
+  }
+}
+
+TEST(NodeKind, AListTakesItsOwnClassAlone)
+{
+  AssertionCounter reports;
+  BaseDocument* document = CreateDocument();
+  ASSERT_NE(document, nullptr);
+  BaseObject* object = AllocObject(kObjectNull);
+  RootList2D* const lists[] = {document->GetMaterialRoot(), document->GetLayerRoot(), document->GetRenderDataRoot(),
+                               document->GetViewPanelRoot(), &object->GetTagRoot()};
+  BaseTag tag(kTagProtection);
+  int refused = 0;
+  for (RootList2D* list : lists) {
+    const LLong count = list->GetCount();
+    EXPECT_FALSE(list->InsertFirst(object)) << ++refused;
+    EXPECT_FALSE(list->InsertLast(object)) << ++refused;
+    EXPECT_EQ(list->GetCount(), count);
+  }
+  EXPECT_FALSE(document->GetObjectRoot()->InsertLast(&tag));
+  EXPECT_EQ(reports.Take(), 2 * 5 + 1);
+  EXPECT_EQ(tag.GetDocument(), nullptr);
+  DeleteObj(object);
+  BaseDocument::Free(document);
+}
+
+TEST(NodeKind, ALinkToAnythingGivesOnlyWhatIsAskedFor)
+{
+  BaseDocument* document = CreateDocument();
+  BaseObject object(kTypeLayer); // the type of a layer
+  BaseObject node(kObjectNull);
+  for (GeListNode* target : std::initializer_list<GeListNode*>{&object, &document->GetPref()}) {
+    node.GetLinkInstance().SetLink(target);
+    EXPECT_EQ(node.GetLayer(), nullptr);
+    GeAliasLink link;
+    link.SetLink(target);
+    Material material;
+    material.GetDataInstance().SetData(3000, GeData(link));
+    EXPECT_EQ(material.ChannelShaderOf(3000), nullptr);
+  }
+  BaseDocument::Free(document);
+}
