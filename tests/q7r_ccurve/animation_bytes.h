@@ -1,10 +1,10 @@
 // Keys, curves and tracks as bytes, composed value by value.
 #pragma once
 
-#include <algorithm>
 #include <string_view>
 
 #include "q7r_file/node_bytes.h"
+#include "support/record_samples.h"
 
 namespace animation_test
 {
@@ -34,19 +34,6 @@ inline ByteWriter& Curve(ByteWriter& w, bool hasKey = false, double seconds = 0,
   if (hasKey)
     Key(w.Start(110419, 0).Start(110100, 0), seconds, value).End().End();
   return w.End();
-}
-
-// Markers are drawn anew for each node: all become zeros.
-inline Bytes WithoutMarkers(Bytes bytes)
-{
-  static constexpr std::uint8_t kStart[] = {0x0C, 1, 0x80, 0, 0, 0, 16};
-  for (auto place = bytes.begin();;) {
-    place = std::search(place, bytes.end(), std::begin(kStart), std::end(kStart));
-    if (place == bytes.end())
-      return bytes;
-    place += sizeof kStart;
-    std::fill_n(place, 16, std::uint8_t{0});
-  }
 }
 
 } // namespace animation_test

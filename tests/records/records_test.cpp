@@ -1,0 +1,167 @@
+// What holds for every record, by the samples of them all.
+#include <algorithm>
+#include <memory>
+
+#include <gtest/gtest.h>
+
+#include "support/assertion_counter.h"
+#include "support/counting_memory.h"
+#include "support/memory_file.h"
+#include "support/record_samples.h"
+#include "torvane/values/ge_data.h"
+
+namespace
+{
+
+using namespace _torvane_;
+using Bytes = std::vector<std::uint8_t>;
+
+struct NodeDeleter
+{
+  void operator()(GeListNode* node) const { DeleteObj(node); }
+};
+using NodePtr = std::unique_ptr<GeListNode, NodeDeleter>;
+
+Bytes Chunk(Long id, Long level, const std::vector<RecordValue>& values, Long version = 13000)
+{
+  return ByteWriter().Start(id, level).Append(RecordBytes(values, version)).End().bytes;
+}
+
+bool Read(GeListNode& node, const RecordSample& sample, const Bytes& chunk)
+{
+  const Bytes whole = ByteWriter().Header("Q7R6", sample.version).Append(chunk).End().bytes;
+  MemoryReadFile memory(whole);
+  return node.ReadChunkLoop(memory.file, true) && memory.file.GetPosition() == static_cast<LLong>(whole.size());
+}
+
+// What the node writes in place of `like`: nothing if it is `like`, or else the first bytes that differ.
+std::string Difference(GeListNode& node, const Bytes& like)
+{
+  const Bytes all = WithoutMarkers(WriteToMemory([&](HyperFile& file) { node.WriteChunks(file); }));
+  if (std::search(all.begin(), all.end(), like.begin(), like.end()) != all.end())
+    return "";
+  auto place = std::search(all.begin(), all.end(), like.begin(), like.begin() + 9);
+  auto wanted = like.begin();
+  for (; place != all.end() && *place == *wanted; ++place, ++wanted) {
+  }
+  const auto next = [](const Bytes& bytes, auto from) {
+    return ToHex(Bytes(from, from + std::min<std::ptrdiff_t>(bytes.end() - from, 20)));
+  };
+  return next(all, place) + " in place of " + next(like, wanted) + " at " + std::to_string(wanted - like.begin());
+}
+
+Bytes CurrentChunk(const RecordSample& sample)
+{
+  const bool same = sample.now == "same";
+  return Chunk(sample.chunk, same ? sample.level : sample.nowLevel, ParseRecord(same ? sample.body : sample.now));
+}
+
+GeListNode* CopyOf(GeListNode& node, const RecordSample& sample)
+{
+  if (GeListNode* clone = node.MakeClone(0, nullptr))
+    return clone;
+  GeListNode* copy = sample.make(); // of a class that has no clones
+  if (!node.CopyWithTranslation(*copy, 0, nullptr))
+    DeleteObj(copy);
+  return copy;
+}
+
+// The values that are marked by a parameter, against that parameter.
+void CheckParameters(GeListNode& node, const std::vector<RecordValue>& values)
+{
+  int depth = 0;
+  for (const RecordValue& value : values) {
+    depth += value.kind == '[' ? 1 : value.kind == ']' ? -1 : 0;
+    const std::size_t at = value.text.find('@');
+    if (at == std::string::npos || depth > 0)
+      continue;
+    GeData data;
+    ASSERT_TRUE(node.GetParameterById(std::stoi(value.text.substr(at + 1)), data)) << value.text;
+    const double number = value.kind == 'V'   ? data.GetVector().x
+                          : value.kind == 'T' ? data.GetTime().Get()
+                                              : data.GetReal();
+    EXPECT_TRUE(value.kind == 'S' || number == std::stod(value.text)) << value.text << " but " << number;
+  }
+}
+
+} // namespace
+
+TEST(Records, AreKeptCopiedAndWrittenInTheCurrentForm)
+{
+  const counting_memory::BalanceCheck balance;
+  for (const RecordSample& sample : RecordSamples()) {
+    SCOPED_TRACE(sample.name);
+    const auto values = ParseRecord(sample.body);
+    const NodePtr node(sample.make());
+    const bool read = Read(*node, sample, Chunk(sample.chunk, sample.level, values, sample.version));
+    EXPECT_TRUE(read);
+    if (!read)
+      continue;
+    CheckParameters(*node, values);
+    if (sample.now == "-")
+      continue;
+    const Bytes now = CurrentChunk(sample);
+    const NodePtr copy(CopyOf(*node, sample)); // before writing, which leaves check sums in objects
+    EXPECT_EQ(Difference(*node, now), "");
+    EXPECT_TRUE(copy && (Difference(*copy, now).empty() == sample.copied)) << Difference(*copy, now);
+  }
+}
+
+// Each value that is kept is kept by itself, whatever the others are.
+TEST(Records, KeepEachValueByItself)
+{
+  for (const RecordSample& sample : RecordSamples()) {
+    if (sample.now != "same")
+      continue;
+    const auto values = ParseRecord(sample.body);
+    for (std::size_t i = 0; i < values.size(); ++i) {
+      auto changed = values;
+      if (!ChangeValue(changed[i]))
+        continue;
+      const Bytes chunk = Chunk(sample.chunk, sample.level, changed);
+      const NodePtr node(sample.make());
+      EXPECT_TRUE(Read(*node, sample, chunk)) << sample.name << ", value " << i;
+      EXPECT_EQ(Difference(*node, chunk), "") << sample.name << ", value " << i;
+    }
+  }
+}
+
+TEST(Records, AreRefusedWhereverTheyAreCut)
+{
+  AssertionCounter silence;
+  const counting_memory::BalanceCheck balance;
+  for (const RecordSample& sample : RecordSamples()) {
+    const Bytes chunk = Chunk(sample.chunk, sample.level, ParseRecord(sample.body), sample.version);
+    for (std::size_t cut = 0; cut < chunk.size(); ++cut) {
+      const NodePtr node(sample.make());
+      MemoryReadFile memory(ByteWriter()
+                                .Header("Q7R6", sample.version)
+                                .Append({chunk.begin(), chunk.begin() + static_cast<long>(cut)})
+                                .bytes);
+      ASSERT_FALSE(node->ReadChunkLoop(memory.file, true)) << sample.name << " cut at " << cut;
+    }
+  }
+}
+
+TEST(Records, TakeNoMemoryForCountsThatTheFileDoesNotHold)
+{
+  AssertionCounter silence;
+  for (const RecordSample& sample : RecordSamples()) {
+    auto values = ParseRecord(sample.body);
+    for (RecordValue& value : values) {
+      if (value.mark != '#')
+        continue;
+      const std::string before = value.text;
+      for (const char* count : {"2147483647", "-1", "-2147483648", "40000", "1000000"}) {
+        value.text = count;
+        const Bytes chunk = Chunk(sample.chunk, sample.level, values, sample.version);
+        const NodePtr node(sample.make());
+        counting_memory::ResetPeak();
+        const LLong bytes = counting_memory::Get().bytes;
+        Read(*node, sample, chunk);
+        EXPECT_LT(counting_memory::Get().peakBytes - bytes, 100000) << sample.name << " with " << count;
+      }
+      value.text = before;
+    }
+  }
+}
