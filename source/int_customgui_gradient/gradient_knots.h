@@ -15,7 +15,7 @@ void ForEachKnot(const GradientData& gradient, Visit&& visit)
   const BaseContainer* knots = gradient.GetSettings().GetContainerInstance(kGradientKnots);
   BaseContainer::Iterator iterator;
   Long id = 0;
-  GeData* value = nullptr;
+  const GeData* value = nullptr;
   ULong place = 0;
   for (Bool more = knots && knots->BrowseFirst(iterator, id, value); more;
        more = knots->BrowseNext(iterator, id, value), ++place) {

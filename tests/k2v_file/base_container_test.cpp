@@ -29,7 +29,7 @@ std::string Listed(const BaseContainer& container)
   std::string text;
   BaseContainer::Iterator iterator;
   Long id = 0;
-  GeData* value = nullptr;
+  const GeData* value = nullptr;
   for (Bool more = container.BrowseFirst(iterator, id, value); more; more = container.BrowseNext(iterator, id, value))
     text += std::to_string(id) + ":" + std::to_string(value->GetLong()) + " ";
   return text;

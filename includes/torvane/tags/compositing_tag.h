@@ -14,11 +14,14 @@ class CompositingTag : public BaseTag
   static constexpr NodeKindOf<CompositingTag> kNodeKind{"compositing tag", &BaseTag::kNodeKind};
   const NodeKind& GetNodeKind() const override { return kNodeKind; }
 
-  // Sets every default.
-  CompositingTag();
+  // With every default. The clock of a tag that is to be read stays 0 unless an old file's values come, which lack it.
+  explicit CompositingTag(Bool toRead = false);
 
   // Also takes the tag's own chunk of old files, whose values become entries.
   Bool ReadChunk(HyperFile& file, Long id, Long level) override;
+
+ private:
+  void StartClock();
 };
 
 } // namespace _torvane_

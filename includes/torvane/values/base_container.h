@@ -1,5 +1,9 @@
 // An ordered list of ids and values. Order is that of insertion and is what a file keeps. There is no index: containers
 // are small, and every lookup scans from the start.
+//
+// New nodes of a class share one table of default elements, in static memory, until their container is to be changed:
+// it then takes a copy. Whatever gives a value that can be changed counts as a change; asking a container that is const
+// does not, and what its values lead to (links, containers, custom objects) is to be left as it is.
 #pragma once
 
 #include "torvane/memory/memory.h"
@@ -11,6 +15,7 @@ namespace _torvane_
 
 class BaseDocument;
 class BaseList2D;
+struct ContainerDefault;
 class TransArray;
 
 class BaseContainer
@@ -38,23 +43,32 @@ class BaseContainer
   // Sets the first element of that id, or appends. A stored Real stays a Real when a Long comes, and a stored Long
   // stays one when a Real comes, truncated. The element's value, or null when memory is short.
   GeData* SetData(Long id, const GeData& value);
-  Bool RemoveData(Long id);     // the first of that id
-  Bool RemoveIndex(Long index); // by position
+  // The first of that id, or the one at a position. False when there is none.
+  Bool RemoveData(Long id);
+  Bool RemoveIndex(Long index);
 
   Long FindIndex(Long id) const; // position of the first of that id, or -1
   Long GetCount() const;
-  GeData* GetIndexData(Long index) const; // null out of range
-  Long GetIndexId(Long index) const;      // -1 out of range
-  const GeData& GetData(Long id) const;   // a nil value when absent
-  GeData* FindData(Long id) const;        // null when absent
+  Long GetIndexId(Long index) const; // -1 out of range
+  // Null out of range, and when a value that can be changed needs memory that there isn't. The same holds below.
+  GeData* GetIndexData(Long index);
+  const GeData* GetIndexData(Long index) const;
+  const GeData& GetData(Long id); // a nil value when absent
+  const GeData& GetData(Long id) const;
+  GeData* FindData(Long id); // null when absent
+  const GeData* FindData(Long id) const;
 
   // Replaces the destination's id and elements by copies; each element removed and each one added counts as a change
   // there. False when memory is short: the destination is then unchanged.
   Bool CopyTo(BaseContainer& destination, ULong flags, TransArray* translation) const;
   // A new container that the caller owns; null when memory is short.
   BaseContainer* GetClone(ULong flags, TransArray* translation) const;
-  // Sets a copy of every element of `source`, which doesn't lie inside of this container. False when memory is short.
-  Bool MergeFrom(const BaseContainer& source);
+  // Sets every element of `defaults`, a container from DefaultsOf; an empty container shares them. False when memory is
+  // short.
+  Bool SetDefaults(const BaseContainer& defaults);
+  // Makes this new container that of a table. `places` has kDefaultSize bytes for each of the rows and
+  // outlives all containers.
+  void BuildDefaults(const ContainerDefault* rows, LLong count, void* places);
 
   // A getter gives the default only when the id is absent.
   Bool GetBool(Long id, Bool defaultValue = false) const;
@@ -81,10 +95,12 @@ class BaseContainer
   void SetContainer(Long id, const BaseContainer& value) { SetData(id, GeData(value)); }
   void SetLink(Long id, BaseList2D* target); // null sets an empty link
 
-  BaseContainer* GetContainerInstance(Long id) const; // null when absent or of another type
+  BaseContainer* GetContainerInstance(Long id); // null when absent or of another type
+  const BaseContainer* GetContainerInstance(Long id) const;
   // The target of the link of that id, or null. With a document, a target that belongs to another document gives null.
   BaseList2D* GetLink(Long id, const BaseDocument* document = nullptr) const;
-  CustomData* GetCustomDataType(Long id, Long type) const;
+  CustomData* GetCustomDataType(Long id, Long type);
+  const CustomData* GetCustomDataType(Long id, Long type) const;
 
   // Same id, same elements in the same order.
   Bool IsEqual(const BaseContainer& other) const;
@@ -98,15 +114,18 @@ class BaseContainer
   };
 
  public:
+  // The room that BuildDefaults takes for an element and its payload.
+  static constexpr std::size_t kDefaultSize = sizeof(Element) + sizeof(Vector);
+
   // Stands on an element; valid as long as that element.
   class Iterator
   {
     friend class BaseContainer;
-    Element* element_ = nullptr;
+    const Element* element_ = nullptr;
   };
   // Gives each element's id and value in order; false at the end.
-  Bool BrowseFirst(Iterator& iterator, Long& id, GeData*& value) const;
-  Bool BrowseNext(Iterator& iterator, Long& id, GeData*& value) const;
+  Bool BrowseFirst(Iterator& iterator, Long& id, const GeData*& value) const;
+  Bool BrowseNext(Iterator& iterator, Long& id, const GeData*& value) const;
 
   // The change counter, 16 bits wide.
   UWord GetDirty() const { return dirty_; }
@@ -130,8 +149,13 @@ class BaseContainer
   GeData* FillNew(Element* element, const GeData& value);
   Element* Find(Long id) const;
   Element* FindAt(Long index) const;
-  static Bool Visit(const Iterator& iterator, Long& id, GeData*& value);
+  static Bool Visit(const Iterator& iterator, Long& id, const GeData*& value);
+  static void BuildDefault(GeData& value, const ContainerDefault& row, void* payload);
   void Swap(BaseContainer& other);
+  void Share(const BaseContainer& source);
+  Bool IsShared() const { return head_ && !blocks_; }
+  Bool TakeCopy();
+  GeData* Change(const Element* element);
   Bool AppendCopies(const BaseContainer& source, ULong flags, TransArray* translation);
   BaseContainer* EnterGroup(Long id);
   Bool SetComponent(Long id, Long componentId, Real value);
@@ -140,9 +164,12 @@ class BaseContainer
 
   Element* head_ = nullptr;
   Element* tail_ = nullptr;
-  Element* free_ = nullptr;          // places of removed elements, linked through `next`
-  Block* blocks_ = nullptr;          // where the elements lie, the newest first; owned
-  BaseContainer* pending_ = nullptr; // the next container in the list of those that wait to be freed
+  Block* blocks_ = nullptr; // where the elements lie, the newest first; owned; null where they are shared
+  union
+  {
+    Element* free_ = nullptr; // places of removed elements, linked through `next`
+    BaseContainer* pending_;  // of a container that waits to be freed: the next one that does
+  };
   Long id_;
   UWord dirty_ = 0;
   UWord savedDirty_ = 0;

@@ -199,7 +199,7 @@ Bool HyperFile::WriteContainer(const BaseContainer& container)
   WriteLong(container.GetId());
   BaseContainer::Iterator iterator;
   Long id = 0;
-  GeData* value = nullptr;
+  const GeData* value = nullptr;
   for (Bool more = container.BrowseFirst(iterator, id, value); more && error_ == FILEERROR_NONE;
        more = container.BrowseNext(iterator, id, value)) {
     if (value->GetType() == kDataPointer)

@@ -2,6 +2,7 @@
 
 #include <bit>
 
+#include "k2v_file/values/container_defaults.h"
 #include "torvane/memory/assertion.h"
 
 namespace _torvane_
@@ -60,7 +61,9 @@ struct BaseContainer::Block
 
 BaseContainer::BaseContainer(const BaseContainer& other) : id_(other.id_)
 {
-  if (!AppendCopies(other, 0, nullptr))
+  if (other.IsShared())
+    Share(other);
+  else if (!AppendCopies(other, 0, nullptr))
     FreeElements();
 }
 
@@ -93,6 +96,37 @@ BaseContainer& BaseContainer::operator=(BaseContainer&& other) noexcept
 
 BaseContainer::~BaseContainer() { FreeElements(); }
 
+// Shows the elements of a table of defaults. They have no block of their own here, which is how they are told apart.
+void BaseContainer::Share(const BaseContainer& source)
+{
+  head_ = source.head_;
+  tail_ = source.tail_;
+  dirty_ = static_cast<UWord>(dirty_ + source.GetCount());
+}
+
+// Gives this container elements of its own before they change. False, with nothing changed, when memory is short.
+Bool BaseContainer::TakeCopy()
+{
+  if (!IsShared())
+    return true;
+  BaseContainer copy;
+  if (!copy.AppendCopies(*this, 0, nullptr))
+    return false;
+  Swap(copy);
+  return true;
+}
+
+// The value of an element of this container, to be changed; null without an element and when memory is short.
+GeData* BaseContainer::Change(const Element* element)
+{
+  if (!element || !IsShared())
+    return element ? &const_cast<Element*>(element)->value : nullptr;
+  Long index = 0;
+  for (const Element* before = head_; before != element; before = before->next)
+    ++index;
+  return TakeCopy() ? &FindAt(index)->value : nullptr;
+}
+
 // Exchanges the elements.
 void BaseContainer::Swap(BaseContainer& other)
 {
@@ -106,7 +140,7 @@ void BaseContainer::Swap(BaseContainer& other)
 void BaseContainer::Flush()
 {
   dirty_ = static_cast<UWord>(dirty_ + GetCount());
-  if (!tail_ || blocks_->capacity == kLargestBlock)
+  if (!tail_ || IsShared() || blocks_->capacity == kLargestBlock)
     return FreeElements();
   for (Element* element = head_; element; element = element->next)
     element->value.Free();
@@ -130,7 +164,7 @@ void BaseContainer::FreeElements()
 
 void BaseContainer::DropElements(BaseContainer*& pending)
 {
-  for (Element* element = head_; element;) {
+  for (Element* element = IsShared() ? nullptr : head_; element;) {
     Element* next = element->next;
     GeData& value = element->value;
     if (value.type_ == kDataContainer) {
@@ -153,6 +187,8 @@ void BaseContainer::DropElements(BaseContainer*& pending)
 // A nil element that is in no list yet; null when memory is short.
 BaseContainer::Element* BaseContainer::NewElement(Long id)
 {
+  if (!TakeCopy())
+    return nullptr;
   Element* place = free_;
   if (place) {
     free_ = place->next;
@@ -245,15 +281,17 @@ GeData* BaseContainer::InsertData(Long id, GeData&& value)
 
 GeData* BaseContainer::InsertDataAfter(Long id, const GeData& value, const GeData* after)
 {
-  Element* previous = head_;
-  while (previous && &previous->value != after)
-    previous = previous->next;
-  if (previous && previous == tail_)
+  Long index = 0;
+  const Element* found = head_;
+  for (; found && &found->value != after; found = found->next)
+    ++index;
+  if (found && found == tail_)
     return InsertData(id, value);
   Element* element = NewElement(id);
   GeData* stored = FillNew(element, value);
   if (!stored)
     return nullptr;
+  Element* previous = found ? FindAt(index) : nullptr;
   Element*& place = previous ? previous->next : head_;
   element->next = place;
   place = element;
@@ -265,10 +303,13 @@ GeData* BaseContainer::InsertDataAfter(Long id, const GeData& value, const GeDat
 
 GeData* BaseContainer::SetData(Long id, const GeData& value)
 {
-  Element* element = Find(id);
+  const Element* element = Find(id);
   if (!element)
     return InsertData(id, value);
-  GeData& stored = element->value;
+  GeData* place = Change(element);
+  if (!place)
+    return nullptr;
+  GeData& stored = *place;
   if (stored.type_ == value.type_) {
     if (stored.type_ == kDataContainer && stored.payload_.container == value.payload_.container) {
       ReportAssertion(kModule, __LINE__, "a container was set onto itself");
@@ -286,21 +327,12 @@ GeData* BaseContainer::SetData(Long id, const GeData& value)
   return stored.Assign(value, 0, nullptr) ? &stored : nullptr;
 }
 
-Bool BaseContainer::RemoveData(Long id)
-{
-  Element* previous = nullptr;
-  Element* element = head_;
-  while (element && element->id != id) {
-    previous = element;
-    element = element->next;
-  }
-  if (element)
-    Unlink(element, previous);
-  return element != nullptr;
-}
+Bool BaseContainer::RemoveData(Long id) { return RemoveIndex(FindIndex(id)); }
 
 Bool BaseContainer::RemoveIndex(Long index)
 {
+  if (!TakeCopy())
+    return false;
   Element* previous = nullptr;
   Element* element = index < 0 ? nullptr : head_;
   for (; element && index > 0; --index) {
@@ -341,9 +373,11 @@ BaseContainer::Element* BaseContainer::FindAt(Long index) const
   return element;
 }
 
-GeData* BaseContainer::GetIndexData(Long index) const
+GeData* BaseContainer::GetIndexData(Long index) { return Change(FindAt(index)); }
+
+const GeData* BaseContainer::GetIndexData(Long index) const
 {
-  Element* element = FindAt(index);
+  const Element* element = FindAt(index);
   return element ? &element->value : nullptr;
 }
 
@@ -353,33 +387,45 @@ Long BaseContainer::GetIndexId(Long index) const
   return element ? element->id : -1;
 }
 
+// What a link, a container or a custom value leads to can be changed.
+const GeData& BaseContainer::GetData(Long id)
+{
+  const Element* element = Find(id);
+  if (!element || element->value.type_ < kDataContainer)
+    return element ? element->value : kNothing;
+  const GeData* value = Change(element);
+  return value ? *value : kNothing;
+}
+
 const GeData& BaseContainer::GetData(Long id) const
 {
   const Element* element = Find(id);
   return element ? element->value : kNothing;
 }
 
-GeData* BaseContainer::FindData(Long id) const
+GeData* BaseContainer::FindData(Long id) { return Change(Find(id)); }
+
+const GeData* BaseContainer::FindData(Long id) const
 {
-  Element* element = Find(id);
+  const Element* element = Find(id);
   return element ? &element->value : nullptr;
 }
 
-Bool BaseContainer::BrowseFirst(Iterator& iterator, Long& id, GeData*& value) const
+Bool BaseContainer::BrowseFirst(Iterator& iterator, Long& id, const GeData*& value) const
 {
   iterator.element_ = head_;
   return Visit(iterator, id, value);
 }
 
-Bool BaseContainer::BrowseNext(Iterator& iterator, Long& id, GeData*& value) const
+Bool BaseContainer::BrowseNext(Iterator& iterator, Long& id, const GeData*& value) const
 {
   iterator.element_ = iterator.element_ ? iterator.element_->next : nullptr;
   return Visit(iterator, id, value);
 }
 
-Bool BaseContainer::Visit(const Iterator& iterator, Long& id, GeData*& value)
+Bool BaseContainer::Visit(const Iterator& iterator, Long& id, const GeData*& value)
 {
-  Element* element = iterator.element_;
+  const Element* element = iterator.element_;
   if (!element)
     return false;
   id = element->id;
@@ -409,8 +455,11 @@ Bool BaseContainer::AppendCopies(const BaseContainer& source, ULong flags, Trans
     const BaseContainer* nested = element->value.payload_.container;
     if (!copy->value.SetType(kDataContainer))
       return false;
-    copy->value.payload_.container->id_ = nested->id_;
-    if (!copy->value.payload_.container->AppendCopies(*nested, flags, translation))
+    BaseContainer& target = *copy->value.payload_.container;
+    target.id_ = nested->id_;
+    if (nested->IsShared())
+      target.Share(*nested);
+    else if (!target.AppendCopies(*nested, flags, translation))
       return false;
   }
   return true;
@@ -422,7 +471,9 @@ Bool BaseContainer::CopyTo(BaseContainer& destination, ULong flags, TransArray* 
   if (&destination == this)
     return true;
   BaseContainer copy(id_);
-  if (!copy.AppendCopies(*this, flags, translation))
+  if (IsShared())
+    copy.Share(*this); // its links are empty: there is nothing to translate
+  else if (!copy.AppendCopies(*this, flags, translation))
     return false;
   destination.dirty_ = static_cast<UWord>(destination.dirty_ + destination.GetCount() + copy.dirty_);
   destination.id_ = copy.id_;
@@ -436,17 +487,6 @@ BaseContainer* BaseContainer::GetClone(ULong flags, TransArray* translation) con
   if (clone && !CopyTo(*clone, flags, translation))
     DeleteObj(clone);
   return clone;
-}
-
-Bool BaseContainer::MergeFrom(const BaseContainer& source)
-{
-  if (&source == this)
-    return true;
-  for (const Element* element = source.head_; element; element = element->next) {
-    if (!SetData(element->id, element->value))
-      return false;
-  }
-  return true;
 }
 
 Bool BaseContainer::IsEqual(const BaseContainer& other) const
@@ -521,8 +561,15 @@ void* BaseContainer::GetPointer(Long id, void* defaultValue) const
   return value ? value->GetPointer() : defaultValue;
 }
 
-BaseContainer* BaseContainer::GetContainerInstance(Long id) const { return GetData(id).GetContainer(); }
+BaseContainer* BaseContainer::GetContainerInstance(Long id) { return GetData(id).GetContainer(); }
 
-CustomData* BaseContainer::GetCustomDataType(Long id, Long type) const { return GetData(id).GetCustomDataType(type); }
+const BaseContainer* BaseContainer::GetContainerInstance(Long id) const { return GetData(id).GetContainer(); }
+
+CustomData* BaseContainer::GetCustomDataType(Long id, Long type) { return GetData(id).GetCustomDataType(type); }
+
+const CustomData* BaseContainer::GetCustomDataType(Long id, Long type) const
+{
+  return GetData(id).GetCustomDataType(type);
+}
 
 } // namespace _torvane_

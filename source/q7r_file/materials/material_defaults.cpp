@@ -1,7 +1,6 @@
 #include "q7r_file/materials/material_defaults.h"
 
-#include "torvane/links/alias.h"
-#include "torvane/values/base_container.h"
+#include "k2v_file/values/container_defaults.h"
 
 namespace _torvane_
 {
@@ -9,51 +8,49 @@ namespace _torvane_
 namespace
 {
 
-enum Kind : UChar
-{
-  kSwitch,
-  kInteger,
-  kNumber,
-  kColor, // a Vector of three equal components
-  kLink,  // the shader slot of a channel, empty
-};
-
-struct Default
-{
-  Long id;
-  Kind kind;
-  Real value;
-};
-
 // What every material has.
-constexpr Default kBaseDefaults[] = {
-    {500, kInteger, 0},    {501, kSwitch, 0},     {1100, kSwitch, 1},    {1101, kSwitch, 1},     {1102, kNumber, 1.0},
-    {1103, kNumber, 0.65}, {1104, kInteger, 0},   {1105, kNumber, 1.0},  {1106, kSwitch, 0},     {1107, kSwitch, 0},
-    {1108, kSwitch, 1},    {1109, kSwitch, 1},    {1110, kNumber, 10.0}, {1111, kNumber, 100.0}, {1112, kNumber, 1.0},
-    {1113, kNumber, 1.0},  {1114, kNumber, 1.0},  {1115, kNumber, 1.0},  {1116, kNumber, 1.0},   {1117, kSwitch, 0},
-    {1118, kInteger, 0},   {1119, kInteger, 128},
+constexpr ContainerDefault kBaseDefaults[] = {
+    {500, DefaultForm::kLong, 0},     {501, DefaultForm::kBool, 0},      {1100, DefaultForm::kBool, 1},
+    {1101, DefaultForm::kBool, 1},    {1102, DefaultForm::kReal, 1.0},   {1103, DefaultForm::kReal, 0.65},
+    {1104, DefaultForm::kLong, 0},    {1105, DefaultForm::kReal, 1.0},   {1106, DefaultForm::kBool, 0},
+    {1107, DefaultForm::kBool, 0},    {1108, DefaultForm::kBool, 1},     {1109, DefaultForm::kBool, 1},
+    {1110, DefaultForm::kReal, 10.0}, {1111, DefaultForm::kReal, 100.0}, {1112, DefaultForm::kReal, 1.0},
+    {1113, DefaultForm::kReal, 1.0},  {1114, DefaultForm::kReal, 1.0},   {1115, DefaultForm::kReal, 1.0},
+    {1116, DefaultForm::kReal, 1.0},  {1117, DefaultForm::kBool, 0},     {1118, DefaultForm::kLong, 0},
+    {1119, DefaultForm::kLong, 128},
 };
 
 // What the standard material has besides its channels.
-constexpr Default kMaterialDefaults[] = {
-    {1000, kSwitch, 1},    {1001, kSwitch, 0},   {1002, kSwitch, 0},     {1003, kSwitch, 1},      {1004, kSwitch, 0},
-    {1005, kNumber, 1.0},  {1006, kNumber, 1.0}, {1007, kNumber, 1.0},   {1008, kNumber, 1000.0}, {1009, kNumber, 0.2},
-    {1010, kSwitch, 1},    {1011, kColor, 0.1},  {1012, kSwitch, 1},     {1013, kSwitch, 1},      {1014, kSwitch, 0},
-    {1016, kNumber, 0.5},  {1017, kNumber, 0.2}, {1018, kInteger, 0},    {1019, kNumber, 1.0},    {1020, kNumber, 5.0},
-    {1021, kNumber, 10.0}, {1022, kNumber, 0.0}, {1023, kNumber, 1.0},   {1024, kSwitch, 1},      {1025, kNumber, 1.0},
-    {1026, kNumber, 5.0},  {1027, kSwitch, 0},   {1028, kSwitch, 1},     {1121, kNumber, 0.5},    {1122, kInteger, 5},
-    {1123, kInteger, 128}, {1131, kNumber, 0.5}, {1132, kInteger, 5},    {1133, kInteger, 128},   {1134, kInteger, 0},
-    {1135, kNumber, 0.5},  {1136, kNumber, 0.0}, {1137, kNumber, 0.0},   {1138, kNumber, 1.0},    {1139, kNumber, 0.0},
-    {2050, kSwitch, 1},    {2051, kSwitch, 1},   {2052, kSwitch, 1},     {2053, kSwitch, 1},      {2055, kSwitch, 1},
-    {2057, kSwitch, 1},    {2058, kSwitch, 1},   {2059, kSwitch, 1},     {2060, kSwitch, 1},      {2063, kSwitch, 1},
-    {2404, kNumber, 1.0},  {2405, kColor, 1.0},  {2406, kNumber, 100.0}, {2407, kSwitch, 1},      {2408, kColor, 0.0},
-    {2411, kSwitch, 0},    {2511, kSwitch, 0},   {3202, kSwitch, 0},     {3203, kInteger, 4},     {3205, kSwitch, 1},
-    {3206, kSwitch, 1},    {3207, kSwitch, 0},   {3208, kSwitch, 0},     {3209, kSwitch, 1},      {3210, kInteger, 1},
-    {3211, kSwitch, 1},    {3212, kSwitch, 0},   {3300, kNumber, 1.0},   {3302, kSwitch, 0},      {3303, kSwitch, 0},
-    {3304, kSwitch, 0},    {3305, kInteger, 0},  {3306, kSwitch, 0},     {8000, kLink, 0},        {8001, kLink, 0},
-    {8002, kLink, 0},      {8003, kLink, 0},     {8004, kLink, 0},       {8005, kLink, 0},        {8006, kLink, 0},
-    {8007, kLink, 0},      {8008, kLink, 0},     {8009, kLink, 0},       {8012, kLink, 0},        {8020, kNumber, 0.0},
-    {8021, kNumber, 0.0},  {8022, kSwitch, 0},
+constexpr ContainerDefault kMaterialDefaults[] = {
+    {1000, DefaultForm::kBool, 1},   {1001, DefaultForm::kBool, 0},     {1002, DefaultForm::kBool, 0},
+    {1003, DefaultForm::kBool, 1},   {1004, DefaultForm::kBool, 0},     {1005, DefaultForm::kReal, 1.0},
+    {1006, DefaultForm::kReal, 1.0}, {1007, DefaultForm::kReal, 1.0},   {1008, DefaultForm::kReal, 1000.0},
+    {1009, DefaultForm::kReal, 0.2}, {1010, DefaultForm::kBool, 1},     {1011, DefaultForm::kGrey, 0.1},
+    {1012, DefaultForm::kBool, 1},   {1013, DefaultForm::kBool, 1},     {1014, DefaultForm::kBool, 0},
+    {1016, DefaultForm::kReal, 0.5}, {1017, DefaultForm::kReal, 0.2},   {1018, DefaultForm::kLong, 0},
+    {1019, DefaultForm::kReal, 1.0}, {1020, DefaultForm::kReal, 5.0},   {1021, DefaultForm::kReal, 10.0},
+    {1022, DefaultForm::kReal, 0.0}, {1023, DefaultForm::kReal, 1.0},   {1024, DefaultForm::kBool, 1},
+    {1025, DefaultForm::kReal, 1.0}, {1026, DefaultForm::kReal, 5.0},   {1027, DefaultForm::kBool, 0},
+    {1028, DefaultForm::kBool, 1},   {1121, DefaultForm::kReal, 0.5},   {1122, DefaultForm::kLong, 5},
+    {1123, DefaultForm::kLong, 128}, {1131, DefaultForm::kReal, 0.5},   {1132, DefaultForm::kLong, 5},
+    {1133, DefaultForm::kLong, 128}, {1134, DefaultForm::kLong, 0},     {1135, DefaultForm::kReal, 0.5},
+    {1136, DefaultForm::kReal, 0.0}, {1137, DefaultForm::kReal, 0.0},   {1138, DefaultForm::kReal, 1.0},
+    {1139, DefaultForm::kReal, 0.0}, {2050, DefaultForm::kBool, 1},     {2051, DefaultForm::kBool, 1},
+    {2052, DefaultForm::kBool, 1},   {2053, DefaultForm::kBool, 1},     {2055, DefaultForm::kBool, 1},
+    {2057, DefaultForm::kBool, 1},   {2058, DefaultForm::kBool, 1},     {2059, DefaultForm::kBool, 1},
+    {2060, DefaultForm::kBool, 1},   {2063, DefaultForm::kBool, 1},     {2404, DefaultForm::kReal, 1.0},
+    {2405, DefaultForm::kGrey, 1.0}, {2406, DefaultForm::kReal, 100.0}, {2407, DefaultForm::kBool, 1},
+    {2408, DefaultForm::kGrey, 0.0}, {2411, DefaultForm::kBool, 0},     {2511, DefaultForm::kBool, 0},
+    {3202, DefaultForm::kBool, 0},   {3203, DefaultForm::kLong, 4},     {3205, DefaultForm::kBool, 1},
+    {3206, DefaultForm::kBool, 1},   {3207, DefaultForm::kBool, 0},     {3208, DefaultForm::kBool, 0},
+    {3209, DefaultForm::kBool, 1},   {3210, DefaultForm::kLong, 1},     {3211, DefaultForm::kBool, 1},
+    {3212, DefaultForm::kBool, 0},   {3300, DefaultForm::kReal, 1.0},   {3302, DefaultForm::kBool, 0},
+    {3303, DefaultForm::kBool, 0},   {3304, DefaultForm::kBool, 0},     {3305, DefaultForm::kLong, 0},
+    {3306, DefaultForm::kBool, 0},   {8000, DefaultForm::kLink},        {8001, DefaultForm::kLink},
+    {8002, DefaultForm::kLink},      {8003, DefaultForm::kLink},        {8004, DefaultForm::kLink},
+    {8005, DefaultForm::kLink},      {8006, DefaultForm::kLink},        {8007, DefaultForm::kLink},
+    {8008, DefaultForm::kLink},      {8009, DefaultForm::kLink},        {8012, DefaultForm::kLink},
+    {8020, DefaultForm::kReal, 0.0}, {8021, DefaultForm::kReal, 0.0},   {8022, DefaultForm::kBool, 0},
 };
 
 constexpr ChannelParameters kChannels[] = {
@@ -63,31 +60,57 @@ constexpr ChannelParameters kChannels[] = {
     {12, 0, 0.0, 2200, 2201, 2202, 0},
 };
 
-void AddDefault(BaseContainer& data, const Default& entry)
+// The parameters of a channel, up to those that it lacks.
+constexpr Long kParametersOfChannel = 4;
+
+constexpr ContainerDefault ChannelDefault(const ChannelParameters& row, Long index)
 {
-  switch (entry.kind) {
-  case kSwitch:
-  case kInteger:
-    data.InsertData(entry.id, GeData(static_cast<Long>(entry.value)));
-    break;
-  case kNumber:
-    data.InsertData(entry.id, GeData(entry.value));
-    break;
-  case kColor:
-    data.InsertData(entry.id, GeData(Vector(entry.value, entry.value, entry.value)));
-    break;
-  case kLink:
-    data.InsertData(entry.id, GeData(GeAliasLink()));
-    break;
+  switch (index) {
+  case 0:
+    return {row.color, DefaultForm::kGrey, row.colorDefault};
+  case 1:
+    return {row.brightness, DefaultForm::kReal, 1.0};
+  case 2:
+    return {row.mix, DefaultForm::kReal, 1.0};
+  default:
+    return {row.mode, DefaultForm::kLong, static_cast<Real>(row.modeDefault)};
   }
 }
 
-// An id of 0 is a parameter that the channel lacks.
-void AddIfPresent(BaseContainer& data, const Default& entry)
+constexpr std::size_t CountChannelDefaults()
 {
-  if (entry.id != 0)
-    AddDefault(data, entry);
+  std::size_t count = 0;
+  for (const ChannelParameters& row : kChannels) {
+    for (Long i = 0; i < kParametersOfChannel; ++i)
+      count += ChannelDefault(row, i).id != 0 ? 1 : 0;
+  }
+  return count;
 }
+
+// All that the standard material has: what every material has, its channels, and the rest.
+struct StandardDefaults
+{
+  ContainerDefault rows[std::size(kBaseDefaults) + CountChannelDefaults() + std::size(kMaterialDefaults)] = {};
+
+  constexpr StandardDefaults()
+  {
+    ContainerDefault* next = rows;
+    for (const ContainerDefault& row : kBaseDefaults)
+      *next++ = row;
+    for (const ChannelParameters& channel : kChannels) {
+      for (Long i = 0; i < kParametersOfChannel; ++i) {
+        *next = ChannelDefault(channel, i);
+        next += next->id != 0 ? 1 : 0;
+      }
+    }
+    for (const ContainerDefault& row : kMaterialDefaults)
+      *next++ = row;
+  }
+  static constexpr std::size_t size() { return std::size(StandardDefaults().rows); }
+  constexpr const ContainerDefault* data() const { return rows; }
+};
+
+constexpr StandardDefaults kStandardDefaults;
 
 } // namespace
 
@@ -100,22 +123,12 @@ const ChannelParameters* FindChannelParameters(Long channel)
   return nullptr;
 }
 
-void SetBaseMaterialDefaults(BaseContainer& data)
-{
-  for (const Default& entry : kBaseDefaults)
-    AddDefault(data, entry);
-}
+void SetBaseMaterialDefaults(BaseContainer& data) { data.SetDefaults(DefaultsOf<kBaseDefaults>()); }
 
 void SetMaterialDefaults(BaseContainer& data)
 {
-  for (const ChannelParameters& row : kChannels) {
-    AddIfPresent(data, {row.color, kColor, row.colorDefault});
-    AddIfPresent(data, {row.brightness, kNumber, 1.0});
-    AddIfPresent(data, {row.mix, kNumber, 1.0});
-    AddIfPresent(data, {row.mode, kInteger, static_cast<Real>(row.modeDefault)});
-  }
-  for (const Default& entry : kMaterialDefaults)
-    AddDefault(data, entry);
+  data.Flush();
+  data.SetDefaults(DefaultsOf<kStandardDefaults>());
 }
 
 } // namespace _torvane_

@@ -23,7 +23,7 @@ struct ChannelParameters
 // Null for a channel without parameters and for a number that no channel has.
 const ChannelParameters* FindChannelParameters(Long channel);
 
-// Append the entries to a container that has none of them.
+// The entries of every material, and of the standard material, in place of what a container has.
 void SetBaseMaterialDefaults(BaseContainer& data);
 void SetMaterialDefaults(BaseContainer& data);
 

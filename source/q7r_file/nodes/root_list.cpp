@@ -2,6 +2,7 @@
 
 #include "k2v_file/stream/chunk_visitor.h"
 #include "q7r_file/types/member_makers.h"
+#include "q7r_file/types/tag_makers.h"
 #include "torvane/animation/ctrack.h"
 #include "torvane/layers/layer_object.h"
 #include "torvane/materials/base_material.h"
@@ -197,7 +198,7 @@ Bool RootTag::ReadChunk(HyperFile& file, Long id, Long level)
     return true;
   if (id == kChunkNodeBits)
     return file.SkipToEndChunk();
-  BaseTag* tag = MakeTag(id);
+  BaseTag* tag = MakeTagToRead(id);
   if (!tag) {
     file.SetError(FILEERROR_MEMORY);
     return false;

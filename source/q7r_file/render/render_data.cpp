@@ -1,12 +1,20 @@
 #include "torvane/render/render_data.h"
 
 #include "k2v_file/stream/chunk_visitor.h"
+#include "k2v_file/values/container_defaults.h"
 #include "q7r_file/nodes/node_tools.h"
 #include "q7r_file/render/render_defaults.h"
 #include "torvane/hooks.h"
 
 namespace _torvane_
 {
+
+namespace
+{
+
+constexpr ContainerDefault kMultipassDefaults[] = {{1002, DefaultForm::kLong, 1}};
+
+} // namespace
 
 RenderData::RenderData() : BaseList4D(kTypeRenderData)
 {
@@ -85,7 +93,7 @@ void RenderData::SetDocument(BaseDocument* document)
 
 RenderData* AllocRenderData() { return NewObj<RenderData>(); }
 
-MultipassObject::MultipassObject() : BaseList4D(kTypeMultipass) { data_.SetLong(1002, 1); }
+MultipassObject::MultipassObject() : BaseList4D(kTypeMultipass) { data_.SetDefaults(DefaultsOf<kMultipassDefaults>()); }
 
 void MultipassObject::WriteChunks(HyperFile& file)
 {

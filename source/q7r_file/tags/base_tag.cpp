@@ -1,6 +1,7 @@
 #include "torvane/tags/base_tag.h"
 
 #include "k2v_file/stream/chunk_visitor.h"
+#include "k2v_file/values/container_defaults.h"
 #include "q7r_file/nodes/node_data_chunk.h"
 #include "q7r_file/types/tag_makers.h"
 #include "torvane/hooks.h"
@@ -8,13 +9,18 @@
 namespace _torvane_
 {
 
+namespace
+{
+
+constexpr ContainerDefault kTargetDefaults[] = {
+    {kTargetLink, DefaultForm::kLink}, {kTargetUpLink, DefaultForm::kLink}, {kTargetFlag, DefaultForm::kBool, 1}};
+
+} // namespace
+
 BaseTag::BaseTag(Long type, Long pluginId) : BaseList2D(type), pluginId_(pluginId)
 {
-  if (type != kTagTarget)
-    return;
-  data_.SetLink(kTargetLink, nullptr);
-  data_.SetLink(kTargetUpLink, nullptr);
-  data_.SetBool(kTargetFlag, true);
+  if (type == kTagTarget)
+    data_.SetDefaults(DefaultsOf<kTargetDefaults>());
 }
 
 BaseTag::~BaseTag() { DeleteObj(nodeData_); }

@@ -2,6 +2,7 @@
 
 #include <chrono>
 
+#include "k2v_file/values/container_defaults.h"
 #include "q7r_file/tags/tag_entries.h"
 #include "q7r_file/types/tag_makers.h"
 
@@ -11,13 +12,21 @@ namespace _torvane_
 namespace
 {
 
-constexpr EntryDefault kCompositingDefaults[] = {
-    {1000, 1003, EntryForm::kBool, 1},    {1017, 1017, EntryForm::kBool, 1},   {1126, 1129, EntryForm::kBool, 1},
-    {1142, 1142, EntryForm::kBool, 1},    {1004, 1005, EntryForm::kBool, 0},   {1143, 1143, EntryForm::kBool, 0},
-    {1153, 1156, EntryForm::kBool, 0},    {1158, 1158, EntryForm::kBool, 0},   {1006, 1006, EntryForm::kLong, 0},
-    {1007, 1007, EntryForm::kLong, 2},    {1016, 1016, EntryForm::kReal, 0.1}, {1110, 1115, EntryForm::kLong, 1, 1},
-    {1120, 1125, EntryForm::kLong, 7, 1}, {1131, 1131, EntryForm::kLong, 1},   {1144, 1144, EntryForm::kVector, 0},
-    {1150, 1152, EntryForm::kReal, 1.0},  {1159, 1159, EntryForm::kReal, 1.0},
+constexpr ContainerDefault kCompositingDefaults[] = {
+    {1000, DefaultForm::kBool, 1},           {1001, DefaultForm::kBool, 1},   {1002, DefaultForm::kBool, 1},
+    {1003, DefaultForm::kBool, 1},           {1017, DefaultForm::kBool, 1},   {1126, DefaultForm::kBool, 1},
+    {1127, DefaultForm::kBool, 1},           {1128, DefaultForm::kBool, 1},   {1129, DefaultForm::kBool, 1},
+    {1142, DefaultForm::kBool, 1},           {1004, DefaultForm::kBool, 0},   {1005, DefaultForm::kBool, 0},
+    {1143, DefaultForm::kBool, 0},           {1153, DefaultForm::kBool, 0},   {1154, DefaultForm::kBool, 0},
+    {1155, DefaultForm::kBool, 0},           {1156, DefaultForm::kBool, 0},   {1158, DefaultForm::kBool, 0},
+    {1006, DefaultForm::kLong, 0},           {1007, DefaultForm::kLong, 2},   {1016, DefaultForm::kReal, 0.1},
+    {1110, DefaultForm::kLong, 1},           {1111, DefaultForm::kLong, 2},   {1112, DefaultForm::kLong, 3},
+    {1113, DefaultForm::kLong, 4},           {1114, DefaultForm::kLong, 5},   {1115, DefaultForm::kLong, 6},
+    {1120, DefaultForm::kLong, 7},           {1121, DefaultForm::kLong, 8},   {1122, DefaultForm::kLong, 9},
+    {1123, DefaultForm::kLong, 10},          {1124, DefaultForm::kLong, 11},  {1125, DefaultForm::kLong, 12},
+    {1131, DefaultForm::kLong, 1},           {1144, DefaultForm::kGrey},      {1150, DefaultForm::kReal, 1.0},
+    {1151, DefaultForm::kReal, 1.0},         {1152, DefaultForm::kReal, 1.0}, {1159, DefaultForm::kReal, 1.0},
+    {kCompositingClock, DefaultForm::kLong},
 };
 
 // A running number of milliseconds, cut to 32 bits.
@@ -63,12 +72,16 @@ void ReadOldValues(EntryReader& entries, Long level)
 } // namespace
 
 BaseTag* MakeCompositingTag() { return NewObj<CompositingTag>(); }
+BaseTag* MakeCompositingTagToRead() { return NewObj<CompositingTag>(true); }
 
-CompositingTag::CompositingTag() : BaseTag(kTagCompositing)
+CompositingTag::CompositingTag(Bool toRead) : BaseTag(kTagCompositing)
 {
-  SetEntryDefaults(data_, kCompositingDefaults);
-  data_.SetLong(kCompositingClock, ReadMilliseconds());
+  data_.SetDefaults(DefaultsOf<kCompositingDefaults>());
+  if (!toRead)
+    StartClock();
 }
+
+void CompositingTag::StartClock() { data_.SetLong(kCompositingClock, ReadMilliseconds()); }
 
 Bool CompositingTag::ReadChunk(HyperFile& file, Long id, Long level)
 {
@@ -76,6 +89,7 @@ Bool CompositingTag::ReadChunk(HyperFile& file, Long id, Long level)
     return true;
   if (id != kTagCompositing)
     return false;
+  StartClock();
   return ReadChunkBody(file, level, [&](ChunkReader& v) {
     EntryReader entries(v, data_);
     ReadOldValues(entries, level);

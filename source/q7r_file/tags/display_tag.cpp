@@ -1,5 +1,6 @@
 #include "torvane/tags/display_tag.h"
 
+#include "k2v_file/values/container_defaults.h"
 #include "q7r_file/nodes/node_tools.h"
 #include "q7r_file/tags/tag_entries.h"
 #include "q7r_file/types/tag_makers.h"
@@ -12,19 +13,20 @@ namespace
 
 // From this version on no file holds chunk kChunkOldDisplay.
 
-constexpr EntryDefault ColorDefault(Long id, Real red, Real green, Real blue)
+constexpr ContainerDefault ColorDefault(Long id, Real red, Real green, Real blue)
 {
-  return {id, id, EntryForm::kVector, 0, 0, Vector(red / 255.0, green / 255.0, blue / 255.0)};
+  return {id, DefaultForm::kVector, 0, Vector(red / 255.0, green / 255.0, blue / 255.0)};
 }
 
-constexpr EntryDefault kDisplayDefaults[] = {
-    {1015, 1015, EntryForm::kBool, 1},    {10000, 10000, EntryForm::kBool, 0},   {10001, 10001, EntryForm::kTime, 0},
-    {10002, 10002, EntryForm::kTime, 3},  {10003, 10004, EntryForm::kLong, 12},  {10005, 10005, EntryForm::kLong, 3},
-    {10006, 10007, EntryForm::kLong, 40}, {10009, 10009, EntryForm::kString, 0}, {10010, 10010, EntryForm::kReal, 1.0},
-    {10011, 10011, EntryForm::kLong, 5},  ColorDefault(20000, 142, 173, 203),    ColorDefault(20001, 255, 170, 24),
-    ColorDefault(20002, 85, 223, 143),    ColorDefault(20003, 229, 91, 91),      ColorDefault(20004, 169, 153, 255),
-    {30000, 30000, EntryForm::kLong, 1},  {30002, 30002, EntryForm::kBool, 0},   {30006, 30008, EntryForm::kBool, 0},
-    {30010, 30010, EntryForm::kBool, 0},  {30009, 30009, EntryForm::kLong, 2},
+constexpr ContainerDefault kDisplayDefaults[] = {
+    {1015, DefaultForm::kBool, 1},      {10000, DefaultForm::kBool, 0},     {10001, DefaultForm::kTime, 0},
+    {10002, DefaultForm::kTime, 3},     {10003, DefaultForm::kLong, 12},    {10004, DefaultForm::kLong, 12},
+    {10005, DefaultForm::kLong, 3},     {10006, DefaultForm::kLong, 40},    {10007, DefaultForm::kLong, 40},
+    {10009, DefaultForm::kString},      {10010, DefaultForm::kReal, 1.0},   {10011, DefaultForm::kLong, 5},
+    ColorDefault(20000, 142, 173, 203), ColorDefault(20001, 255, 170, 24),  ColorDefault(20002, 85, 223, 143),
+    ColorDefault(20003, 229, 91, 91),   ColorDefault(20004, 169, 153, 255), {30000, DefaultForm::kLong, 1},
+    {30002, DefaultForm::kBool, 0},     {30006, DefaultForm::kBool, 0},     {30007, DefaultForm::kBool, 0},
+    {30008, DefaultForm::kBool, 0},     {30010, DefaultForm::kBool, 0},     {30009, DefaultForm::kLong, 2},
 };
 
 // Takes no chunk, so that whatever comes is passed over.
@@ -61,7 +63,7 @@ DisplayTag::DisplayTag() : BaseTag(kTagDisplay)
     longs_[i] = kLongSettings[i].initial;
   for (Long i = 0; i < kRealCount; ++i)
     reals_[i] = kRealSettings[i].initial;
-  SetEntryDefaults(data_, kDisplayDefaults);
+  data_.SetDefaults(DefaultsOf<kDisplayDefaults>());
 }
 
 Long* DisplayTag::FindLong(Long id)

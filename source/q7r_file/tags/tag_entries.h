@@ -1,39 +1,10 @@
-// The entries of a tag's container: defaults from a table, and values of old chunks.
+// The entries of a tag's container: values of old chunks.
 #pragma once
 
 #include "k2v_file/stream/chunk_visitor.h"
 
 namespace _torvane_
 {
-
-enum class EntryForm : UChar
-{
-  kBool,
-  kLong,
-  kReal,
-  kTime, // whole seconds
-  kVector,
-  kString, // empty
-};
-
-// The entries from `first` to `last`. Each next number is `step` larger.
-struct EntryDefault
-{
-  Long first;
-  Long last;
-  EntryForm form;
-  Real number;
-  Real step = 0.0;
-  Vector vector = {};
-};
-
-void SetEntryDefaults(BaseContainer& data, const EntryDefault* rows, std::size_t count);
-
-template <std::size_t count>
-void SetEntryDefaults(BaseContainer& data, const EntryDefault (&rows)[count])
-{
-  SetEntryDefaults(data, rows, count);
-}
 
 // Reads values of a chunk into entries of a container. An entry whose value doesn't come stays as it is.
 class EntryReader

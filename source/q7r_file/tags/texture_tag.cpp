@@ -2,6 +2,7 @@
 
 #include <cmath>
 
+#include "k2v_file/values/container_defaults.h"
 #include "q7r_file/tags/tag_entries.h"
 #include "q7r_file/types/tag_makers.h"
 #include "torvane/materials/base_material.h"
@@ -13,59 +14,26 @@ namespace _torvane_
 namespace
 {
 
-enum class Form : UChar
-{
-  kBool,
-  kLong,
-  kReal,
-  kVector, // the number in all three components
-  kLink,   // an empty one
-};
-
-struct Default
-{
-  Long id;
-  Form form;
-  Real number;
-};
-
 // In the order in which a file holds them.
-constexpr Default kTextureDefaults[] = {
-    {kTextureOffsetX, Form::kReal, 0.0},
-    {kTextureOffsetY, Form::kReal, 0.0},
-    {kTextureLengthX, Form::kReal, 1.0},
-    {kTextureLengthY, Form::kReal, 1.0},
-    {kTextureProjection, Form::kLong, 0.0},
-    {1005, Form::kLong, 0.0},
-    {1007, Form::kBool, 1.0},
-    {1008, Form::kBool, 0.0},
-    {1009, Form::kBool, 0.0},
-    {kTextureMaterial, Form::kLink, 0.0},
-    {kTextureSize, Form::kVector, 100.0},
-    {kTextureSecondLink, Form::kLink, 0.0},
-    {kTextureFilmAspect, Form::kReal, 1.3333333333},
-    {kTexturePixelAspect, Form::kReal, 1.0},
-    {1200, Form::kBool, 1.0},
-    {1201, Form::kReal, 0.0},
-    {1202, Form::kReal, 0.0},
+constexpr ContainerDefault kTextureDefaults[] = {
+    {kTextureOffsetX, DefaultForm::kReal, 0.0},
+    {kTextureOffsetY, DefaultForm::kReal, 0.0},
+    {kTextureLengthX, DefaultForm::kReal, 1.0},
+    {kTextureLengthY, DefaultForm::kReal, 1.0},
+    {kTextureProjection, DefaultForm::kLong, 0.0},
+    {1005, DefaultForm::kLong, 0.0},
+    {1007, DefaultForm::kBool, 1.0},
+    {1008, DefaultForm::kBool, 0.0},
+    {1009, DefaultForm::kBool, 0.0},
+    {kTextureMaterial, DefaultForm::kLink, 0.0},
+    {kTextureSize, DefaultForm::kGrey, 100.0},
+    {kTextureSecondLink, DefaultForm::kLink, 0.0},
+    {kTextureFilmAspect, DefaultForm::kReal, 1.3333333333},
+    {kTexturePixelAspect, DefaultForm::kReal, 1.0},
+    {1200, DefaultForm::kBool, 1.0},
+    {1201, DefaultForm::kReal, 0.0},
+    {1202, DefaultForm::kReal, 0.0},
 };
-
-GeData MakeDefault(const Default& row)
-{
-  switch (row.form) {
-  case Form::kBool:
-    return row.number != 0.0;
-  case Form::kLong:
-    return static_cast<Long>(row.number);
-  case Form::kReal:
-    return row.number;
-  case Form::kVector:
-    return Vector(row.number, row.number, row.number);
-  case Form::kLink:
-    return GeAliasLink();
-  }
-  return {};
-}
 
 // An aspect: the number that is looked for, and the one that is stored. They are not always the same.
 struct Aspect
@@ -137,11 +105,7 @@ Real QuotientOrOne(Real a, Real b) { return b != 0.0 ? a / b : 1.0; }
 
 } // namespace
 
-TextureTag::TextureTag() : BaseTag(kTagTexture)
-{
-  for (const Default& row : kTextureDefaults)
-    data_.InsertData(row.id, MakeDefault(row));
-}
+TextureTag::TextureTag() : BaseTag(kTagTexture) { data_.SetDefaults(DefaultsOf<kTextureDefaults>()); }
 
 BaseTag* MakeTextureTag() { return NewObj<TextureTag>(); }
 

@@ -79,6 +79,8 @@ BaseTag* MakeTag(Long type)
   return watch.Whole(tag);
 }
 
+BaseTag* MakeTagToRead(Long type) { return type == kTagCompositing ? MakeCompositingTagToRead() : MakeTag(type); }
+
 NodeData* AllocTagDataOfType(Long pluginId, Bool& known)
 {
   const TagClass* row = FindTagClass(pluginId);

@@ -16,12 +16,16 @@ BaseTag* MakeDisplayTag();
 BaseTag* MakeTextureTag();
 BaseTag* MakeTangentTag();
 BaseTag* MakeCompositingTag();
+BaseTag* MakeCompositingTagToRead();
 BaseTag* MakeUVWTag();
 BaseTag* MakeSegmentTag();
 BaseTag* MakeSelectionTag(Long type); // of polygons, points or edges
 BaseTag* MakeVertexMapTag();
 BaseTag* MakeNormalTag();
 NodeData* MakeWeightTagData();
+
+// As MakeTag, for a tag of a file.
+BaseTag* MakeTagToRead(Long type);
 
 // The library's own data for a plug-in tag's type, null where there is none. `known` tells whether there is.
 NodeData* AllocTagDataOfType(Long pluginId, Bool& known);

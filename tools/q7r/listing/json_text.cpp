@@ -82,7 +82,7 @@ Json ToJson(const BaseContainer& container)
   Json object = Json::object();
   BaseContainer::Iterator iterator;
   Long id = 0;
-  GeData* value = nullptr;
+  const GeData* value = nullptr;
   for (bool more = container.BrowseFirst(iterator, id, value); more; more = container.BrowseNext(iterator, id, value)) {
     std::string key = std::to_string(id);
     if (!object.contains(key))

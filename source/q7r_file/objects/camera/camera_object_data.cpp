@@ -2,6 +2,7 @@
 
 #include <cmath>
 
+#include "k2v_file/values/container_defaults.h"
 #include "q7r_file/types/object_data_makers.h"
 #include "torvane/document/base_document.h"
 #include "torvane/tags/base_tag.h"
@@ -13,71 +14,56 @@ namespace _torvane_
 namespace
 {
 
-enum class EntryKind : UChar
-{
-  kReal,
-  kLong,
-  kBool,
-  kLink, // empty
-};
-
-struct CameraDefault
-{
-  Long id;
-  EntryKind kind;
-  Real number = 0.0;
-};
-
 // In the order of a new camera's container.
-constexpr CameraDefault kCameraDefaults[] = {
-    {kCameraFocalLength, EntryKind::kReal, 36.0},
-    {1000, EntryKind::kReal, 1.0},
-    {kCameraProjection, EntryKind::kLong, 0},
-    {kCameraApertureWidth, EntryKind::kReal, 36.0},
-    {1007, EntryKind::kBool, true},
-    {kCameraUseTarget, EntryKind::kBool, false},
-    {kCameraFocusDistance, EntryKind::kReal, 2000.0},
-    {1111, EntryKind::kBool, false},
-    {1114, EntryKind::kBool, false},
-    {1112, EntryKind::kReal, 0.0},
-    {1115, EntryKind::kReal, 0.0},
-    {1113, EntryKind::kReal, 1000.0},
-    {1116, EntryKind::kReal, 1000.0},
-    {1118, EntryKind::kReal, 0.0},
-    {1119, EntryKind::kReal, 0.0},
-    {1321, EntryKind::kReal, 0.0},
-    {1322, EntryKind::kReal, 0.0},
-    {1122, EntryKind::kReal, 0.0},
-    {1123, EntryKind::kBool, false},
-    {1128, EntryKind::kReal, 10000.0},
-    {1129, EntryKind::kBool, false},
-    {1130, EntryKind::kLink},
-    {kCameraApertureNumber, EntryKind::kReal, 8.0},
-    {kCameraExposureTime, EntryKind::kReal, 0.03333333333333333},
-    {1212, EntryKind::kReal, 3.141592653589793},
-    {1213, EntryKind::kReal, 0.0},
-    {1214, EntryKind::kReal, 0.7},
-    {1220, EntryKind::kBool, false},
-    {kCameraFilmSpeed, EntryKind::kReal, 200.0},
-    {1241, EntryKind::kReal, 0.0},
-    {1300, EntryKind::kBool, false},
-    {1301, EntryKind::kLong, 6},
-    {1302, EntryKind::kReal, 0.0},
-    {1303, EntryKind::kReal, 0.0},
-    {1306, EntryKind::kReal, 0.0},
-    {1305, EntryKind::kLink},
-    {kCameraTemperature, EntryKind::kReal, 6500.0},
-    {1312, EntryKind::kReal, 0.0},
-    {1331, EntryKind::kReal, 0.0},
-    {1333, EntryKind::kReal, 0.0},
-    {1341, EntryKind::kReal, 0.0},
-    {4200, EntryKind::kLong, 0},
-    {4201, EntryKind::kReal, 6.5},
-    {4202, EntryKind::kLong, 0},
-    {4204, EntryKind::kReal, 800.0},
-    {4205, EntryKind::kReal, 1000.0},
-    {4206, EntryKind::kReal, 1200.0},
-    {4207, EntryKind::kBool, true},
+constexpr ContainerDefault kCameraDefaults[] = {
+    {kCameraFocalLength, DefaultForm::kReal, 36.0},
+    {1000, DefaultForm::kReal, 1.0},
+    {kCameraProjection, DefaultForm::kLong, 0},
+    {kCameraApertureWidth, DefaultForm::kReal, 36.0},
+    {1007, DefaultForm::kBool, true},
+    {kCameraUseTarget, DefaultForm::kBool, false},
+    {kCameraFocusDistance, DefaultForm::kReal, 2000.0},
+    {1111, DefaultForm::kBool, false},
+    {1114, DefaultForm::kBool, false},
+    {1112, DefaultForm::kReal, 0.0},
+    {1115, DefaultForm::kReal, 0.0},
+    {1113, DefaultForm::kReal, 1000.0},
+    {1116, DefaultForm::kReal, 1000.0},
+    {1118, DefaultForm::kReal, 0.0},
+    {1119, DefaultForm::kReal, 0.0},
+    {1321, DefaultForm::kReal, 0.0},
+    {1322, DefaultForm::kReal, 0.0},
+    {1122, DefaultForm::kReal, 0.0},
+    {1123, DefaultForm::kBool, false},
+    {1128, DefaultForm::kReal, 10000.0},
+    {1129, DefaultForm::kBool, false},
+    {1130, DefaultForm::kLink},
+    {kCameraApertureNumber, DefaultForm::kReal, 8.0},
+    {kCameraExposureTime, DefaultForm::kReal, 0.03333333333333333},
+    {1212, DefaultForm::kReal, 3.141592653589793},
+    {1213, DefaultForm::kReal, 0.0},
+    {1214, DefaultForm::kReal, 0.7},
+    {1220, DefaultForm::kBool, false},
+    {kCameraFilmSpeed, DefaultForm::kReal, 200.0},
+    {1241, DefaultForm::kReal, 0.0},
+    {1300, DefaultForm::kBool, false},
+    {1301, DefaultForm::kLong, 6},
+    {1302, DefaultForm::kReal, 0.0},
+    {1303, DefaultForm::kReal, 0.0},
+    {1306, DefaultForm::kReal, 0.0},
+    {1305, DefaultForm::kLink},
+    {kCameraTemperature, DefaultForm::kReal, 6500.0},
+    {1312, DefaultForm::kReal, 0.0},
+    {1331, DefaultForm::kReal, 0.0},
+    {1333, DefaultForm::kReal, 0.0},
+    {1341, DefaultForm::kReal, 0.0},
+    {4200, DefaultForm::kLong, 0},
+    {4201, DefaultForm::kReal, 6.5},
+    {4202, DefaultForm::kLong, 0},
+    {4204, DefaultForm::kReal, 800.0},
+    {4205, DefaultForm::kReal, 1000.0},
+    {4206, DefaultForm::kReal, 1200.0},
+    {4207, DefaultForm::kBool, true},
 };
 
 // A list of usual values for one stored entry.
@@ -202,24 +188,7 @@ Bool CameraObjectData::Init()
 {
   if (!node_)
     return false;
-  BaseContainer& settings = GetSettings();
-  for (const CameraDefault& entry : kCameraDefaults) {
-    switch (entry.kind) {
-    case EntryKind::kReal:
-      settings.SetReal(entry.id, entry.number);
-      break;
-    case EntryKind::kLong:
-      settings.SetLong(entry.id, static_cast<Long>(entry.number));
-      break;
-    case EntryKind::kBool:
-      settings.SetBool(entry.id, entry.number != 0.0);
-      break;
-    case EntryKind::kLink:
-      settings.SetLink(entry.id, nullptr);
-      break;
-    }
-  }
-  return true;
+  return GetSettings().SetDefaults(DefaultsOf<kCameraDefaults>());
 }
 
 // The relation of height to width in which the document is rendered.

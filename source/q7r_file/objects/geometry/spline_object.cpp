@@ -1,5 +1,6 @@
 #include "torvane/objects/spline_object.h"
 
+#include "k2v_file/values/container_defaults.h"
 #include "q7r_file/objects/geometry/geometry_tags.h"
 #include "q7r_file/types/object_data_makers.h"
 #include "torvane/objects/point_object_data.h"
@@ -10,7 +11,14 @@ namespace _torvane_
 namespace
 {
 
-constexpr Real kFiveDegrees = 0.08726646259971647;
+constexpr ContainerDefault kSplineDefaults[] = {
+    {kSplineType, DefaultForm::kLong, kSplineLinear},
+    {1001, DefaultForm::kLong, 3},
+    {1002, DefaultForm::kBool, 0},
+    {1003, DefaultForm::kLong, 8},
+    {1004, DefaultForm::kReal, 0.08726646259971647}, // five degrees
+    {1005, DefaultForm::kReal, 5.0},
+};
 
 Bool HasTangents(Long type) { return type == 1 || type == 2 || type == 4; }
 
@@ -38,15 +46,7 @@ Bool ResizeSegments(BaseObject& object, Long count)
 
 BaseObject* MakeSplineObject() { return NewObj<SplineObject>(); }
 
-SplineObject::SplineObject() : PointObject(kObjectSpline)
-{
-  data_.SetLong(kSplineType, kSplineLinear);
-  data_.SetLong(1001, 3);
-  data_.SetBool(1002, false);
-  data_.SetLong(1003, 8);
-  data_.SetReal(1004, kFiveDegrees);
-  data_.SetReal(1005, 5.0);
-}
+SplineObject::SplineObject() : PointObject(kObjectSpline) { data_.SetDefaults(DefaultsOf<kSplineDefaults>()); }
 
 Bool SplineObject::ReadChunk(HyperFile& file, Long id, Long level)
 {
