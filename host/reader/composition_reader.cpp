@@ -369,13 +369,14 @@ Project LoadCompositionText(std::string_view text, const std::string& name, cons
 Project LoadComposition(const std::filesystem::path& file)
 {
   const std::string name = PathToUtf8(file.filename());
+  errno = 0;
   std::ifstream stream(file, std::ios::binary);
   std::string text;
   std::vector<char> piece(65536);
   while (stream.read(piece.data(), static_cast<std::streamsize>(piece.size())) || stream.gcount() > 0)
     text.append(piece.data(), static_cast<std::size_t>(stream.gcount()));
   if (!stream.is_open() || stream.bad()) // a folder opens, but is bad to read
-    throw CompositionError(OneLine(name) + ": cannot be read");
+    throw CompositionError(OneLine(name) + ": " + (errno ? std::generic_category().message(errno) : "cannot be read"));
   return LoadCompositionText(text, name, std::filesystem::absolute(file).parent_path());
 }
 

@@ -26,8 +26,9 @@ inline std::string ReadOutput(const std::string& path)
   return {std::istreambuf_iterator<char>(file), std::istreambuf_iterator<char>()};
 }
 
-// `arguments` as they stand on a command line, with the paths Quoted. Standard input is empty.
-inline RunResult RunQ7r(const std::string& arguments)
+// `arguments` as they stand on a command line, with the paths Quoted. Standard input is empty. `environment` are
+// settings of the shell for this program alone.
+inline RunResult RunQ7r(const std::string& arguments, [[maybe_unused]] const std::string& environment = {})
 {
   const TempFolder folder;
   const std::string out = folder / "out";
@@ -37,7 +38,8 @@ inline RunResult RunQ7r(const std::string& arguments)
       "\"" + Quoted(TEST_Q7R) + " " + arguments + " <NUL >" + Quoted(out) + " 2>" + Quoted(err) + "\"";
   const int status = std::system(command.c_str());
 #else
-  const std::string command = Quoted(TEST_Q7R) + " " + arguments + " </dev/null >" + Quoted(out) + " 2>" + Quoted(err);
+  const std::string command =
+      environment + " " + Quoted(TEST_Q7R) + " </dev/null >" + Quoted(out) + " 2>" + Quoted(err) + " " + arguments;
   const int raw = std::system(command.c_str());
   const int status = WIFEXITED(raw) ? WEXITSTATUS(raw) : -1;
 #endif

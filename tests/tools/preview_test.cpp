@@ -110,7 +110,7 @@ TEST_F(Preview, RefusesWithOneLine)
       {"a damaged picture", damaged, "", "out.jpg", "damaged.q7r: byte "},
       {"no scene", folder_ / "none.q7r", "", "out.jpg", "none.q7r"},
       {"another suffix", scene, "", "out.png", "out.png: the name of a picture ends with"},
-      {"no picture file", scene, "--set " + Quoted(folder_ / "none.jpg"), "out.q7r", "none.jpg: can't be read"},
+      {"no picture file", scene, "--set " + Quoted(folder_ / "none.jpg"), "out.q7r", "none.jpg: No such file"},
       {"another format", scene, "--set " + Quoted(scene), "out.q7r", "plain.q7r: is neither"},
       {"8 bits", scene, "--set " + Quoted(Write("8.bmp", narrow)), "out.q7r", "8.bmp: this kind isn't read"},
       {"a cut picture", scene, "--set " + Quoted(Write("cut.jpg", {0xFF, 0xD8, 0xFF})), "out.q7r", "cut.jpg: damaged"},

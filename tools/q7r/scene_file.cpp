@@ -3,6 +3,7 @@
 #include <cerrno>
 #include <cstdio>
 #include <filesystem>
+#include <fstream>
 #include <system_error>
 
 #ifndef _WIN32
@@ -66,6 +67,20 @@ Filename ToFilename(const std::string& path)
   Filename name;
   name.SetString(String(reinterpret_cast<const UniChar*>(wide.data()), static_cast<Long>(wide.size())));
   return name;
+}
+
+std::string ReadInput(const std::string& path)
+{
+  errno = 0;
+  std::ifstream file(std::filesystem::path(path), std::ios::binary);
+  std::string bytes;
+  for (std::string block(1 << 16, '\0'); file;) {
+    file.read(block.data(), static_cast<std::streamsize>(block.size()));
+    bytes.append(block, 0, static_cast<std::size_t>(file.gcount()));
+  }
+  if (!file.is_open() || file.bad())
+    throw Failure(path + ": " + std::generic_category().message(errno));
+  return bytes;
 }
 
 std::string ToUtf8(const String& text)

@@ -19,6 +19,9 @@ using DocumentPtr = std::unique_ptr<_torvane_::BaseDocument, DocumentDeleter>;
 // A path of the command line as the library takes it: of a file that exists, or UTF-8.
 _torvane_::Filename ToFilename(const std::string& path);
 
+// The bytes of any file; throws Failure with the system's cause.
+std::string ReadInput(const std::string& path);
+
 // Text of the library as UTF-8; unpaired surrogates become U+FFFD.
 std::string ToUtf8(const _torvane_::String& text);
 

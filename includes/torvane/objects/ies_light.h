@@ -51,8 +51,10 @@ class IESLight : public GeMemory
   // Computes maxCandela from the table, and totalFlux from 65536 samples that are the same each time.
   void Normalise();
 
-  // The light output in lumens.
-  Real GetLumens() const { return maxCandela * totalFlux; }
+  // The light output of the table, in lumens when it is in candela, by the zonal method that makers use: between two
+  // neighbouring vertical angles, the mean intensity all around times the solid angle. It differs by up to 1 % from
+  // maxCandela times totalFlux, which is sampled. 0 for a table that isn't complete.
+  Real GetLumens() const;
 
   // The stored form within a light's chunk. Reading also takes the versions 1 to 3 of the form; it fails on a table
   // that no photometric file can hold, and when memory is short.
@@ -78,6 +80,7 @@ class IESLight : public GeMemory
   struct Interval;
 
   Real GetHorizontalPosition(Real angle) const;
+  Real GetMeanIntensity(Long vertical) const;
   Real SampleRow(Long row, const Interval& vertical) const;
   template <class Visitor>
   Bool VisitStored(Visitor& visitor);
@@ -96,12 +99,16 @@ enum IESResult : Long
   kIESUnreadable = -5, // a read failed, or the numbers aren't those of such a file
 };
 
+// What the table of a photometric file is multiplied by: the factors that stand before it.
+enum class IESFactors : UChar
+{
+  kAll,       // as the application does for its lights
+  kLightOnly, // without the last one, which in files of today is the power in watts and says nothing of the light
+};
+
 // Reads a photometric file. On success `light` is deleted and replaced by a new distribution that the caller owns;
-// on failure it stays as it was. The table is multiplied by the three factors before it, as the application does: of
-// these the last one is, in files of today, the power that the luminaire draws in watts, and no factor of its light.
-// Who wants the light alone takes it out again: `watts`, if it isn't null, gets it on success (1 when the file has no
-// numbers).
-Long LoadIESFile(IESLight*& light, const Filename& name, Real* watts = nullptr);
+// on failure it stays as it was.
+Long LoadIESFile(IESLight*& light, const Filename& name, IESFactors factors = IESFactors::kAll);
 
 // A plain sentence for a result, without a full stop.
 const char* GetIESResultText(Long result);

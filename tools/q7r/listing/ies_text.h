@@ -7,7 +7,8 @@
 namespace q7r
 {
 
-// Everything that a distribution holds, and its lumens.
+// Everything that a distribution holds. Its lumens are apart: the table of a light in a scene is multiplied by the
+// lamp's power, which the scene doesn't tell.
 Json IESJson(const _torvane_::IESLight& light);
 
 } // namespace q7r

@@ -89,7 +89,7 @@ std::string LightWords(BaseObject& light)
   }
   if (const IESLight* ies = GetIESLight(&light)) {
     const std::string name = ToUtf8(ies->luminaire.Content() ? ies->luminaire : ies->luminaireCatalogue);
-    words += ", distribution \"" + name + "\"" + Labelled("output", ies->GetLumens(), " lm");
+    words += ", distribution \"" + name + "\"" + Labelled("output", ies->GetLumens(), " lm times the power in watts");
   }
   return words;
 }
@@ -127,7 +127,11 @@ Json ObjectParams(BaseObject& object)
 Json ObjectIES(BaseObject& object)
 {
   const IESLight* light = GetIESLight(&object);
-  return light ? IESJson(*light) : Json();
+  if (!light)
+    return {};
+  Json json = IESJson(*light);
+  json["lumensTimesWatts"] = light->GetLumens();
+  return json;
 }
 
 std::string ObjectWords(BaseObject& object)

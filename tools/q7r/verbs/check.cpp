@@ -54,6 +54,8 @@ int Check(const Options& options)
     problems.push_back(walk);
   FileProblem problem;
   DocumentPtr document(LoadDocument(ToFilename(options.file), LoadObjects | LoadMaterials, &problem));
+  if (problem.systemError != 0) // nothing that the file could be blamed for
+    throw Failure(ProblemText(options.file, problem));
   if (!document)
     problems.push_back(ProblemText(options.file, problem) + " (the scene can't be loaded)");
   if (options.json) {

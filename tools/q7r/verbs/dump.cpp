@@ -15,8 +15,13 @@ namespace q7r
 namespace
 {
 
-constexpr const char* kHelp = R"(Lists every value of a scene file: its byte offset, the chunks around it, its kind
-and the value itself. Chunks that this program doesn't know are listed like all others.
+constexpr const char* kHelp =
+    R"(Lists every value of a scene file: its byte offset, its kind and the value itself, indented
+by the chunks around it; below the twentieth the depth is told in parentheses. Chunks that
+this program doesn't know are listed like all others.
+
+With --json each line is an object: offset, tag, kind, depth, the value, and as "parent" the
+offset of the chunk that it stands in (null outside all chunks).
 
 Use it to see what a file really holds, or to compare two files value by value.
 
@@ -69,12 +74,45 @@ std::string BodyText(const StreamValue& value)
   return text;
 }
 
-void PrintJson(const StreamWalker& walker, const StreamValue& value)
+// The chunks that enclose a value, by the offsets of their starts. A line tells the innermost one alone: with all of
+// them the output would grow with the square of the depth.
+class Nesting
+{
+ public:
+  // To be told each value before it is printed and behind.
+  void Leave(const StreamValue& value)
+  {
+    if (value.tag == _torvane_::kTagChunkEnd)
+      starts_.pop_back();
+  }
+  void Enter(const StreamValue& value)
+  {
+    if (value.tag == _torvane_::kTagChunkStart)
+      starts_.push_back(value.offset);
+  }
+
+  std::size_t Depth() const { return starts_.size(); }
+  nlohmann::json Parent() const { return starts_.empty() ? nlohmann::json() : nlohmann::json(starts_.back()); }
+  std::string Indent() const
+  {
+    constexpr std::size_t kMost = 20;
+    if (Depth() <= kMost)
+      return std::string(2 * Depth(), ' ');
+    return std::string(2 * kMost, ' ') + "(" + std::to_string(Depth()) + ") ";
+  }
+
+ private:
+  std::vector<std::int64_t> starts_;
+};
+
+void PrintJson(const Nesting& nesting, const StreamValue& value)
 {
   using namespace _torvane_;
-  nlohmann::json line = {{"offset", value.offset}, {"tag", value.tag}, {"kind", TagName(value.tag)}};
-  for (const ChunkPlace& chunk : walker.Path())
-    line["path"].push_back({chunk.id, chunk.level});
+  nlohmann::json line = {{"offset", value.offset},
+                         {"tag", value.tag},
+                         {"kind", TagName(value.tag)},
+                         {"depth", nesting.Depth()},
+                         {"parent", nesting.Parent()}};
   if (value.tag == kTagChunkStart)
     line["chunk"] = {value.chunk.id, value.chunk.level};
   else if (value.tag == kTagString || value.tag == kTagFilename)
@@ -94,14 +132,15 @@ int Dump(const Options& options)
 {
   StreamWalker walker(options.file);
   StreamValue value;
+  Nesting nesting;
   while (walker.Next(value)) {
-    if (options.json) {
-      PrintJson(walker, value);
-      continue;
-    }
-    int indent = static_cast<int>(2 * walker.Path().size());
-    PrintFormatted("%10lld  %*s%s %s\n", static_cast<long long>(value.offset), indent, "", TagName(value.tag).c_str(),
-                   BodyText(value).c_str());
+    nesting.Leave(value);
+    if (options.json)
+      PrintJson(nesting, value);
+    else
+      PrintFormatted("%10lld  %s%s %s\n", static_cast<long long>(value.offset), nesting.Indent().c_str(),
+                     TagName(value.tag).c_str(), BodyText(value).c_str());
+    nesting.Enter(value);
   }
   return kDone;
 }
@@ -113,7 +152,7 @@ void AddDump(CLI::App& program, int& status)
   auto options = std::make_shared<Options>();
   CLI::App* verb = program.add_subcommand("dump", kHelp);
   verb->add_option("FILE", options->file, "the scene file")->required();
-  verb->add_flag("--json", options->json, "one JSON object a line, with offset, tag, chunk path and value");
+  verb->add_flag("--json", options->json, "one JSON object a line");
   verb->callback([options, &status] { status = Dump(*options); });
 }
 

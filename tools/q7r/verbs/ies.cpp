@@ -38,26 +38,16 @@ struct IESDeleter
 };
 using IESPtr = std::unique_ptr<IESLight, IESDeleter>;
 
-// Leaves the light alone in a table that was multiplied by the power, too.
-void TakeOut(Real watts, IESLight& light)
-{
-  if (watts == 0) // then nothing is left of the table
-    return;
-  for (Real& candela : light.candela)
-    candela /= watts;
-  light.Normalise();
-}
-
 IESPtr LoadIES(const std::string& path)
 {
+  const std::string bytes = ReadInput(path);
+  Filename name;
+  name.SetMemoryRead(bytes.data(), static_cast<LLong>(bytes.size()));
   IESLight* loaded = nullptr;
-  Real watts = 1;
-  const Long result = LoadIESFile(loaded, ToFilename(path), &watts);
+  const Long result = LoadIESFile(loaded, name, IESFactors::kLightOnly);
   if (result != kIESLoaded)
     throw Failure(path + ": " + GetIESResultText(result));
-  IESPtr light(loaded);
-  TakeOut(watts, *light);
-  return light;
+  return IESPtr(loaded);
 }
 
 Json Numbers(const Real* numbers, Long count)
@@ -133,11 +123,18 @@ void PrintIES(const IESLight& light)
   Row("lumens", NumberText(light.GetLumens()));
 }
 
+Json LightJson(const IESLight& light)
+{
+  Json json = IESJson(light);
+  json["lumens"] = light.GetLumens();
+  return json;
+}
+
 int ShowIES(const Options& options)
 {
   const IESPtr light = LoadIES(options.file);
   if (options.json)
-    PrintLine(IESJson(*light).dump(1, ' ', false, Json::error_handler_t::replace));
+    PrintLine(LightJson(*light).dump(1, ' ', false, Json::error_handler_t::replace));
   else
     PrintIES(*light);
   return kDone;
@@ -162,8 +159,7 @@ Json IESJson(const IESLight& light)
           {"horizontalAngles", Numbers(light.horizontalAngles)},
           {"candela", RowsJson(light)},
           {"maxCandela", light.maxCandela},
-          {"totalFlux", light.totalFlux},
-          {"lumens", light.GetLumens()}};
+          {"totalFlux", light.totalFlux}};
 }
 
 void AddIES(CLI::App& program, int& status)

@@ -9,7 +9,10 @@
 #include "output/standard_output.h"
 #include "scene_file.h"
 #include "torvane/animation/ctrack.h"
+#include "torvane/render/render_data.h"
+#include "torvane/shaders/base_shader.h"
 #include "torvane/tags/base_tag.h"
+#include "torvane/views/base_draw.h"
 #include "verbs.h"
 
 namespace q7r
@@ -50,17 +53,46 @@ void CountTracks(const BaseList2D& node, Counts& counts)
   }
 }
 
-void CountObjects(BaseObject* first, Counts& counts)
+void CountNodes(BaseList2D* first, Counts& counts);
+
+// A node and all that it owns: every one of them may move.
+void CountNode(BaseList2D& node, Counts& counts)
 {
-  for (BaseObject* object = first; object; object = object->GetNext()) {
+  CountTracks(node, counts);
+  CountNodes(node.GetShaders(), counts);
+  if (auto* inTree = NodeCast<BaseList4D>(&node))
+    CountNodes(inTree->GetDown(), counts);
+  if (auto* object = NodeCast<BaseObject>(&node)) {
     ++counts.objects[object->GetType()];
-    CountTracks(*object, counts);
-    for (BaseTag* tag = object->GetFirstTag(); tag; tag = tag->GetNext()) {
-      ++counts.tags[tag->GetType()];
-      CountTracks(*tag, counts);
-    }
-    CountObjects(object->GetDown(), counts);
+    CountNodes(object->GetFirstTag(), counts);
+  } else if (NodeCast<BaseTag>(&node)) {
+    ++counts.tags[node.GetType()];
+  } else if (auto* settings = NodeCast<RenderData>(&node)) {
+    CountNodes(settings->GetVideoPosts().GetFirst(), counts);
+    CountNodes(settings->GetMultipasses().GetFirst(), counts);
+  } else if (auto* panel = NodeCast<ViewPanel>(&node)) {
+    CountNodes(panel->GetDraws().GetFirst(), counts);
+  } else if (auto* draw = NodeCast<BaseDraw>(&node)) {
+    CountTracks(*draw->GetEditorCamera(), counts); // not an object of the scene
   }
+}
+
+void CountNodes(BaseList2D* first, Counts& counts)
+{
+  for (BaseList2D* node = first; node; node = node->GetNext())
+    CountNode(*node, counts);
+}
+
+Counts CountScene(BaseDocument& document)
+{
+  Counts counts;
+  CountNode(document, counts);
+  for (RootList2D* root :
+       {static_cast<RootList2D*>(document.GetObjectRoot()), static_cast<RootList2D*>(document.GetMaterialRoot()),
+        static_cast<RootList2D*>(document.GetLayerRoot()), static_cast<RootList2D*>(document.GetRenderDataRoot()),
+        static_cast<RootList2D*>(document.GetViewPanelRoot())})
+    CountNodes(root->GetFirst(), counts);
+  return counts;
 }
 
 long long Sum(const std::map<Long, long long>& counts)
@@ -150,8 +182,7 @@ void PrintInfo(const Json& info, const Counts& counts)
 int Info(const Options& options)
 {
   DocumentPtr document = LoadScene(options.file);
-  Counts counts;
-  CountObjects(document->GetFirstObject(), counts);
+  const Counts counts = CountScene(*document);
   Json info = InfoJson(*document, counts, std::filesystem::file_size(options.file));
   if (options.json)
     PrintLine(info.dump(1, ' ', false, Json::error_handler_t::replace));

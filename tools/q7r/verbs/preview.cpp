@@ -2,7 +2,6 @@
 #include <algorithm>
 #include <cctype>
 #include <filesystem>
-#include <fstream>
 #include <memory>
 
 #include "output/output_file.h"
@@ -100,18 +99,17 @@ int TakeOut(const Options& options)
 
 void LoadPicture(const std::string& path, Bitmap& bitmap)
 {
-  std::ifstream file(std::filesystem::path(path), std::ios::binary);
-  char first[4096];
-  file.read(first, sizeof first);
-  auto count = static_cast<LLong>(file.gcount());
-  if (count < 1)
-    throw Failure(path + ": can't be read, or is empty");
-  Filename name = ToFilename(path);
+  const std::string bytes = ReadInput(path);
+  const auto size = static_cast<LLong>(bytes.size());
+  if (size < 1)
+    throw Failure(path + ": is empty");
+  Filename name;
+  name.SetMemoryRead(bytes.data(), size);
   const BmpLoader bmp;
   const JpgLoader jpeg;
   for (const BitmapLoaderData* loader :
        {static_cast<const BitmapLoaderData*>(&bmp), static_cast<const BitmapLoaderData*>(&jpeg)}) {
-    if (loader->Identify(name, first, count))
+    if (loader->Identify(name, bytes.data(), size))
       return RequireGood(path, loader->Load(name, bitmap, kFirstFrame));
   }
   throw Failure(path + ": is neither a JPEG file nor a BMP file of the common kind");

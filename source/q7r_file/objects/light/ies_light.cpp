@@ -19,6 +19,7 @@ constexpr Real kPoleFactor = -0.999999;
 constexpr Real kSpanOfSymmetry = 45.0; // the same all around
 constexpr Real kSpanOfQuadrant = 135.0;
 constexpr Real kSpanOfHalf = 225.0;
+constexpr Real kCircle = 360.0;
 
 constexpr Long kFluxSamples = 65536;
 constexpr ULong kFluxSeed = 117641;
@@ -176,6 +177,37 @@ void IESLight::Normalise()
   for (Long i = 0; i < kFluxSamples && candela.GetCount() > 0; ++i) // without a table every sample is 0
     sum += SampleIESLight(DrawDirection(random));
   totalFlux = sum * kFluxOfSample;
+}
+
+// The mean all around of the intensities at a vertical angle. A table of a part of the circle stands for the rest by
+// symmetry; one that goes all around but ends before it is closed goes on to its first row.
+Real IESLight::GetMeanIntensity(Long vertical) const
+{
+  const Long last = GetHorizontalCount() - 1;
+  const Long step = GetVerticalCount();
+  const Real* values = candela.Data() + vertical;
+  Real span = horizontalAngles[last] - horizontalAngles[0];
+  Real sum = 0.0;
+  for (Long i = 0; i < last; ++i)
+    sum += (horizontalAngles[i + 1] - horizontalAngles[i]) * (values[i * step] + values[(i + 1) * step]) / 2.0;
+  if (span >= kSpanOfHalf && span < kCircle) {
+    sum += (kCircle - span) * (values[last * step] + values[0]) / 2.0;
+    span = kCircle;
+  }
+  return span > 0.0 ? sum / span : values[0];
+}
+
+Real IESLight::GetLumens() const
+{
+  Real lumens = 0.0;
+  if (GetHorizontalCount() == 0 || !IsComplete())
+    return lumens;
+  for (Long i = 0; i + 1 < GetVerticalCount(); ++i) {
+    const Real height =
+        std::cos(DegreesToRadians(verticalAngles[i])) - std::cos(DegreesToRadians(verticalAngles[i + 1]));
+    lumens += 2.0 * kPi * height * (GetMeanIntensity(i) + GetMeanIntensity(i + 1)) / 2.0;
+  }
+  return lumens;
 }
 
 IESLight* CopyIESLight(const IESLight* source)

@@ -168,11 +168,10 @@ void SetShape(IESLight& light, Real x, Real l, Real h)
 class IESParser
 {
  public:
-  IESParser(BaseFile& file, IESLight& light) : file_(file), light_(light) {}
+  IESParser(BaseFile& file, IESLight& light, IESFactors factors) : file_(file), light_(light), factors_(factors) {}
 
   // Reads all of the file, or up to the end of the numbers.
   Bool Parse();
-  Real GetWatts() const { return watts_; }
 
  private:
   Bool NextByte(char& byte);
@@ -190,7 +189,7 @@ class IESParser
 
   BaseFile& file_;
   IESLight& light_;
-  Real watts_ = 1.0; // the last factor of the table
+  IESFactors factors_;
   char buffer_[kBufferSize];
   LLong bufferCount_ = 0;
   LLong bufferPosition_ = 0;
@@ -325,6 +324,7 @@ Bool IESParser::ParseNumbers()
   Real h = 0.0;
   Real ballast = 0.0;
   Real future = 0.0;
+  Real watts = 0.0;
   if (light_.tiltMode == kIESTiltInclude && !ParseIncludedTilt())
     return false;
   if (!TakeInteger(lampCount) || !TakeNumbers({&lampLumens, &multiplier}) || !TakeInteger(verticalCount) ||
@@ -333,7 +333,7 @@ Bool IESParser::ParseNumbers()
   SetShape(light_, x, l, h);
   if (unit == kUnitFeet)
     light_.size *= kFoot;
-  if (!TakeNumbers({&ballast, &future, &watts_}))
+  if (!TakeNumbers({&ballast, &future, &watts}))
     return false;
   for (Long count : {verticalCount, horizontalCount}) {
     if (count < 0 || count > kMaxIESAngles)
@@ -342,8 +342,9 @@ Bool IESParser::ParseNumbers()
   if (!TakeTable(light_.verticalAngles, verticalCount) || !TakeTable(light_.horizontalAngles, horizontalCount) ||
       !TakeTable(light_.candela, verticalCount * horizontalCount))
     return false;
+  const Real factor = multiplier * ballast * (factors_ == IESFactors::kAll ? watts : 1.0);
   for (Real& value : light_.candela) {
-    value *= multiplier * ballast * watts_;
+    value *= factor;
     if (!std::isfinite(value))
       return false;
   }
@@ -441,7 +442,7 @@ constexpr ResultText kResultTexts[] = {
 
 } // namespace
 
-Long LoadIESFile(IESLight*& light, const Filename& name, Real* watts)
+Long LoadIESFile(IESLight*& light, const Filename& name, IESFactors factors)
 {
   BaseFile file;
   if (!file.Open(name, kFileRead))
@@ -454,12 +455,10 @@ Long LoadIESFile(IESLight*& light, const Filename& name, Real* watts)
   Long result = kIESUnreadable;
   if (file.GetError() == FILEERROR_NONE && !HoldsMark(head, count))
     result = kIESNotPhotometric;
-  IESParser parser(file, *loaded);
+  IESParser parser(file, *loaded, factors);
   if (result == kIESUnreadable && file.Seek(0) && parser.Parse())
     result = kIESLoaded;
   if (result == kIESLoaded) {
-    if (watts)
-      *watts = parser.GetWatts();
     DeleteObj(light);
     light = loaded;
   } else {
