@@ -24,6 +24,48 @@ Bool BlendFolder::LayersEqualIgnoringFlags(const BlendLayer& other, Long mode) c
   return true;
 }
 
+namespace
+{
+
+Bool HoldsLayer(const CBlendLayers& stack, const BlendLayer& layer)
+{
+  Bool found = false;
+  for (Long i = 0; !found && i < stack.GetCount(); ++i) {
+    BlendFolder* folder = stack.GetLayer(i)->AsFolder();
+    found = stack.GetLayer(i) == &layer || (folder && HoldsLayer(folder->GetChildren(), layer));
+  }
+  return found;
+}
+
+Bool HoldsLayer(const BaseContainer& settings, const BlendLayer& layer)
+{
+  BaseContainer::Iterator place;
+  Long id = 0;
+  GeData* value = nullptr;
+  Bool found = false;
+  for (Bool more = settings.BrowseFirst(place, id, value); more && !found;
+       more = settings.BrowseNext(place, id, value)) {
+    if (auto* stack = static_cast<const iBlendDataType*>(value->GetCustomDataType(kCustomBlendLayers)))
+      found = HoldsLayer(stack->GetLayers(), layer);
+    else if (const BaseContainer* nested = value->GetContainer())
+      found = HoldsLayer(*nested, layer);
+  }
+  return found;
+}
+
+// True if the layer stands in a stack of the shader's or of a shader below it.
+Bool HoldsLayer(const BaseShader& shader, const BlendLayer& layer)
+{
+  Bool found = HoldsLayer(shader.GetDataInstance(), layer);
+  for (const BaseShader* child = shader.GetDown(); child && !found; child = child->GetNext())
+    found = HoldsLayer(*child, layer);
+  for (const BaseShader* own = shader.GetShaders(); own && !found; own = own->GetNext())
+    found = HoldsLayer(*own, layer);
+  return found;
+}
+
+} // namespace
+
 BlendFields BlendShader::Fields() { return {{mode_, 2000}, {opacity_, 2001, 0, 0.0, 1.0}, {link_, 2002}}; }
 
 BaseShader* BlendShader::GetShader() const
@@ -38,12 +80,12 @@ void BlendShader::GetLayerName(String& name)
   name = name_;
 }
 
-// A shader in no list isn't the scene's to delete.
+// A shader in no list isn't the scene's to delete, nor is one that would take the layer's own stack along.
 void BlendShader::ReleaseLinked()
 {
   BaseShader* shader = GetShader();
   link_.ClearLink();
-  if (!shader || !shader->IsInList())
+  if (!shader || !shader->IsInList() || HoldsLayer(*shader, *this))
     return;
   shader->RemoveFromList();
   DeleteObj(shader);

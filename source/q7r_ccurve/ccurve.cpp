@@ -147,9 +147,29 @@ Bool CCurve::DelKey(Long index)
   CKey* key = GetKey(index);
   if (!key)
     return false;
-  keys_.Remove(index);
-  DeleteObj(key);
+  DeleteObj(key); // leaves the index
   return true;
+}
+
+// Takes a key out of the index: it is about to leave the list.
+void CCurve::ForgetKey(const CKey& key)
+{
+  Long place = PlaceOf(key.GetTime());
+  while (GetKey(place) && GetKey(place) != &key)
+    ++place;
+  keys_.Remove(place);
+}
+
+// The index has room for the key again that it just gave up.
+Bool CCurve::MoveKey(CKey& key, const BaseTime& time)
+{
+  if (!IsKeyTime(time))
+    return false;
+  if (IsKeyTime(key.time_))
+    ForgetKey(key);
+  key.time_ = time;
+  const Long place = PlaceOf(time);
+  return keys_.Insert(place, &key) && keyRoot_.InsertAfter(&key, GetKey(place - 1));
 }
 
 } // namespace _torvane_

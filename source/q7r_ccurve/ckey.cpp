@@ -3,6 +3,7 @@
 #include "k2v_file/stream/chunk_visitor.h"
 #include "q7r_file/nodes/node_tools.h"
 #include "torvane/animation/animation_ids.h"
+#include "torvane/animation/ccurve.h"
 
 namespace _torvane_
 {
@@ -36,6 +37,30 @@ const KeySwitch* FindSwitch(Long parameter)
 } // namespace
 
 CKey::CKey() : BaseList2D(kLabelKey) {}
+
+// A list that frees its members has unlinked them.
+CKey::~CKey()
+{
+  if (IsInList())
+    CKey::RemoveFromList();
+}
+
+CCurve* CKey::GetCurve() const { return listHead_ ? NodeCast<CCurve>(listHead_->GetOwner()) : nullptr; }
+
+void CKey::RemoveFromList()
+{
+  if (CCurve* curve = GetCurve())
+    curve->ForgetKey(*this);
+  BaseList2D::RemoveFromList();
+}
+
+Bool CKey::SetTime(const BaseTime& time)
+{
+  if (CCurve* curve = GetCurve())
+    return curve->MoveKey(*this, time);
+  time_ = time;
+  return true;
+}
 
 template <class Visitor>
 Bool CKey::VisitBody(Visitor& v)
@@ -71,7 +96,8 @@ Bool CKey::CopyTo(PrivateChunk& destination, ULong flags, TransArray* translatio
   auto* target = NodeCast<CKey>(&destination);
   if (!target)
     return false;
-  target->time_ = time_;
+  if (!target->SetTime(time_))
+    return false;
   target->value_ = value_;
   target->leftValue_ = leftValue_;
   target->rightValue_ = rightValue_;
@@ -126,8 +152,7 @@ Bool CKey::SetParameter(const ParameterPath& path, const GeData& value)
   }
   switch (id) {
   case kKeyTime:
-    time_ = value.GetTime();
-    return true;
+    return SetTime(value.GetTime());
   case kKeyLeftTime:
     leftTime_ = value.GetTime();
     return true;

@@ -505,3 +505,27 @@ TEST(BlendLayers, NameAndReleaseTheirShader)
   EXPECT_EQ(Utf8(name), "BlendShader");
   CBlendLayers::DeleteLayer(folder);
 }
+
+TEST(BlendLayers, LetAShaderLiveThatHoldsTheirStack)
+{
+  const counting_memory::BalanceCheck balance;
+  BaseShader owner;
+  BaseShader* outer = MakeShader(1011128);
+  BaseShader* inner = MakeShader(1011128);
+  owner.InsertShaderLast(outer);
+  inner->InsertUnderLast(outer);
+  BaseContainer group;
+  group.SetData(1, Stack().value);
+  inner->GetDataInstance().SetContainer(5, group);
+  BaseContainer* settings = inner->GetDataInstance().GetContainerInstance(5);
+  auto& layers = static_cast<iBlendDataType*>(settings->GetCustomDataType(1, kCustomBlendLayers))->GetLayers();
+  for (BaseShader* target : {inner, outer}) {
+    BlendLayer* folder = layers.AppendLayer(kBlendFolder);
+    BlendLayer* layer = folder->AsFolder()->GetChildren().AppendLayer(kBlendShader);
+    layer->GetLink()->SetLink(target);
+    EXPECT_TRUE(layers.RemoveLayer(folder));
+    EXPECT_EQ(layers.GetCount(), 0);
+    EXPECT_TRUE(owner.GetShaders() == outer && outer->GetDown() == inner);
+    CBlendLayers::DeleteLayer(folder);
+  }
+}

@@ -129,6 +129,37 @@ TEST(Curve, AnyOrderOfInsertionsAndDeletionsKeepsTheOrderOfTime)
   }
 }
 
+TEST(Curve, AKeyThatGetsAnotherTimeMovesToItsPlace)
+{
+  counting_memory::BalanceCheck balance;
+  CCurve curve;
+  for (Long time : {1, 2, 3})
+    curve.AddKey(BaseTime(time, 1))->SetValue(&curve, time);
+  auto values = [&] {
+    std::vector<Real> all;
+    for (Long i = 0; i < curve.GetKeyCount(); ++i)
+      all.push_back(curve.GetKey(i)->GetValue());
+    return all;
+  };
+  CKey* key = curve.GetKey(0);
+  ASSERT_TRUE(key->SetParameterById(kKeyTime, GeData(BaseTime(5, 2))));
+  EXPECT_EQ(values(), (std::vector<Real>{2, 1, 3}));
+  EXPECT_EQ(key->GetNext(), curve.GetKey(2));
+  EXPECT_TRUE(key->SetTime(BaseTime(9, 1)));
+  EXPECT_EQ(values(), (std::vector<Real>{2, 3, 1}));
+  EXPECT_FALSE(key->SetTime(BaseTime(10001, 1)));
+  EXPECT_EQ(key->GetTime(), BaseTime(9, 1));
+  EXPECT_TRUE(curve.GetKey(1)->CopyWithTranslation(*curve.GetKey(0), 0, nullptr)); // brings its time along
+  EXPECT_EQ(values(), (std::vector<Real>{3, 3, 1}));
+  key->RemoveFromList();
+  EXPECT_EQ(key->GetCurve(), nullptr);
+  EXPECT_EQ(curve.GetKeyCount(), 2);
+  DeleteObj(key);
+  key = curve.GetKey(1);
+  DeleteObj(key);
+  EXPECT_EQ(values(), (std::vector<Real>{3}));
+}
+
 TEST(Curve, WritesItsKeysAndNothingForNone)
 {
   CCurve curve;

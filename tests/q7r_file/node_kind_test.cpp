@@ -97,6 +97,35 @@ TEST(NodeKind, AListTakesItsOwnClassAlone)
   BaseDocument::Free(document);
 }
 
+TEST(NodeKind, WhatLeavesItsListForgetsWhereItStood)
+{
+  counting_memory::BalanceCheck balance;
+  BaseDocument* document = CreateDocument();
+  BaseObject* parent = AllocObject(kObjectNull);
+  BaseObject* child = AllocObject(kObjectNull);
+  document->InsertObject(parent);
+  child->InsertUnder(parent);
+  BaseTag* tag = child->MakeTag(kTagProtection);
+  Material* material = AllocMaterial();
+  document->InsertMaterial(material);
+  ASSERT_EQ(tag->GetDocument(), document);
+  tag->RemoveFromList();
+  EXPECT_TRUE(!tag->GetObject() && !tag->GetDocument());
+  BaseObject other(kObjectNull);
+  other.GetTagRoot().InsertFirst(tag);
+  EXPECT_EQ(tag->GetObject(), &other);
+  child->InsertTag(tag);
+  EXPECT_TRUE(tag->GetObject() == child && !other.GetFirstTag());
+  parent->RemoveFromList();
+  material->RemoveFromList();
+  BaseDocument::Free(document);
+  for (BaseList2D* node : std::initializer_list<BaseList2D*>{parent, child, tag, material})
+    EXPECT_EQ(node->GetDocument(), nullptr) << node->GetNodeKind().name;
+  EXPECT_EQ(material->GetListHead(), nullptr);
+  DeleteObj(parent);
+  DeleteObj(material);
+}
+
 TEST(NodeKind, ALinkToAnythingGivesOnlyWhatIsAskedFor)
 {
   BaseDocument* document = CreateDocument();

@@ -137,6 +137,8 @@ TEST(Node, KeepsExtraIdentifiersThroughAFile)
   EXPECT_TRUE(node.AddUniqueID(20, bytes, 3));
   EXPECT_TRUE(node.AddUniqueID(10, bytes, 2));
   EXPECT_TRUE(node.AddUniqueID(20, bytes, 1)); // replaces, with another size
+  EXPECT_FALSE(node.AddUniqueID(20, nullptr, 1));
+  EXPECT_FALSE(node.AddUniqueID(20, bytes, -1));
   ASSERT_EQ(node.GetUniqueIDCount(), 3);
   Bytes written = BytesOf(node);
   const Bytes chunk =
@@ -152,6 +154,10 @@ TEST(Node, KeepsExtraIdentifiersThroughAFile)
   EXPECT_EQ(size, 1);
   EXPECT_FALSE(back.GetUniqueIDByIndex(3, appId, data, size));
   EXPECT_EQ(std::memcmp(back.GetMarker().bytes, node.GetMarker().bytes, 16), 0);
+  // An entry of a file that bears the marker's number isn't the marker.
+  ASSERT_TRUE(ReadInto(back, ByteWriter().Start(110068, 1).Long(1).Long(kMarkerAppId).Memory(Bytes{7}).End().bytes));
+  ASSERT_TRUE(back.GetUniqueIDByIndex(1, appId, data, size));
+  EXPECT_TRUE(appId == kMarkerAppId && size == 1 && *static_cast<const UChar*>(data) == 7);
 }
 
 TEST(Node, CopiesWithAMarkerOfItsOwn)

@@ -26,7 +26,7 @@ class CCurve : public BaseList2D
   static constexpr NodeKindOf<CCurve> kNodeKind{"curve", &BaseList2D::kNodeKind};
   const NodeKind& GetNodeKind() const override { return kNodeKind; }
 
-  CCurve() = default;
+  CCurve() { keyRoot_.SetOwner(this); }
   ~CCurve() override = default;
 
   Bool ReadChunk(HyperFile& file, Long id, Long level) override;
@@ -54,7 +54,11 @@ class CCurve : public BaseList2D
   Real GetValue(const BaseTime& time) const { return GetValue(time.Get()); }
 
  private:
+  friend class CKey; // tells when it goes or changes its time
+
   Bool RebuildIndex();
+  void ForgetKey(const CKey& key);
+  Bool MoveKey(CKey& key, const BaseTime& time);
   Long PlaceOf(const BaseTime& time) const;
   KeyTangents AutomaticTangents(Long index) const;
   Bool IsClamped(Long index) const;

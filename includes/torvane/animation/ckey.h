@@ -37,6 +37,7 @@ class CKey : public BaseList2D
   const NodeKind& GetNodeKind() const override { return kNodeKind; }
 
   CKey();
+  ~CKey() override;
 
   Bool ReadChunk(HyperFile& file, Long id, Long level) override;
   void WriteChunks(HyperFile& file) override;
@@ -45,12 +46,16 @@ class CKey : public BaseList2D
   Bool SetParameter(const ParameterPath& path, const GeData& value) override;
   GeListNode* MakeClone(ULong flags, TransArray* translation) override;
   Bool ChangeNBit(Long bit, Long mode) override;
+  void RemoveFromList() override; // takes the key out of its curve; the caller owns it then
 
   CKey* GetNext() const { return NodeCast<CKey>(BaseList2D::GetNext()); }
 
   const BaseTime& GetTime() const { return time_; }
-  // Only for a key that is in no curve: a curve is sorted by the times of its keys.
-  void SetTime(const BaseTime& time) { time_ = time; }
+  // A key that stands in a curve moves to its place there, before one of the same time; false, with nothing changed,
+  // for a time at which a curve takes no keys.
+  Bool SetTime(const BaseTime& time);
+  // The curve that the key stands in, or null.
+  CCurve* GetCurve() const;
   Real GetValue() const { return value_; }
   // The curve that holds the key is not looked at; an equal value isn't stored again.
   void SetValue(CCurve* curve, Real value);
@@ -74,6 +79,8 @@ class CKey : public BaseList2D
   Bool IsEqual(const CKey& other) const;
 
  private:
+  friend class CCurve; // sets the time of a key that it moves
+
   template <class Visitor>
   Bool VisitBody(Visitor& visitor);
 

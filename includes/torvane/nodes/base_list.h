@@ -98,7 +98,9 @@ class BaseList2D : public GeListNode
   // The node's marker. It is drawn when it is first asked for.
   const NodeMarker& GetMarker() const;
 
-  // Extra identifiers. The application id kMarkerAppId is the marker itself, of 16 bytes.
+  // Extra identifiers. The application id kMarkerAppId is the marker itself, of 16 bytes. Adding copies the bytes; it
+  // fails for a negative size, for a size without bytes, and when memory is short. What the others give is valid until
+  // the identifiers change.
   Bool AddUniqueID(Long appId, const void* data, LLong size);
   Bool FindUniqueID(Long appId, const void*& data, LLong& size) const;
   Long GetUniqueIDCount() const;

@@ -52,6 +52,8 @@ class RootList2D : public PrivateChunk
   void SetDocument(BaseDocument* document) { document_ = document; }
 
  protected:
+  // Called when a node has become a member.
+  virtual void OnEnter(BaseList2D&) {}
   // The label of a member's chunk.
   virtual Long GetMemberLabel(BaseList2D& member) const;
   // False: an empty list writes nothing at all, not even its outer chunk.
@@ -64,6 +66,7 @@ class RootList2D : public PrivateChunk
 
  private:
   Bool Takes(const BaseList2D& node) const;
+  void Enter(BaseList2D& node, Bool setListHead);
 
   GeTempPublicList2D<PrivateChunk> list_;
   BaseList2D* owner_ = nullptr;
@@ -88,6 +91,9 @@ class RootTag : public RootList2D
   explicit RootTag(BaseObject* tagOwner) : tagOwner_(tagOwner) {}
   const NodeKind& GetMemberKind() const override;
   Bool ReadChunk(HyperFile& file, Long id, Long level) override;
+
+ protected:
+  void OnEnter(BaseList2D& tag) override; // sets the tag's object
 
  private:
   BaseObject* tagOwner_;

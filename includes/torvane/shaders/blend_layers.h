@@ -223,7 +223,7 @@ class BlendShader : public BlendLayer
 
   // The shader's name, which becomes the layer's.
   void GetLayerName(String& name) override;
-  // Takes the shader out of its list and deletes it.
+  // Takes the shader out of its list and deletes it, unless the shader's own settings hold the layer.
   void ReleaseLinked() override;
   GeAliasLink* GetLink() override { return &link_; }
 

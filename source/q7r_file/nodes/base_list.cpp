@@ -258,6 +258,8 @@ Bool BaseList2D::AddUniqueID(Long appId, const void* data, LLong size)
     markerDrawn_ = true;
     return true;
   }
+  if (size < 0 || (size > 0 && !data))
+    return false;
   if (!uniqueIds_)
     uniqueIds_ = NewObj<UniqueIDArray>();
   return uniqueIds_ && uniqueIds_->SetEntry(appId, data, size);
@@ -284,8 +286,16 @@ Bool BaseList2D::GetUniqueIDByIndex(Long index, Long& appId, const void*& data, 
 {
   if (index < 0 || index >= GetUniqueIDCount())
     return false;
-  appId = index == 0 ? kMarkerAppId : (*uniqueIds_)[index - 1].appId;
-  return FindUniqueID(appId, data, size);
+  if (index == 0) {
+    appId = kMarkerAppId;
+    return FindUniqueID(appId, data, size);
+  }
+  // A file may hold an entry with the marker's number too.
+  const UniqueIDEntry& entry = (*uniqueIds_)[index - 1];
+  appId = entry.appId;
+  data = entry.data;
+  size = entry.size;
+  return true;
 }
 
 BaseShader* BaseList2D::GetShaders() const { return shaders_ ? NodeCast<BaseShader>(shaders_->GetFirst()) : nullptr; }

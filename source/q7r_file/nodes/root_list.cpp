@@ -50,9 +50,15 @@ Bool RootList2D::Append(BaseList2D* node, Bool setListHead)
   if (!Takes(*node))
     return false;
   list_.InsertLast(node);
-  node->SetListHead(setListHead ? this : nullptr);
-  node->SetDocument(GetDocument());
+  Enter(*node, setListHead);
   return true;
+}
+
+void RootList2D::Enter(BaseList2D& node, Bool setListHead)
+{
+  node.SetListHead(setListHead ? this : nullptr);
+  node.SetDocument(GetDocument());
+  OnEnter(node);
 }
 
 Bool RootList2D::InsertFirst(BaseList2D* node) { return InsertAfter(node, nullptr); }
@@ -69,8 +75,7 @@ Bool RootList2D::InsertAfter(BaseList2D* node, BaseList2D* reference)
     node->GeToolNode2D::InsertAfter(reference);
   else
     list_.InsertFirst(node);
-  node->SetListHead(this);
-  node->SetDocument(GetDocument());
+  Enter(*node, true);
   return true;
 }
 
@@ -203,11 +208,10 @@ Bool RootTag::ReadChunk(HyperFile& file, Long id, Long level)
     file.SetError(FILEERROR_MEMORY);
     return false;
   }
-  if (!ReadMember(file, tag, false))
-    return false;
-  tag->SetObject(tagOwner_);
-  return true;
+  return ReadMember(file, tag, false);
 }
+
+void RootTag::OnEnter(BaseList2D& tag) { NodeCast<BaseTag>(&tag)->SetObject(tagOwner_); }
 
 Bool RootMaterial::ReadChunk(HyperFile& file, Long id, Long level)
 {

@@ -61,13 +61,7 @@ BaseTag* BaseObject::GetTag(Long type) const
   return tag;
 }
 
-void BaseObject::InsertTag(BaseTag* tag, BaseTag* after)
-{
-  if (!tag)
-    return;
-  tags_.InsertAfter(tag, after);
-  tag->SetObject(this);
-}
+void BaseObject::InsertTag(BaseTag* tag, BaseTag* after) { tags_.InsertAfter(tag, after); }
 
 BaseTag* BaseObject::MakeTag(Long type)
 {
@@ -376,8 +370,6 @@ Bool BaseObject::CopyTo(PrivateChunk& destination, ULong flags, TransArray* tran
     return false;
   if (!BaseList2D::CopyTo(*target, flags, translation) || !tags_.CopyWithTranslation(target->tags_, flags, translation))
     return false;
-  for (BaseTag* tag = target->GetFirstTag(); tag; tag = tag->GetNext())
-    tag->SetObject(target);
   if (GetType() != target->GetType() && !(flags & kCopyNoBranches))
     ReportAssertion("q7r_file", __LINE__, "an object was copied onto an object of another type");
   CopyTransform(*target);
