@@ -41,7 +41,7 @@ Bool HoldsLayer(const BaseContainer& settings, const BlendLayer& layer)
 {
   BaseContainer::Iterator place;
   Long id = 0;
-  GeData* value = nullptr;
+  const GeData* value = nullptr;
   Bool found = false;
   for (Bool more = settings.BrowseFirst(place, id, value); more && !found;
        more = settings.BrowseNext(place, id, value)) {

@@ -22,7 +22,7 @@ Bool IsKeyTime(const BaseTime& time)
 void CCurve::WriteChunks(HyperFile& file)
 {
   BaseList2D::WriteChunks(file);
-  if (!keyRoot_.IsEmpty())
+  if (keyRoot_.HasContent())
     keyRoot_.WriteAsChunk(file, kChunkKeys);
 }
 

@@ -12,6 +12,7 @@
 #include "support/temp_folder.h"
 #include "support/text.h"
 #include "torvane/animation/ctrack.h"
+#include "torvane/materials/base_material.h"
 #include "torvane/tags/base_tag.h"
 #include "torvane/time/date_time.h"
 
@@ -442,6 +443,60 @@ TEST(Document, AThousandLevelsOfParentsWork)
   EXPECT_EQ(depth, 1001);
 }
 
+TEST(Document, WhatIsSavedCanBeLoadedAndWhatNestsTooDeepIsRefused)
+{
+  const auto depthOf = [](BaseDocument& document) {
+    int depth = 0;
+    for (BaseObject* object = document.GetFirstObject(); object; object = object->GetDown())
+      ++depth;
+    return depth;
+  };
+  DocumentPtr document = NewDocument();
+  BaseObject* last = nullptr;
+  int saved = 0;
+  for (int depth = 1; depth <= HyperFile::kMaxLoopDepth + 1; ++depth) {
+    BaseObject* object = AllocObject(kObjectNull);
+    last ? object->InsertUnder(last) : document->InsertObject(object);
+    last = object;
+    if (depth < HyperFile::kMaxLoopDepth - 5 && depth != 2000)
+      continue;
+    Long error = FILEERROR_NONE;
+    const Bytes bytes = WriteToMemory(
+        [&](HyperFile& file) {
+          document->WriteChunks(file);
+          error = file.GetError();
+        },
+        true);
+    if (error == FILEERROR_NONE) {
+      DocumentPtr back = LoadFromBytes(bytes);
+      ASSERT_NE(back, nullptr) << depth;
+      EXPECT_EQ(depthOf(*back), saved = depth);
+    } else {
+      EXPECT_EQ(error, FILEERROR_TOO_DEEP) << depth;
+    }
+  }
+  EXPECT_GE(saved, HyperFile::kMaxLoopDepth - 3);
+  EXPECT_LT(saved, HyperFile::kMaxLoopDepth);
+}
+
+TEST(Document, ACopyThatFailsLeavesNoNodesBehind)
+{
+  DocumentPtr source = NewDocument();
+  AddObject(*source, "A")->MakeTag(kTagProtection);
+  source->InsertMaterial(MakeMaterial(kMaterialStandard));
+  source->InsertLayer(AllocLayer());
+  DocumentPtr target = NewDocument();
+  bool copied = false;
+  for (LLong count = 0; !copied; count += 3) {
+    counting_memory::FailAfter(count);
+    copied = source->CopyWithTranslation(*target, 0, nullptr);
+    counting_memory::FailNever();
+    for (RootList2D* root :
+         std::initializer_list<RootList2D*>{target->GetObjectRoot(), target->GetMaterialRoot(), target->GetLayerRoot()})
+      EXPECT_EQ(root->IsEmpty(), !copied) << count;
+  }
+}
+
 TEST(Document, NestingWithoutEndIsAnErrorAndNoCrash)
 {
   ByteWriter w;
@@ -472,6 +527,12 @@ TEST(RootLists, SkipWhatTheyDoNotKnowAndKeepTheNeighbours)
   ASSERT_EQ(document->GetObjectRoot()->GetCount(), 2);
   EXPECT_EQ(Utf8(document->GetFirstObject()->GetName()), "one");
   EXPECT_EQ(Utf8(document->GetFirstObject()->GetNext()->GetName()), "two");
+  // What stood under the unknown label comes back behind them, also from a copy.
+  const std::string unknown = ToHex(ByteWriter().Start(5127, 0).Start(3, 3).Long(1).End().End().bytes);
+  DocumentPtr copy(NodeCast<BaseDocument>(document->MakeClone(0, nullptr)));
+  ASSERT_NE(copy, nullptr);
+  for (BaseDocument* each : {document.get(), copy.get()})
+    EXPECT_NE(ToHex(SaveToBytes(*each)).find(unknown), std::string::npos);
 }
 
 TEST(RenderData, HasEveryDefaultInFileOrder)

@@ -191,13 +191,11 @@ TEST(UVWTag, IsNamedWhenTheFileHasNoName)
   EXPECT_EQ(named.GetName(), String("map"));
 }
 
-TEST(UVWTag, CopiesWithItsParameterButNotWithoutEntries)
+TEST(UVWTag, CopiesWithItsParameter)
 {
   UVWTag source;
   UVWTag target;
   source.SetParameterById(1000, GeData(Long{3}));
-  EXPECT_FALSE(source.CopyWithTranslation(target, 0, nullptr));
-  EXPECT_EQ(source.MakeClone(0, nullptr), nullptr);
   source.ResizeTagArray(2);
   source.GetArray()[1].corners[3] = {4, 5};
   target.ResizeTagArray(9);

@@ -195,6 +195,7 @@ class BaseDocument : public BaseList2D
   void SetContainerDefaults();
   Bool GetOwnParameter(Long id, GeData& value) const;
   Bool GetBackColor(const ParameterPath& path, GeData& value) const;
+  Bool CopyContent(BaseDocument& destination, ULong flags, TransArray* translation);
   Bool CopyRoots(BaseDocument& destination, ULong flags, TransArray* translation);
   Long AxisLockRow() const;
 

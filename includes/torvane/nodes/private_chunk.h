@@ -37,6 +37,9 @@ class PrivateChunk : public GeTempPublicNode2D<PrivateChunk>
   // consumed with its end.
   virtual Bool KeepChunk(HyperFile&, Long, Long) { return false; }
   virtual Bool IsRootList() const { return false; }
+  // Called in a loop for each chunk start. True: the chunk only holds more of what this loop reads, which then goes on
+  // inside of it. A root list enters its own chunks so, which keeps a chain of objects to one loop each.
+  virtual Bool EntersChunk(Long) { return false; }
   virtual Long GetType() const { return 0; }
   // Writes the chunks of this node, those of the base class first. Failures show in the file's error.
   virtual void WriteChunks(HyperFile& file);
@@ -50,12 +53,14 @@ class PrivateChunk : public GeTempPublicNode2D<PrivateChunk>
 
   // Reads chunks up to the end mark of the chunk that encloses them and hands each to ReadChunk. With `keepGoing` a
   // chunk that nobody takes is skipped; without it the loop ends there. False on an error, and at the end of the file
-  // (without an error). `tagAlreadyRead` is always false.
+  // (without an error). Loops of nodes nest no deeper than HyperFile::kMaxLoopDepth; those of root lists don't count.
+  // `tagAlreadyRead` is always false.
   Bool ReadChunkLoop(HyperFile& file, Bool keepGoing, Bool tagAlreadyRead = false);
   // The loop with `keepGoing`; with `consumeHeader` the start of the enclosing chunk is read first (an end mark there
   // passes).
   Bool ReadChunks(HyperFile& file, Bool consumeHeader);
-  // Chunk (id, 0) around WriteChunks.
+  // Chunk (id, 0) around WriteChunks. A node that could not be read again, so deep does it stand, is the error
+  // FILEERROR_TOO_DEEP.
   void WriteAsChunk(HyperFile& file, Long id);
   // The entry to CopyTo. Without an array, and unless kCopyNoTranslation is set, links inside the copy are translated
   // here: they point at copies of what was copied along and else at what the source points at.
@@ -65,7 +70,9 @@ class PrivateChunk : public GeTempPublicNode2D<PrivateChunk>
   Bool SetParameterById(Long id, const GeData& value);
 
  private:
-  Bool ReadOneChunk(HyperFile& file, Bool keepGoing, Bool& finished);
+  struct Loop;
+  Bool ReadOneChunk(HyperFile& file, Loop& loop);
+  Bool EndLoopChunk(HyperFile& file, Loop& loop);
 };
 
 // A node with an alias goal and 128 node bits.
@@ -120,9 +127,11 @@ class NodeData : public PrivateChunk
   virtual const NodeKind& GetOwnerKind() const;
   // Called once after creation, with the node set; false makes the creation fail.
   virtual Bool Init() { return true; }
-  // Reads the body of the node data chunk, and other chunks of a polygon object. False: not read; the caller skips.
+  // Called while a node is read, for the body of its node data chunk (kChunkNodeData), and for chunks of a polygon
+  // object or a spline that nobody else takes. True: read; of other chunks than the node data's also the end tag.
+  // False: the caller passes over the rest.
   virtual Bool ReadData(HyperFile& file, Long id, Long level);
-  // A hook for clients.
+  // A hook for clients, which BaseObject::Execute calls; the library itself never does.
   virtual Bool Execute() { return false; }
   // The label of the owner object in its root list.
   virtual Long GetDiskType() const { return kObjectGeneric; }

@@ -3,6 +3,7 @@
 // member is made from that label.
 #pragma once
 
+#include "torvane/nodes/kept_chunks.h"
 #include "torvane/nodes/private_chunk.h"
 
 namespace _torvane_
@@ -22,6 +23,11 @@ class RootList2D : public PrivateChunk
   ~RootList2D() override;
 
   Bool IsRootList() const override { return true; }
+  // The list's own chunk, whose members replace the present ones.
+  Bool EntersChunk(Long id) override;
+  // Keeps members under labels that nobody knows; they are written behind the others. Those of files below version
+  // 13000 are passed over.
+  Bool KeepChunk(HyperFile& file, Long id, Long level) override;
   Bool ReadChunk(HyperFile& file, Long id, Long level) override;
   void WriteChunks(HyperFile& file) override;
   Bool CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation) override;
@@ -29,6 +35,8 @@ class RootList2D : public PrivateChunk
   BaseList2D* GetFirst() const;
   BaseList2D* GetLast() const;
   Bool IsEmpty() const { return GetFirst() == nullptr; }
+  // True if there is anything to write: members, or chunks that were kept.
+  Bool HasContent() const { return !IsEmpty() || !keptChunks_.IsEmpty(); }
 
   // The class of the members; a node of another one is refused.
   virtual const NodeKind& GetMemberKind() const;
@@ -39,9 +47,12 @@ class RootList2D : public PrivateChunk
   Bool InsertAfter(BaseList2D* node, BaseList2D* reference);  // first when the reference is null
   Bool InsertBefore(BaseList2D* node, BaseList2D* reference); // first when the reference has no predecessor
   void RemoveMember(BaseList2D* node);
-  // Deletes all members, first to last.
+  // Deletes all members, first to last, and what was kept.
   void FreeAll();
   LLong GetCount() const;
+
+  // Copies what was kept, for those that copy the members on their own. False when memory is short.
+  Bool CopyKeptChunks(RootList2D& destination) const { return keptChunks_.CopyTo(destination.keptChunks_); }
 
   // The node above the list, or null; set by the owner.
   BaseList2D* GetOwner() const { return owner_; }
@@ -69,6 +80,7 @@ class RootList2D : public PrivateChunk
   void Enter(BaseList2D& node, Bool setListHead);
 
   GeTempPublicList2D<PrivateChunk> list_;
+  KeptChunks keptChunks_;
   BaseList2D* owner_ = nullptr;
   BaseDocument* document_ = nullptr;
 };
@@ -78,6 +90,7 @@ class RootObject : public RootList2D
 {
  public:
   const NodeKind& GetMemberKind() const override;
+  Bool EntersChunk(Long id) override; // also an old nested list, whose members join the others
   Bool ReadChunk(HyperFile& file, Long id, Long level) override;
   // Called while a list is read, for each label in it: a new object that the list then owns, or null for a label that
   // can't be made, which is passed over. A client may give objects of its own classes.

@@ -62,7 +62,7 @@ class BaseObject : public BaseList4D
   Long GetDiskType() const override;
   GeListNode* MakeClone(ULong flags, TransArray* translation) override;
   void SetDocument(BaseDocument* document) override;
-  // The object data's Execute; false without object data.
+  // The object data's Execute; false without object data. For clients: the library itself never calls it.
   virtual Bool Execute();
 
   BaseObject* GetUp() const { return NodeCast<BaseObject>(BaseList4D::GetUp()); }
@@ -102,17 +102,23 @@ class BaseObject : public BaseList4D
   ULong GetFrozenFlags() const { return frozenFlags_; }
   Long GetRotationOrder() const { return rotationOrder_; }
 
+  // Maps the object's space to that of its parent: the absolute values. Valid until the next setter.
   const Matrix& GetLocalMatrix();
-  Matrix GetGlobalMatrix();
-  Matrix GetUpGlobalMatrix() const; // of the parent; identity without one
+  Matrix GetGlobalMatrix();         // the object's space to the world
+  Matrix GetUpGlobalMatrix() const; // the parent's space to the world; identity without a parent
+  // As the local and the global matrix, with axes of length 1.
   Matrix GetNormalizedLocalMatrix() const;
   Matrix GetNormalizedGlobalMatrix();
+  // The object's space to that of its frozen transform: the relative values, with and without their scale.
   Matrix GetRelativeMatrix() const;
   Matrix GetRelativeNormalizedMatrix() const;
+  // The frozen transform's space to that of the parent, without scale; identity when nothing is frozen.
   Matrix GetFrozenTransformMatrix() const;
+  // A matrix that a file holds and the library hands on without a meaning of its own.
   const Matrix& GetStoredMatrix() const { return storedMatrix_; }
 
-  // Every setter of the transform does nothing on an object with a Protection Tag (5629).
+  // Every setter of the transform does nothing on an object with a Protection Tag (5629). The matrices are taken apart
+  // into position, rotation and scale; each maps what the getter of its name maps.
   void SetRelPos(const Vector& value);
   void SetRelRot(const Vector& value);
   void SetRelScale(const Vector& value);
@@ -166,6 +172,9 @@ class BaseObject : public BaseList4D
   RootObject* legacyListB_ = nullptr;
   NodeData* objectData_ = nullptr; // owned
 
+  // A new object of this class and type for MakeClone, or null; the object data are copied later.
+  virtual BaseObject* MakeEmpty() const;
+
  private:
   struct LongParameter;
   struct VectorParameter;
@@ -198,7 +207,8 @@ class BaseObject : public BaseList4D
   Bool ReadChildren(HyperFile& file);
   Bool ReadObjectData(HyperFile& file, Long id, Long level);
   void StoreModelCheckSum();
-  Bool KeepsChunksBesideTransform() const;
+  enum class DataForm;
+  DataForm GetDataForm() const;
   void WriteObjectData(HyperFile& file);
   Bool CopyObjectData(BaseObject& destination, ULong flags, TransArray* translation) const;
   void CopyTransform(BaseObject& destination) const;

@@ -25,6 +25,9 @@ class PointObject : public BaseObject
 
   Bool IsInstanceOf(Long type) const override { return type == kObjectPoint || BaseObject::IsInstanceOf(type); }
   Long GetDiskType() const override { return kObjectPoint; }
+
+ protected:
+  BaseObject* MakeEmpty() const override { return NewObj<PointObject>(GetType()); }
 };
 
 // Its object data come from the client (PolygonObjectData or a class derived from it) and give the label in a file.
@@ -34,12 +37,15 @@ class PolygonObject : public PointObject
   static constexpr NodeKindOf<PolygonObject> kNodeKind{"polygon object", &PointObject::kNodeKind};
   const NodeKind& GetNodeKind() const override { return kNodeKind; }
 
-  PolygonObject() : PointObject(kObjectPolygon) {}
+  explicit PolygonObject(Long type = kObjectPolygon) : PointObject(type) {}
 
   Bool IsInstanceOf(Long type) const override { return type == kObjectPolygon || PointObject::IsInstanceOf(type); }
   // The label comes from the object data, as for most objects.
   // NOLINTNEXTLINE(bugprone-parent-virtual-call)
   Long GetDiskType() const override { return BaseObject::GetDiskType(); }
+
+ protected:
+  BaseObject* MakeEmpty() const override { return NewObj<PolygonObject>(GetType()); }
 };
 
 // Null where an object has none.

@@ -23,13 +23,16 @@ class SplineObject : public PointObject
   const NodeKind& GetNodeKind() const override { return kNodeKind; }
 
   // Sets the defaults of the container.
-  SplineObject();
+  explicit SplineObject(Long type = kObjectSpline);
 
   Bool IsInstanceOf(Long type) const override { return type == kObjectSpline || PointObject::IsInstanceOf(type); }
   Long GetDiskType() const override { return kObjectSpline; }
   // Also takes the chunks of the object data, which stand among the object's own. A spline without a name is called
   // "Spline".
   Bool ReadChunk(HyperFile& file, Long id, Long level) override;
+
+ protected:
+  BaseObject* MakeEmpty() const override { return NewObj<SplineObject>(GetType()); }
 };
 
 // Null where an object has none.

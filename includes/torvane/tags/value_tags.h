@@ -39,7 +39,7 @@ class BaseArrayTag : public BaseTag
   // `target` is a tag of this class and not this one. The common way: resize it and copy the bytes.
   virtual Bool CopyEntries(BaseArrayTag& target);
   // The way of tags that a copy onto a filled tag empties: `target` then gets zeroed entries, this tag loses its own,
-  // and the copy fails. So does the copy of a tag without entries.
+  // and the copy fails. Without entries on both sides there is nothing to do.
   Bool CopyEntriesOntoEmpty(BaseArrayTag& target);
 
   // Frees the old entries and takes over the block.

@@ -23,6 +23,7 @@ constexpr ErrorText kErrorTexts[] = {
     {FILEERROR_MEMORY, "not enough memory"},
     {FILEERROR_WRONG_VALUE, "a value is not of the expected kind"},
     {FILEERROR_CHUNK_STRUCTURE, "the chunk structure is damaged"},
+    {FILEERROR_TOO_DEEP, "the content nests too deep to be read again"},
     {FILEERROR_PREMATURE_END, "the file ends inside a chunk"},
 };
 

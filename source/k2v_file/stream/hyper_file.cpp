@@ -224,7 +224,7 @@ Bool HyperFile::EnterLoop()
   if (error_ != FILEERROR_NONE)
     return false;
   if (loopDepth_ >= kMaxLoopDepth)
-    return Fail(FILEERROR_CHUNK_STRUCTURE, file_.GetPosition());
+    return Fail(mode_ == kHyperFileWrite ? FILEERROR_TOO_DEEP : FILEERROR_CHUNK_STRUCTURE, file_.GetPosition());
   ++loopDepth_;
   return true;
 }

@@ -308,6 +308,7 @@ Bool BaseDocument::SetParameter(const ParameterPath& path, const GeData& value)
   }
 }
 
+// A copy that fails leaves no nodes behind.
 Bool BaseDocument::CopyTo(PrivateChunk& destination, ULong flags, TransArray*)
 {
   auto* target = NodeCast<BaseDocument>(&destination);
@@ -315,24 +316,31 @@ Bool BaseDocument::CopyTo(PrivateChunk& destination, ULong flags, TransArray*)
     return false;
   AllocationWatch watch;
   AliasTranslator translator;
-  if (!translator.MakeTranslator() || !BaseList2D::CopyTo(destination, flags, translator.GetArray()))
-    return false;
-  target->fileName_ = fileName_;
-  pref_.CopyTo(target->pref_, flags, translator.GetArray());
-  target->time_ = time_;
-  target->mode_ = mode_;
-  target->tool_ = tool_;
-  Bool copied = preview_.CopyTo(target->preview_);
-  for (Long i = 0; i < kSettingsCount && copied; ++i)
-    copied = settings_[i].CopyTo(target->settings_[i], flags, translator.GetArray());
-  if (!copied || !CopyRoots(*target, flags, translator.GetArray()) || watch.Failed()) {
-    target->materials_->FreeAll();
-    target->objects_->FreeAll();
-    target->layers_->FreeAll();
-    return false;
+  Bool copied = translator.MakeTranslator() && CopyContent(*target, flags, translator.GetArray()) && !watch.Failed();
+  translator.Finish(copied);
+  copied = copied && !watch.Failed();
+  if (!copied) {
+    for (RootList2D* root : std::initializer_list<RootList2D*>{target->materials_, target->objects_, target->layers_,
+                                                               target->renderData_, target->viewPanels_})
+      root->FreeAll();
   }
-  translator.Finish(true);
-  return !watch.Failed();
+  return copied;
+}
+
+Bool BaseDocument::CopyContent(BaseDocument& target, ULong flags, TransArray* translation)
+{
+  if (!BaseList2D::CopyTo(target, flags, translation) || !pref_.CopyTo(target.pref_, flags, translation) ||
+      !preview_.CopyTo(target.preview_))
+    return false;
+  target.fileName_ = fileName_;
+  target.time_ = time_;
+  target.mode_ = mode_;
+  target.tool_ = tool_;
+  for (Long i = 0; i < kSettingsCount; ++i) {
+    if (!settings_[i].CopyTo(target.settings_[i], flags, translation))
+      return false;
+  }
+  return CopyRoots(target, flags, translation);
 }
 
 Bool BaseDocument::CopyRoots(BaseDocument& target, ULong flags, TransArray* translation)

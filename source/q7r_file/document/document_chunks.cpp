@@ -207,6 +207,8 @@ Bool BaseDocument::VisitNewerState(Visitor& v)
 void BaseDocument::WriteChunks(HyperFile& file)
 {
   StampInfo(data_, kInfoWriterName, kInfoWriterId, kInfoSaveDate);
+  if (!file.EnterLoop()) // a reader's loop for the document itself
+    return;
   file.WriteChunkStart(kChunkDocumentState, 0);
   WriteFileInfo(file);
   BaseList2D::WriteChunks(file);
@@ -220,12 +222,13 @@ void BaseDocument::WriteChunks(HyperFile& file)
                {renderData_, kChunkRenderDataRoot},
                {viewPanels_, kChunkViewPanelRoot}};
   for (const auto& [root, id] : roots) {
-    if (root && !root->IsEmpty())
+    if (root && root->HasContent())
       root->WriteAsChunk(file, id);
   }
   pref_.WriteChunks(file);
   WriteChunk(file, kChunkDocumentState, kLevelDocumentState, [this](ChunkWriter& v) { return VisitState(v); });
   file.WriteChunkEnd();
+  file.LeaveLoop();
 }
 
 Bool BaseDocument::ReadRoot(HyperFile& file, RootList2D* root, Bool wanted)

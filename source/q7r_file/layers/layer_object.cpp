@@ -33,7 +33,7 @@ Bool LayerObject::VisitBody(Visitor& v)
 void LayerObject::WriteChunks(HyperFile& file)
 {
   BaseList4D::WriteChunks(file);
-  if (children_ && !children_->IsEmpty())
+  if (children_ && children_->HasContent())
     children_->WriteAsChunk(file, kChunkList);
   WriteChunk(file, kChunkLayer, kLevelLayer, [this](ChunkWriter& v) { return VisitBody(v); });
 }
@@ -69,7 +69,7 @@ Bool LayerObject::CopyTo(PrivateChunk& destination, ULong flags, TransArray* tra
     }
     clone->InsertUnderLast(target);
   }
-  return true;
+  return !target->children_ || children_->CopyKeptChunks(*target->children_);
 }
 
 Bool LayerObject::GetParameter(const ParameterPath& path, GeData& value)

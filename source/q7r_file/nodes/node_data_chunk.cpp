@@ -2,6 +2,8 @@
 
 #include "torvane/hooks.h"
 #include "torvane/nodes/base_list.h"
+#include "torvane/objects/base_object.h"
+#include "torvane/objects/point_object_data.h"
 #include "torvane/stream/hyper_file.h"
 
 namespace _torvane_
@@ -15,20 +17,26 @@ Bool AttachNodeData(NodeData* data, NodeDataSlot slot)
     return true;
   data->SetNode(&slot.node);
   slot.data = data;
-  if (data->Init())
-    return true;
-  DeleteObj(slot.data);
-  return false;
+  // The container was read or copied before: the defaults that Init puts there must not come over it.
+  BaseContainer present(std::move(slot.node.GetDataInstance()));
+  const Bool made = data->Init();
+  slot.node.GetDataInstance() = std::move(present);
+  if (!made)
+    DeleteObj(slot.data);
+  return made;
 }
 
 NodeData* AllocNodeDataFor(const BaseList2D& node, Long type, Bool& known)
 {
   NodeData* data = AllocNodeData(type, known);
-  if (!data || node.GetNodeKind().Is(data->GetOwnerKind()))
+  if (data && !node.GetNodeKind().Is(data->GetOwnerKind())) {
+    DeleteObj(data);
+    known = false;
+  }
+  if (data || known || type != kObjectPolygon || !NodeCast<BaseObject>(&node))
     return data;
-  DeleteObj(data);
-  known = false;
-  return nullptr;
+  known = true;
+  return NewObj<PolygonObjectData>();
 }
 
 Bool ReadNodeDataBody(HyperFile& file, Long id, Long level, Long type, NodeDataSlot slot)
@@ -40,11 +48,7 @@ Bool ReadNodeDataBody(HyperFile& file, Long id, Long level, Long type, NodeDataS
     slot.raw.Free();
     return false;
   }
-  // The container was read from an earlier chunk: the defaults that Init puts there must not come over it.
-  BaseContainer loaded(std::move(slot.node.GetDataInstance()));
-  Bool attached = AttachNodeData(data, slot);
-  slot.node.GetDataInstance() = std::move(loaded);
-  if (!attached)
+  if (!AttachNodeData(data, slot))
     return false;
   if (!data)
     return slot.raw.Read(file, level);

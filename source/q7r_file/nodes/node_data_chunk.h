@@ -30,7 +30,8 @@ struct NodeDataSlot
 };
 
 // What the client's hook gives for a node of a type; data that are for nodes of another class count as none, and the
-// type as unknown.
+// type as unknown. A polygon object, whose chunks are its data's to read, gets the library's own when the client knows
+// none.
 NodeData* AllocNodeDataFor(const BaseList2D& node, Long type, Bool& known);
 
 // Reads the rest of the chunk behind its opening values, the end tag included, into a NodeData of `type` that the
@@ -44,8 +45,8 @@ void WriteNodeDataBody(HyperFile& file, NodeData* data, const RawChunkBody& raw)
 // The level at which the chunk is to be written.
 Long NodeDataLevel(const NodeData* data, const RawChunkBody& raw);
 
-// Puts `data` (may be null) into the slot in place of what was there and runs its Init. A data object that Init
-// refuses is deleted: false.
+// Puts `data` (may be null) into the slot in place of what was there and runs its Init; the node's container stays as
+// it is. A data object that Init refuses is deleted: false.
 Bool AttachNodeData(NodeData* data, NodeDataSlot slot);
 
 } // namespace _torvane_

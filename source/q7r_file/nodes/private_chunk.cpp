@@ -21,14 +21,16 @@ Bool EndsPartialLoad(const HyperFile& file, Long id, Long level)
          ((flags & LoadPreviewOnly) && id == kChunkFileInfo && level == kLevelFileInfo);
 }
 
-// Holds one level of nested reading open.
+// Holds one level of nesting open. Root lists take none: they only nest with the nodes that hold them.
 class LoopScope
 {
  public:
-  explicit LoopScope(HyperFile& file) : file_(file), entered_(file.EnterLoop()) {}
+  LoopScope(HyperFile& file, const PrivateChunk& chunk)
+      : file_(file), counted_(!chunk.IsRootList()), entered_(!counted_ || file.EnterLoop())
+  {}
   ~LoopScope()
   {
-    if (entered_)
+    if (counted_ && entered_)
       file_.LeaveLoop();
   }
   LoopScope(const LoopScope&) = delete;
@@ -38,6 +40,7 @@ class LoopScope
 
  private:
   HyperFile& file_;
+  Bool counted_;
   Bool entered_;
 };
 
@@ -53,18 +56,34 @@ Bool PrivateChunk::GetParameter(const ParameterPath&, GeData&) { return false; }
 
 Bool PrivateChunk::SetParameter(const ParameterPath&, const GeData&) { return false; }
 
+// Where a loop stands.
+struct PrivateChunk::Loop
+{
+  Bool keepGoing;
+  Long inside = 0;       // chunks that were entered and not yet left
+  Bool finished = false; // the loop ends with `result`
+  Bool result = false;
+
+  Bool End(Bool value)
+  {
+    finished = true;
+    result = value;
+    return value;
+  }
+};
+
 Bool PrivateChunk::ReadChunkLoop(HyperFile& file, Bool keepGoing, Bool)
 {
   if (file.GetError() != FILEERROR_NONE)
     return false;
-  LoopScope scope(file);
+  LoopScope scope(file, *this);
   if (!scope.Entered())
     return false;
+  Loop loop{keepGoing};
   do {
-    Bool finished = false;
-    Bool result = ReadOneChunk(file, keepGoing, finished);
-    if (finished)
-      return result;
+    ReadOneChunk(file, loop);
+    if (loop.finished)
+      return loop.result;
   } while (file.GetError() == FILEERROR_NONE && file.GetPosition() < file.GetLength());
   // A loop that merely met the end of the file leaves the error clear.
   if (file.GetError() != FILEERROR_NONE)
@@ -72,46 +91,48 @@ Bool PrivateChunk::ReadChunkLoop(HyperFile& file, Bool keepGoing, Bool)
   return false;
 }
 
-// One round of the loop. `finished` tells that the loop ends with the result.
-Bool PrivateChunk::ReadOneChunk(HyperFile& file, Bool keepGoing, Bool& finished)
+// An end mark: that of a chunk that the loop had entered, or that of the loop.
+Bool PrivateChunk::EndLoopChunk(HyperFile& file, Loop& loop)
+{
+  const Bool read = file.ReadChunkEndMark();
+  if (loop.inside == 0 || !read)
+    return loop.End(read);
+  --loop.inside;
+  return true;
+}
+
+// One round of the loop.
+Bool PrivateChunk::ReadOneChunk(HyperFile& file, Loop& loop)
 {
   UChar tag = 0;
   if (!file.ReadValueHeader(tag))
     return false;
-  if (tag == kTagChunkEnd) {
-    finished = true;
-    return file.ReadChunkEndMark();
-  }
+  if (tag == kTagChunkEnd)
+    return EndLoopChunk(file, loop);
   if (tag != kTagChunkStart) {
     file.SetError(FILEERROR_CHUNK_STRUCTURE);
-    finished = true;
-    return false;
+    return loop.End(false);
   }
   Long id = 0;
   Long level = 0;
   if (!file.ReadChunkStart(id, level))
     return false;
-  const LLong body = file.GetPosition();
-  const Bool taken = ReadChunk(file, id, level);
-  if (!file.HasMemory()) {
-    finished = true;
-    return false;
+  if (EntersChunk(id)) {
+    ++loop.inside;
+    return true;
   }
-  if (!taken && !(keepGoing && file.GetPosition() == body && KeepChunk(file, id, level))) {
-    Bool skipped = file.SkipToEndChunk();
-    if (!keepGoing) {
-      finished = true;
-      return skipped;
-    }
+  const LLong body = file.GetPosition();
+  const Bool keepGoing = loop.keepGoing || loop.inside > 0;
+  if (!ReadChunk(file, id, level) && !(keepGoing && file.GetPosition() == body && KeepChunk(file, id, level))) {
+    const Bool skipped = file.SkipToEndChunk();
+    if (!keepGoing)
+      return loop.End(skipped);
     if (!skipped)
       return false;
   }
-  if (EndsPartialLoad(file, id, level)) {
-    finished = true;
-    return true;
-  }
-  finished = !file.HasMemory();
-  return false;
+  if (EndsPartialLoad(file, id, level))
+    return loop.End(true);
+  return file.GetError() == FILEERROR_NONE || loop.End(false);
 }
 
 Bool PrivateChunk::ReadChunks(HyperFile& file, Bool consumeHeader)
@@ -135,6 +156,9 @@ Bool PrivateChunk::ReadChunks(HyperFile& file, Bool consumeHeader)
 
 void PrivateChunk::WriteAsChunk(HyperFile& file, Long id)
 {
+  LoopScope scope(file, *this);
+  if (!scope.Entered())
+    return;
   file.WriteChunkStart(id, 0);
   WriteChunks(file);
   file.WriteChunkEnd();

@@ -96,6 +96,7 @@ void RootList2D::FreeAll()
     member->Remove();
     DeleteObj(member);
   }
+  keptChunks_.Flush();
 }
 
 LLong RootList2D::GetCount() const
@@ -110,12 +111,26 @@ Long RootList2D::GetMemberLabel(BaseList2D& member) const { return member.GetDis
 
 void RootList2D::WriteChunks(HyperFile& file)
 {
-  if (IsEmpty() && !IsWrittenWhenEmpty())
+  if (!HasContent() && !IsWrittenWhenEmpty())
     return;
   file.WriteChunkStart(kChunkList, 0);
   for (BaseList2D* member = GetFirst(); member; member = member->GetNext())
     member->WriteAsChunk(file, GetMemberLabel(*member));
+  keptChunks_.Write(file);
   file.WriteChunkEnd();
+}
+
+Bool RootList2D::EntersChunk(Long id)
+{
+  if (id != kChunkList)
+    return false;
+  FreeAll();
+  return true;
+}
+
+Bool RootList2D::KeepChunk(HyperFile& file, Long id, Long level)
+{
+  return !IsLibraryChunk(id) && file.GetFileVersion() >= kVersionCurrent && keptChunks_.Read(file, id, level);
 }
 
 Bool RootList2D::ReadChunk(HyperFile& file, Long id, Long level)
@@ -160,17 +175,17 @@ Bool RootList2D::CopyTo(PrivateChunk& destination, ULong flags, TransArray* tran
       return false;
     }
   }
+  if (!CopyKeptChunks(*target))
+    return false;
   return true;
 }
+
+Bool RootObject::EntersChunk(Long id) { return id == kChunkNestedList || RootList2D::EntersChunk(id); }
 
 Bool RootObject::ReadChunk(HyperFile& file, Long id, Long level)
 {
   if (RootList2D::ReadChunk(file, id, level))
     return true;
-  if (id == kChunkNestedList) {
-    ReadChunks(file, false);
-    return true;
-  }
   if (id == kChunkNodeBits)
     return file.SkipToEndChunk();
   return ReadMember(file, AllocMember(id), true);

@@ -261,10 +261,24 @@ Bool BaseObject::ReadChunk(HyperFile& file, Long id, Long level)
   return GetType() == kObjectJoint && file.SkipToEndChunk();
 }
 
-// Polygon data stand behind the transform chunk; those of a joint, though under the same label, where all others do.
-Bool BaseObject::KeepsChunksBesideTransform() const
+// How what is particular to the type stands in a file.
+enum class BaseObject::DataForm
 {
-  return objectData_ && objectData_->GetDiskType() == kObjectPolygonLabel && GetType() != kObjectJoint;
+  kEnclosed, // in the chunk kChunkNodeData
+  kBeside,   // behind the transform chunk, with an empty chunk kChunkNodeData that tells the type
+  kStraight, // among the object's chunks, without a chunk kChunkNodeData: the label tells the type
+};
+
+// A spline's own chunks can stand straight where the label says all that there is to say; bytes that nobody understands
+// and data of another type can't. Polygon data stand behind the transform chunk; those of a joint, though under the
+// same label, don't.
+BaseObject::DataForm BaseObject::GetDataForm() const
+{
+  const Bool points = objectData_ ? objectData_->GetDiskType() == kObjectPoint : raw_.GetSize() == 0;
+  if (GetDiskType() == kObjectSpline && GetType() == kObjectSpline && points)
+    return DataForm::kStraight;
+  const Bool polygons = objectData_ && objectData_->GetDiskType() == kObjectPolygonLabel;
+  return polygons && GetType() != kObjectJoint ? DataForm::kBeside : DataForm::kEnclosed;
 }
 
 // The sum stands in the container, which was written before: a file holds the sum of the write before its own.
@@ -283,21 +297,18 @@ void BaseObject::StoreModelCheckSum()
   data_.SetLong(kKeyModelCheckSum, static_cast<Long>(sum.GetCrc()));
 }
 
-// A spline's own chunks stand straight among the object's; bytes that nobody understands can't.
 void BaseObject::WriteObjectData(HyperFile& file)
 {
-  const Bool enclosed = GetDiskType() != kObjectSpline || (!objectData_ && raw_.GetSize() > 0);
-  if (enclosed) {
-    Long type = GetType();
-    const Long level = NodeDataLevel(objectData_, raw_);
-    file.WriteChunkStart(kChunkNodeData, level);
-    ChunkWriter writer(file, level);
-    VisitNodeDataHead(writer, type, name_);
-  }
-  if (!KeepsChunksBesideTransform())
+  const DataForm form = GetDataForm();
+  if (form == DataForm::kStraight) {
     WriteNodeDataBody(file, objectData_, raw_);
-  if (enclosed)
-    file.WriteChunkEnd();
+    return;
+  }
+  Long type = GetType();
+  WriteChunk(file, kChunkNodeData, NodeDataLevel(objectData_, raw_), [&](ChunkWriter& v) {
+    if (VisitNodeDataHead(v, type, name_) && form == DataForm::kEnclosed)
+      WriteNodeDataBody(file, objectData_, raw_);
+  });
 }
 
 void BaseObject::WriteChunks(HyperFile& file)
@@ -305,12 +316,12 @@ void BaseObject::WriteChunks(HyperFile& file)
   BaseList4D::WriteChunks(file);
   StoreModelCheckSum();
   WriteObjectData(file);
-  if (children_ && !children_->IsEmpty())
+  if (children_ && children_->HasContent())
     children_->WriteAsChunk(file, kChunkList);
-  if (!tags_.IsEmpty())
+  if (tags_.HasContent())
     tags_.WriteAsChunk(file, kChunkTags);
   WriteChunk(file, kChunkTransform, kLevelTransform, [this](ChunkWriter& v) { return VisitTransform(v); });
-  if (KeepsChunksBesideTransform())
+  if (GetDataForm() == DataForm::kBeside)
     objectData_->WriteChunks(file);
 }
 
@@ -324,13 +335,13 @@ Bool BaseObject::CopyObjectData(BaseObject& destination, ULong flags, TransArray
   destination.SetType(GetType());
   Bool known = false;
   NodeData* data = AllocObjectDataOfType(GetType(), known);
+  if (!data && !known)
+    data = AllocNodeDataFor(destination, GetType(), known);
   if (known && !data)
     return false;
   if (!AttachNodeData(data, {destination, destination.objectData_, destination.raw_}))
     return false;
-  if (data)
-    objectData_->CopyTo(*data, flags, translation);
-  return true;
+  return !data || objectData_->CopyTo(*data, flags, translation);
 }
 
 void BaseObject::CopyTransform(BaseObject& destination) const
@@ -389,12 +400,23 @@ Bool BaseObject::CloneChildren(BaseObject& destination, ULong flags, TransArray*
       clone->InsertUnder(&destination);
     last = clone;
   }
-  return true;
+  return !children_ || !destination.children_ || children_->CopyKeptChunks(*destination.children_);
+}
+
+BaseObject* BaseObject::MakeEmpty() const
+{
+  BaseObject* made = AllocObject(GetType());
+  // An object of this class may have been read with the type of another.
+  if (made && &made->GetNodeKind() != &kNodeKind && made->GetDiskType() != GetDiskType()) {
+    DeleteObj(made);
+    made = NewObj<BaseObject>(GetType());
+  }
+  return made;
 }
 
 GeListNode* BaseObject::MakeClone(ULong flags, TransArray* translation)
 {
-  BaseObject* clone = AllocObject(GetType());
+  BaseObject* clone = MakeEmpty();
   if (!clone)
     return nullptr;
   clone->tags_.FreeAll();

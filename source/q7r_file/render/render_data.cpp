@@ -35,11 +35,11 @@ Bool RenderData::MakeChildList()
 void RenderData::WriteChunks(HyperFile& file)
 {
   BaseList4D::WriteChunks(file);
-  if (children_ && !children_->IsEmpty())
+  if (children_ && children_->HasContent())
     children_->WriteAsChunk(file, kChunkList);
-  if (!videoPosts_.IsEmpty())
+  if (videoPosts_.HasContent())
     videoPosts_.WriteAsChunk(file, kChunkVideoPosts);
-  if (!multipasses_.IsEmpty())
+  if (multipasses_.HasContent())
     multipasses_.WriteAsChunk(file, kChunkMultipasses);
   WriteChunk(file, kChunkRenderExtra, 0, [this](ChunkWriter& v) { return v.Container(extraData_); });
 }

@@ -109,7 +109,7 @@ Bool BaseShader::CloneChildren(BaseShader& clone, ULong flags, TransArray* trans
       return false;
     clone.children_->InsertLast(copy);
   }
-  return true;
+  return !children_ || !clone.children_ || children_->CopyKeptChunks(*clone.children_);
 }
 
 // Links between the shader and its children are translated together, so the translation starts here.

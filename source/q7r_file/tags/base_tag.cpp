@@ -124,8 +124,8 @@ Bool BaseTag::SetParameter(const ParameterPath& path, const GeData& value)
 GeListNode* BaseTag::MakeClone(ULong flags, TransArray* translation)
 {
   BaseTag* clone = MakeTag(GetType());
-  if (clone && clone->GetDiskType() != GetDiskType()) {
-    // A plug-in's type that the factory doesn't list: the copy is of the same kind all the same.
+  if (clone && (clone->GetDiskType() != GetDiskType() || clone->GetType() != GetType())) {
+    // A plug-in's type that the factory doesn't list, or that is a label: the copy is of the same kind all the same.
     DeleteObj(clone);
     clone = NewObj<BaseTag>(GetDiskType(), GetPluginId());
   }

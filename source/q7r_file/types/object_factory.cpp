@@ -5,6 +5,7 @@
 #include "q7r_file/types/object_data_makers.h"
 #include "torvane/hooks.h"
 #include "torvane/objects/base_object.h"
+#include "torvane/objects/point_object_data.h"
 
 namespace _torvane_
 {
@@ -25,11 +26,12 @@ NodeData* MakeOpaque(Long type) { return NewObj<OpaqueObjectData>(type, 0, kObje
 // A joint stands under the label of polygon objects.
 NodeData* MakeJoint(Long type) { return NewObj<OpaqueObjectData>(type, 0, kObjectPolygonLabel); }
 
-// The client's own polygon data, which it also uses for the polygons that it makes.
-NodeData* MakeClientData(Long type)
+// The client's own polygon data, or the library's for a client that knows none.
+NodeData* MakePolygonData(Long type)
 {
   Bool known = false;
-  return AllocNodeData(type, known);
+  NodeData* data = AllocNodeData(type, known);
+  return data || known ? data : NewObj<PolygonObjectData>();
 }
 
 // The types from `first` to `last`.
@@ -42,7 +44,7 @@ struct ObjectClass
 };
 
 constexpr ObjectClass kObjectClasses[] = {
-    {kObjectPolygon, kObjectPolygon, MakePolygon, MakeClientData},
+    {kObjectPolygon, kObjectPolygon, MakePolygon, MakePolygonData},
     {kObjectSpline, kObjectSpline, MakeSpline, MakePoint},
     {kObjectLight, kObjectLight, MakeBaseObject, MakeLight},
     {kObjectCamera, kObjectCamera, MakeBaseObject, MakeCamera},

@@ -113,7 +113,7 @@ void ViewPanel::SetDocument(BaseDocument* document)
 void ViewPanel::WriteChunks(HyperFile& file)
 {
   BaseList2D::WriteChunks(file);
-  if (!draws_.IsEmpty())
+  if (draws_.HasContent())
     draws_.WriteAsChunk(file, kChunkBaseDrawRoot);
   WriteChunk(file, kChunkViewPanel, 0, [this](ChunkWriter& v) { return v.Container(settings_); });
 }

@@ -7,6 +7,8 @@
 #include "torvane/hooks.h"
 #include "torvane/memory/memory.h"
 #include "torvane/nodes/root_list.h"
+#include "torvane/objects/point_object.h"
+#include "torvane/objects/point_object_data.h"
 #include "torvane/text/ge_string.h"
 
 namespace
@@ -79,6 +81,12 @@ bool Save(const char* path)
   if (saved) {
     object->SetName(kName);
     document->InsertObject(object);
+    // A type that the hook knows nothing of keeps what it has.
+    BaseObject* polygons = AllocObject(kObjectPolygon);
+    document->InsertObject(polygons, object);
+    saved = polygons && ResizePolygons(*polygons, 3, 1, 1);
+  }
+  if (saved) {
     FileProblem problem;
     saved = SaveDocument(document, path, 0, &problem) && problem.code == FILEERROR_NONE;
   }
@@ -90,7 +98,9 @@ bool Load(const char* path)
 {
   BaseDocument* document = LoadDocument(path, LoadObjects | LoadMaterials);
   const BaseObject* object = document ? document->GetFirstObject() : nullptr;
-  bool found = object && object->GetName() == kName;
+  const BaseObject* polygons = object ? object->GetNext() : nullptr;
+  bool found = polygons && object->GetName() == kName && GetPointCount(*polygons) == 3 && GetPolygonData(*polygons) &&
+               GetPolygonData(*polygons)->GetNgons();
   BaseDocument::Free(document);
   return found;
 }

@@ -46,7 +46,7 @@ Bool ResizeSegments(BaseObject& object, Long count)
 
 BaseObject* MakeSplineObject() { return NewObj<SplineObject>(); }
 
-SplineObject::SplineObject() : PointObject(kObjectSpline) { data_.SetDefaults(DefaultsOf<kSplineDefaults>()); }
+SplineObject::SplineObject(Long type) : PointObject(type) { data_.SetDefaults(DefaultsOf<kSplineDefaults>()); }
 
 Bool SplineObject::ReadChunk(HyperFile& file, Long id, Long level)
 {

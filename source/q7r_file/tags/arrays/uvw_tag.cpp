@@ -142,6 +142,8 @@ Bool UVWTag::CopyEntries(BaseArrayTag& target)
   if (!coordinates)
     return false;
   coordinates->parameter_ = parameter_;
+  if (!block_ && !coordinates->block_)
+    return true;
   return BaseArrayTag::CopyEntries(target) && block_ && coordinates->block_;
 }
 

@@ -101,6 +101,8 @@ Bool BaseArrayTag::CopyEntries(BaseArrayTag& target)
 
 Bool BaseArrayTag::CopyEntriesOntoEmpty(BaseArrayTag& target)
 {
+  if (!block_ && !target.block_)
+    return true;
   const Long count = count_;
   if (target.block_)
     FreeEntries();
