@@ -4,6 +4,8 @@
 #include "host/text.h"
 
 #include <algorithm>
+#include <new>
+#include <utility>
 
 namespace host
 {
@@ -15,15 +17,20 @@ constexpr AEGP_PluginID kFirstPluginId = 1; // before the plug-in registers itse
 constexpr A_long kHostMajorVersion = 118;
 constexpr A_long kHostMinorVersion = 0;
 
-// A plug-in may throw its error through the host.
+// A plug-in may throw its error through the host. A lack of memory of the host's own goes past the plug-in to the
+// program that plays the host.
 template <class Body>
-A_Err CallPlugin(Body&& body)
+A_Err CallPlugin(HostState& state, Body&& body)
 {
+  A_Err result = 0;
   try {
-    return body();
+    result = body();
   } catch (int error) {
-    return error;
+    result = error;
   }
+  if (std::exchange(state.outOfMemory, false))
+    throw std::bad_alloc();
+  return result;
 }
 
 } // namespace
@@ -116,13 +123,14 @@ void StandaloneHost::OnProgress(std::function<void(double)> progress) { state_->
 A_Err StandaloneHost::Start(AEGP_EntryPoint entry)
 {
   AEGP_GlobalRefcon refcon = nullptr;
-  return CallPlugin([&] { return entry(Basic(), kHostMajorVersion, kHostMinorVersion, kFirstPluginId, &refcon); });
+  return CallPlugin(*state_,
+                    [&] { return entry(Basic(), kHostMajorVersion, kHostMinorVersion, kFirstPluginId, &refcon); });
 }
 
 A_Err StandaloneHost::CallMenuHook()
 {
   for (const MenuHook& hook : state_->menuHooks) {
-    const A_Err error = CallPlugin([&] { return hook.call(nullptr, hook.refcon, 0); });
+    const A_Err error = CallPlugin(*state_, [&] { return hook.call(nullptr, hook.refcon, 0); });
     if (error)
       return error;
   }
@@ -140,7 +148,7 @@ CommandResult StandaloneHost::CallCommandHook(AEGP_Command command, bool already
     A_Boolean handled = 0;
     const A_Boolean before = alreadyHandled || result.isHandled;
     result.error =
-        CallPlugin([&] { return hook.call(nullptr, hook.refcon, command, hook.priority, before, &handled); });
+        CallPlugin(*state_, [&] { return hook.call(nullptr, hook.refcon, command, hook.priority, before, &handled); });
     result.isHandled = result.isHandled || handled;
     if (result.error)
       break;

@@ -82,6 +82,7 @@ class StandaloneHost
   // --- What the application does
 
   // Calls the plug-in's entry point. An int that a plug-in throws out of this or out of a hook is taken as its error.
+  // All three throw std::bad_alloc when the host itself ran out of memory meanwhile, whatever the plug-in made of it.
   A_Err Start(AEGP_EntryPoint entry);
   // Calls the update-menu hooks, as before the menus are shown; the first error ends the round.
   A_Err CallMenuHook();

@@ -1,5 +1,4 @@
 #include <cstring>
-#include <memory>
 
 #include "exporter/entry/dialog_scripts.h"
 #include "exporter/entry/hooks.h"
@@ -7,6 +6,7 @@
 #include "exporter/entry/plugin_state.h"
 #include "exporter/entry/scene_writer.h"
 #include "torvane/bytes/base_file.h"
+#include "torvane/memory/owned.h"
 #include "torvane/text/filename.h"
 
 namespace exporter
@@ -20,11 +20,6 @@ namespace
 constexpr A_Err kNoSceneFile = 2;
 constexpr const char* kSceneSuffix = "q7r";
 
-struct FreeText
-{
-  void operator()(char* text) const { GeFree(text); }
-};
-
 // The text that a script gives, valid as long as the handle is locked; null when the host fails.
 const char* RunScript(HostCalls& host, const char* script, HostText& result)
 {
@@ -37,9 +32,10 @@ bool WriteUnderSceneSuffix(const char* path, Filename& name)
 {
   if (name.CheckSuffix(kSceneSuffix))
     return WriteSceneFile(path);
+  const AllocationWatch watch;
   name.SetSuffix(kSceneSuffix);
-  std::unique_ptr<char, FreeText> suffixedPath(name.GetString().GetCStringCopy(STRINGENCODING_UTF8));
-  return WriteSceneFile(suffixedPath.get());
+  const Owned<char> suffixedPath(name.GetString().GetCStringCopy(STRINGENCODING_UTF8));
+  return !watch.Failed() && WriteSceneFile(suffixedPath.get());
 }
 
 A_Err RunExport()
@@ -48,7 +44,12 @@ A_Err RunExport()
   HostCalls host(suites);
   HostText pathText(host);
   const char* path = RunScript(host, kOpenSaveDialogScript, pathText);
+  const AllocationWatch watch;
   Filename name(path);
+  if (watch.Failed()) {
+    pathText.Abandon();
+    return kNoSceneFile;
+  }
   if (!name.Content()) {
     // A cancelled dialog's text stays locked: what the host has always seen.
     if (host.Good())

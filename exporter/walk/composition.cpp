@@ -187,6 +187,7 @@ bool ExportComposition(BaseDocument* document)
 {
   if (!document)
     return false;
+  const AllocationWatch watch;
   ExportSuites suites(BasicSuite);
   ExportContext context;
   HostCalls host(suites);
@@ -215,6 +216,8 @@ bool ExportComposition(BaseDocument* document)
     root->SetName(name.Take16());
   }
   if (!ExportLayerList(context, composition, root, width, height, LayerPass::kLink, nullptr))
+    host.Fail();
+  if (watch.Failed())
     host.Fail();
   if (!host.Good())
     suites.Get<AEGP_UtilitySuite11>().AEGP_ReportInfo(PluginId, GetMessage(Message::kExportProblems));
@@ -252,10 +255,11 @@ bool LinkLayerObject(ExportContext& context, BaseObject* parentObject, LayerObje
   for (BaseObject* node : {target, object}) {
     if (node && sceneLayer)
       node->SetLayer(sceneLayer);
-    if (node && newParent) {
-      node->RemoveFromList();
-      node->InsertUnderLast(newParent);
-    }
+    if (!node || !newParent)
+      continue;
+    node->RemoveFromList();
+    if (!node->InsertUnderLast(newParent))
+      context.document->InsertObject(node);
   }
   return host.Good();
 }

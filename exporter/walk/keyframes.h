@@ -2,12 +2,12 @@
 // through by being sampled.
 #pragma once
 
-#include <memory>
 #include <span>
 
 #include "exporter/walk/export_context.h"
 #include "exporter/walk/transform.h"
 #include "torvane/animation/ctrack.h"
+#include "torvane/memory/owned.h"
 
 namespace exporter
 {
@@ -39,17 +39,12 @@ class SampledTrack
   void Insert();
 
  private:
-  struct DeleteTrack
-  {
-    void operator()(_torvane_::CTrack* track) const { _torvane_::DeleteObj(track); }
-  };
-
   bool IsSame(Real a, Real b) const;
   bool IsConstant();
   void AddSampledKey(const _torvane_::BaseTime& time, Real value);
 
   _torvane_::BaseObject* object_;
-  std::unique_ptr<_torvane_::CTrack, DeleteTrack> track_;
+  _torvane_::Owned<_torvane_::CTrack> track_;
   Content content_;
   bool comparesData_ = false;
   bool isEmpty_ = true;

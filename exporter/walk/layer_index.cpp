@@ -1,5 +1,7 @@
 #include "exporter/walk/layer_index.h"
 
+#include <new>
+
 namespace exporter
 {
 
@@ -35,7 +37,16 @@ BaseObject* FindLayerObject(BaseObject* first, Long layerId)
 
 void LayerIndex::Add(Long layerId, BaseObject* object)
 {
-  Entry& entry = entries_[layerId];
+  if (!complete_)
+    return;
+  auto found = entries_.end();
+  try {
+    found = entries_.try_emplace(layerId).first;
+  } catch (const std::bad_alloc&) {
+    complete_ = false; // searching needs no memory
+    return;
+  }
+  Entry& entry = found->second;
   if (entry.copies > 0 && (entry.number >= firstOfUse_ || entry.composition != composition_))
     trusted_ = false;
   entry = {object, composition_, count_, entry.copies + 1};

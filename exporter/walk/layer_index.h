@@ -80,7 +80,7 @@ class LayerIndex
   std::uint64_t count_ = 0;
   std::uint64_t firstOfUse_ = 0;
   AEGP_CompH composition_ = nullptr;
-  bool complete_ = true; // every object with an id was entered
+  bool complete_ = true; // every object with an id was entered; false when memory for one was short
   bool trusted_ = true;
 };
 

@@ -54,6 +54,7 @@ struct HostState
   std::vector<Hook> hooks;
   std::vector<MenuHook> menuHooks;
   bool withholdsCommand = false;
+  bool outOfMemory = false; // an operation failed by it since the plug-in was called
 
   std::unordered_map<const void*, std::unique_ptr<MemoryBlock>> blocks;
   std::map<std::pair<std::string, std::int32_t>, std::int64_t> acquired;
@@ -102,6 +103,7 @@ A_Err Operation(const char* name, Body&& body)
     if (outcome)
       return state->Fail(name, outcome, kErrorParameter);
   } catch (const std::bad_alloc&) {
+    state->outOfMemory = true;
     return state->Fail(name, "out of memory", kErrorMemory);
   } catch (const std::exception& error) {
     return state->Fail(name, error.what(), kErrorParameter);

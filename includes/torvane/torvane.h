@@ -22,6 +22,7 @@
 #include "torvane/math/vector.h"
 #include "torvane/memory/assertion.h"
 #include "torvane/memory/memory.h"
+#include "torvane/memory/owned.h"
 #include "torvane/memory/private_ge_mtools.h"
 #include "torvane/memory/range_array.h"
 #include "torvane/memory/spin_lock.h"

@@ -11,6 +11,8 @@
 #include "exporter/entry/plugin_state.h"
 #include "exporter/entry/scene_writer.h"
 #include "support/counting_memory.h"
+#include "support/every_failed_allocation.h"
+#include "support/full_scene.h"
 #include "support/temp_folder.h"
 
 namespace
@@ -269,6 +271,31 @@ TEST(Failures, AnyHostCallMayFailAndTheFileIsWrittenAllTheSame)
     }
     ASSERT_TRUE(result.isHandled);
   }
+}
+
+TEST(Failures, EveryFailedAllocationLeavesNoFileOrTheWholeScene)
+{
+  const TempFolder folder;
+  const fs::path file = folder / "memory.q7r";
+  EveryFailedAllocation(
+      [&] {
+        fs::remove(file);
+        host::StandaloneHost host(host::LoadCompositionText(kEverything, "test.json", "/footage"));
+        host.Start(EntryPointFunc);
+        host.SetOutputPath(file.string());
+        const host::CommandResult result = host.CallCommandHook(ExportCommand);
+        EXPECT_TRUE(result.isHandled);
+        EXPECT_TRUE(result.error == 0 || result.error == 2) << result.error;
+        EXPECT_EQ(fs::exists(file), result.error == 0);
+        EXPECT_TRUE(host.Reports().empty() ||
+                    (result.error != 0 && host.Reports() == std::vector<std::string>{kProblems}));
+        EXPECT_EQ(host.Balance().streams, 0);
+        return result.error == 0;
+      },
+      [&](bool) {
+        std::ifstream written(file, std::ios::binary);
+        return full_scene::Comparable({std::istreambuf_iterator<char>(written), {}});
+      });
 }
 
 TEST(Failures, ARefusedSuiteLeavesAsAnExceptionAndEverythingIsGivenBack)

@@ -21,12 +21,19 @@ std::atomic<LLong> gBytes{0};
 std::atomic<LLong> gPeak{0};
 std::atomic<LLong> gAllocations{0};
 std::atomic<LLong> gFailAt{-1};
+std::atomic<bool> gFailOnce{false};
 
 bool MustFail()
 {
   LLong number = gAllocations.fetch_add(1);
   LLong failAt = gFailAt.load();
-  return failAt >= 0 && number >= failAt;
+  return failAt >= 0 && (gFailOnce ? number == failAt : number >= failAt);
+}
+
+void FailAt(LLong count, bool once)
+{
+  gFailOnce = once;
+  gFailAt = gAllocations.load() + count;
 }
 
 void* Finish(void* raw, LLong size)
@@ -96,9 +103,15 @@ Counts Get() { return {gBlocks, gBytes, gPeak, gAllocations}; }
 
 void ResetPeak() { gPeak = gBytes.load(); }
 
-void FailAfter(LLong count) { gFailAt = gAllocations.load() + count; }
+void FailAfter(LLong count) { FailAt(count, false); }
 
-void FailNever() { gFailAt = -1; }
+void FailOnceAfter(LLong count) { FailAt(count, true); }
+
+bool FailNever()
+{
+  const LLong failAt = gFailAt.exchange(-1);
+  return failAt >= 0 && gAllocations > failAt;
+}
 
 BalanceCheck::BalanceCheck() : blocks_(Get().blocks) {}
 

@@ -20,7 +20,10 @@ void ResetPeak();
 
 // The allocation that comes after `count` further ones fails, and so do all that follow, until FailNever.
 void FailAfter(_torvane_::LLong count);
-void FailNever();
+// As FailAfter, but the one allocation fails alone.
+void FailOnceAfter(_torvane_::LLong count);
+// True if an allocation failed before this call.
+bool FailNever();
 
 // Fails the running test, on leaving the scope, if blocks were left allocated since it was made.
 class BalanceCheck

@@ -1,13 +1,12 @@
 // q7r: scene files from compositions, and tools for scene files.
 #include <cstdio>
 #include <exception>
-#include <iostream>
 #include <new>
-#include <sstream>
 
 #include "output/standard_output.h"
 #include "output/temporary_file.h"
 #include "torvane/memory/assertion.h"
+#include "torvane/memory/memory.h"
 #include "verbs/verbs.h"
 
 namespace
@@ -47,8 +46,12 @@ int main(int argc, char** argv)
   _torvane_::SetAssertionLog(nullptr);
   q7r::PrepareProcess();
   try {
+    // What any part of the library could not allocate may be missing from what was printed.
+    const _torvane_::AllocationWatch watch;
     const int status = Run(argc, argv);
     q7r::FlushStandardOutput();
+    if (watch.Failed() && status != q7r::kNotDone)
+      throw std::bad_alloc();
     return status;
   } catch (const std::bad_alloc&) {
     std::fputs("q7r: not enough memory\n", stderr);

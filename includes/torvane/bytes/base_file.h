@@ -272,6 +272,7 @@ class BaseFile : public GeMemory
   Long CloseNetwork();
 
   void NoteSystemError();
+  Bool MakeDiskBuffer(LLong size);
   Bool MeasureDisk();
   Bool FlushDisk();
   Bool MoveHandle(LLong position, HandleUse use);

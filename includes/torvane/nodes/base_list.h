@@ -190,9 +190,10 @@ class BaseList4D : public BaseList2D
   // no list.
   void InsertBefore(BaseList4D* reference);
   void InsertAfter(BaseList4D* reference);
-  // Put this node first or last among the children of `parent`; nothing happens if it is null or has no child list.
-  void InsertUnder(BaseList4D* parent);
-  void InsertUnderLast(BaseList4D* parent);
+  // Put this node first or last among the children of `parent`. False, and nothing happens, if it is null or has no
+  // child list: the node then stays the caller's.
+  Bool InsertUnder(BaseList4D* parent);
+  Bool InsertUnderLast(BaseList4D* parent);
 
   RootList2D* GetChildRoot() const { return children_; }
 

@@ -26,6 +26,10 @@ void BaseFile::NoteSystemError()
 
 Long BaseFile::OpenDisk(Long mode)
 {
+  // A writer has its buffer before it makes or empties the file.
+  const Bool writes = mode_ == kFileWrite || mode_ == kFileReadWriteAtEnd;
+  if (writes && !MakeDiskBuffer(kBufferSize))
+    return FILEERROR_MEMORY;
   handle_ = OpenDiskFile(name_.GetString(), mode);
   if (!handle_) {
     NoteSystemError();
@@ -39,15 +43,19 @@ Long BaseFile::OpenDisk(Long mode)
   std::setvbuf(handle_, nullptr, _IONBF, 0);
   if (mode_ != kFileWrite && !MeasureDisk())
     return FILEERROR_SEEK;
-  const Bool fits = mode_ == kFileRead && cachedLength_ < kBufferSize;
-  bufferSize_ = fits ? cachedLength_ + kSpare : kBufferSize;
-  buffer_ = static_cast<UChar*>(GeAlloc(bufferSize_));
-  if (!buffer_)
+  if (!writes && !MakeDiskBuffer(cachedLength_ < kBufferSize ? cachedLength_ + kSpare : kBufferSize))
     return FILEERROR_MEMORY;
   EmptyWindow(mode_ == kFileReadWriteAtEnd ? cachedLength_ : 0);
   if (mode_ != kFileRead)
     writeLeft_ = bufferSize_;
   return FILEERROR_NONE;
+}
+
+Bool BaseFile::MakeDiskBuffer(LLong size)
+{
+  buffer_ = static_cast<UChar*>(GeAlloc(size));
+  bufferSize_ = size;
+  return buffer_ != nullptr;
 }
 
 // Learns the file's length once; the C stream is brought back by the next read or write.

@@ -355,16 +355,14 @@ void BaseList4D::InsertAfter(BaseList4D* reference)
     reference->listHead_->InsertAfter(this, reference);
 }
 
-void BaseList4D::InsertUnder(BaseList4D* parent)
+Bool BaseList4D::InsertUnder(BaseList4D* parent)
 {
-  if (parent && parent->children_)
-    parent->children_->InsertFirst(this);
+  return parent && parent->children_ && parent->children_->InsertFirst(this);
 }
 
-void BaseList4D::InsertUnderLast(BaseList4D* parent)
+Bool BaseList4D::InsertUnderLast(BaseList4D* parent)
 {
-  if (parent && parent->children_)
-    parent->children_->InsertLast(this);
+  return parent && parent->children_ && parent->children_->InsertLast(this);
 }
 
 } // namespace _torvane_

@@ -391,13 +391,19 @@ Bool BaseObject::CloneChildren(BaseObject& destination, ULong flags, TransArray*
 {
   BaseObject* last = nullptr;
   for (BaseObject* child = GetDown(); child; child = child->GetNext()) {
+<<<<<<< HEAD
     auto* clone = destination.children_ ? NodeCast<BaseObject>(child->MakeClone(flags, translation)) : nullptr;
+=======
+    auto* clone = static_cast<BaseObject*>(child->MakeClone(flags, translation));
+>>>>>>> 0a10da9 (Let an export without enough memory leave no file; one check for every failed allocation)
     if (!clone)
       return false;
-    if (last)
+    if (last) {
       clone->InsertAfter(last);
-    else
-      clone->InsertUnder(&destination);
+    } else if (!clone->InsertUnder(&destination)) {
+      DeleteObj(clone);
+      return false;
+    }
     last = clone;
   }
   return !children_ || !destination.children_ || children_->CopyKeptChunks(*destination.children_);

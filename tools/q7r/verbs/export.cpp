@@ -4,6 +4,7 @@
 #include <cstdio>
 #include <filesystem>
 #include <memory>
+#include <new>
 
 #include "exporter/entry/scene_writer.h"
 #include "exporter/host_api/aegp_entry.h"
@@ -71,7 +72,10 @@ bool PlayExport(host::StandaloneHost& player, const std::string& output, const s
   player.CallMenuHook();
   if (!command || !player.IsCommandEnabled(command))
     throw Failure(output + ": the exporter offers no export for this composition");
+  const _torvane_::AllocationWatch watch;
   host::CommandResult result = player.CallCommandHook(command);
+  if (watch.Failed())
+    throw Failure(output + ": not enough memory");
   const _torvane_::FileProblem& problem = exporter::GetSceneFileProblem();
   if (problem.code != _torvane_::FILEERROR_NONE)
     throw Failure(ProblemText(output, problem));
