@@ -173,6 +173,7 @@ inline constexpr AEGP_LightType AEGP_LightType_POINT = 2;
 inline constexpr AEGP_LightType AEGP_LightType_AMBIENT = 3;
 
 // Streams.
+inline constexpr AEGP_LayerStream AEGP_LayerStream_NONE = -1;
 inline constexpr AEGP_LayerStream AEGP_LayerStream_ANCHORPOINT = 0; // the point of interest of cameras and lights
 inline constexpr AEGP_LayerStream AEGP_LayerStream_POSITION = 1;
 inline constexpr AEGP_LayerStream AEGP_LayerStream_SCALE = 2;

@@ -2,9 +2,9 @@
 
 #include <cmath>
 
-#include "exporter/walk/keyframes.h"
 #include "exporter/walk/layer_transform.h"
-#include "exporter/walk/scene_parameters.h"
+#include "exporter/walk/value_stream.h"
+#include "torvane/objects/camera_object_data.h"
 
 namespace exporter
 {
@@ -16,39 +16,19 @@ namespace
 
 constexpr Real kDefaultAperture = 36.0;
 
-// Zoom: an angle, animated as one.
-void ExportZoom(ExportContext& context, HostCalls& host, Real width)
-{
-  HostStream zoom;
-  zoom.Open(host, context.layer, AEGP_LayerStream_ZOOM);
-  if (!zoom)
-    return;
-  AEGP_StreamVal2 value = {};
-  if (ReadStream(host, zoom.Get(), context.workAreaStart, value))
-    context.object->SetParameterById(kCameraFieldOfView, FieldOfView(value.one_d, width, context.pixelAspect));
-  if (StreamVaries(host, zoom.Get()) > 0) {
-    SampledTrack track(context.object, kCameraFieldOfView, "Field of View");
-    SampleStream(context, host, zoom.Get(), {&track, 1}, {.mode = SampleMode::kFieldOfView, .width = width});
-  }
-  zoom.Dispose(host);
-}
+constexpr ValueStream kZoom = {
+    .stream = AEGP_LayerStream_ZOOM,
+    .parameter = {kCameraFieldOfView, "Field of View"},
+    .mode = SampleMode::kFieldOfView,
+};
 
-void ExportFocus(ExportContext& context, HostCalls& host)
-{
-  HostStream focus;
-  focus.Open(host, context.layer, AEGP_LayerStream_FOCUS_DISTANCE);
-  if (!focus)
-    return;
-  AEGP_StreamVal2 value = {};
-  if (ReadStream(host, focus.Get(), context.workAreaStart, value))
-    context.object->SetParameterById(kCameraFocusDistance, PixelsToMillimetres(value.one_d));
-  if (StreamVaries(host, focus.Get()) > 0) {
-    SampledTrack track(context.object, kCameraFocusDistance, "Focus Distance");
-    SampleStream(context, host, focus.Get(), {&track, 1},
-                 {.mode = SampleMode::kValue, .divisor = kPixelsPerMillimetre});
-  }
-  focus.Dispose(host);
-}
+constexpr ValueStream kFocus = {
+    .stream = AEGP_LayerStream_FOCUS_DISTANCE,
+    .parameter = {kCameraFocusDistance, "Focus Distance"},
+    .mode = SampleMode::kValue,
+    .divisor = kPixelsPerMillimetre,
+    .firstValue = PixelsToMillimetres,
+};
 
 } // namespace
 
@@ -85,9 +65,9 @@ bool ExportCamera(ExportContext& context, A_long width, A_long height)
                            type == AEGP_CameraType_ORTHOGRAPHIC ? kProjectionParallel : kProjectionPerspective);
   host(&AEGP_CameraSuite2::AEGP_GetCameraFilmSize, context.layer, &units, &filmSize);
   // The aperture comes first: the field of view is kept as the focal length that belongs to it.
-  camera->SetParameterById(kCameraAperture, ApertureWidth(units, filmSize, width, height));
-  ExportZoom(context, host, width);
-  ExportFocus(context, host);
+  camera->SetParameterById(kCameraApertureWidth, ApertureWidth(units, filmSize, width, height));
+  ExportValueStream(context, host, kZoom, width);
+  ExportValueStream(context, host, kFocus);
   return host.Good();
 }
 

@@ -1,7 +1,6 @@
 #include "exporter/walk/keyframes.h"
 
 #include <algorithm>
-#include <array>
 #include <cmath>
 
 #include "exporter/walk/layer_sample.h"
@@ -36,21 +35,7 @@ ParameterPath ComponentPath(Long parameter, Long component)
   return {ParameterLevel{parameter, kDataVector, 0}, ParameterLevel{kVectorX + component, kDataReal, 0}};
 }
 
-// A stream's value in the terms of its tracks.
-class ValueConverter
-{
- public:
-  ValueConverter(const ExportContext& context, const StreamSampling& sampling)
-      : sampling_(sampling), pixelAspect_(context.pixelAspect)
-  {}
-
-  std::array<Real, 3> Convert(const AEGP_StreamVal2& value, const AEGP_StreamVal2& second);
-
- private:
-  const StreamSampling& sampling_;
-  Real pixelAspect_;
-  Real lastEnumerator_ = 0.0;
-};
+} // namespace
 
 std::array<Real, 3> ValueConverter::Convert(const AEGP_StreamVal2& value, const AEGP_StreamVal2& second)
 {
@@ -74,13 +59,13 @@ std::array<Real, 3> ValueConverter::Convert(const AEGP_StreamVal2& value, const 
     else if (value.one_d == 3.0)
       lastEnumerator_ = 10.0;
     return {lastEnumerator_};
+  case SampleMode::kSwitch:
+    return {value.one_d == 0.0 ? 0.0 : 1.0};
   case SampleMode::kColor:
     return {value.color.redF, value.color.greenF, value.color.blueF};
   }
   return {};
 }
-
-} // namespace
 
 SampledTrack::SampledTrack(BaseObject* object, const ParameterPath& path, const String& name, Content content)
     : object_(object),
@@ -220,7 +205,7 @@ bool SampleTransform(ExportContext& context, HostCalls& host, const HostStream& 
   Vector previousRotation;
   const Long lastFrame = LastFrame(context);
   for (Long frame = 0; frame <= lastFrame; ++frame) {
-    if (!ReadLayerSample(host, context, anchorStream, scaleStream, FrameTime(context, frame), sample))
+    if (!ReadLayerSample(host, context, anchorStream, scaleStream, FrameTime(context, frame), rules, sample))
       break;
     const SceneTransform transform = ConvertTransform(sample, rules, frame > 0 ? &previousRotation : nullptr);
     const BaseTime keyTime = KeyTime(context, frame);

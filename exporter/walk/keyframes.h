@@ -2,6 +2,7 @@
 // through by being sampled.
 #pragma once
 
+#include <array>
 #include <span>
 
 #include "exporter/walk/export_context.h"
@@ -87,6 +88,7 @@ enum class SampleMode
   kCone = 4,        // outer and inner angle: x, and x less the percentage in the second stream, in radians
   kEnumeration = 5, // 2 becomes 8 and 3 becomes 10; anything else repeats the number before, which is 0 at first
   kColor = 6,       // red, green, blue
+  kSwitch,          // 0 or 1; never animated
 };
 
 struct StreamSampling
@@ -96,6 +98,22 @@ struct StreamSampling
   AEGP_StreamRefH secondStream = nullptr;
   Real width = 0.0; // of the composition, for the field of view
   Vector parentShift = Vector();
+};
+
+// Turns the values of a stream into those of its tracks, one after the other.
+class ValueConverter
+{
+ public:
+  ValueConverter(const ExportContext& context, const StreamSampling& sampling)
+      : sampling_(sampling), pixelAspect_(context.pixelAspect)
+  {}
+
+  std::array<Real, 3> Convert(const AEGP_StreamVal2& value, const AEGP_StreamVal2& second);
+
+ private:
+  const StreamSampling& sampling_;
+  Real pixelAspect_;
+  Real lastEnumerator_ = 0.0;
 };
 
 // Samples a stream over all frames into one to three tracks, of which the first must be there, and finishes them. False

@@ -32,13 +32,14 @@ bool ReadRotation(HostCalls& host, const ExportContext& context, const A_Time& t
 }
 
 bool ReadLayerSample(HostCalls& host, const ExportContext& context, const HostStream& anchorStream,
-                     const HostStream& scaleStream, const A_Time& time, LayerSample& sample)
+                     const HostStream& scaleStream, const A_Time& time, const TransformRules& rules,
+                     LayerSample& sample)
 {
   ReadVector(host, context.positionStream, time, sample.position);
   ReadRotation(host, context, time, sample);
   if (anchorStream)
     ReadVector(host, anchorStream, time, sample.anchor);
-  if (scaleStream)
+  if (scaleStream && rules.useScale)
     ReadVector(host, scaleStream, time, sample.scale);
   return host.Good();
 }

@@ -13,8 +13,9 @@ constexpr Vector ToVector(const AEGP_ThreeDVal& value) { return {value.x, value.
 bool ReadRotation(HostCalls& host, const ExportContext& context, const A_Time& time, LayerSample& sample);
 
 // The rotation streams and the position stream of the context, which must all be there, and the anchor and the scale if
-// there are such streams. False when the host fails.
+// there are such streams; the scale only if the rules use it. False when the host fails.
 bool ReadLayerSample(HostCalls& host, const ExportContext& context, const HostStream& anchorStream,
-                     const HostStream& scaleStream, const A_Time& time, LayerSample& sample);
+                     const HostStream& scaleStream, const A_Time& time, const TransformRules& rules,
+                     LayerSample& sample);
 
 } // namespace exporter

@@ -1,10 +1,12 @@
 #include "exporter/walk/layer_transform.h"
 
+#include <utility>
+
 #include "exporter/entry/plugin_state.h"
 #include "exporter/walk/keyframes.h"
 #include "exporter/walk/layer_sample.h"
-#include "exporter/walk/scene_parameters.h"
 #include "exporter/walk/transform.h"
+#include "torvane/objects/light_parameters.h"
 #include "torvane/tags/base_tag.h"
 
 namespace exporter
@@ -47,7 +49,7 @@ class LayerTransform
   void PlaceTarget();
   void ExportTracks();
   void DisposeStreams();
-  void TakeOff(AEGP_ItemH item);
+  void ReadParentSize();
   bool HasRotationStreams() const
   {
     return context_.rotateXStream && context_.rotateYStream && context_.rotateZStream && context_.orientationStream;
@@ -57,6 +59,7 @@ class LayerTransform
   HostCalls host_;
   BaseObject& object_;
   BaseObject* target_ = nullptr;
+  AEGP_LayerH offsetLayer_ = nullptr; // its size shifts the object; null for none, and once the size was asked for
   HostStream anchorStream_;
   HostStream scaleStream_;
   TransformRules rules_;
@@ -64,6 +67,7 @@ class LayerTransform
   bool hasAnchor_ = false;
   bool positionVaries_ = false;
   bool rotationVaries_ = false;
+  bool rotationHasKeys_ = false;
   bool scaleVaries_ = false;
   bool anchorVaries_ = false;
 };
@@ -96,9 +100,7 @@ void LayerTransform::ReadParent()
   AEGP_ItemH item = nullptr;
   host_(&AEGP_LayerSuite13::AEGP_GetLayerParent, context_.layer, &parent);
   if (!parent) {
-    if (context_.enclosingLayer)
-      host_(&AEGP_LayerSuite13::AEGP_GetLayerSourceItem, context_.enclosingLayer, &item);
-    TakeOff(item);
+    offsetLayer_ = context_.enclosingLayer;
     return;
   }
   A_Boolean is3D = 0;
@@ -112,13 +114,18 @@ void LayerTransform::ReadParent()
   if (item)
     host_(&AEGP_ItemSuite13::AEGP_GetItemType, item, &itemType);
   if (itemType == AEGP_ItemType_FOOTAGE || itemType == AEGP_ItemType_COMP)
-    TakeOff(item);
+    offsetLayer_ = parent;
 }
 
-void LayerTransform::TakeOff(AEGP_ItemH item)
+// Asked for once, where it is first needed.
+void LayerTransform::ReadParentSize()
 {
+  const AEGP_LayerH layer = std::exchange(offsetLayer_, nullptr);
+  AEGP_ItemH item = nullptr;
   A_long width = 0;
   A_long height = 0;
+  if (layer)
+    host_(&AEGP_LayerSuite13::AEGP_GetLayerSourceItem, layer, &item);
   if (item && host_(&AEGP_ItemSuite13::AEGP_GetItemDimensions, item, &width, &height))
     rules_.parentShift = ParentShift(width, height);
 }
@@ -129,7 +136,7 @@ void LayerTransform::ReadFlags()
   GeData lightType;
   bool canLook = object_.GetType() == kObjectCamera;
   if (object_.GetType() == kObjectLight && object_.GetParameterById(kLightType, lightType))
-    canLook = lightType.GetLong() == kLightTypeSpot;
+    canLook = lightType.GetLong() == kLightSpot;
   rules_.lookAtTarget = canLook && (flags_ & AEGP_LayerFlag_LOOK_AT_POI) != 0;
   if ((flags_ & AEGP_LayerFlag_VIDEO_ACTIVE) == 0)
     object_.SetRenderMode(kObjectModeOff);
@@ -152,11 +159,12 @@ void LayerTransform::OpenStreams()
 
 void LayerTransform::DecideRotation()
 {
-  A_long keys = 0;
   for (HostStream* stream :
-       {&context_.rotateXStream, &context_.rotateYStream, &context_.rotateZStream, &context_.orientationStream})
-    keys += StreamVaries(host_, stream->Get());
-  rotationVaries_ = keys > 0;
+       {&context_.rotateXStream, &context_.rotateYStream, &context_.rotateZStream, &context_.orientationStream}) {
+    const A_long keys = StreamVaries(host_, stream->Get());
+    rotationVaries_ = rotationVaries_ || keys > 0;
+    rotationHasKeys_ = rotationHasKeys_ || keys != 0;
+  }
   positionVaries_ = StreamVaries(host_, context_.positionStream.Get()) > 0;
   scaleVaries_ = StreamVaries(host_, scaleStream_.Get()) > 0;
   anchorVaries_ = StreamVaries(host_, anchorStream_.Get()) > 0;
@@ -166,7 +174,7 @@ void LayerTransform::DecideRotation()
   ReadRotation(host_, context_, context_.workAreaStart, sample);
   const bool turned =
       sample.orientation != Vector() || sample.rotateX != 0.0 || sample.rotateY != 0.0 || sample.rotateZ != 0.0;
-  rules_.useRotation = turned || rotationVaries_;
+  rules_.useRotation = turned || rotationHasKeys_;
 }
 
 // A camera or spot light without a rotation of its own follows a target object; one with a rotation has the look at its
@@ -239,8 +247,9 @@ void LayerTransform::SetInitialTransform()
 {
   LayerSample sample;
   if (!context_.positionStream || !HasRotationStreams() ||
-      !ReadLayerSample(host_, context_, anchorStream_, scaleStream_, context_.workAreaStart, sample))
+      !ReadLayerSample(host_, context_, anchorStream_, scaleStream_, context_.workAreaStart, rules_, sample))
     return;
+  ReadParentSize();
   const SceneTransform transform = ConvertTransform(sample, rules_, nullptr);
   object_.SetRelPos(transform.position);
   if (rules_.useRotation) {
@@ -285,8 +294,10 @@ void LayerTransform::PlaceTarget()
     AEGP_StreamVal2 place = {};
     A_long keyframes = 0;
     A_Boolean varies = 0;
-    if (ReadStream(host_, stream, context_.workAreaStart, place))
+    if (ReadStream(host_, stream, context_.workAreaStart, place)) {
+      ReadParentSize();
       target_->SetRelPos(FlipY(ToVector(place.three_d)) + rules_.parentShift);
+    }
     host_(&AEGP_KeyframeSuite4::AEGP_GetStreamNumKFs, stream, &keyframes);
     host_(&AEGP_StreamSuite9::AEGP_IsStreamTimevarying, stream, &varies);
     if (varies || keyframes > 0) {

@@ -1,8 +1,8 @@
 #include "exporter/walk/plane.h"
 
 #include "exporter/walk/layer_transform.h"
-#include "exporter/walk/scene_parameters.h"
 #include "torvane/materials/material.h"
+#include "torvane/objects/plane_parameters.h"
 #include "torvane/shaders/base_shader.h"
 #include "torvane/tags/texture_tag.h"
 
@@ -69,9 +69,8 @@ void SetPlaneParameters(BaseObject& plane, Real width, Real height)
 {
   plane.SetParameterById(kPlaneWidth, width);
   plane.SetParameterById(kPlaneHeight, height);
-  plane.SetParameterById(kPlaneWidthSegments, Long{1});
-  plane.SetParameterById(kPlaneHeightSegments, Long{1});
-  plane.SetParameterById(kPlaneAxis, kPlaneAxisTowardsViewer);
+  for (const PlaneSetting& setting : kPlaneSettings)
+    plane.SetParameterById(setting.id, setting.value);
 }
 
 } // namespace

@@ -1,7 +1,9 @@
 // q7r: scene files from compositions, and tools for scene files.
 #include <cstdio>
 #include <exception>
+#include <iostream>
 #include <new>
+#include <sstream>
 
 #include "output/standard_output.h"
 #include "output/temporary_file.h"

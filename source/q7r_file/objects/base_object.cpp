@@ -391,11 +391,7 @@ Bool BaseObject::CloneChildren(BaseObject& destination, ULong flags, TransArray*
 {
   BaseObject* last = nullptr;
   for (BaseObject* child = GetDown(); child; child = child->GetNext()) {
-<<<<<<< HEAD
-    auto* clone = destination.children_ ? NodeCast<BaseObject>(child->MakeClone(flags, translation)) : nullptr;
-=======
-    auto* clone = static_cast<BaseObject*>(child->MakeClone(flags, translation));
->>>>>>> 0a10da9 (Let an export without enough memory leave no file; one check for every failed allocation)
+    auto* clone = NodeCast<BaseObject>(child->MakeClone(flags, translation));
     if (!clone)
       return false;
     if (last) {
