@@ -8,6 +8,7 @@
 #include "measure.h"
 #include "torvane/animation/ctrack.h"
 #include "torvane/document/base_document.h"
+#include "torvane/memory/owned.h"
 #include "torvane/objects/base_object.h"
 
 namespace
@@ -16,11 +17,7 @@ namespace
 using namespace _torvane_;
 using namespace benchmarks;
 
-struct FreeDocument
-{
-  void operator()(BaseDocument* document) const { BaseDocument::Free(document); }
-};
-using DocumentPtr = std::unique_ptr<BaseDocument, FreeDocument>;
+using DocumentPtr = Owned<BaseDocument>;
 
 constexpr Long kVectors[] = {kObjectRelPos, kObjectRelRot, kObjectRelScale};
 constexpr Long kKeysEach = 1000;

@@ -8,17 +8,13 @@
 #include "host/standalone_host.h"
 #include "measure.h"
 #include "torvane/document/base_document.h"
+#include "torvane/memory/owned.h"
 
 namespace
 {
 
 using namespace benchmarks;
 using _torvane_::BaseDocument;
-
-struct FreeDocument
-{
-  void operator()(BaseDocument* document) const { BaseDocument::Free(document); }
-};
 
 // The streams that a plane is sampled from.
 constexpr AEGP_LayerStream kStreams[] = {
@@ -101,7 +97,7 @@ void ExportAnimatedLayers(benchmark::State& state)
   const std::int64_t before = PresentMemory();
   Seconds best(1e9);
   RunBest(state, [&] {
-    const std::unique_ptr<BaseDocument, FreeDocument> document(BaseDocument::Alloc());
+    const _torvane_::Owned<BaseDocument> document(BaseDocument::Alloc());
     const Seconds time = TimeOf([&] {
       if (!exporter::ExportComposition(document.get()))
         state.SkipWithError("the export failed");
@@ -126,7 +122,7 @@ void ExportStaticLayers(benchmark::State& state)
   ResetPeakMemory();
   const std::int64_t before = PresentMemory();
   RunBest(state, [&] {
-    const std::unique_ptr<BaseDocument, FreeDocument> document(BaseDocument::Alloc());
+    const _torvane_::Owned<BaseDocument> document(BaseDocument::Alloc());
     return TimeOf([&] {
       if (!exporter::ExportComposition(document.get()) ||
           !SaveDocument(document.get(), _torvane_::Filename(scratch.Path().c_str()), 0))

@@ -5,6 +5,7 @@
 #include "machine_limits.h"
 #include "measure.h"
 #include "torvane/document/base_document.h"
+#include "torvane/memory/owned.h"
 #include "torvane/objects/point_object.h"
 #include "torvane/tags/value_tags.h"
 
@@ -17,11 +18,7 @@ using namespace benchmarks;
 constexpr Long kAround = 1000; // points around the tube
 constexpr double kGeometryPerPoint = sizeof(Vector) + sizeof(PolygonCorners) + sizeof(PackedUVWQuad);
 
-struct DeleteDocument
-{
-  void operator()(BaseDocument* document) const { DeleteObj(document); }
-};
-using DocumentPtr = std::unique_ptr<BaseDocument, DeleteDocument>;
+using DocumentPtr = Owned<BaseDocument>;
 
 void FillPoints(Vector* points, Long rings)
 {

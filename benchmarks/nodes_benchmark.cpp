@@ -8,6 +8,7 @@
 #include "measure.h"
 #include "torvane/document/base_document.h"
 #include "torvane/materials/material.h"
+#include "torvane/memory/owned.h"
 #include "torvane/objects/base_object.h"
 #include "torvane/tags/texture_tag.h"
 
@@ -22,11 +23,7 @@ constexpr int kObjectsOfSub = 36;
 constexpr int kNodesOfGroup = 1 + kSubsOfGroup * (1 + kObjectsOfSub);
 constexpr std::size_t kMaterials = 1000;
 
-struct DocumentDeleter
-{
-  void operator()(BaseDocument* document) const { BaseDocument::Free(document); }
-};
-using DocumentPtr = std::unique_ptr<BaseDocument, DocumentDeleter>;
+using DocumentPtr = Owned<BaseDocument>;
 
 using MaterialList = std::vector<BaseMaterial*>; // by number
 

@@ -3,6 +3,7 @@
 #include <atomic>
 #include <cstring>
 
+#include "torvane/memory/owned.h"
 #include "torvane/nodes/private_chunk.h"
 #include "torvane/stream/hyper_file.h"
 
@@ -192,10 +193,8 @@ void GeAliasLink::SetName(const String& name)
 
 GeAliasLink* GeAliasLink::CloneLink(TransArray* translation) const
 {
-  GeAliasLink* clone = NewObj<GeAliasLink>();
-  if (clone && !CopyLinkTo(clone, translation))
-    DeleteObj(clone);
-  return clone;
+  Owned<GeAliasLink> clone(NewObj<GeAliasLink>());
+  return clone && CopyLinkTo(clone.get(), translation) ? clone.release() : nullptr;
 }
 
 Bool GeAliasLink::CopyLinkTo(GeAliasLink* destination, TransArray* translation) const
@@ -218,16 +217,13 @@ Bool GeAliasLink::WriteLink(HyperFile& file) const
     return file.WriteMemory(record, kRecordSize);
 
   constexpr LLong kNameOffset = kRecordSize + kNameLengthSize;
-  void* block = GeAllocNC(kNameOffset + room + 1);
+  const Owned<UChar> block(static_cast<UChar*>(GeAllocNC(kNameOffset + room + 1)));
   if (!block)
     return CheckMemory(file, false);
-  UChar* bytes = static_cast<UChar*>(block);
-  Long length = name_->GetCString(static_cast<char*>(block) + kNameOffset, room + 1);
-  std::memcpy(bytes, record, kRecordSize);
-  bytes::PutBig(bytes + kRecordSize, static_cast<ULong>(length));
-  Bool done = file.WriteMemory(block, kNameOffset + length);
-  GeFree(block);
-  return done;
+  const Long length = name_->GetCString(reinterpret_cast<char*>(block.get()) + kNameOffset, room + 1);
+  std::memcpy(block.get(), record, kRecordSize);
+  bytes::PutBig(block.get() + kRecordSize, static_cast<ULong>(length));
+  return file.WriteMemory(block.get(), kNameOffset + length);
 }
 
 // Takes the label out of the bytes behind the id. A length that reaches past them is cut to what is there.

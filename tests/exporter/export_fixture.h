@@ -13,6 +13,7 @@
 #include "torvane/animation/ctrack.h"
 #include "torvane/document/base_document.h"
 #include "torvane/math/ge_math.h"
+#include "torvane/memory/owned.h"
 #include "torvane/tags/base_tag.h"
 
 namespace export_test
@@ -137,13 +138,8 @@ class Exported
     return value;
   }
 
-  struct FreeDocument
-  {
-    void operator()(BaseDocument* freed) const { BaseDocument::Free(freed); }
-  };
-
   host::StandaloneHost host;
-  std::unique_ptr<BaseDocument, FreeDocument> document;
+  Owned<BaseDocument> document;
   bool succeeded = false;
 };
 

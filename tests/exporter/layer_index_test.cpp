@@ -6,6 +6,7 @@
 
 #include "exporter/walk/layer_index.h"
 #include "torvane/document/base_document.h"
+#include "torvane/memory/owned.h"
 
 namespace
 {
@@ -121,14 +122,9 @@ class Walk
     return object != nullptr;
   }
 
-  struct FreeDocument
-  {
-    void operator()(BaseDocument* document) const { BaseDocument::Free(document); }
-  };
-
   std::mt19937 random_;
   Faults faults_;
-  std::unique_ptr<BaseDocument, FreeDocument> document_;
+  Owned<BaseDocument> document_;
   std::vector<std::vector<Layer>> compositions_;
   LayerIndex index_;
   int searches_ = 0;

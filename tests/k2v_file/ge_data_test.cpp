@@ -8,8 +8,10 @@
 #include "support/assertion_counter.h"
 #include "support/byte_writer.h"
 #include "support/counting_memory.h"
+#include "support/every_failed_allocation.h"
 #include "support/memory_file.h"
 #include "torvane/links/alias.h"
+#include "torvane/memory/owned.h"
 #include "torvane/values/base_container.h"
 
 using namespace _torvane_;
@@ -343,20 +345,6 @@ TEST_F(GeDataTest, FailsOnEveryCutOfAValueWithoutReadingPastIt)
   }
 }
 
-// Runs `action` with the first, the second, ... allocation failing, until it comes through.
-void FailEachAllocation(const std::function<bool()>& action)
-{
-  for (LLong count = 0;; ++count) {
-    counting_memory::BalanceCheck balance;
-    ASSERT_LT(count, 1000);
-    counting_memory::FailAfter(count);
-    bool done = action();
-    counting_memory::FailNever();
-    if (done)
-      break;
-  }
-}
-
 TEST_F(GeDataTest, GivesNilOrAFailureWheneverMemoryRunsOut)
 {
   std::vector<Form> forms = Forms();
@@ -365,23 +353,19 @@ TEST_F(GeDataTest, GivesNilOrAFailureWheneverMemoryRunsOut)
     all.InsertData(all.GetCount(), form.value);
   all.InsertData(100, GeData(all));
   const GeData whole(all);
-  const std::string expected = Written(whole);
   std::vector<std::uint8_t> bytes = WriteToMemory([&](HyperFile& file) { whole.Write(file); }, true);
 
-  FailEachAllocation([&] {
-    GeData copy(whole);
-    const bool done = copy.GetType() != kDataNil;
-    counting_memory::FailNever();
-    return done && Written(copy) == expected;
-  });
-  FailEachAllocation([&] {
-    MemoryReadFile source(bytes);
-    GeData read;
-    const bool done = source.opened && read.Read(source.file);
-    EXPECT_TRUE(done || read.GetType() == kDataNil);
-    counting_memory::FailNever();
-    return done && Written(read) == expected;
-  });
+  const auto written = [](const auto& value) { return Written(*value); };
+  EveryFailedAllocation([&] { return Owned<GeData>(NewObj<GeData>(whole)); }, written);
+  EveryFailedAllocation(
+      [&] {
+        MemoryReadFile source(bytes);
+        Owned<GeData> value(NewObj<GeData>());
+        const bool done = value && source.opened && value->Read(source.file);
+        EXPECT_TRUE(done || !value || value->GetType() == kDataNil);
+        return done && source.file.HasMemory() ? std::move(value) : nullptr;
+      },
+      written);
 }
 
 } // namespace

@@ -492,40 +492,6 @@ TEST(BaseObject, ClonesTakeTagsTransformAndChildrenAlong)
   DeleteObj(source);
 }
 
-TEST(BaseObject, RunningOutOfMemoryLeavesNothingBehind)
-{
-  counting_memory::BalanceCheck balance;
-  AssertionCounter reports; // the failures of reading
-  BaseObject* source = MakeNamed("an object with a long name, and so with a block");
-  source->MakeTag(kTagTarget);
-  MakeNamed("child", source);
-  ByteWriter chunks;
-  chunks.Append(BytesOf(*source)).Append(NodeDataChunk(kUnknownType, 1, kStrangeBody));
-  bool cloned = false;
-  for (LLong count = 0; !cloned; ++count) {
-    ASSERT_LT(count, 1000);
-    counting_memory::FailAfter(count);
-    GeListNode* clone = source->MakeClone(0, nullptr);
-    counting_memory::FailNever();
-    cloned = clone && static_cast<BaseObject*>(clone)->GetDown();
-    EXPECT_EQ(clone != nullptr, cloned) << "a clone without its child after " << count;
-    DeleteObj(clone);
-  }
-  DeleteObj(source);
-  bool read = false;
-  for (LLong count = 0; !read; ++count) {
-    ASSERT_LT(count, 1000);
-    ByteWriter whole;
-    whole.Header().Append(chunks.bytes).End();
-    MemoryReadFile memory(whole.bytes);
-    BaseObject object(kObjectGeneric);
-    counting_memory::FailAfter(count);
-    object.ReadChunkLoop(memory.file, true);
-    counting_memory::FailNever();
-    read = object.GetDown() && object.GetRawSize() > 0 && object.GetFirstTag();
-  }
-}
-
 TEST(BaseObject, AChainOfAThousandWritesReadsCopiesAndDies)
 {
   counting_memory::BalanceCheck balance;

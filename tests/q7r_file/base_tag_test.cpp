@@ -5,6 +5,7 @@
 
 #include "q7r_file/node_bytes.h"
 #include "support/counting_memory.h"
+#include "support/every_failed_allocation.h"
 #include "torvane/objects/base_object.h"
 #include "torvane/tags/base_tag.h"
 #include "torvane/values/ge_data.h"
@@ -111,16 +112,8 @@ TEST(BaseTag, CopiesOntoATagOfTheSameTypeOnly)
 
   BaseTag unknown(kTagPlugin);
   ASSERT_TRUE(ReadInto(unknown, UnknownChunk()));
-  bool cloned = false;
-  for (LLong count = 0; !cloned; ++count) {
-    ASSERT_LT(count, 1000);
-    counting_memory::FailAfter(count);
-    GeListNode* clone = unknown.MakeClone(0, nullptr);
-    counting_memory::FailNever();
-    cloned = clone != nullptr;
-    EXPECT_TRUE(!clone || static_cast<BaseTag*>(clone)->GetRawSize() == 17);
-    DeleteObj(clone);
-  }
+  EveryFailedAllocation([&] { return std::unique_ptr<GeListNode>(unknown.MakeClone(0, nullptr)); },
+                        [](const auto& clone) { return static_cast<BaseTag&>(*clone).GetRawSize() == 17; });
 }
 
 TEST(BaseTag, MakesTheTypesOfItsTable)

@@ -11,6 +11,7 @@
 #include "support/counting_memory.h"
 #include "support/scene_bytes.h"
 #include "support/text.h"
+#include "torvane/memory/owned.h"
 #include "torvane/objects/base_object.h"
 #include "torvane/objects/camera_object_data.h"
 #include "torvane/tags/base_tag.h"
@@ -21,11 +22,7 @@ namespace
 
 using namespace _torvane_;
 
-struct ObjectDeleter
-{
-  void operator()(BaseObject* object) const { DeleteObj(object); }
-};
-using ObjectPtr = std::unique_ptr<BaseObject, ObjectDeleter>;
+using ObjectPtr = Owned<BaseObject>;
 
 ObjectPtr NewCamera() { return ObjectPtr(AllocObject(kObjectCamera)); }
 

@@ -164,23 +164,6 @@ TEST(DocumentFile, NoChangedByteCrashesTheReader)
   }
 }
 
-TEST(DocumentFile, EveryFailedAllocationEndsTheLoadCleanly)
-{
-  DocumentPtr document = MakeScene();
-  const Bytes whole = SaveToBytes(*document);
-  AssertionCounter quiet;
-  counting_memory::BalanceCheck balance;
-  bool loaded = false;
-  for (LLong count = 0; !loaded && count < 20000; count += 1 + count / 40) {
-    counting_memory::FailAfter(count);
-    DocumentPtr back = LoadFromBytes(whole);
-    bool failed = counting_memory::Get().allocations > 0 && !back;
-    counting_memory::FailNever();
-    loaded = !failed && back && back->GetFirstObject() && back->GetFirstObject()->GetDown();
-  }
-  EXPECT_TRUE(loaded);
-}
-
 TEST(DocumentFile, RefusesWhatIsNoSceneFile)
 {
   struct Case

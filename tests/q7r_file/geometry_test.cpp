@@ -1,7 +1,6 @@
 // Objects of points: their own chunks, the operations that resize their tags, splines, and copies.
 #include <algorithm>
 #include <climits>
-#include <functional>
 #include <string>
 
 #include <gtest/gtest.h>
@@ -9,6 +8,8 @@
 #include "q7r_file/node_bytes.h"
 #include "support/assertion_counter.h"
 #include "support/counting_memory.h"
+#include "support/every_failed_allocation.h"
+#include "torvane/memory/owned.h"
 #include "torvane/objects/point_object_data.h"
 #include "torvane/objects/spline_object.h"
 #include "torvane/tags/value_tags.h"
@@ -52,20 +53,6 @@ BaseArrayTag* AddTag(BaseObject& object, Long type, Long count)
   auto* tag = static_cast<BaseArrayTag*>(object.MakeTag(type));
   EXPECT_TRUE(tag->ResizeTagArray(count));
   return tag;
-}
-
-// Runs `attempt` with ever more memory until it succeeds.
-void TryWithLittleMemory(const std::function<bool()>& attempt)
-{
-  counting_memory::BalanceCheck balance;
-  for (LLong count = 0;; ++count) {
-    ASSERT_LT(count, 500);
-    counting_memory::FailAfter(count);
-    const bool done = attempt();
-    counting_memory::FailNever();
-    if (done)
-      return;
-  }
 }
 
 } // namespace
@@ -198,22 +185,13 @@ TEST(PolygonObject, TakesAnotherNumberOfNgonsWithTheirEdges)
 TEST(Geometry, SurvivesLittleMemory)
 {
   AssertionCounter quiet;
-  TryWithLittleMemory([] {
-    BaseObject* object = AllocObject(kObjectPolygon);
-    const bool done = object && ResizePolygons(*object, 4, 2, 3) && AddUVWTag(*object) &&
-                      ResizePolygons(*object, 5, 3, 9) && ReadInto(*object, AllPolygonChunks());
-    BaseObject* clone = done ? static_cast<BaseObject*>(object->MakeClone(0, nullptr)) : nullptr;
-    const bool copied = clone && GetPointCount(*clone) == 5 && GetPolygonData(*clone)->GetNgons() &&
-                        GetPolygonData(*clone)->GetNgons()->GetCount() == 2;
-    DeleteObj(clone);
-    DeleteObj(object);
-    return copied;
+  EveryFailedAllocation([] {
+    const Owned<BaseObject> object(AllocObject(kObjectPolygon));
+    return object && ResizePolygons(*object, 4, 2, 3) && AddUVWTag(*object) && ResizePolygons(*object, 5, 3, 9);
   });
-  TryWithLittleMemory([] {
-    SplineObject* spline = AllocSpline(3, 1);
-    const bool done = spline && ResizeSpline(*spline, 5, 2) && GetTangentTag(*spline)->GetCount() == 5;
-    DeleteObj(spline);
-    return done;
+  EveryFailedAllocation([] {
+    const Owned<SplineObject> spline(AllocSpline(3, 1));
+    return spline && ResizeSpline(*spline, 5, 2) && GetTangentTag(*spline)->GetCount() == 5;
   });
 }
 

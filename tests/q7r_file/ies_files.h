@@ -6,14 +6,11 @@
 #include <string>
 #include <vector>
 
+#include "torvane/memory/owned.h"
 #include "torvane/objects/ies_light.h"
 #include "torvane/text/filename.h"
 
-struct IESDeleter
-{
-  void operator()(_torvane_::IESLight* light) const { _torvane_::DeleteObj(light); }
-};
-using IESPtr = std::unique_ptr<_torvane_::IESLight, IESDeleter>;
+using IESPtr = _torvane_::Owned<_torvane_::IESLight>;
 
 // What LoadIESFile makes of a file with this text, which lies in a heap block of just its size. `light` stays on
 // failure.

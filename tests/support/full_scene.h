@@ -4,6 +4,7 @@
 #include <algorithm>
 #include <string_view>
 
+#include "support/byte_writer.h"
 #include "support/scene_bytes.h"
 #include "torvane/animation/ctrack.h"
 #include "torvane/materials/material.h"
@@ -146,6 +147,11 @@ inline DocumentPtr MakeFullScene()
   for (Long type : {kObjectLight, kObjectCamera, kObjectNull, kObjectPlane, kObjectPointBased, kObjectSky,
                     kObjectGeneric, kObjectJoint})
     AddObject(*document, type, polygons);
+  // An object of another program, whose data are kept as bytes.
+  const std::vector<std::uint8_t> unknown =
+      ByteWriter().Header().Start(110064, 3).Long(1234567).String(u"").String(u"what it holds").End().End().bytes;
+  MemoryReadFile file(unknown);
+  AddObject(*document, kObjectGeneric, polygons)->ReadChunkLoop(file.file, true);
   IESLight* distribution = NewObj<IESLight>();
   distribution->manufacturer = kText;
   for (Real angle : {0.0, 180.0}) {

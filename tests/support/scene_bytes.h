@@ -5,12 +5,9 @@
 
 #include "support/memory_file.h"
 #include "torvane/document/base_document.h"
+#include "torvane/memory/owned.h"
 
-struct DocumentDeleter
-{
-  void operator()(_torvane_::BaseDocument* document) const { _torvane_::BaseDocument::Free(document); }
-};
-using DocumentPtr = std::unique_ptr<_torvane_::BaseDocument, DocumentDeleter>;
+using DocumentPtr = _torvane_::Owned<_torvane_::BaseDocument>;
 
 inline DocumentPtr NewDocument() { return DocumentPtr(_torvane_::CreateDocument()); }
 

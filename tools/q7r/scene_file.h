@@ -6,15 +6,12 @@
 #include <string>
 
 #include "torvane/document/base_document.h"
+#include "torvane/memory/owned.h"
 
 namespace q7r
 {
 
-struct DocumentDeleter
-{
-  void operator()(_torvane_::BaseDocument* document) const { _torvane_::BaseDocument::Free(document); }
-};
-using DocumentPtr = std::unique_ptr<_torvane_::BaseDocument, DocumentDeleter>;
+using DocumentPtr = _torvane_::Owned<_torvane_::BaseDocument>;
 
 // A path of the command line as the library takes it: of a file that exists, or UTF-8.
 _torvane_::Filename ToFilename(const std::string& path);

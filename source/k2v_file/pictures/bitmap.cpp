@@ -1,5 +1,6 @@
 #include "torvane/pictures/bitmap.h"
 
+#include "torvane/memory/owned.h"
 #include "torvane/pictures/bitmap_filters.h"
 
 namespace _torvane_
@@ -73,10 +74,8 @@ Bool Bitmap::CopyTo(Bitmap& destination) const
 
 Bitmap* Bitmap::GetClone() const
 {
-  Bitmap* clone = NewObj<Bitmap>();
-  if (clone && !CopyTo(*clone))
-    DeleteObj(clone);
-  return clone;
+  Owned<Bitmap> clone(NewObj<Bitmap>());
+  return clone && CopyTo(*clone) ? clone.release() : nullptr;
 }
 
 Long Bitmap::Save(const Filename& name, Long format, const BaseContainer* settings, Long flags) const

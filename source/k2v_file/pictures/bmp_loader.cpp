@@ -2,6 +2,7 @@
 #include "k2v_file/pictures/bmp_run_decoder.h"
 #include "k2v_file/pictures/picture_rows.h"
 #include "torvane/bytes/base_file.h"
+#include "torvane/memory/owned.h"
 #include "torvane/pictures/bitmap_filters.h"
 
 namespace _torvane_
@@ -69,14 +70,13 @@ Long LoadRuns(BaseFile& file, RowFiller& filler, UChar* row, Long width, Long he
     return IMAGERESULT_FILE;
   if (size < 1)
     return IMAGERESULT_OK;
-  auto* codes = static_cast<UChar*>(GeAllocNC(size));
+  const Owned<UChar> codes(static_cast<UChar*>(GeAllocNC(size)));
   if (!codes)
     return IMAGERESULT_MEMORY;
-  Bool read = file.ReadBytes(codes, size) == size;
-  if (read)
-    BmpRunDecoder(row, width, height, header.bits, RowFiller::PutTo, &filler).Decode(codes, size);
-  GeFree(codes);
-  return read ? IMAGERESULT_OK : IMAGERESULT_FILE;
+  if (file.ReadBytes(codes.get(), size) != size)
+    return IMAGERESULT_FILE;
+  BmpRunDecoder(row, width, height, header.bits, RowFiller::PutTo, &filler).Decode(codes.get(), size);
+  return IMAGERESULT_OK;
 }
 
 Long LoadRows(BaseFile& file, Bitmap& bitmap, const BmpHeader& header)
@@ -85,14 +85,12 @@ Long LoadRows(BaseFile& file, Bitmap& bitmap, const BmpHeader& header)
   auto height = static_cast<Long>(Magnitude(header.height));
   if (width < 1 || height < 1)
     return IMAGERESULT_OK;
-  auto* row = static_cast<UChar*>(GeAllocNC(GetPaddedRowSize(width, header.bits)));
+  const Owned<UChar> row(static_cast<UChar*>(GeAllocNC(GetPaddedRowSize(width, header.bits))));
   if (!row)
     return IMAGERESULT_MEMORY;
   RowFiller filler(bitmap, width, height, static_cast<Long>(header.height) >= 1);
-  Long result = header.compression == kBmpPlain ? LoadPlain(file, filler, row, width, height)
-                                                : LoadRuns(file, filler, row, width, height, header);
-  GeFree(row);
-  return result;
+  return header.compression == kBmpPlain ? LoadPlain(file, filler, row.get(), width, height)
+                                         : LoadRuns(file, filler, row.get(), width, height, header);
 }
 
 } // namespace

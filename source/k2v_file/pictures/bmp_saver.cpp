@@ -1,6 +1,7 @@
 #include "k2v_file/pictures/bmp_header.h"
 #include "k2v_file/pictures/picture_rows.h"
 #include "torvane/bytes/base_file.h"
+#include "torvane/memory/owned.h"
 #include "torvane/pictures/bitmap_filters.h"
 #include "torvane/values/base_container.h"
 
@@ -55,15 +56,14 @@ Long BmpSaver::Save(const Filename& name, const Bitmap& bitmap, const BaseContai
   LLong rowSize = GetPaddedRowSize(bitmap.GetBw(), kBmpBits);
   MakeHeader(bitmap, rowSize, dotsPerInch).Visit(WriteNumber{file});
   // Zeroed, so that the bytes that fill the row up are.
-  auto* row = static_cast<UChar*>(GeAlloc(rowSize));
+  const Owned<UChar> row(static_cast<UChar*>(GeAlloc(rowSize)));
   if (!row)
     return IMAGERESULT_MEMORY;
   for (Long y = bitmap.GetBh() - 1; y >= 0 && file.GetError() == FILEERROR_NONE; --y) {
-    GetColorRow(bitmap, y, row);
-    SwapRedAndBlue(row, bitmap.GetBw());
-    file.WriteBytes(row, rowSize);
+    GetColorRow(bitmap, y, row.get());
+    SwapRedAndBlue(row.get(), bitmap.GetBw());
+    file.WriteBytes(row.get(), rowSize);
   }
-  GeFree(row);
   return file.Close() ? IMAGERESULT_OK : IMAGERESULT_FILE;
 }
 

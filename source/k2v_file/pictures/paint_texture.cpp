@@ -1,5 +1,7 @@
 #include "torvane/pictures/paint_texture.h"
 
+#include "torvane/memory/owned.h"
+
 #include <cstring>
 
 #include "k2v_file/pictures/pixel_block.h"
@@ -248,14 +250,13 @@ Bool K2VAlpha::SetLayerLine(HyperFile& file, Long x, Long y, Long count, const U
   const GreyRule* rule = FindGreyRule(type_);
   if (!rule || components < rule->components || count < 1)
     return true;
-  auto* grey = static_cast<UChar*>(GeAllocNC(count));
+  const Owned<UChar> grey(static_cast<UChar*>(GeAllocNC(count)));
   if (!grey) {
     file.SetError(FILEERROR_MEMORY);
     return false;
   }
-  TurnGrey(*rule, buffer, count, grey);
-  filter->client_->SetAlphaLine(index_, x, y, count, grey);
-  GeFree(grey);
+  TurnGrey(*rule, buffer, count, grey.get());
+  filter->client_->SetAlphaLine(index_, x, y, count, grey.get());
   return true;
 }
 

@@ -2,6 +2,7 @@
 
 #include "k2v_file/stream/counted_records.h"
 #include "torvane/bytes/base_file.h"
+#include "torvane/memory/owned.h"
 #include "torvane/memory/private_ge_mtools.h"
 
 namespace _torvane_
@@ -345,10 +346,8 @@ Bool BaseSelect::CopySelect(BaseSelect& destination) const
 
 BaseSelect* BaseSelect::CloneSelect() const
 {
-  auto* clone = NewObj<BaseSelect>();
-  if (clone && !CopySelect(*clone))
-    DeleteObj(clone);
-  return clone;
+  Owned<BaseSelect> clone(NewObj<BaseSelect>());
+  return clone && CopySelect(*clone) ? clone.release() : nullptr;
 }
 
 void BaseSelect::WriteChunks(HyperFile& file)

@@ -32,11 +32,7 @@ struct Options
   bool json = false;
 };
 
-struct IESDeleter
-{
-  void operator()(IESLight* light) const { DeleteObj(light); }
-};
-using IESPtr = std::unique_ptr<IESLight, IESDeleter>;
+using IESPtr = Owned<IESLight>;
 
 IESPtr LoadIES(const std::string& path)
 {

@@ -3,6 +3,7 @@
 
 #include "k2v_file/stream/chunk_visitor.h"
 #include "q7r_file/types/tag_makers.h"
+#include "torvane/memory/owned.h"
 #include "torvane/tags/value_tags.h"
 #include "torvane/values/ge_data.h"
 
@@ -222,13 +223,13 @@ Bool UVWTag::ReadOldEntries(HyperFile& file, Long level)
   LLong count = 0;
   if (!file.ReadLegacyWordArray(words, count))
     return false;
-  const Bool done =
-      level >= kLevelPoints ? ReadPointEntries(file) : FillEntries(file, count / kOldWordsPerQuad, [words](LLong i) {
-        const UWord* word = words + i * 3;
-        return PackUVW({FromOldWord(word[0]), FromOldWord(word[1]), FromOldWord(word[2])});
-      });
-  GeFree(words);
-  return done;
+  const Owned<UWord> owned(words);
+  if (level >= kLevelPoints)
+    return ReadPointEntries(file);
+  return FillEntries(file, count / kOldWordsPerQuad, [words](LLong i) {
+    const UWord* word = words + i * 3;
+    return PackUVW({FromOldWord(word[0]), FromOldWord(word[1]), FromOldWord(word[2])});
+  });
 }
 
 Bool UVWTag::ReadPointEntries(HyperFile& file)
@@ -237,9 +238,8 @@ Bool UVWTag::ReadPointEntries(HyperFile& file)
   LLong count = 0;
   if (!file.ReadLegacyPointArray(points, count))
     return false;
-  const Bool done = FillEntries(file, count / 4, [points](LLong i) { return PackUVW(points[i]); });
-  GeFree(points);
-  return done;
+  const Owned<Vector> owned(points);
+  return FillEntries(file, count / 4, [points](LLong i) { return PackUVW(points[i]); });
 }
 
 // The words of a legacy array of floats as they stand in the file: few of them are numbers, and a cleaned one would be
@@ -254,12 +254,11 @@ Bool UVWTag::ReadFloatEntries(HyperFile& file)
   GeFree(head);
   if (!file.ReadBlock(words, size))
     return false;
-  const Bool done = FillEntries(file, size / static_cast<LLong>(sizeof(PackedUVWQuad)), [words](LLong i) {
+  const Owned<void> owned(words);
+  return FillEntries(file, size / static_cast<LLong>(sizeof(PackedUVWQuad)), [words](LLong i) {
     const UChar* place = static_cast<UChar*>(words) + i * static_cast<LLong>(sizeof(PackedUVW));
     return PackedUVW{bytes::GetBig<ULong>(place), bytes::GetBig<ULong>(place + sizeof(ULong))};
   });
-  GeFree(words);
-  return done;
 }
 
 } // namespace _torvane_

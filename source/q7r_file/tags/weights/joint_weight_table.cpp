@@ -1,5 +1,7 @@
 #include "torvane/tags/joint_weight_table.h"
 
+#include "torvane/memory/owned.h"
+
 #include <cmath>
 
 #include "k2v_file/stream/array_elements.h"
@@ -29,12 +31,12 @@ Bool ReadOldElements(HyperFile& file, void* data, Long type, LLong count)
   const LLong elementSize = GetElementSize(type);
   if (!file.ReadMemory(block, size))
     return false;
+  const Owned<void> owned(block);
   const Bool fits = size == count * elementSize;
   if (fits)
     FindUnpackElements(type, type)(static_cast<UChar*>(data), static_cast<UChar*>(block), elementSize, count);
   else
     file.SetError(FILEERROR_WRONG_VALUE);
-  GeFree(block);
   return fits;
 }
 
