@@ -1,13 +1,14 @@
 // What holds for every record, by the samples of them all.
 #include <algorithm>
-#include <memory>
 
 #include <gtest/gtest.h>
 
 #include "support/assertion_counter.h"
 #include "support/counting_memory.h"
+#include "support/every_failed_allocation.h"
 #include "support/memory_file.h"
 #include "support/record_samples.h"
+#include "torvane/memory/owned.h"
 #include "torvane/values/ge_data.h"
 
 namespace
@@ -16,11 +17,7 @@ namespace
 using namespace _torvane_;
 using Bytes = std::vector<std::uint8_t>;
 
-struct NodeDeleter
-{
-  void operator()(GeListNode* node) const { DeleteObj(node); }
-};
-using NodePtr = std::unique_ptr<GeListNode, NodeDeleter>;
+using NodePtr = Owned<GeListNode>;
 
 Bytes Chunk(Long id, Long level, const std::vector<RecordValue>& values, Long version = 13000)
 {
@@ -61,7 +58,7 @@ GeListNode* CopyOf(GeListNode& node, const RecordSample& sample)
   if (GeListNode* clone = node.MakeClone(0, nullptr))
     return clone;
   GeListNode* copy = sample.make(); // of a class that has no clones
-  if (!node.CopyWithTranslation(*copy, 0, nullptr))
+  if (copy && !node.CopyWithTranslation(*copy, 0, nullptr))
     DeleteObj(copy);
   return copy;
 }
@@ -163,5 +160,27 @@ TEST(Records, TakeNoMemoryForCountsThatTheFileDoesNotHold)
       }
       value.text = before;
     }
+  }
+}
+
+TEST(Records, AreReadAndCopiedWholeOrNotAtAllWhenAnAllocationFails)
+{
+  for (const RecordSample& sample : RecordSamples()) {
+    SCOPED_TRACE(sample.name);
+    const Bytes chunk = Chunk(sample.chunk, sample.level, ParseRecord(sample.body), sample.version);
+    const auto written = [](const NodePtr& node) {
+      return WithoutMarkers(WriteToMemory([&](HyperFile& file) { node->WriteChunks(file); }));
+    };
+    EveryFailedAllocation(
+        [&] {
+          NodePtr node(sample.make());
+          return node && Read(*node, sample, chunk) ? std::move(node) : nullptr;
+        },
+        written);
+    const NodePtr node(sample.make());
+    Read(*node, sample, chunk);
+    const bool hasClones = NodePtr(node->MakeClone(0, nullptr)) != nullptr;
+    EveryFailedAllocation([&] { return NodePtr(hasClones ? node->MakeClone(0, nullptr) : CopyOf(*node, sample)); },
+                          written);
   }
 }
