@@ -1,5 +1,8 @@
 #include "host/progress.h"
 
+#include "host/model/layer_streams.h"
+#include "host/model/timing.h"
+
 #include <algorithm>
 #include <unordered_map>
 
@@ -16,10 +19,7 @@ std::uint64_t CountLayers(const Composition& composition, std::unordered_map<con
     return found->second;
   std::uint64_t count = 0;
   for (const Layer* layer : composition.layers) {
-    const bool isObject = layer->type == AEGP_ObjectType_AV
-                              ? layer->source != nullptr
-                              : layer->type == AEGP_ObjectType_CAMERA || layer->type == AEGP_ObjectType_LIGHT;
-    if (!layer->is3D || !isObject)
+    if (!IsExported(*layer))
       continue;
     ++count;
     if (layer->source && layer->source->composition)
@@ -36,8 +36,8 @@ void Progress::Start(const Composition& composition)
   std::unordered_map<const Composition*, std::uint64_t> known;
   layers_ = listener_ ? CountLayers(composition, known) : 0;
   begun_ = 0;
-  singleFrame_ = composition.workAreaStart;
-  frames_ = std::max(1, composition.workAreaEnd - composition.workAreaStart);
+  singleFrame_ = FrameAt(composition.workAreaStart, composition.frameDuration);
+  frames_ = std::max(1.0, FrameAt(composition.workAreaDuration, composition.frameDuration));
   share_ = 0;
 }
 

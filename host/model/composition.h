@@ -7,6 +7,7 @@
 #include <array>
 #include <deque>
 #include <filesystem>
+#include <optional>
 #include <stdexcept>
 #include <string>
 #include <string_view>
@@ -28,13 +29,23 @@ struct Item
 {
   ItemKind kind = ItemKind::kFootage;
   std::string name;
-  std::string id; // of the asset; empty for the root composition and for solids
+  std::string id; // of the asset or of the project's item; empty for a file's top level and for solids of layers
   A_long width = 0;
   A_long height = 0;
   Composition* composition = nullptr; // of a composition
-  std::string path;                   // of footage: absolute, or the id of embedded data
+  std::string path;                   // of footage: absolute, or the id of embedded data; empty for a placeholder
   A_long files = 1;                   // of footage
+  double duration = 0;                // of footage that is known to last, in seconds
   AEGP_ColorVal color{.alphaF = 1, .redF = 1, .greenF = 1, .blueF = 1}; // of a solid
+};
+
+// When a layer is there. In frames of the root composition.
+struct LayerSpan
+{
+  double in = 0;
+  double out = 0;
+  double start = 0;   // where the layer's own time 0 lies
+  double stretch = 1; // of the layer's own time; negative for one that runs backwards
 };
 
 struct Layer
@@ -50,6 +61,7 @@ struct Layer
   AEGP_FilmSizeUnits filmSizeUnits = AEGP_FilmSizeUnits_HORIZONTAL;
   double filmSize = 0; // pixels
   AEGP_LightType lightType = AEGP_LightType_POINT;
+  std::optional<LayerSpan> span; // where the file tells it
   // By StreamIndex; null where the stream is not legal on this layer.
   std::array<std::unique_ptr<Property>, kStreamCount> streams;
 };
@@ -57,8 +69,11 @@ struct Layer
 struct Composition
 {
   Item* item = nullptr;
-  A_long workAreaStart = 0; // frames
-  A_long workAreaEnd = 0;   // frames, not before the start
+  double frameRate = 0;       // as the file states it
+  A_Time frameDuration{1, 1}; // the exact one
+  A_Time workAreaStart{0, 1};
+  A_Time workAreaDuration{0, 1}; // not below 0
+  double frames = 0;             // how long it is, in frames of its own; 0 where that isn't known
   A_Ratio pixelAspect{1, 1};
   std::vector<Layer*> layers; // the top one first
 };
@@ -66,8 +81,7 @@ struct Composition
 // Owns what the handles of a host point to; moving a project leaves its parts where they are.
 struct Project
 {
-  double frameRate = 0;                 // as the file states it
-  A_Time frameDuration{1, 1};           // the exact one
+  A_Time frameDuration{1, 1};           // that of the root, in which keyframes are counted
   Composition* root = nullptr;          // the file's top level
   std::deque<Composition> compositions; // the root first, then in the order of the assets
   std::deque<Item> items;

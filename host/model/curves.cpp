@@ -53,40 +53,53 @@ double Ease(const Easing& easing, double x)
 {
   if (x <= 0)
     return 0;
+  const double end = easing.isBump ? 0 : 1;
   if (x >= 1)
-    return 1;
+    return end;
   const double cx = 3 * easing.x1, bx = 3 * (easing.x2 - easing.x1) - cx, ax = 1 - cx - bx;
   const double u = Solve(0, 1, x, 1e-15, [&](double at) {
     return ValueAndSlope{((ax * at + bx) * at + cx) * at - x, (3 * ax * at + 2 * bx) * at + cx};
   });
-  const double cy = 3 * easing.y1, by = 3 * (easing.y2 - easing.y1) - cy, ay = 1 - cy - by;
+  const double cy = 3 * easing.y1, by = 3 * (easing.y2 - easing.y1) - cy, ay = end - cy - by;
   return ((ay * u + by) * u + cy) * u;
 }
 
-BezierPath::BezierPath(const Value& p0, const Value& p1, const Value& p2, const Value& p3) : points_{p0, p1, p2, p3}
+BezierPath::BezierPath(const Value& p0, const Value& p1, const Value& p2, const Value& p3)
+    : BezierPath(std::vector<Value>{p0, p1, p2, p3})
+{}
+
+BezierPath::BezierPath(std::vector<Value> points) : points_(std::move(points)), hodograph_(points_.size() - 1)
 {
-  for (std::size_t k = 0; k < 3; ++k)
+  for (std::size_t k = 0; k < hodograph_.size(); ++k)
     for (std::size_t c = 0; c < 3; ++c)
       hodograph_[k][c] = 3 * (points_[k + 1][c] - points_[k][c]);
 }
 
+std::size_t BezierPath::CurveAt(double u) const
+{
+  return std::min(static_cast<std::size_t>(std::max(u, 0.0)), hodograph_.size() / 3 - 1);
+}
+
 Value BezierPath::Point(double u) const
 {
-  const double v = 1 - u;
-  const double weights[4] = {v * v * v, 3 * v * v * u, 3 * v * u * u, u * u * u};
+  const std::size_t curve = CurveAt(u);
+  const double t = u - static_cast<double>(curve), v = 1 - t;
+  const double weights[4] = {v * v * v, 3 * v * v * t, 3 * v * t * t, t * t * t};
   Value point{};
   for (std::size_t k = 0; k < 4; ++k)
     for (std::size_t c = 0; c < 3; ++c)
-      point[c] += weights[k] * points_[k][c];
+      point[c] += weights[k] * points_[3 * curve + k][c];
   return point;
 }
 
 double BezierPath::Speed(double u) const
 {
-  const double v = 1 - u;
+  const std::size_t curve = CurveAt(u);
+  const Value* slopes = &hodograph_[3 * curve];
+  const double t = u - static_cast<double>(curve), v = 1 - t;
   Value derivative{};
   for (std::size_t c = 0; c < 3; ++c)
-    derivative[c] = v * v * hodograph_[0][c] + 2 * v * u * hodograph_[1][c] + u * u * hodograph_[2][c];
+    derivative[c] = v * v * slopes[0][c] + 2 * v * t * slopes[1][c] + t * t * slopes[2][c];
   return Norm(derivative);
 }
 
@@ -117,9 +130,14 @@ void BezierPath::Measure(double from, double to, double length, double tolerance
 double BezierPath::Length() const
 {
   if (marks_.empty()) {
-    const double polygon = (Norm(hodograph_[0]) + Norm(hodograph_[1]) + Norm(hodograph_[2])) / 3;
+    double polygon = 0;
+    for (const Value& side : hodograph_)
+      polygon += Norm(side) / 3;
     marks_.push_back({0, 0});
-    Measure(0, 1, Integrate(0, 1), kLengthTolerance * polygon, kMaxSubdivisions);
+    for (std::size_t curve = 0; curve < hodograph_.size() / 3; ++curve) {
+      const double from = static_cast<double>(curve), to = from + 1;
+      Measure(from, to, Integrate(from, to), kLengthTolerance * polygon, kMaxSubdivisions);
+    }
   }
   return marks_.back().length;
 }
@@ -140,9 +158,9 @@ double BezierPath::ParameterAt(double length) const
 Value BezierPath::EndTangent(bool atStart) const
 {
   // Where a handle has no length, the next control point gives the direction.
-  for (std::size_t k = 1; k < 4; ++k) {
-    const Value& from = atStart ? points_[0] : points_[3 - k];
-    const Value& to = atStart ? points_[k] : points_[3];
+  for (std::size_t k = 1; k < points_.size(); ++k) {
+    const Value& from = atStart ? points_.front() : points_[points_.size() - 1 - k];
+    const Value& to = atStart ? points_[k] : points_.back();
     Value way{to[0] - from[0], to[1] - from[1], to[2] - from[2]};
     const double norm = Norm(way);
     if (norm > 0)
@@ -161,7 +179,7 @@ Value BezierPath::At(double fraction) const
   const bool isBefore = fraction < 0;
   const Value tangent = EndTangent(isBefore);
   const double way = (isBefore ? fraction : fraction - 1) * length;
-  Value point = isBefore ? points_[0] : points_[3];
+  Value point = isBefore ? points_.front() : points_.back();
   for (std::size_t c = 0; c < 3; ++c)
     point[c] += tangent[c] * way;
   return point;

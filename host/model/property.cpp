@@ -1,5 +1,7 @@
 #include "host/model/property.h"
 
+#include "host/model/turning.h"
+
 #include <algorithm>
 #include <cmath>
 
@@ -80,25 +82,34 @@ Value Property::KeyedAt(double frame) const
   const std::size_t i = IntervalAt(frame);
   const Keyframe& from = keyframes_[i];
   const Keyframe& to = keyframes_[i + 1];
-  if (from.isHold)
+  if (from.hold == Hold::kValue || frame == from.time)
     return from.value;
-  const double x = (frame - from.time) / (to.time - from.time);
+  if (from.hold == Hold::kNextValue)
+    return to.value;
+  return Between(from, to, (frame - from.time) / (to.time - from.time));
+}
+
+Value Property::Between(const Keyframe& from, const Keyframe& to, double x) const
+{
   const auto eased = [&](std::size_t c) { return from.easing.empty() ? x : Ease(from.easing[c], x); };
   double y = eased(0);
+  if (isTurning_)
+    return TurnBetween(from.value, to.value, y);
   if (from.path)
     return from.path->At(y);
   Value value{};
   for (std::size_t c = 0; c < static_cast<std::size_t>(info_->Dimensions()); ++c) {
     if (c > 0 && c < from.easing.size())
       y = eased(c);
-    value[c] = from.value[c] + (to.value[c] - from.value[c]) * y;
+    const bool isBump = !from.easing.empty() && from.easing[std::min(c, from.easing.size() - 1)].isBump;
+    value[c] = from.value[c] + (isBump ? y : (to.value[c] - from.value[c]) * y);
   }
   return value;
 }
 
 std::size_t Property::KeyframeCount() const
 {
-  std::size_t count = keyframes_.size();
+  std::size_t count = keyframes_.size() + leftOut_;
   for (const Property& component : split_)
     count = std::max(count, component.KeyframeCount());
   return count;
@@ -112,7 +123,7 @@ bool Property::IsTimeVarying() const
 
 bool Property::HasExpression() const
 {
-  return hasExpression_ ||
+  return !expression_.empty() ||
          std::any_of(split_.begin(), split_.end(), [](const Property& c) { return c.HasExpression(); });
 }
 
@@ -120,7 +131,7 @@ bool Property::IsExpressionLost() const
 {
   if (!samples_.empty())
     return false;
-  return hasExpression_ ||
+  return !expression_.empty() ||
          std::any_of(split_.begin(), split_.end(), [](const Property& c) { return c.IsExpressionLost(); });
 }
 

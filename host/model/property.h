@@ -5,6 +5,7 @@
 #include "host/model/curves.h"
 
 #include <memory>
+#include <string>
 #include <vector>
 
 namespace host
@@ -28,11 +29,19 @@ const StreamInfo* FindStreamInfo(AEGP_LayerStream id);
 // The place of a kind of stream in tables of kStreamCount entries.
 std::size_t StreamIndex(const StreamInfo& info);
 
+// What an interval without movement shows between its ends.
+enum class Hold
+{
+  kNone,
+  kValue,     // the value of the keyframe that begins it
+  kNextValue, // that of the one that ends it: a hold of a layer that runs backwards
+};
+
 struct Keyframe
 {
   double time = 0; // in frames
   Value value{};   // here; the value at the end of this interval is the next keyframe's
-  bool isHold = false;
+  Hold hold = Hold::kNone;
   // One curve for all components, or one for each; none: linear.
   std::vector<Easing> easing;
   // The way to the next keyframe, when it is not straight.
@@ -55,14 +64,27 @@ class Property
   // More than one keyframe or more than one sample.
   bool IsTimeVarying() const;
   bool HasExpression() const;
+  // The text of its expression, which is not evaluated; empty if there is none.
+  const std::string& Expression() const { return expression_; }
   // An expression without samples that stand in for it.
   bool IsExpressionLost() const;
+
+  const Value& Constant() const { return constant_; }
+  const std::vector<Keyframe>& Keyframes() const { return keyframes_; }
+  const std::vector<Value>& Samples() const { return samples_; }
+  // Empty, or the three properties of a split position.
+  const std::vector<Property>& Split() const { return split_; }
+  // Three angles that turn together by the shortest way from keyframe to keyframe.
+  bool IsTurning() const { return isTurning_; }
 
   // What the reader fills. `keyframes` are in the order of time; `samples` hold one value for each frame from 0.
   void SetConstant(const Value& value) { constant_ = value; }
   void SetKeyframes(std::vector<Keyframe> keyframes) { keyframes_ = std::move(keyframes); }
   void SetSamples(std::vector<Value> samples) { samples_ = std::move(samples); }
-  void SetHasExpression() { hasExpression_ = true; }
+  // A keyframe that only shapes the way between its neighbours may be left out of the list and is counted here.
+  void CountKeyframes(std::size_t leftOut) { leftOut_ = leftOut; }
+  void SetExpression(std::string text) { expression_ = std::move(text); }
+  void SetTurning() { isTurning_ = true; }
   // Three one-dimensional properties whose first components take the place of this one's.
   void SetSplit(std::vector<Property> components) { split_ = std::move(components); }
 
@@ -71,6 +93,7 @@ class Property
 
  private:
   Value KeyedAt(double frame) const;
+  Value Between(const Keyframe& from, const Keyframe& to, double x) const;
   std::size_t IntervalAt(double frame) const;
 
   const StreamInfo* info_;
@@ -78,7 +101,9 @@ class Property
   std::vector<Keyframe> keyframes_;
   std::vector<Value> samples_;
   std::vector<Property> split_;
-  bool hasExpression_ = false;
+  std::string expression_;
+  std::size_t leftOut_ = 0;
+  bool isTurning_ = false;
   mutable std::size_t lastInterval_ = 0;
 };
 

@@ -8,17 +8,17 @@
 namespace host
 {
 
-void CheckParents(const JsonDocument& document, const LayerList& list)
+void CheckParents(const Composition& composition, const RefuseLayer& refuse)
 {
   // Each layer is visited once: a walk ends at a layer of an earlier walk, and loops when it meets its own.
   std::unordered_map<const Layer*, std::size_t> walkOf;
-  const std::vector<Layer*>& layers = list.composition->layers;
+  const std::vector<Layer*>& layers = composition.layers;
   for (std::size_t walk = 0; walk < layers.size(); ++walk) {
     const Layer* layer = layers[walk];
     while (layer && walkOf.try_emplace(layer, walk).second)
       layer = layer->parent;
     if (layer && walkOf[layer] == walk)
-      document.RefuseMember(*list.layers[walk], "parent", "the chain of parents loops");
+      refuse(composition, walk, "parent", "the chain of parents loops");
   }
 }
 
@@ -28,16 +28,16 @@ namespace
 class NestingCheck
 {
  public:
-  NestingCheck(const JsonDocument& document, const std::vector<LayerList>& lists)
-      : document_(document), lists_(lists), states_(lists.size())
+  NestingCheck(const Project& project, const RefuseLayer& refuse)
+      : compositions_(project.compositions), refuse_(refuse), states_(compositions_.size())
   {
-    for (std::size_t i = 0; i < lists.size(); ++i)
-      indexOf_[lists[i].composition] = i;
+    for (std::size_t i = 0; i < compositions_.size(); ++i)
+      indexOf_[&compositions_[i]] = i;
   }
 
   void Run()
   {
-    for (std::size_t i = 0; i < lists_.size(); ++i)
+    for (std::size_t i = 0; i < compositions_.size(); ++i)
       if (!states_[i].isEntered)
         Walk(i);
   }
@@ -77,7 +77,7 @@ class NestingCheck
   std::size_t Advance(std::size_t index)
   {
     State& state = states_[index];
-    const std::vector<Layer*>& layers = lists_[index].composition->layers;
+    const std::vector<Layer*>& layers = compositions_[index].layers;
     for (; state.nextLayer < layers.size(); ++state.nextLayer) {
       const Item* source = layers[state.nextLayer]->source;
       if (!source || !source->composition) {
@@ -88,8 +88,8 @@ class NestingCheck
       if (!states_[inner].isEntered)
         return inner;
       if (!states_[inner].isLeft)
-        document_.RefuseMember(*lists_[index].layers[state.nextLayer], "refId",
-                               "composition " + Quoted(source->name) + " contains itself");
+        refuse_(compositions_[index], state.nextLayer, "source",
+                "composition " + Quoted(source->name) + " contains itself");
       Count(index, 1 + states_[inner].unfolded, 1 + states_[inner].nesting);
     }
     return kNone;
@@ -101,24 +101,22 @@ class NestingCheck
     state.unfolded += layers; // neither is above the limit, so the sum can't overflow
     state.nesting = std::max(state.nesting, nesting);
     if (state.unfolded > kMaxUnfoldedLayers)
-      document_.Refuse(*lists_[index].json, "unfolds to more than " + std::to_string(kMaxUnfoldedLayers) + " layers");
+      refuse_(compositions_[index], kNoLayer, "",
+              "unfolds to more than " + std::to_string(kMaxUnfoldedLayers) + " layers");
     if (state.nesting > kMaxNesting)
-      document_.Refuse(*lists_[index].json, "compositions nested deeper than " + std::to_string(kMaxNesting));
+      refuse_(compositions_[index], kNoLayer, "", "compositions nested deeper than " + std::to_string(kMaxNesting));
   }
 
   static constexpr std::size_t kNone = static_cast<std::size_t>(-1);
 
-  const JsonDocument& document_;
-  const std::vector<LayerList>& lists_;
+  const std::deque<Composition>& compositions_;
+  const RefuseLayer& refuse_;
   std::vector<State> states_;
   std::unordered_map<const Composition*, std::size_t> indexOf_;
 };
 
 } // namespace
 
-void CheckNesting(const JsonDocument& document, const std::vector<LayerList>& lists)
-{
-  NestingCheck(document, lists).Run();
-}
+void CheckNesting(const Project& project, const RefuseLayer& refuse) { NestingCheck(project, refuse).Run(); }
 
 } // namespace host

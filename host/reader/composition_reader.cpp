@@ -1,16 +1,19 @@
 // Reads a composition file into a project.
-#include "host/model/composition.h"
+#include "host/reader/composition_reader.h"
 
 #include "host/model/timing.h"
 #include "host/reader/composition_checks.h"
+#include "host/reader/item_reader.h"
 #include "host/reader/json_document.h"
 #include "host/reader/layer_reader.h"
+#include "host/reader/warnings.h"
 #include "host/text.h"
 
+#include <algorithm>
 #include <cmath>
-#include <fstream>
 #include <optional>
 #include <unordered_map>
+#include <unordered_set>
 
 namespace host
 {
@@ -18,9 +21,15 @@ namespace host
 namespace
 {
 
-constexpr A_long kNullSize = 100;
-constexpr A_long kDefaultSolidSize = 100;
 constexpr double kLargestFrame = 1e9; // so that rounding fits; times are tested exactly
+
+// The layers of a composition as the file lists them.
+struct LayerList
+{
+  Composition* composition;
+  const Json* json;                // the array
+  std::vector<const Json*> layers; // its entries, in the order of composition->layers
+};
 
 class CompositionReader
 {
@@ -34,36 +43,41 @@ class CompositionReader
  private:
   struct Frames
   {
-    A_long start, end;
+    A_Time start, duration;
   };
 
   void ReadRoot();
   void ReadAssets();
   void ReadAsset(const Json& json);
-  void ReadFootage(const Json& json, Item& item);
   void ReadSettings(const Json& json, Composition& composition);
   Composition& AddComposition(const Json& json, const Json& layers);
   Item& AddItem(ItemKind kind);
 
   void ReadLayers(LayerList& list);
   Item* ReadSource(const Json& json, const Layer& layer);
-  Item* MakeSolid(const Json& json);
-  Item* MakeNull(const Json& json);
+  AEGP_LayerIDVal ReadId(const Json& json);
   Item* FindAsset(const Json& json, const Layer& layer);
   void NoteUse(Item& item, const Json& layer);
   void LinkParents(LayerList& list);
   void SettleSizes();
 
   Frames ReadFrames(const Json& start, const Json& end, bool mayBeEmpty) const;
+  A_Time ReadFrameDuration(const Json& json) const;
+  const Json* FindPair(const Json& holder, const char* key) const;
+  A_Ratio ReadRatio(const Json& pair) const;
+  RefuseLayer Refusal() const;
   void Warn(const Layer& layer, const std::string& text);
 
   const JsonDocument& document_;
   std::filesystem::path folder_;
   Project project_;
-  Frames rootFrames_{0, 0};
+  double frameRate_ = 0;
+  double frames_ = 0;
+  Frames rootFrames_{{0, 1}, {0, 1}};
   std::vector<LayerList> lists_; // in the order of project_.compositions
   std::unordered_map<std::string, Item*> assets_;
   std::unordered_map<const Item*, const Json*> firstUse_; // of compositions, by layers
+  std::unordered_set<std::int64_t> ids_;                  // of layers that state theirs
 };
 
 // --- Settings
@@ -76,41 +90,65 @@ CompositionReader::Frames CompositionReader::ReadFrames(const Json& start, const
       document_.Refuse(*json, "beyond what the host can count");
   if (last < first || (last == first && !mayBeEmpty))
     document_.Refuse(end, "the end is not after the start");
-  const Frames frames{static_cast<A_long>(std::lround(first)), static_cast<A_long>(std::lround(last))};
-  if (!FramesToTime(frames.start, project_.frameDuration))
+  const std::int64_t from = std::llround(first), to = std::llround(last);
+  const std::optional<A_Time> begin = FramesToTime(from, project_.frameDuration);
+  const std::optional<A_Time> duration = FramesToTime(to - from, project_.frameDuration);
+  if (!begin)
     document_.Refuse(start, "beyond what the host can count");
-  if (!FramesToTime(std::int64_t{frames.end} - frames.start, project_.frameDuration))
+  if (!duration)
     document_.Refuse(end, "beyond what the host can count");
-  return frames;
+  return {*begin, *duration};
+}
+
+// A member of `holder` that holds two numbers; null when it is missing.
+const Json* CompositionReader::FindPair(const Json& holder, const char* key) const
+{
+  const Json* found = document_.Find(holder, key);
+  if (found && (!found->is_array() || found->size() != 2))
+    document_.Refuse(*found, "expected an array of two numbers");
+  return found;
+}
+
+// Two whole numbers above 0.
+A_Ratio CompositionReader::ReadRatio(const Json& pair) const
+{
+  const auto part = [&](const Json& number, std::int64_t largest) {
+    const std::int64_t value = document_.WholeNumber(number);
+    if (value < 1 || value > largest)
+      document_.Refuse(number, "expected a whole number above 0");
+    return value;
+  };
+  return {static_cast<A_long>(part(pair[0], 0x7FFFFFFF)), static_cast<A_u_long>(part(pair[1], 0xFFFFFFFF))};
 }
 
 void CompositionReader::ReadSettings(const Json& json, Composition& composition)
 {
+  composition.frameRate = frameRate_;
+  composition.frames = frames_;
+  composition.frameDuration = project_.frameDuration;
   composition.workAreaStart = rootFrames_.start;
-  composition.workAreaEnd = rootFrames_.end;
+  composition.workAreaDuration = rootFrames_.duration;
   const Json* ae = document_.Find(json, "ae");
   if (!ae)
     return;
-  const auto pair = [&](const char* key) -> const Json* {
-    const Json* found = document_.Find(*ae, key);
-    if (found && (!found->is_array() || found->size() != 2))
-      document_.Refuse(*found, "expected an array of two numbers");
-    return found;
-  };
-  if (const Json* area = pair("workArea")) {
+  if (const Json* area = FindPair(*ae, "workArea")) {
     const Frames frames = ReadFrames((*area)[0], (*area)[1], true);
     composition.workAreaStart = frames.start;
-    composition.workAreaEnd = frames.end;
+    composition.workAreaDuration = frames.duration;
   }
-  if (const Json* aspect = pair("pixelAspect")) {
-    const auto part = [&](const Json& number) {
-      const std::int64_t value = document_.WholeNumber(number);
-      if (value < 1 || value > 0x7FFFFFFF)
-        document_.Refuse(number, "expected a whole number above 0");
-      return static_cast<A_long>(value);
-    };
-    composition.pixelAspect = {part((*aspect)[0]), static_cast<A_u_long>(part((*aspect)[1]))};
-  }
+  if (const Json* aspect = FindPair(*ae, "pixelAspect"))
+    composition.pixelAspect = ReadRatio(*aspect);
+}
+
+// What `ae.frameDuration` says, else what follows from the rate.
+A_Time CompositionReader::ReadFrameDuration(const Json& json) const
+{
+  const Json* ae = document_.Find(json, "ae");
+  const Json* duration = ae ? FindPair(*ae, "frameDuration") : nullptr;
+  if (!duration)
+    return FrameDuration(frameRate_);
+  const A_Ratio ratio = ReadRatio(*duration);
+  return {ratio.num, ratio.den};
 }
 
 void CompositionReader::ReadRoot()
@@ -119,11 +157,12 @@ void CompositionReader::ReadRoot()
   const A_long width = ReadSize(document_, document_.Require(json, "w"));
   const A_long height = ReadSize(document_, document_.Require(json, "h"));
   const Json& rate = document_.Require(json, "fr");
-  project_.frameRate = document_.Number(rate);
-  if (!(project_.frameRate > 0 && project_.frameRate <= 999))
+  frameRate_ = document_.Number(rate);
+  if (!(frameRate_ > 0 && frameRate_ <= 999))
     document_.Refuse(rate, "expected a rate above 0 and not above 999");
-  project_.frameDuration = FrameDuration(project_.frameRate);
+  project_.frameDuration = ReadFrameDuration(json);
   rootFrames_ = ReadFrames(document_.Require(json, "ip"), document_.Require(json, "op"), false);
+  frames_ = document_.Number(document_.Require(json, "op")) - document_.Number(document_.Require(json, "ip"));
   Composition& root = AddComposition(json, document_.Require(json, "layers"));
   root.item->name = document_.TextOr(json, "nm", PathToUtf8(PathFromUtf8(document_.Name()).stem()));
   root.item->width = width;
@@ -178,85 +217,44 @@ void CompositionReader::ReadAsset(const Json& json)
   }
   item->id = document_.TextOr(json, "id", "");
   if (item->kind == ItemKind::kFootage)
-    ReadFootage(json, *item);
+    ReadFootage(document_, json, folder_, *item);
   else
     item->name = document_.TextOr(json, "nm", item->id);
   if (!item->id.empty())
     assets_.try_emplace(item->id, item);
 }
 
-void CompositionReader::ReadFootage(const Json& json, Item& item)
-{
-  const std::string& file = document_.Text(document_.Require(json, "p"));
-  const bool isEmbedded = document_.FlagOr(json, "e", false) && file.starts_with("data:");
-  if (isEmbedded) {
-    item.path = item.id;
-  } else {
-    const std::filesystem::path path = folder_ / PathFromUtf8(document_.TextOr(json, "u", "") + file);
-    item.path = PathToUtf8(path.lexically_normal().make_preferred());
-  }
-  // npos + 1 is 0
-  item.name = document_.TextOr(json, "nm", isEmbedded ? item.id : file.substr(file.find_last_of("/\\") + 1));
-  // Sounds have no size.
-  if (const Json* width = document_.Find(json, "w"))
-    item.width = ReadSize(document_, *width, 0);
-  if (const Json* height = document_.Find(json, "h"))
-    item.height = ReadSize(document_, *height, 0);
-  const Json* ae = document_.Find(json, "ae");
-  const Json* files = ae ? document_.Find(*ae, "files") : nullptr;
-  if (files) {
-    const std::int64_t count = document_.WholeNumber(*files);
-    if (count < 1 || count > 0x7FFFFFFF)
-      document_.Refuse(*files, "expected a whole number above 0");
-    item.files = static_cast<A_long>(count);
-  }
-}
-
-// "#rgb" or "#rrggbb"
-std::optional<AEGP_ColorVal> ParseColor(const std::string& text)
-{
-  if ((text.size() != 4 && text.size() != 7) || text[0] != '#' ||
-      text.find_first_not_of("0123456789abcdefABCDEF", 1) != std::string::npos)
-    return std::nullopt;
-  const std::size_t digits = text.size() / 3;
-  const auto part = [&](std::size_t i) {
-    const int number = std::stoi(text.substr(1 + i * digits, digits), nullptr, 16);
-    return number / (digits == 1 ? 15.0 : 255.0);
-  };
-  return AEGP_ColorVal{.alphaF = 1, .redF = part(0), .greenF = part(1), .blueF = part(2)};
-}
-
-Item* CompositionReader::MakeSolid(const Json& json)
-{
-  Item& item = AddItem(ItemKind::kSolid);
-  item.name = document_.TextOr(json, "nm", "Solid");
-  const Json* width = document_.Find(json, "sw");
-  const Json* height = document_.Find(json, "sh");
-  item.width = width ? ReadSize(document_, *width) : kDefaultSolidSize;
-  item.height = height ? ReadSize(document_, *height) : kDefaultSolidSize;
-  if (const Json* text = document_.Find(json, "sc")) {
-    const std::optional<AEGP_ColorVal> color = ParseColor(document_.Text(*text));
-    if (!color)
-      document_.Refuse(*text, "expected a colour, \"#rgb\" or \"#rrggbb\"");
-    item.color = *color;
-  }
-  return &item;
-}
-
-Item* CompositionReader::MakeNull(const Json& json)
-{
-  Item& item = AddItem(ItemKind::kSolid);
-  item.name = document_.TextOr(json, "nm", "Null");
-  item.width = item.height = kNullSize;
-  return &item;
-}
-
 // --- Layers
+
+RefuseLayer CompositionReader::Refusal() const
+{
+  return [this](const Composition& composition, std::size_t layer, const char* member, const std::string& reason) {
+    const auto list =
+        std::find_if(lists_.begin(), lists_.end(), [&](const auto& l) { return l.composition == &composition; });
+    if (layer == kNoLayer)
+      document_.Refuse(*list->json, reason);
+    document_.RefuseMember(*list->layers[layer], std::string_view(member) == "source" ? "refId" : member, reason);
+  };
+}
 
 void CompositionReader::Warn(const Layer& layer, const std::string& text)
 {
-  const std::string label = layer.name.empty() ? "layer " + std::to_string(layer.id) : "layer " + Quoted(layer.name);
-  project_.warnings.push_back(document_.Name() + ": " + label + ": " + text);
+  project_.warnings.push_back(document_.Name() + ": " + LayerLabel(layer) + ": " + text);
+}
+
+// `ae.id`, else the layer's place among all layers of the file.
+AEGP_LayerIDVal CompositionReader::ReadId(const Json& json)
+{
+  const Json* ae = document_.Find(json, "ae");
+  const Json* stated = ae ? document_.Find(*ae, "id") : nullptr;
+  if (!stated)
+    return static_cast<AEGP_LayerIDVal>(project_.layers.size());
+  const std::int64_t id = document_.WholeNumber(*stated);
+  if (id < 1 || id > 0x7FFFFFFF)
+    document_.Refuse(*stated, "expected a whole number above 0");
+  if (!ids_.insert(id).second)
+    document_.Refuse(*stated, "another layer has the same id");
+  return static_cast<AEGP_LayerIDVal>(id);
 }
 
 Item* CompositionReader::FindAsset(const Json& json, const Layer& layer)
@@ -284,9 +282,11 @@ Item* CompositionReader::ReadSource(const Json& json, const Layer& layer)
   case LayerSource::kAsset:
     return FindAsset(json, layer);
   case LayerSource::kSolid:
-    return MakeSolid(json);
-  case LayerSource::kNull:
-    return MakeNull(json);
+  case LayerSource::kNull: {
+    Item& item = AddItem(ItemKind::kSolid);
+    ReadSolid(document_, json, SourceOf(document_, json) == LayerSource::kNull, item);
+    return &item;
+  }
   case LayerSource::kNone:
     break;
   }
@@ -295,16 +295,12 @@ Item* CompositionReader::ReadSource(const Json& json, const Layer& layer)
 
 void CompositionReader::ReadLayers(LayerList& list)
 {
-  std::vector<const char*> lostExpressions;
   for (const Json* json : list.layers) {
     Layer& layer = project_.layers.emplace_back();
-    layer.id = static_cast<AEGP_LayerIDVal>(project_.layers.size());
+    layer.id = ReadId(*json);
     list.composition->layers.push_back(&layer);
-    lostExpressions.clear();
-    ReadLayer(document_, *json, layer, lostExpressions);
+    ReadLayer(document_, *json, layer);
     layer.source = ReadSource(*json, layer);
-    for (const char* property : lostExpressions)
-      Warn(layer, std::string("the expression of ") + property + " is not evaluated");
   }
   LinkParents(list);
 }
@@ -328,7 +324,7 @@ void CompositionReader::LinkParents(LayerList& list)
     else
       layer.parent = found->second;
   }
-  CheckParents(document_, list);
+  CheckParents(*list.composition, Refusal());
 }
 
 void CompositionReader::SettleSizes()
@@ -354,30 +350,22 @@ Project CompositionReader::Read()
   for (LayerList& list : lists_)
     ReadLayers(list);
   SettleSizes();
-  CheckNesting(document_, lists_);
+  CheckNesting(project_, Refusal());
   return std::move(project_);
 }
 
 } // namespace
 
-Project LoadCompositionText(std::string_view text, const std::string& name, const std::filesystem::path& folder)
+Project ReadComposition(const JsonDocument& document, const std::filesystem::path& folder)
 {
-  const JsonDocument document(name, text);
   return CompositionReader(document, folder).Read();
 }
 
-Project LoadComposition(const std::filesystem::path& file)
+Project LoadCompositionText(std::string_view text, const std::string& name, const std::filesystem::path& folder)
 {
-  const std::string name = PathToUtf8(file.filename());
-  errno = 0;
-  std::ifstream stream(file, std::ios::binary);
-  std::string text;
-  std::vector<char> piece(65536);
-  while (stream.read(piece.data(), static_cast<std::streamsize>(piece.size())) || stream.gcount() > 0)
-    text.append(piece.data(), static_cast<std::size_t>(stream.gcount()));
-  if (!stream.is_open() || stream.bad()) // a folder opens, but is bad to read
-    throw CompositionError(OneLine(name) + ": " + (errno ? std::generic_category().message(errno) : "cannot be read"));
-  return LoadCompositionText(text, name, std::filesystem::absolute(file).parent_path());
+  Project project = ReadComposition(JsonDocument(name, text), folder);
+  WarnOfLostExpressions(project, OneLine(name));
+  return project;
 }
 
 Composition* FindComposition(Project& project, std::string_view nameOrId)

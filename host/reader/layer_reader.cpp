@@ -1,5 +1,7 @@
 #include "host/reader/layer_reader.h"
 
+#include "host/model/layer_streams.h"
+#include "host/reader/composition_keys.h"
 #include "host/reader/property_reader.h"
 
 #include <algorithm>
@@ -55,12 +57,6 @@ const LayerKind& KindOf(const JsonDocument& document, const Json& json)
   return found == std::end(kKinds) ? kOtherKind : *found;
 }
 
-struct Word
-{
-  const char* text;
-  A_long value;
-};
-
 // The value of a member that holds one of a few words.
 template <std::size_t N>
 A_long ReadWord(const JsonDocument& document, const Json& json, const char* key, const Word (&words)[N],
@@ -78,77 +74,11 @@ A_long ReadWord(const JsonDocument& document, const Json& json, const char* key,
   document.Refuse(*value, expected);
 }
 
-constexpr Word kCameraTypes[] = {{"perspective", AEGP_CameraType_PERSPECTIVE},
-                                 {"orthographic", AEGP_CameraType_ORTHOGRAPHIC}};
-constexpr Word kFilmSizeUnits[] = {{"horizontal", AEGP_FilmSizeUnits_HORIZONTAL},
-                                   {"vertical", AEGP_FilmSizeUnits_VERTICAL},
-                                   {"diagonal", AEGP_FilmSizeUnits_DIAGONAL}};
-constexpr Word kLightTypes[] = {{"parallel", AEGP_LightType_PARALLEL},
-                                {"spot", AEGP_LightType_SPOT},
-                                {"point", AEGP_LightType_POINT},
-                                {"ambient", AEGP_LightType_AMBIENT}};
-
-// --- Which streams a layer has
-
-bool IsLight(const Layer& layer) { return layer.type == AEGP_ObjectType_LIGHT; }
-bool IsCamera(const Layer& layer) { return layer.type == AEGP_ObjectType_CAMERA; }
-bool IsSpot(const Layer& layer) { return IsLight(layer) && layer.lightType == AEGP_LightType_SPOT; }
-bool IsAudioVideo(const Layer& layer) { return layer.type == AEGP_ObjectType_AV; }
-bool IsAmbient(const Layer& layer) { return IsLight(layer) && layer.lightType == AEGP_LightType_AMBIENT; }
-bool HasPlace(const Layer& layer) { return !IsAmbient(layer); }
-bool TurnsInSpace(const Layer& layer) { return HasPlace(layer) && layer.is3D; }
-bool CastsShadows(const Layer& layer) { return IsLight(layer) && !IsAmbient(layer); }
-
-// A camera, or a light that shines one way.
-bool CanLookAt(const Layer& layer)
-{
-  return IsCamera(layer) || IsSpot(layer) || (IsLight(layer) && layer.lightType == AEGP_LightType_PARALLEL);
-}
-
-enum class Holder // the object in which a property stands
-{
-  kTransform, // "ks"
-  kLayer,
-  kCamera,
-  kLight,
-};
-
-struct StreamRule
-{
-  AEGP_LayerStream id;
-  Holder holder;
-  const char* key;
-  const char* otherKey; // taken when there is no `key`
-  bool (*isLegal)(const Layer&);
-};
-
-// The anchor point has a rule of its own beside these.
-constexpr StreamRule kStreamRules[] = {
-    {AEGP_LayerStream_POSITION, Holder::kTransform, "p", nullptr, HasPlace},
-    {AEGP_LayerStream_SCALE, Holder::kTransform, "s", nullptr, IsAudioVideo},
-    {AEGP_LayerStream_ROTATE_Z, Holder::kTransform, "rz", "r", HasPlace},
-    {AEGP_LayerStream_ROTATE_X, Holder::kTransform, "rx", nullptr, TurnsInSpace},
-    {AEGP_LayerStream_ROTATE_Y, Holder::kTransform, "ry", nullptr, TurnsInSpace},
-    {AEGP_LayerStream_ORIENTATION, Holder::kTransform, "or", nullptr, TurnsInSpace},
-    {AEGP_LayerStream_ZOOM, Holder::kLayer, "pe", nullptr, IsCamera},
-    {AEGP_LayerStream_FOCUS_DISTANCE, Holder::kCamera, "focusDistance", nullptr, IsCamera},
-    {AEGP_LayerStream_INTENSITY, Holder::kLight, "intensity", nullptr, IsLight},
-    {AEGP_LayerStream_COLOR, Holder::kLight, "color", nullptr, IsLight},
-    {AEGP_LayerStream_CONE_ANGLE, Holder::kLight, "coneAngle", nullptr, IsSpot},
-    {AEGP_LayerStream_CONE_FEATHER, Holder::kLight, "coneFeather", nullptr, IsSpot},
-    {AEGP_LayerStream_SHADOW_DARKNESS, Holder::kLight, "shadowDarkness", nullptr, CastsShadows},
-    {AEGP_LayerStream_CASTS_SHADOWS, Holder::kLight, "castsShadows", nullptr, CastsShadows},
-};
-
 class LayerReader
 {
  public:
-  LayerReader(const JsonDocument& document, const Json& json, Layer& layer, std::vector<const char*>& lostExpressions)
-      : document_(document),
-        layer_(layer),
-        lostExpressions_(lostExpressions),
-        transform_(document.Find(json, "ks")),
-        json_(json)
+  LayerReader(const JsonDocument& document, const Json& json, Layer& layer)
+      : document_(document), layer_(layer), transform_(document.Find(json, "ks")), json_(json)
   {}
 
   void Read();
@@ -159,11 +89,10 @@ class LayerReader
   void ReadLight();
   void ReadStreams();
   void ReadStream(AEGP_LayerStream id, const Json* json);
-  const Json* HolderOf(const StreamRule& rule) const;
+  const Json* HolderOf(Holder holder) const;
 
   const JsonDocument& document_;
   Layer& layer_;
-  std::vector<const char*>& lostExpressions_;
   const Json* transform_; // may be null
   const Json& json_;
 };
@@ -221,9 +150,9 @@ void LayerReader::ReadLight()
         static_cast<AEGP_LightType>(ReadWord(document_, *light, "type", kLightTypes, AEGP_LightType_POINT));
 }
 
-const Json* LayerReader::HolderOf(const StreamRule& rule) const
+const Json* LayerReader::HolderOf(Holder holder) const
 {
-  switch (rule.holder) {
+  switch (holder) {
   case Holder::kTransform:
     return transform_;
   case Holder::kCamera:
@@ -238,17 +167,15 @@ const Json* LayerReader::HolderOf(const StreamRule& rule) const
 
 void LayerReader::ReadStreams()
 {
-  const Json* anchor = transform_ ? document_.Find(*transform_, "a") : nullptr;
-  if (IsAudioVideo(layer_) || (CanLookAt(layer_) && anchor))
-    ReadStream(AEGP_LayerStream_ANCHORPOINT, anchor);
-  for (const StreamRule& rule : kStreamRules) {
-    if (!rule.isLegal(layer_))
+  for (const StreamKey& rule : kStreamKeys) {
+    if (!HasStream(layer_, rule.id))
       continue;
-    const Json* holder = HolderOf(rule);
+    const Json* holder = HolderOf(rule.holder);
     const Json* json = holder ? document_.Find(*holder, rule.key) : nullptr;
     if (!json && holder && rule.otherKey)
       json = document_.Find(*holder, rule.otherKey);
-    ReadStream(rule.id, json);
+    if (rule.id != AEGP_LayerStream_ANCHORPOINT || IsAudioVideo(layer_) || json)
+      ReadStream(rule.id, json);
   }
 }
 
@@ -262,17 +189,15 @@ void LayerReader::ReadStream(AEGP_LayerStream id, const Json* json)
   }
   auto& property = layer_.streams[StreamIndex(info)];
   property = ReadProperty(document_, info, json, defaults);
-  if (property->IsExpressionLost())
-    lostExpressions_.push_back(info.name);
 }
 
 } // namespace
 
 LayerSource SourceOf(const JsonDocument& document, const Json& json) { return KindOf(document, json).source; }
 
-void ReadLayer(const JsonDocument& document, const Json& json, Layer& layer, std::vector<const char*>& lostExpressions)
+void ReadLayer(const JsonDocument& document, const Json& json, Layer& layer)
 {
-  LayerReader(document, json, layer, lostExpressions).Read();
+  LayerReader(document, json, layer).Read();
 }
 
 A_long ReadSize(const JsonDocument& document, const Json& json, A_long smallest)

@@ -19,9 +19,8 @@ enum class LayerSource
 // What the layer's `ty` says about its source.
 LayerSource SourceOf(const JsonDocument& document, const Json& json);
 
-// Fills all that the layer's own object states: everything but id, source and parent. The names of properties whose
-// expressions are lost go to `lostExpressions`. Throws CompositionError.
-void ReadLayer(const JsonDocument& document, const Json& json, Layer& layer, std::vector<const char*>& lostExpressions);
+// Fills all that the layer's own object states: everything but id, source and parent. Throws CompositionError.
+void ReadLayer(const JsonDocument& document, const Json& json, Layer& layer);
 
 // A size in pixels from 1 (or `smallest`) to 30000, rounded; a number outside refuses the file.
 A_long ReadSize(const JsonDocument& document, const Json& json, A_long smallest = 1);

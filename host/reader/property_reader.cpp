@@ -99,7 +99,7 @@ Keyframe PropertyReader::ReadKeyframe(const Json& json, const Keyframe* previous
   key.time = document_.Number(time);
   if (previous && key.time < previous->time)
     document_.Refuse(time, "before the keyframe ahead of it");
-  key.isHold = document_.FlagOr(json, "h", false);
+  key.hold = document_.FlagOr(json, "h", false) ? Hold::kValue : Hold::kNone;
   key.easing = EasingOf(json);
   return key;
 }
@@ -173,11 +173,16 @@ void FillKeyed(const JsonDocument& document, const Json& json, const PropertyRea
   else
     property.SetConstant(reader.Components(values, defaults));
   const Json* expression = document.Find(json, "x");
-  if (expression && !document.Text(*expression).empty())
-    property.SetHasExpression();
+  if (expression)
+    property.SetExpression(document.Text(*expression));
 }
 
 } // namespace
+
+std::vector<Value> ReadSamples(const JsonDocument& document, const StreamInfo& info, const Json& list)
+{
+  return PropertyReader(document, info, info.defaults).Samples(list);
+}
 
 std::unique_ptr<Property> ReadProperty(const JsonDocument& document, const StreamInfo& info, const Json* json,
                                        const Value& defaults)

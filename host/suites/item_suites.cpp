@@ -1,8 +1,6 @@
 // The suites that deal with the items of the project: compositions and footage.
 #include "host/suites/host_state.h"
 
-#include "host/model/timing.h"
-
 namespace host
 {
 
@@ -85,36 +83,33 @@ A_Err GetCompFromItem(AEGP_ItemH item, AEGP_CompH* comp)
 A_Err GetCompFramerate(AEGP_CompH comp, A_FpLong* framesPerSecond)
 {
   return Query("AEGP_GetCompFramerate", comp, kNoComposition, framesPerSecond,
-               [&](HostState& state, const Composition&) {
-                 *framesPerSecond = state.project.frameRate;
+               [&](HostState&, const Composition& found) {
+                 *framesPerSecond = found.frameRate;
                  return kDone;
                });
 }
 
-// The reader has made sure that the times of work areas fit.
 A_Err GetCompWorkAreaStart(AEGP_CompH comp, A_Time* start)
 {
-  return Query("AEGP_GetCompWorkAreaStart", comp, kNoComposition, start,
-               [&](HostState& state, const Composition& found) {
-                 *start = FramesToTime(found.workAreaStart, state.project.frameDuration).value();
-                 return kDone;
-               });
+  return Query("AEGP_GetCompWorkAreaStart", comp, kNoComposition, start, [&](HostState&, const Composition& found) {
+    *start = found.workAreaStart;
+    return kDone;
+  });
 }
 
 A_Err GetCompWorkAreaDuration(AEGP_CompH comp, A_Time* duration)
 {
   return Query("AEGP_GetCompWorkAreaDuration", comp, kNoComposition, duration,
-               [&](HostState& state, const Composition& found) {
-                 const std::int64_t frames = std::int64_t{found.workAreaEnd} - found.workAreaStart;
-                 *duration = FramesToTime(frames, state.project.frameDuration).value();
+               [&](HostState&, const Composition& found) {
+                 *duration = found.workAreaDuration;
                  return kDone;
                });
 }
 
 A_Err GetCompFrameDuration(AEGP_CompH comp, A_Time* duration)
 {
-  return Query("AEGP_GetCompFrameDuration", comp, kNoComposition, duration, [&](HostState& state, const Composition&) {
-    *duration = state.project.frameDuration;
+  return Query("AEGP_GetCompFrameDuration", comp, kNoComposition, duration, [&](HostState&, const Composition& found) {
+    *duration = found.frameDuration;
     return kDone;
   });
 }

@@ -11,6 +11,7 @@
 #include "host/standalone_host.h"
 #include "output/output_file.h"
 #include "progress_bar.h"
+#include "project_input.h"
 #include "verbs.h"
 
 namespace q7r
@@ -19,21 +20,21 @@ namespace q7r
 namespace
 {
 
-constexpr const char* kHelp = R"(Exports a composition (Lottie JSON) into a scene file.
+constexpr const char* kHelp = R"(Exports a composition of an After Effects project into a scene file.
 
-Use it to turn what After Effects users publish as Lottie into a scene of cameras,
-lights and image planes. docs/composition.md tells which keys are read.
+Use it to turn a project (.aep, .aepx), or what its user published as Lottie JSON, into
+a scene of cameras, lights and image planes. docs/projects.md and docs/composition.md
+tell what is read.
 
-Example: q7r export shot.json shot.q7r --composition "Main")";
+Example: q7r export shot.aep shot.q7r --composition "Main")";
 
 constexpr const char* kMenuEntry = "KORVEX Exporter...";
 constexpr const char* kSuffix = "q7r";
 
 struct Options
 {
-  std::string composition;
+  ProjectOptions project;
   std::string output;
-  std::string name; // of the composition to export; empty for the root
   bool force = false;
 };
 
@@ -88,12 +89,7 @@ int Export(const Options& options)
 {
   const std::string output = WithSuffix(options.output);
   RequireWritable(output, options.force);
-  host::Project project = host::LoadComposition(options.composition);
-  for (const std::string& warning : project.warnings)
-    std::fprintf(stderr, "warning: %s\n", warning.c_str());
-  host::StandaloneHost player(std::move(project));
-  if (!options.name.empty() && !player.ActivateComposition(options.name))
-    throw Failure(options.composition + ": there is no composition \"" + options.name + "\"");
+  host::StandaloneHost player(ReadProject(options.project));
   bool quiet = true;
   WriteOutput(output, [&](const std::string& partial) {
     quiet = PlayExport(player, output, partial);
@@ -109,9 +105,10 @@ void AddExport(CLI::App& program, int& status)
 {
   auto options = std::make_shared<Options>();
   CLI::App* verb = program.add_subcommand("export", kHelp);
-  verb->add_option("COMPOSITION", options->composition, "the composition file")->required();
+  verb->add_option("PROJECT", options->project.file, "an After Effects project (.aep, .aepx) or a composition file")
+      ->required();
   verb->add_option("OUTPUT", options->output, "the scene file to write; its suffix becomes .q7r")->required();
-  verb->add_option("--composition", options->name, "export the nested composition of this name or id");
+  AddProjectOptions(*verb, options->project);
   verb->add_flag("--force", options->force, "replace an existing file without asking");
   verb->callback([options, &status] { status = Export(*options); });
 }

@@ -30,5 +30,7 @@ void AddResave(CLI::App& program, int& status);
 void AddMerge(CLI::App& program, int& status);
 void AddPreview(CLI::App& program, int& status);
 void AddIES(CLI::App& program, int& status);
+void AddCompositions(CLI::App& program, int& status);
+void AddExtract(CLI::App& program, int& status);
 
 } // namespace q7r

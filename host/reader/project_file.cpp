@@ -1,0 +1,118 @@
+#include "host/reader/project_file.h"
+
+#include "host/file_bytes.h"
+#include "host/model/layer_streams.h"
+#include "host/model/timing.h"
+#include "host/reader/composition_reader.h"
+#include "host/reader/moved_footage.h"
+#include "host/reader/projects/project_reader.h"
+#include "host/reader/samples_file.h"
+#include "host/reader/unfolded_layers.h"
+#include "host/reader/warnings.h"
+#include "host/text.h"
+
+#include <algorithm>
+#include <unordered_map>
+
+namespace host
+{
+
+namespace
+{
+
+// A composition file: all of it is read at once.
+class CompositionFile : public ProjectFile
+{
+ public:
+  CompositionFile(const std::string& name, const FileBytes& bytes, const std::filesystem::path& folder)
+      : project_(ReadComposition(JsonDocument(name, bytes.View()), folder))
+  {}
+
+  std::vector<CompositionSummary> Compositions() override;
+  Project Read(std::size_t composition) override
+  {
+    project_.root = &project_.compositions.at(composition);
+    return std::move(project_);
+  }
+
+ private:
+  UnfoldedLayers LayersOf(const Composition& composition) const;
+
+  Project project_;
+  std::unordered_map<const Composition*, std::size_t> places_;
+};
+
+UnfoldedLayers CompositionFile::LayersOf(const Composition& composition) const
+{
+  UnfoldedLayers layers;
+  for (const Layer* layer : composition.layers) {
+    if (!IsExported(*layer))
+      continue;
+    ++layers.own;
+    if (layer->source && layer->source->composition)
+      layers.nested.push_back(places_.at(layer->source->composition));
+  }
+  return layers;
+}
+
+std::vector<CompositionSummary> CompositionFile::Compositions()
+{
+  std::vector<CompositionSummary> summaries;
+  std::vector<UnfoldedLayers> layers;
+  for (const Composition& composition : project_.compositions)
+    places_[&composition] = places_.size();
+  for (const Composition& composition : project_.compositions) {
+    const Item& item = *composition.item;
+    layers.push_back(LayersOf(composition));
+    CompositionSummary& summary = summaries.emplace_back();
+    summary = {.name = item.name, .id = item.id, .width = item.width, .height = item.height};
+    summary.frameRate = composition.frameRate;
+    summary.frames = composition.frames;
+    summary.seconds = composition.frames * composition.frameDuration.value / composition.frameDuration.scale;
+    summary.layers = composition.layers.size();
+    summary.isActive = &composition == project_.root;
+  }
+  const std::vector<std::uint64_t> counts = CountUnfolded(layers);
+  for (std::size_t i = 0; i < summaries.size(); ++i)
+    summaries[i].exported = counts[i];
+  return summaries;
+}
+
+bool HasSuffix(const std::filesystem::path& file, std::string_view suffix)
+{
+  std::string own = PathToUtf8(file.extension());
+  std::transform(own.begin(), own.end(), own.begin(),
+                 [](char c) { return c >= 'A' && c <= 'Z' ? static_cast<char>(c + 32) : c; });
+  return own == suffix;
+}
+
+} // namespace
+
+std::unique_ptr<ProjectFile> OpenProjectFile(const std::filesystem::path& file)
+{
+  const std::string name = PathToUtf8(file.filename());
+  FileBytes bytes(file);
+  const bool isXml = projects::IsXmlProject(bytes.View()) || HasSuffix(file, ".aepx");
+  if (isXml || projects::IsBinaryProject(bytes.View()) || HasSuffix(file, ".aep"))
+    return projects::OpenProject(name, std::move(bytes), isXml);
+  return std::make_unique<CompositionFile>(name, bytes, std::filesystem::absolute(file).parent_path());
+}
+
+Project LoadComposition(const std::filesystem::path& file)
+{
+  const FileBytes bytes(file);
+  return LoadCompositionText(bytes.View(), PathToUtf8(file.filename()), std::filesystem::absolute(file).parent_path());
+}
+
+Project ReadProject(ProjectFile& file, std::size_t composition, const std::string& name, const ReadOptions& options)
+{
+  Project project = file.Read(composition);
+  if (!options.samples.empty())
+    AddSamples(project, options.samples);
+  if (!options.images.empty())
+    FindMovedFootage(project, options.images, name);
+  WarnOfLostExpressions(project, name);
+  return project;
+}
+
+} // namespace host
