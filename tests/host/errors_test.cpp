@@ -244,10 +244,10 @@ TEST(CompositionWarnings, NameTheLayerAndGoOn)
   const std::vector<std::string> expected = {
       "orbit.json: layer \"Sky\": refId \"image_9\" names no asset",
       "orbit.json: layer 2: no refId names an asset",
+      "orbit.json: layer 3: parent 8 names no layer",
       "orbit.json: layer \"Wall \"1\"\": the expression of position is not evaluated",
       "orbit.json: layer \"Wall \"1\"\": the expression of rotation X is not evaluated",
       "orbit.json: layer \"Flat\": the expression of position is not evaluated",
-      "orbit.json: layer 3: parent 8 names no layer",
   };
   EXPECT_EQ(expected, project.warnings);
   EXPECT_EQ(nullptr, project.layers[0].source);

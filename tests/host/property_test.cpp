@@ -9,6 +9,7 @@ namespace
 {
 
 using host::Value;
+using stage::ExpectNear;
 using stage::Stage;
 
 // A solid with this position, which the host is asked for.
@@ -21,12 +22,6 @@ Value PositionAt(const Stage& stage, double frame)
 {
   // At 25 frames a second; a scale of 25000 gives thousandths of a frame.
   return stage.ValueAt(0, AEGP_LayerStream_POSITION, {static_cast<A_long>(std::lround(frame * 1000)), 25000});
-}
-
-void ExpectNear(const Value& expected, const Value& actual, double tolerance)
-{
-  for (std::size_t c = 0; c < 3; ++c)
-    EXPECT_NEAR(expected[c], actual[c], tolerance) << "component " << c;
 }
 
 TEST(PropertyValue, FollowsTheKindOfTheInterval)

@@ -33,6 +33,12 @@ const Suite* Acquire(host::StandaloneHost& host, const char* name, std::int32_t 
   return static_cast<const Suite*>(table);
 }
 
+inline void ExpectNear(const host::Value& expected, const host::Value& actual, double tolerance = 1e-9)
+{
+  for (std::size_t c = 0; c < 3; ++c)
+    EXPECT_NEAR(expected[c], actual[c], tolerance) << "component " << c;
+}
+
 struct Stage
 {
   explicit Stage(const std::string& layerList, const std::string& more = "") : host(Load(layerList, more)) {}
