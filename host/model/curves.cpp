@@ -12,6 +12,7 @@ namespace
 constexpr int kMaxSolverSteps = 200;
 constexpr int kMaxSubdivisions = 40; // halvings of a path around a cusp
 constexpr double kLengthTolerance = 1e-10;
+constexpr double kNothing = 1e-100; // squares of lengths below vanish, and no halving makes them exact
 
 // Gauss-Legendre nodes and weights of order 8, one half; the other is its mirror.
 constexpr double kGaussNodes[4] = {0.18343464249564980, 0.52553240991632899, 0.79666647741362674, 0.96028985649753623};
@@ -136,7 +137,7 @@ double BezierPath::Length() const
     marks_.push_back({0, 0});
     for (std::size_t curve = 0; curve < hodograph_.size() / 3; ++curve) {
       const double from = static_cast<double>(curve), to = from + 1;
-      Measure(from, to, Integrate(from, to), kLengthTolerance * polygon, kMaxSubdivisions);
+      Measure(from, to, Integrate(from, to), std::max(kLengthTolerance * polygon, kNothing), kMaxSubdivisions);
     }
   }
   return marks_.back().length;

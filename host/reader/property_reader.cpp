@@ -179,11 +179,6 @@ void FillKeyed(const JsonDocument& document, const Json& json, const PropertyRea
 
 } // namespace
 
-std::vector<Value> ReadSamples(const JsonDocument& document, const StreamInfo& info, const Json& list)
-{
-  return PropertyReader(document, info, info.defaults).Samples(list);
-}
-
 std::unique_ptr<Property> ReadProperty(const JsonDocument& document, const StreamInfo& info, const Json* json,
                                        const Value& defaults)
 {

@@ -14,7 +14,4 @@ namespace host
 std::unique_ptr<Property> ReadProperty(const JsonDocument& document, const StreamInfo& info, const Json* json,
                                        const Value& defaults);
 
-// One value or more of a property of this kind. Throws CompositionError.
-std::vector<Value> ReadSamples(const JsonDocument& document, const StreamInfo& info, const Json& list);
-
 } // namespace host

@@ -1,11 +1,8 @@
 #include "host/reader/samples_file.h"
 
 #include "host/file_bytes.h"
-#include "host/model/layer_streams.h"
 #include "host/model/ratio.h"
-#include "host/reader/composition_keys.h"
-#include "host/reader/projects/layer_properties.h"
-#include "host/reader/property_reader.h"
+#include "host/reader/composition_reader.h"
 #include "host/reader/warnings.h"
 #include "host/text.h"
 
@@ -17,113 +14,91 @@ namespace host
 namespace
 {
 
-constexpr std::size_t kMostSamples = 10000000; // after a change of rate
+constexpr double kMostSamples = 1e7; // after a change of rate
+
+const std::string& NameOf(const Layer& layer)
+{
+  return layer.name.empty() && layer.source ? layer.source->name : layer.name;
+}
 
 class SamplesReader
 {
  public:
-  SamplesReader(const JsonDocument& document, Project& project) : document_(document), project_(project) {}
+  SamplesReader(const Project& baked, const std::string& name, Project& project)
+      : baked_(baked),
+        name_(name),
+        project_(project),
+        framesPerSample_(Ratio{baked.frameDuration.value, baked.frameDuration.scale} /
+                         Ratio{project.frameDuration.value, project.frameDuration.scale})
+  {}
 
-  void Read();
+  void Run();
 
  private:
-  void ReadEntry(const Json& entry);
-  Layer* FindLayer(const Composition& composition, const Json& wanted) const;
-  const StreamKey& FindKey(const Json& wanted) const;
-  Ratio ReadFrameDuration(const Json& entry, const Composition& composition) const;
-  std::vector<Value> ReadValues(const Json& entry, const Property& property, const Ratio& frameDuration) const;
+  void TakeLayer(const Composition& composition, std::size_t index, const Composition& target);
+  std::vector<Value> Resample(const std::vector<Value>& samples) const;
+  void Warn(const std::string& text) { project_.warnings.push_back(name_ + ": " + text); }
 
-  const JsonDocument& document_;
+  const Project& baked_;
+  const std::string& name_;
   Project& project_;
+  Ratio framesPerSample_;
 };
 
-// By its place from the top, which is 1, or by its name, which may be its source's.
-Layer* SamplesReader::FindLayer(const Composition& composition, const Json& wanted) const
+Layer* FindLayer(const Composition& composition, std::size_t index, const Layer& wanted)
 {
   const std::vector<Layer*>& layers = composition.layers;
-  if (wanted.is_number()) {
-    const std::int64_t index = document_.WholeNumber(wanted);
-    return index < 1 || index > static_cast<std::int64_t>(layers.size()) ? nullptr
-                                                                         : layers[static_cast<std::size_t>(index - 1)];
-  }
-  const std::string& name = document_.Text(wanted);
-  const auto found = std::find_if(layers.begin(), layers.end(), [&](const Layer* layer) {
-    return (layer->name.empty() && layer->source ? layer->source->name : layer->name) == name;
-  });
+  const auto isNamed = [&](const Layer* layer) { return NameOf(*layer) == NameOf(wanted); };
+  if (index < layers.size() && isNamed(layers[index]))
+    return layers[index];
+  const auto found = std::find_if(layers.begin(), layers.end(), isNamed);
   return found == layers.end() ? nullptr : *found;
 }
 
-// By the key of a composition file or by After Effects' match name.
-const StreamKey& SamplesReader::FindKey(const Json& wanted) const
+// One value for each frame of the project's root: the nearest in time.
+std::vector<Value> SamplesReader::Resample(const std::vector<Value>& samples) const
 {
-  const std::string& name = document_.Text(wanted);
-  for (const StreamKey& key : kStreamKeys)
-    if (name == key.key || name == projects::MatchName(key.id))
-      return key;
-  document_.Refuse(wanted, "expected a property such as \"p\" or \"ADBE Position\"");
-}
-
-Ratio SamplesReader::ReadFrameDuration(const Json& entry, const Composition& composition) const
-{
-  const Json* stated = document_.Find(entry, "frameDuration");
-  if (!stated)
-    return {composition.frameDuration.value, composition.frameDuration.scale};
-  if (!stated->is_array() || stated->size() != 2)
-    document_.Refuse(*stated, "expected an array of two numbers");
-  const Ratio duration{document_.WholeNumber((*stated)[0]), document_.WholeNumber((*stated)[1])};
-  if (!(Ratio(0) < duration))
-    document_.Refuse(*stated, "expected a duration above 0");
-  return duration;
-}
-
-// One value for each frame of the root: the nearest in time.
-std::vector<Value> SamplesReader::ReadValues(const Json& entry, const Property& property,
-                                             const Ratio& frameDuration) const
-{
-  const Json& list = document_.Require(entry, "values");
-  std::vector<Value> values = ReadSamples(document_, property.Info(), list);
-  const Ratio rootFrames = frameDuration / Ratio{project_.frameDuration.value, project_.frameDuration.scale};
-  if (rootFrames == Ratio(1))
-    return values;
-  const double perSample = rootFrames.ToDouble();
-  const double count = static_cast<double>(values.size() - 1) * perSample + 1;
-  if (!(count < static_cast<double>(kMostSamples)))
-    document_.Refuse(list, "lasts longer than " + std::to_string(kMostSamples) + " frames of the composition");
+  if (framesPerSample_ == Ratio(1))
+    return samples;
+  const double count = static_cast<double>(samples.size() - 1) * framesPerSample_.ToDouble() + 1;
+  if (!(count < kMostSamples))
+    throw CompositionError(name_ + ": its samples last too many frames of the composition");
   std::vector<Value> resampled;
-  for (std::size_t frame = 0; static_cast<double>(frame) < count; ++frame) {
-    const std::int64_t nearest = (Ratio(static_cast<std::int64_t>(frame)) / rootFrames).Round();
-    resampled.push_back(values[std::min(static_cast<std::size_t>(nearest), values.size() - 1)]);
+  for (std::int64_t frame = 0; static_cast<double>(frame) < count; ++frame) {
+    const auto nearest = static_cast<std::size_t>((Ratio(frame) / framesPerSample_).Round());
+    resampled.push_back(samples[std::min(nearest, samples.size() - 1)]);
   }
   return resampled;
 }
 
-void SamplesReader::ReadEntry(const Json& entry)
+void SamplesReader::TakeLayer(const Composition& composition, std::size_t index, const Composition& target)
 {
-  const Composition* composition = FindComposition(project_, document_.Text(document_.Require(entry, "composition")));
-  const StreamKey& key = FindKey(document_.Require(entry, "property"));
-  const Json& wanted = document_.Require(entry, "layer");
-  if (!composition)
-    return;
-  Layer* layer = FindLayer(*composition, wanted);
-  const std::string start = document_.Name() + ": composition " + Quoted(composition->item->name) + ": ";
-  if (!layer) {
-    project_.warnings.push_back(start + "there is no layer " +
-                                (wanted.is_string() ? Quoted(document_.Text(wanted)) : wanted.dump()));
-    return;
+  const Layer& layer = *composition.layers[index];
+  Layer* const taker = FindLayer(target, index, layer);
+  for (const auto& property : layer.streams) {
+    if (!property || property->Samples().empty())
+      continue;
+    const StreamInfo& info = property->Info();
+    Property* const own = taker ? taker->streams[StreamIndex(info)].get() : nullptr;
+    if (own)
+      own->SetSamples(Resample(property->Samples()));
+    else
+      Warn(LayerLabel(layer) + ": its samples of " + info.name + " find no such property in composition " +
+           Quoted(target.item->name));
   }
-  const StreamInfo& info = *FindStreamInfo(key.id);
-  Property* property = layer->streams[StreamIndex(info)].get();
-  if (!property) {
-    project_.warnings.push_back(start + LayerLabel(*layer) + " has no " + info.name);
-    return;
-  }
-  property->SetSamples(ReadValues(entry, *property, ReadFrameDuration(entry, *composition)));
 }
 
-void SamplesReader::Read()
+void SamplesReader::Run()
 {
-  for (const Json& entry : document_.Array(document_.Require(document_.Root(), "samples")))
-    ReadEntry(document_.Object(entry));
+  bool isUsed = false;
+  for (const Composition& composition : baked_.compositions) {
+    const Composition* target = FindComposition(project_, composition.item->name);
+    isUsed = isUsed || target;
+    for (std::size_t i = 0; target && i < composition.layers.size(); ++i)
+      TakeLayer(composition, i, *target);
+  }
+  if (!isUsed)
+    Warn("its compositions have other names than those that are read: no samples are taken");
 }
 
 } // namespace
@@ -131,8 +106,10 @@ void SamplesReader::Read()
 void AddSamples(Project& project, const std::filesystem::path& file)
 {
   const FileBytes bytes(file);
-  const JsonDocument document(PathToUtf8(file.filename()), bytes.View());
-  SamplesReader(document, project).Read();
+  const std::string name = OneLine(PathToUtf8(file.filename()));
+  SamplesReader(ReadComposition(JsonDocument(name, bytes.View()), std::filesystem::absolute(file).parent_path()), name,
+                project)
+      .Run();
 }
 
 } // namespace host

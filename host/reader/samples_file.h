@@ -1,4 +1,5 @@
-// Values of properties that were worked out elsewhere, by a script in After Effects for example.
+// Values of properties that were worked out elsewhere: by a script in After Effects, for example, which can run
+// expressions.
 #pragma once
 
 #include "host/model/composition.h"
@@ -6,9 +7,9 @@
 namespace host
 {
 
-// Gives properties of the project the samples of the file, which stand in for keyframes and expressions;
-// docs/projects.md tells the format. Entries for compositions that the project doesn't have are passed over; those for
-// layers or properties that a composition doesn't have are warned of. Throws CompositionError.
+// Gives properties of the project the `samples` that a composition file has for them, in place of keyframes and
+// expressions. Compositions are found by name; layers by their place, where the names there don't differ, else by name.
+// Warns of samples that find no property. Throws CompositionError.
 void AddSamples(Project& project, const std::filesystem::path& file);
 
 } // namespace host

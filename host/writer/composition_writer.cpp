@@ -17,6 +17,8 @@ namespace host
 namespace
 {
 
+constexpr double kLastSecond = 10000; // an export reads no values beyond
+
 template <std::size_t N>
 const char* WordOf(const Word (&words)[N], A_long value)
 {
@@ -97,7 +99,8 @@ void CompositionWriter::Collect()
   const Composition& root = *project_.root;
   const double areaEnd =
       FrameAt(root.workAreaStart, root.frameDuration) + FrameAt(root.workAreaDuration, root.frameDuration);
-  lastFrame_ = static_cast<std::size_t>(std::max({1.0, std::ceil(root.frames), std::ceil(areaEnd)}));
+  const double most = kLastSecond * std::ceil(root.frameRate);
+  lastFrame_ = static_cast<std::size_t>(std::min(most, std::max({1.0, std::ceil(root.frames), std::ceil(areaEnd)})));
 }
 
 // --- Compositions and footage

@@ -75,7 +75,8 @@ void AddProjectOptions(CLI::App& verb, ProjectOptions& options)
                   "the composition of this name or id; without it, the one that was in front when the project was "
                   "saved, or the file's only one");
   verb.add_option("--images", options.images, "look here, and in all folders below, for footage that was moved");
-  verb.add_option("--samples", options.samples, "take values of properties from this file, in place of expressions");
+  verb.add_option("--samples", options.samples,
+                  "take the samples of this composition file, in place of expressions that aren't run");
 }
 
 host::Project ReadProject(const ProjectOptions& options)

@@ -52,6 +52,8 @@ void ReadTimes(const Chunk& data, CompositionSettings& settings)
   settings.workAreaStart = SnapToFrame(data.Get(cdta::kWorkAreaStart) * settings.framesPerSecond);
   const bool isToTheEnd = data.Get(Field<u32>{cdta::kWorkAreaEnd.offset}) == cdta::kToTheEnd;
   settings.workAreaEnd = isToTheEnd ? frames : SnapToFrame(data.Get(cdta::kWorkAreaEnd) * settings.framesPerSecond);
+  if (frames < settings.workAreaEnd)
+    settings.workAreaEnd = frames;
   if (settings.workAreaEnd < settings.workAreaStart)
     data.Refuse("the work area ends before it starts");
 }

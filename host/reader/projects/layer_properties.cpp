@@ -306,11 +306,6 @@ void StreamReader::DoubtDefaultPosition() const
 
 } // namespace
 
-const char* MatchName(AEGP_LayerStream id)
-{
-  return std::find_if(std::begin(kSources), std::end(kSources), [id](const auto& s) { return s.id == id; })->matchName;
-}
-
 void ReadStreams(const PropertyGroup& properties, const LayerContext& context, Layer& layer)
 {
   StreamReader(properties, context, layer).Read();

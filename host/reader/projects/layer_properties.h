@@ -22,9 +22,6 @@ struct LayerContext
   Doubts& doubts;
 };
 
-// After Effects' own name of a property, the same in all languages.
-const char* MatchName(AEGP_LayerStream id);
-
 // Fills the streams of a layer whose kind, flags and source are known. `properties` is the layer's own group.
 void ReadStreams(const PropertyGroup& properties, const LayerContext& context, Layer& layer);
 

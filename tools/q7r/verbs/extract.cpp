@@ -1,12 +1,11 @@
 // q7r extract: one composition of a project as a composition file.
 #include <cstdio>
-#include <fstream>
 #include <memory>
 
 #include "host/text.h"
 #include "host/writer/composition_writer.h"
+#include "output/output_file.h"
 #include "project_input.h"
-#include "scene_file.h"
 #include "verbs/verbs.h"
 
 namespace q7r
@@ -32,20 +31,11 @@ struct Options
 
 int Extract(const Options& options)
 {
-  const std::filesystem::path output(options.output);
-  if (std::filesystem::is_directory(output))
-    throw Failure(options.output + ": is a folder");
-  if (std::filesystem::exists(output) && !options.force && !AskReplace(options.output))
-    throw Failure(options.output + ": exists already; --force replaces it");
+  RequireWritable(options.output, options.force);
   const host::CompositionText composition = host::WriteComposition(ReadProject(options.project));
   for (const std::string& warning : composition.warnings)
     std::fprintf(stderr, "warning: %s: %s\n", options.output.c_str(), warning.c_str());
-  std::ofstream file(output, std::ios::binary | std::ios::trunc);
-  file << composition.text;
-  file.close();
-  if (!file)
-    throw Failure(options.output + ": can't be written");
-  std::printf("%s: %s\n", options.output.c_str(), SizeText(composition.text.size()).c_str());
+  WriteOutput(options.output, composition.text);
   return kDone;
 }
 
