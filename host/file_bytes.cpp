@@ -3,7 +3,9 @@
 #include "host/model/composition.h"
 #include "host/text.h"
 
+#include <cerrno>
 #include <fstream>
+#include <system_error>
 #include <utility>
 
 #ifdef _WIN32
@@ -70,12 +72,14 @@ FileBytes::FileBytes(const std::filesystem::path& file)
   Map(file);
   if (mapped_)
     return;
+  errno = 0;
   std::ifstream stream(file, std::ios::binary);
   std::vector<char> piece(65536);
   while (stream.read(piece.data(), static_cast<std::streamsize>(piece.size())) || stream.gcount() > 0)
     owned_.insert(owned_.end(), piece.begin(), piece.begin() + stream.gcount());
   if (!stream.is_open() || stream.bad()) // a folder opens, but is bad to read
-    throw CompositionError(OneLine(PathToUtf8(file.filename())) + ": cannot be read");
+    throw CompositionError(OneLine(PathToUtf8(file.filename())) + ": " +
+                           (errno ? std::generic_category().message(errno) : "cannot be read"));
 }
 
 FileBytes::~FileBytes()
