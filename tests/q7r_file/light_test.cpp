@@ -7,7 +7,6 @@
 
 #include "q7r_file/ies_files.h"
 #include "q7r_file/node_bytes.h"
-#include "q7r_file/objects/unit_factors.h"
 #include "support/assertion_counter.h"
 #include "support/counting_memory.h"
 #include "support/scene_bytes.h"
@@ -15,6 +14,7 @@
 #include "torvane/memory/owned.h"
 #include "torvane/objects/base_object.h"
 #include "torvane/objects/light_object_data.h"
+#include "torvane/objects/unit_factors.h"
 #include "torvane/values/ge_data.h"
 
 namespace

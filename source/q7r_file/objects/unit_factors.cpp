@@ -1,4 +1,4 @@
-#include "q7r_file/objects/unit_factors.h"
+#include "torvane/objects/unit_factors.h"
 
 #include <iterator>
 

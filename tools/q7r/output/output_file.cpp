@@ -101,22 +101,6 @@ bool IsPlain(const fs::path& path)
   return std::all_of(text.begin(), text.end(), [](auto c) { return c >= 0x20 && c < 0x7F; });
 }
 
-// A temporary file whose path is plain, where there is room for one.
-std::unique_ptr<TemporaryFile> MakePlainFile()
-{
-  std::error_code problem = std::make_error_code(std::errc::no_such_file_or_directory);
-  for (const fs::path& folder : TemporaryFolders()) {
-    if (folder.empty() || !IsPlain(folder))
-      continue;
-    try {
-      return std::make_unique<TemporaryFile>(folder, true);
-    } catch (const std::system_error& error) {
-      problem = error.code();
-    }
-  }
-  throw std::system_error(problem);
-}
-
 void Copy(const fs::path& source, RawOutput& output)
 {
   const std::unique_ptr<std::FILE, int (*)(std::FILE*)> file(std::fopen(source.string().c_str(), "rb"), std::fclose);
@@ -181,6 +165,21 @@ bool AskReplace(const std::string& path)
 }
 
 } // namespace
+
+std::unique_ptr<TemporaryFile> MakePlainFile()
+{
+  std::error_code problem = std::make_error_code(std::errc::no_such_file_or_directory);
+  for (const fs::path& folder : TemporaryFolders()) {
+    if (folder.empty() || !IsPlain(folder))
+      continue;
+    try {
+      return std::make_unique<TemporaryFile>(folder, true);
+    } catch (const std::system_error& error) {
+      problem = error.code();
+    }
+  }
+  throw std::system_error(problem);
+}
 
 bool HasFileName(const std::string& path)
 {

@@ -4,6 +4,7 @@
 #pragma once
 
 #include <functional>
+#include <memory>
 #include <string>
 #include <string_view>
 
@@ -11,6 +12,8 @@
 
 namespace q7r
 {
+
+class TemporaryFile;
 
 // False for "", ".", ".." and what ends with a separator.
 bool HasFileName(const std::string& path);
@@ -32,6 +35,9 @@ void WriteOutput(const std::string& path, const FileWriter& write);
 
 // The same for bytes that are in memory.
 void WriteOutput(const std::string& path, std::string_view bytes, const std::string& words = {});
+
+// A temporary file for a scene that goes on into another file: its path is plain ASCII. Throws std::system_error.
+std::unique_ptr<TemporaryFile> MakePlainFile();
 
 // Reads a written scene back; `path` is the name that the user knows it by.
 void RequireReadable(const std::string& partial, const std::string& path);

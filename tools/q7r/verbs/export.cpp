@@ -8,8 +8,10 @@
 
 #include "exporter/entry/scene_writer.h"
 #include "exporter/host_api/aegp_entry.h"
+#include "gltf_file.h"
 #include "host/standalone_host.h"
 #include "output/output_file.h"
+#include "output/temporary_file.h"
 #include "progress_bar.h"
 #include "project_input.h"
 #include "verbs.h"
@@ -44,6 +46,8 @@ struct Options
 std::string WithSuffix(const std::string& path)
 {
   constexpr std::size_t kLongest = 4; // a dot further from the end belongs to the name
+  if (GltfFormOf(path) != GltfForm::kNone)
+    return path;
   const std::size_t dot = path.find_last_of("./");
   if (!HasFileName(path) || IsDevice(path))
     return path;
@@ -85,11 +89,27 @@ bool PlayExport(host::StandaloneHost& player, const std::string& output, const s
   return quiet;
 }
 
+// Goes through the scene, which is kept in a temporary file meanwhile.
+int ExportAsGltf(host::StandaloneHost& player, const std::string& composition, const std::string& output)
+{
+  const std::unique_ptr<TemporaryFile> scene = MakePlainFile();
+  const bool quiet = PlayExport(player, output, scene->Path().string());
+  const DocumentPtr document = LoadScene(scene->Path().string());
+  const int status = WriteGltf(*document, composition, output, {});
+  return quiet ? status : kProblems;
+}
+
 int Export(const Options& options)
 {
   const std::string output = WithSuffix(options.output);
-  RequireWritable(output, options.force);
+  const bool asGltf = GltfFormOf(output) != GltfForm::kNone;
+  if (asGltf)
+    RequireGltfOutput(output, options.project.file, options.force);
+  else
+    RequireWritable(output, options.force);
   host::StandaloneHost player(ReadProject(options.project));
+  if (asGltf)
+    return ExportAsGltf(player, options.project.file, output);
   bool quiet = true;
   WriteOutput(output, [&](const std::string& partial) {
     quiet = PlayExport(player, output, partial);
@@ -107,7 +127,9 @@ void AddExport(CLI::App& program, int& status)
   CLI::App* verb = program.add_subcommand("export", kHelp);
   verb->add_option("PROJECT", options->project.file, "an After Effects project (.aep, .aepx) or a composition file")
       ->required();
-  verb->add_option("OUTPUT", options->output, "the scene file to write; its suffix becomes .q7r")->required();
+  verb->add_option("OUTPUT", options->output,
+                   "the scene file to write; its suffix becomes .q7r (.glb and .gltf: as convert)")
+      ->required();
   AddProjectOptions(*verb, options->project);
   verb->add_flag("--force", options->force, "replace an existing file without asking");
   verb->callback([options, &status] { status = Export(*options); });

@@ -32,5 +32,6 @@ void AddPreview(CLI::App& program, int& status);
 void AddIES(CLI::App& program, int& status);
 void AddCompositions(CLI::App& program, int& status);
 void AddExtract(CLI::App& program, int& status);
+void AddConvert(CLI::App& program, int& status);
 
 } // namespace q7r

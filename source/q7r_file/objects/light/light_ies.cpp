@@ -1,7 +1,7 @@
 // A measured distribution on a light.
-#include "q7r_file/objects/unit_factors.h"
 #include "torvane/document/base_document.h"
 #include "torvane/objects/light_object_data.h"
+#include "torvane/objects/unit_factors.h"
 #include "torvane/values/ge_data.h"
 
 namespace _torvane_

@@ -1,0 +1,35 @@
+// The binary part of a file as it grows: in blocks, so that growing copies nothing.
+#pragma once
+
+#include <cstddef>
+#include <cstdint>
+#include <vector>
+
+namespace gltf
+{
+
+class ByteBuffer
+{
+ public:
+  std::size_t Size() const { return size_; }
+  void Append(const void* data, std::size_t size);
+  // Zeros up to a multiple of `unit`.
+  void Pad(std::size_t unit);
+  // Whether the bytes from `offset` on are those of `data`; false beyond the end.
+  bool Holds(std::size_t offset, const void* data, std::size_t size) const;
+  // Hands each run of bytes, in order, to `take(data, size)`.
+  template <class Take>
+  void ForEachBlock(Take&& take) const
+  {
+    for (const auto& block : blocks_)
+      take(block.data(), block.size());
+  }
+
+ private:
+  static constexpr std::size_t kBlock = std::size_t{1} << 20;
+
+  std::vector<std::vector<std::uint8_t>> blocks_; // all but the last of kBlock bytes
+  std::size_t size_ = 0;
+};
+
+} // namespace gltf

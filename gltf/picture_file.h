@@ -1,0 +1,32 @@
+// Picture files as glTF takes them: PNG and JPEG, whole ones.
+#pragma once
+
+#include <cstdint>
+#include <filesystem>
+#include <vector>
+
+namespace gltf
+{
+
+enum class PictureState
+{
+  kGood,
+  kMissing, // no file, or one that can't be read
+  kOther,   // neither PNG nor JPEG
+  kDamaged, // cut, or without a pixel
+};
+
+struct PictureFile
+{
+  PictureState state = PictureState::kMissing;
+  bool isPng = false;
+  bool hasAlpha = false;           // a PNG that may let through what is behind it
+  std::vector<std::uint8_t> bytes; // only if asked for
+};
+
+// Looks at a file, whose kind is told by its first bytes. Devices and folders count as missing.
+PictureFile ReadPictureFile(const std::filesystem::path& path, bool keepBytes);
+// The same of bytes.
+PictureFile LookAtPicture(std::vector<std::uint8_t> bytes);
+
+} // namespace gltf

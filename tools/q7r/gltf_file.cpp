@@ -1,0 +1,97 @@
+#include "gltf_file.h"
+
+#include <algorithm>
+#include <cstdio>
+#include <filesystem>
+
+#include "gltf/text.h"
+#include "output/output_file.h"
+#include "output/temporary_file.h"
+#include "verbs/verbs.h"
+
+namespace q7r
+{
+
+namespace fs = std::filesystem;
+
+namespace
+{
+
+std::string BytesPath(const std::string& output) { return fs::path(output).replace_extension(".bin").string(); }
+
+// The files that a conversion to `output` makes.
+std::vector<std::string> FilesOf(const std::string& output)
+{
+  if (GltfFormOf(output) == GltfForm::kGltf)
+    return {output, BytesPath(output)};
+  return {output};
+}
+
+// Neither of two files takes its place before both are written.
+void WriteModel(const gltf::Model& model, const std::string& output)
+{
+  auto writeMain = [&](const std::string& partial) {
+    RawOutput file{fs::path(partial)};
+    auto write = [&file](const void* data, std::size_t size) { file.Write(static_cast<const char*>(data), size); };
+    if (GltfFormOf(output) == GltfForm::kGlb)
+      gltf::WriteGlb(model, write);
+    else
+      write(model.json.data(), model.json.size());
+    file.Close();
+    return std::string();
+  };
+  if (GltfFormOf(output) == GltfForm::kGlb || model.bytes.Size() == 0)
+    return WriteOutput(output, writeMain);
+  WriteOutput(BytesPath(output), [&](const std::string& partial) {
+    RawOutput file{fs::path(partial)};
+    model.bytes.ForEachBlock(
+        [&file](const std::uint8_t* data, std::size_t size) { file.Write(reinterpret_cast<const char*>(data), size); });
+    file.Close();
+    WriteOutput(output, writeMain);
+    return std::string();
+  });
+}
+
+} // namespace
+
+GltfForm GltfFormOf(const std::string& path)
+{
+  std::string suffix = fs::path(path).extension().string();
+  std::transform(suffix.begin(), suffix.end(), suffix.begin(),
+                 [](char c) { return c >= 'A' && c <= 'Z' ? static_cast<char>(c + ('a' - 'A')) : c; });
+  return suffix == ".glb" ? GltfForm::kGlb : suffix == ".gltf" ? GltfForm::kGltf : GltfForm::kNone;
+}
+
+void RequireGltfOutput(const std::string& output, const std::string& scene, bool force)
+{
+  if (GltfFormOf(output) == GltfForm::kNone)
+    throw Failure(output + ": the name must end with .glb or .gltf");
+  for (const std::string& file : FilesOf(output)) {
+    std::error_code error;
+    if (!scene.empty() && fs::equivalent(file, scene, error))
+      throw Failure(file + ": is the scene itself");
+    RequireWritable(file, force);
+  }
+}
+
+int WriteGltf(_torvane_::BaseDocument& document, const std::string& scene, const std::string& output,
+              gltf::Options options)
+{
+  options.sceneFolder = fs::absolute(scene).parent_path();
+  options.outputFolder = fs::absolute(output).parent_path();
+  if (GltfFormOf(output) == GltfForm::kGltf) {
+    const std::u8string name = fs::path(BytesPath(output)).filename().u8string();
+    options.bufferName = gltf::PercentEncoded({name.begin(), name.end()});
+  }
+  try {
+    const gltf::Model model = gltf::Convert(document, options);
+    WriteModel(model, output);
+    for (const std::string& line : model.account.Lines())
+      std::fprintf(stderr, "%s\n", line.c_str());
+    return model.account.HasProblems() ? kProblems : kDone;
+  } catch (const gltf::TooLarge& error) {
+    throw Failure(output + ": " + error.what());
+  }
+}
+
+} // namespace q7r

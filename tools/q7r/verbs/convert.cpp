@@ -1,0 +1,65 @@
+// q7r convert: scenes as glTF.
+#include <memory>
+
+#include "gltf_file.h"
+#include "scene_file.h"
+#include "verbs.h"
+
+namespace q7r
+{
+
+namespace
+{
+
+constexpr const char* kHelp = R"(Writes what a scene shows as glTF 2.0, which viewers, engines and 3D applications open:
+nodes, cameras, lights, planes with their pictures, meshes and everything that moves.
+
+OUTPUT ends with .glb (one file) or with .gltf (JSON, with NAME.bin beside it). What
+glTF can't hold is told once a kind; docs/gltf.md tells what goes over and how.
+
+Example: q7r convert shot.q7r shot.glb --embed)";
+
+struct Options
+{
+  std::string scene;
+  std::string output;
+  bool lit = false;
+  bool unlit = false;
+  bool noPointers = false;
+  bool force = false;
+  gltf::Options conversion;
+};
+
+int Convert(Options& options)
+{
+  RequireGltfOutput(options.output, options.scene, options.force);
+  options.conversion.pointers = !options.noPointers;
+  if (options.lit || options.unlit)
+    options.conversion.shading = options.lit ? gltf::Shading::kLit : gltf::Shading::kUnlit;
+  const DocumentPtr document = LoadScene(options.scene);
+  return WriteGltf(*document, options.scene, options.output, options.conversion);
+}
+
+} // namespace
+
+void AddConvert(CLI::App& program, int& status)
+{
+  auto options = std::make_shared<Options>();
+  CLI::App* verb = program.add_subcommand("convert", kHelp);
+  verb->add_option("SCENE", options->scene, "the scene file")->required();
+  verb->add_option("OUTPUT", options->output, "the file to write, .glb or .gltf")->required();
+  verb->add_flag("--embed", options->conversion.embed, "pack the pictures into the file");
+  verb->add_flag("--hidden", options->conversion.keepHidden,
+                 "keep what isn't rendered, switched off by KHR_node_visibility, which few viewers know");
+  CLI::Option* lit = verb->add_flag("--lit", options->lit, "light the materials also in a scene without lights");
+  verb->add_flag("--unlit", options->unlit, "show the materials in full colour also in a scene with lights")
+      ->excludes(lit);
+  verb->add_option("--unit", options->conversion.unit, "metres of one scene unit, in place of what the scene says")
+      ->check(CLI::Range(1e-9, 1e9));
+  verb->add_flag("--no-pointers", options->noPointers,
+                 "leave out what moves in cameras and lights, for old readers (KHR_animation_pointer)");
+  verb->add_flag("--force", options->force, "replace existing files without asking");
+  verb->callback([options, &status] { status = Convert(*options); });
+}
+
+} // namespace q7r
