@@ -29,14 +29,15 @@ Json ChannelsJson(BaseMaterial& material)
   return states;
 }
 
-Json ShadersJson(BaseShader* first)
+Json ShadersJson(BaseShader* first, NodeIndex& index)
 {
   Json shaders = Json::array();
   for (BaseShader* shader = first; shader; shader = shader->GetNext())
     shaders.push_back({{"type", shader->GetType()},
                        {"name", ToJson(shader->GetName())},
                        {"data", ToJson(shader->GetDataInstance())},
-                       {"children", ShadersJson(shader->GetDown())}});
+                       {"links", index.LinksOf(shader->GetDataInstance())},
+                       {"children", ShadersJson(shader->GetDown(), index)}});
   return shaders;
 }
 
@@ -69,15 +70,16 @@ void AddShaderLines(std::vector<std::string>& lines, BaseShader* first, std::siz
 
 } // namespace
 
-Json MaterialsJson(BaseDocument& document)
+Json MaterialsJson(BaseDocument& document, NodeIndex& index)
 {
   Json materials = Json::array();
   for (BaseMaterial* material = document.GetFirstMaterial(); material; material = material->GetNext())
     materials.push_back({{"type", material->GetType()},
                          {"name", ToJson(material->GetName())},
                          {"data", ToJson(material->GetDataInstance())},
+                         {"links", index.LinksOf(material->GetDataInstance())},
                          {"channels", ChannelsJson(*material)},
-                         {"shaders", ShadersJson(material->GetShaders())}});
+                         {"shaders", ShadersJson(material->GetShaders(), index)}});
   return materials;
 }
 

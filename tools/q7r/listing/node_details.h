@@ -6,6 +6,7 @@
 #include <vector>
 
 #include "json_text.h"
+#include "node_index.h"
 
 namespace q7r
 {
@@ -16,8 +17,8 @@ Json ObjectParams(_torvane_::BaseObject& object);
 Json ObjectIES(_torvane_::BaseObject& object);
 // The array of a tag; null for a tag without one.
 Json TagValues(_torvane_::BaseTag& tag);
-Json MaterialsJson(_torvane_::BaseDocument& document);
-Json ViewsJson(_torvane_::BaseDocument& document);
+Json MaterialsJson(_torvane_::BaseDocument& document, NodeIndex& index);
+Json ViewsJson(_torvane_::BaseDocument& document, NodeIndex& index);
 
 // A few words about a node for the listing of people, such as "8 points"; empty where there is nothing to tell.
 std::string ObjectWords(_torvane_::BaseObject& object);

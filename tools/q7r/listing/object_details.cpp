@@ -94,7 +94,7 @@ std::string LightWords(BaseObject& light)
   return words;
 }
 
-Json DrawJson(BaseDraw& draw)
+Json DrawJson(BaseDraw& draw, NodeIndex& index)
 {
   const BaseObject& editor = *draw.GetEditorCamera();
   Json camera = ToJson(editor.GetDataInstance());
@@ -102,6 +102,7 @@ Json DrawJson(BaseDraw& draw)
   camera["scale"] = ToJson(editor.GetRelScale());
   camera["rot"] = ToJson(editor.GetRelRot());
   return {{"sceneCamera", LinkJson(draw.GetSceneCamera())},
+          {"sceneCameraIndex", index.PathOf(draw.GetSceneCamera().GetLink())},
           {"data", ToJson(draw.GetDataInstance())},
           {"camera", std::move(camera)}};
 }
@@ -141,13 +142,13 @@ std::string ObjectWords(BaseObject& object)
   return LightDataOf(object) ? LightWords(object) : GeometryWords(object);
 }
 
-Json ViewsJson(BaseDocument& document)
+Json ViewsJson(BaseDocument& document, NodeIndex& index)
 {
   Json views = Json::array();
   for (ViewPanel* panel = FirstPanel(document); panel; panel = panel->GetNext()) {
     Json draws = Json::array();
     for (BaseDraw* draw = FirstDraw(*panel); draw; draw = draw->GetNext())
-      draws.push_back(DrawJson(*draw));
+      draws.push_back(DrawJson(*draw, index));
     views.push_back({{"draws", std::move(draws)}});
   }
   return views;

@@ -4,6 +4,7 @@
 #include "node_details.h"
 #include "scene_file.h"
 #include "torvane/animation/ctrack.h"
+#include "torvane/objects/unit_factors.h"
 #include "torvane/tags/base_tag.h"
 #include "type_names.h"
 
@@ -31,6 +32,15 @@ Json KeyJson(CKey& key)
           {"nbits", std::move(bits)}};
 }
 
+Json KeysJson(const CCurve& curve)
+{
+  Json keys = Json::array();
+  for (Long i = 0; i < curve.GetKeyCount(); ++i)
+    keys.push_back(KeyJson(*curve.GetKey(i)));
+  return keys;
+}
+
+// The main curve is "keys"; those of further numbers stand in "curves" where they have keys.
 Json TrackJson(CTrack& track)
 {
   Json path = Json::array();
@@ -38,14 +48,15 @@ Json TrackJson(CTrack& track)
     const ParameterLevel& level = track.GetPath()[i];
     path.push_back({level.id, level.dtype, level.creator});
   }
-  Json keys = Json::array();
-  CCurve& curve = *track.GetCurve(1, 0);
-  for (Long i = 0; i < curve.GetKeyCount(); ++i)
-    keys.push_back(KeyJson(*curve.GetKey(i)));
-  return {{"name", ToJson(track.GetName())},
-          {"path", std::move(path)},
-          {"kind", track.GetKind()},
-          {"keys", std::move(keys)}};
+  Json json = {{"name", ToJson(track.GetName())}, {"path", std::move(path)},
+               {"kind", track.GetKind()},         {"before", track.GetBefore()},
+               {"after", track.GetAfter()},       {"keys", KeysJson(*track.GetCurve(1, 0))}};
+  for (Long number = kCurveFirst; number <= kCurveLast; ++number) {
+    const CCurve* curve = track.GetCurve(number, 0);
+    if (curve && curve->GetKeyCount() > 0)
+      json["curves"][std::to_string(number)] = KeysJson(*curve);
+  }
+  return json;
 }
 
 Json TracksJson(const BaseList2D& node)
@@ -56,23 +67,42 @@ Json TracksJson(const BaseList2D& node)
   return tracks;
 }
 
-Json TagJson(BaseTag& tag)
+Json TagJson(BaseTag& tag, NodeIndex& index)
 {
-  Json json = {{"type", tag.GetType()}, {"name", ToJson(tag.GetName())}, {"data", ToJson(tag.GetDataInstance())}};
+  Json json = {{"type", tag.GetType()},
+               {"name", ToJson(tag.GetName())},
+               {"data", ToJson(tag.GetDataInstance())},
+               {"links", index.LinksOf(tag.GetDataInstance())}};
   Json values = TagValues(tag);
   if (!values.is_null())
     json["values"] = std::move(values);
   return json;
 }
 
-Json ObjectJson(BaseObject& object)
+Json FrozenJson(const BaseObject& object)
 {
+  return {{"pos", ToJson(object.GetFrozenPos())},
+          {"scale", ToJson(object.GetFrozenScale())},
+          {"rot", ToJson(object.GetFrozenRot())}};
+}
+
+Json ParameterJson(BaseObject& object, Long id)
+{
+  GeData value;
+  object.GetParameterById(id, value);
+  return ToJson(value);
+}
+
+// `up` is the global matrix of the object above.
+Json ObjectJson(BaseObject& object, const Matrix& up, NodeIndex& index)
+{
+  const Matrix global = Multiply(up, object.GetLocalMatrix());
   Json tags = Json::array();
   for (BaseTag* tag = object.GetFirstTag(); tag; tag = tag->GetNext())
-    tags.push_back(TagJson(*tag));
+    tags.push_back(TagJson(*tag, index));
   Json children = Json::array();
   for (BaseObject* child = object.GetDown(); child; child = child->GetNext())
-    children.push_back(ObjectJson(*child));
+    children.push_back(ObjectJson(*child, global, index));
   const BaseList2D* layer = object.GetLayer();
   Json json = {{"type", object.GetType()},
                {"typeName", TypeName(object.GetType())},
@@ -81,10 +111,17 @@ Json ObjectJson(BaseObject& object)
                {"scale", ToJson(object.GetRelScale())},
                {"rot", ToJson(object.GetRelRot())},
                {"rotationOrder", object.GetRotationOrder()},
+               {"frozen", FrozenJson(object)},
+               {"global", ToJson(global)},
+               {"disabled", object.GetDisabled()},
+               {"displayColor", ParameterJson(object, kObjectDisplayColor)},
+               {"colorMode", ParameterJson(object, kObjectColorMode)},
                {"editorMode", object.GetEditorMode()},
                {"renderMode", object.GetRenderMode()},
                {"layer", layer ? ToJson(layer->GetName()) : Json()},
+               {"layerIndex", index.PathOf(layer)},
                {"data", ToJson(object.GetDataInstance())},
+               {"links", index.LinksOf(object.GetDataInstance())},
                {"params", ObjectParams(object)},
                {"tags", std::move(tags)},
                {"tracks", TracksJson(object)},
@@ -118,34 +155,45 @@ Json RenderJson(RenderData& data)
   return json;
 }
 
+// The length of one unit of the scene; null where the document doesn't say it.
+Json UnitJson(const BaseDocument& document)
+{
+  const CustomData* unit = document.GetDataInstance().GetCustomDataType(kKeyDocumentUnit, kCustomUnitScale);
+  if (!unit)
+    return nullptr;
+  const auto& scale = static_cast<const UnitScaleData&>(*unit);
+  return {{"factor", scale.scale}, {"code", scale.unit}, {"metres", GetUnitFactor(&scale)}};
+}
+
 Json DocumentJson(BaseDocument& document)
 {
   const DocumentPref& pref = document.GetPref();
-  return {{"name", ToJson(document.GetName())},
-          {"fps", pref.GetFps()},
-          {"min", ToJson(pref.GetMinTime())},
-          {"max", ToJson(pref.GetMaxTime())},
-          {"loopMin", ToJson(pref.GetLoopMin())},
-          {"loopMax", ToJson(pref.GetLoopMax())},
-          {"container", ToJson(document.GetDataInstance())}};
+  return {{"name", ToJson(document.GetName())},   {"fps", pref.GetFps()},
+          {"min", ToJson(pref.GetMinTime())},     {"max", ToJson(pref.GetMaxTime())},
+          {"loopMin", ToJson(pref.GetLoopMin())}, {"loopMax", ToJson(pref.GetLoopMax())},
+          {"unit", UnitJson(document)},           {"container", ToJson(document.GetDataInstance())}};
 }
 
 } // namespace
 
 Json SceneJson(BaseDocument& document)
 {
+  NodeIndex index;
   Json objects = Json::array();
   for (BaseObject* object = document.GetFirstObject(); object; object = object->GetNext())
-    objects.push_back(ObjectJson(*object));
+    objects.push_back(ObjectJson(*object, Matrix(), index));
   Json layers = Json::array();
   for (LayerObject* layer = document.GetFirstLayer(); layer; layer = layer->GetNext())
     layers.push_back(LayerJson(*layer));
   Json render = Json::array();
   for (RenderData* data = document.GetFirstRenderData(); data; data = data->GetNext())
     render.push_back(RenderJson(*data));
-  return {{"document", DocumentJson(document)},   {"objects", std::move(objects)},
-          {"materials", MaterialsJson(document)}, {"layers", std::move(layers)},
-          {"renderData", std::move(render)},      {"views", ViewsJson(document)}};
+  return {{"document", DocumentJson(document)},
+          {"objects", std::move(objects)},
+          {"materials", MaterialsJson(document, index)},
+          {"layers", std::move(layers)},
+          {"renderData", std::move(render)},
+          {"views", ViewsJson(document, index)}};
 }
 
 } // namespace q7r
