@@ -129,52 +129,7 @@ bool ReadStack(Stack& stack, const Bytes& body)
   return stack.value.Read(memory.file) && memory.file.ReadLong(witness) && witness == 77;
 }
 
-Bytes WriteStack(const Stack& stack)
-{
-  return WriteToMemory([&](HyperFile& file) { stack.value.Write(file); });
-}
-
 } // namespace
-
-TEST(BlendLayers, WriteAStackByteForByte)
-{
-  Stack stack;
-  BlendLayer* layer = stack.Add(kBlendClip, 3);
-  layer->SetSelected(true);
-  stack.Add(kBlendColorize, 4)->SetEnabled(false);
-  EXPECT_EQ(ToHex(WriteStack(stack)),
-            "0F 00 0F 6D BB 01 00 00 00 00 00 00 00 02 0F 00 00 00 02 0F 00 00 00 03 "
-            // clip: type, selected, name, id, mode, two Reals, enabled
-            "0F 00 00 00 08 15 01 82 00 00 00 08 00 43 00 6C 00 69 00 70 0F 00 00 00 03 0F 00 00 00 00 "
-            "13 00 00 00 00 00 00 00 00 13 3F F0 00 00 00 00 00 00 15 01 "
-            // colorize: the same, a Long, the gradient in a container, two Bools, enabled
-            "0F 00 00 00 06 15 00 82 00 00 00 10 00 43 00 6F 00 6C 00 6F 00 72 00 69 00 7A 00 65 0F 00 00 00 04 "
-            "0F 00 00 00 00 0F 00 00 00 00 01 00 00 00 84 00 00 00 01 0F FF FF FF FF 0F 00 00 00 01 0F 00 0F 44 21 "
-            "01 00 00 00 00 00 00 00 01 01 00 00 00 84 00 00 00 01 0F FF FF FF FF 0F 00 00 03 E9 0F 00 00 00 84 "
-            "01 00 00 00 84 00 00 00 01 0F FF FF FF FF 02 02 15 00 02 02 15 00 15 00 15 00 "
-            "0F 00 00 00 02 02");
-}
-
-TEST(BlendLayers, ReadEveryLevelAndComeBackTheSame)
-{
-  const counting_memory::BalanceCheck balance;
-  for (Long level : {0, 1, 2, 3}) {
-    SCOPED_TRACE(level);
-    Stack stack;
-    ASSERT_TRUE(ReadStack(stack, AllLayers(level).Long(9).Long(1).bytes)); // and a value of a newer program
-    EXPECT_EQ(Ids(stack.Layers()), "1() 2 3 4 5 6 7 8 9 10");
-    EXPECT_EQ(stack.Data().GetBlendVersion(), 9);
-    EXPECT_EQ(stack.Layers().GetLayer(2)->IsEnabled(), level < 2);
-    EXPECT_TRUE(stack.Layers().GetLayer(4)->IsSelected());
-    EXPECT_EQ(RealOf(*stack.Layers().GetLayer(5), 2003), level < 1 ? 0 : 1);
-    EXPECT_EQ(Utf8(stack.Layers().GetLayer(0)->GetName()), "L");
-    if (level == 3) {
-      const Bytes same =
-          ByteWriter().Long(kCustomBlendLayers).Start(0, 2).Append(AllLayers(3).Long(9).End().bytes).bytes;
-      EXPECT_EQ(ToHex(WriteStack(stack)), ToHex(same));
-    }
-  }
-}
 
 TEST(BlendLayers, ReadFoldersByTheLevelOfTheirOwnList)
 {

@@ -97,22 +97,6 @@ const Vector kBlack, kWhite(1, 1, 1);
 
 } // namespace
 
-TEST(Gradient, WritesItsValueByteForByte)
-{
-  GeData value;
-  ASSERT_TRUE(value.SetType(kCustomGradient));
-  const auto write = [&] {
-    const Bytes bytes = WriteToMemory([&](HyperFile& file) { value.Write(file); });
-    return ToHex(bytes);
-  };
-  const std::string settings = "01 00 00 00 84 00 00 00 01 0F FF FF FF FF 0F 00 00 03 E9 0F 00 00 00 84 "
-                               "01 00 00 00 84 00 00 00 01 0F FF FF FF FF 02 02 ";
-  const std::string head = "0F 00 0F 44 21 01 00 00 00 00 00 00 00 01 ";
-  EXPECT_EQ(write(), head + settings + "15 00 02");
-  ASSERT_NE(GradientOf(value).NeedAlpha(), nullptr);
-  EXPECT_EQ(write(), head + settings + "15 01 " + settings + "02");
-}
-
 TEST(Gradient, ReadsEveryLevelAndVersion)
 {
   const Vector half(0.5, 0.25, 0.125);

@@ -23,41 +23,6 @@ void Fill(CKey& key)
   key.SetGeData(nullptr, Long{7});
 }
 
-TEST(Key, WritesItsBytes)
-{
-  CKey key;
-  Fill(key);
-  key.ChangeNBit(46, 1);
-  key.ChangeNBit(41, 1);
-  SetCountingMarker(key);
-  EXPECT_EQ(ToHex(BytesOf(key)),
-            ToHex(FromHex("01 0001ADE2 00000007 0F 00000000 0F 00000000 01 00000084 00000001 0F FFFFFFFF 02 0C 00"
-                          "82 00000000 0F 00000000 0F 00000001 0F 00000000 80 0000000E 616C69617332 0000000000000000"
-                          "0C 01 80 00000010 000102030405060708090A0B0C0D0E0F 15 00 02"
-                          "01 0001ADF5 00000002 0F 00000004 0F 00000000 0F 00004200 0F 00000000 0F 00000000 0C 00 02"
-                          "01 0001AF50 00000000"
-                          "16 4008000000000000 4000000000000000"                        // 3 / 2
-                          "16 BFF0000000000000 4010000000000000"                        // -1 / 4
-                          "16 3FF0000000000000 4020000000000000"                        // 1 / 8
-                          "13 3FF8000000000000 13 C014000000000000 13 4018000000000000" // 1.5, -5, 6
-                          "0F 00000003 0F 0000000F 0F 00000007 02")));
-}
-
-TEST(Key, ReadsItsChunkAtAnyLevel)
-{
-  for (Long level : {0, 5}) {
-    ByteWriter w;
-    w.Start(110416, level).Time(3, 2).Time(-1, 4).Time(1, 8).Real(1.5).Real(-5).Real(6).Long(3).Long(15).Long(7);
-    if (level > 0)
-      w.String(u"of a newer program").Start(1, 1).End();
-    CKey key;
-    CKey expected;
-    Fill(expected);
-    EXPECT_TRUE(ReadInto(key, w.End().bytes));
-    EXPECT_TRUE(key.IsEqual(expected)) << level;
-  }
-}
-
 TEST(Key, ParametersReachFieldsAndBits)
 {
   CKey key;
@@ -119,17 +84,6 @@ TEST(Key, EqualityLooksAtEveryFieldAndResetLeavesTheTime)
   fresh.SetTime(key.GetTime());
   key.Reset();
   EXPECT_TRUE(key.IsEqual(fresh));
-}
-
-TEST(Key, ClonesWithAllItHolds)
-{
-  CKey key;
-  Fill(key);
-  key.SetName("K");
-  key.ChangeNBit(38, 1);
-  std::unique_ptr<CKey> clone(static_cast<CKey*>(key.MakeClone(0, nullptr)));
-  ASSERT_NE(clone, nullptr);
-  EXPECT_EQ(ToHex(WithoutMarkers(BytesOf(*clone))), ToHex(WithoutMarkers(BytesOf(key))));
 }
 
 } // namespace

@@ -215,37 +215,6 @@ TEST(BaseObject, ReadsEveryFormOfTheTransformChunk)
   }
 }
 
-TEST(BaseObject, KeepsTheChunkOfAnUnknownTypeByteForByte)
-{
-  counting_memory::BalanceCheck balance;
-  const Bytes unknown = NodeDataChunk(kUnknownType, 9, kStrangeBody);
-  BaseObject object(kObjectGeneric);
-  ASSERT_TRUE(ReadInto(object, unknown));
-  EXPECT_EQ(object.GetType(), kUnknownType);
-  EXPECT_EQ(object.GetName(), String("from data"));
-  EXPECT_EQ(object.GetObjectData(), nullptr);
-  EXPECT_EQ(object.GetRawLevel(), 9);
-  EXPECT_EQ(object.GetDiskType(), kObjectGeneric);
-  EXPECT_NE(ToHex(BytesOf(object)).find(ToHex(unknown)), std::string::npos);
-
-  BaseObject copy(kUnknownType);
-  ASSERT_TRUE(object.CopyWithTranslation(copy, 0, nullptr));
-  EXPECT_NE(ToHex(BytesOf(copy)).find(ToHex(unknown)), std::string::npos);
-  EXPECT_EQ(object.MakeClone(0, nullptr), nullptr) << "no class for the type";
-}
-
-TEST(BaseObject, KeepsTheBytesOfATypeThatOnlyTheLibraryMakes)
-{
-  // Read, it has bytes; made anew, it has data. A copy of what was read must not write the new data instead.
-  const Bytes sky = NodeDataChunk(kObjectSky, 4, kStrangeBody);
-  BaseObject object(kObjectGeneric);
-  ASSERT_TRUE(ReadInto(object, sky));
-  auto* clone = static_cast<BaseObject*>(object.MakeClone(0, nullptr));
-  ASSERT_NE(clone, nullptr);
-  EXPECT_NE(ToHex(BytesOf(*clone)).find(ToHex(sky)), std::string::npos);
-  DeleteObj(clone);
-}
-
 TEST(BaseObject, OpaqueDataLeaveTheEndTagToTheirOwner)
 {
   for (Long version : {6000, 13000}) {

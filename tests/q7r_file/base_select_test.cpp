@@ -244,24 +244,6 @@ TEST(BaseSelect, IsCopied)
   EXPECT_EQ(target.SegmentArray(), nullptr);
 }
 
-TEST(BaseSelect, WritesAndReadsItsChunk)
-{
-  BaseSelect set;
-  Fill(set, {{1, 2}, {5, 5}});
-  const Bytes bytes = WriteToMemory([&](HyperFile& file) { set.WriteChunks(file); });
-  EXPECT_EQ(ToHex(bytes), ToHex(FromHex("01 0001ADBB 00000000  0F 00000002  0F 00000001 0F 00000002"
-                                        "0F 00000005 0F 00000005  02")));
-  EXPECT_TRUE(ReadFrom(set, ByteWriter().Long(1).Long(3).Long(9).Bool(true).End(), 7))
-      << "what is newer is passed over";
-  EXPECT_EQ(SegmentsOf(set), (Segments{{3, 9}}));
-  EXPECT_TRUE(ReadFrom(set, ByteWriter().Long(0).End()));
-  EXPECT_EQ(set.SegmentArray(), nullptr);
-  MemoryReadFile other(ByteWriter().Header().Long(0).End().bytes);
-  EXPECT_FALSE(set.ReadChunk(other.file, kChunkSelect - 1, 0));
-  EXPECT_FALSE(set.ReadChunk(other.file, kChunkSelect, -1));
-  EXPECT_EQ(other.file.GetPosition(), 13);
-}
-
 TEST(BaseSelect, BringsTheSegmentsOfAFileIntoOrder)
 {
   const ByteWriter body = std::move(ByteWriter()
@@ -286,23 +268,6 @@ TEST(BaseSelect, BringsTheSegmentsOfAFileIntoOrder)
   EXPECT_EQ(SegmentsOf(set), (Segments{{0, 2}, {8, 12}}));
   EXPECT_TRUE(ReadFrom(set, ByteWriter().Long(1).Long(3).Long(2).End()));
   EXPECT_EQ(set.SegmentArray(), nullptr);
-}
-
-TEST(BaseSelect, RefusesACountThatTheFileCannotHold)
-{
-  AssertionCounter quiet;
-  counting_memory::BalanceCheck balance;
-  for (const Long count : {INT_MAX, -1, 3}) {
-    BaseSelect set;
-    counting_memory::ResetPeak();
-    const LLong before = counting_memory::Get().bytes;
-    EXPECT_FALSE(ReadFrom(set, ByteWriter().Long(count).Long(1).Long(2).Long(4).Long(5).Long(7).End())) << count;
-    EXPECT_LT(counting_memory::Get().peakBytes - before, 100000) << count;
-    EXPECT_EQ(set.SegmentArray(), nullptr);
-  }
-  BaseSelect set;
-  EXPECT_FALSE(ReadFrom(set, ByteWriter().Long(2).Long(1).Long(2).Long(4).Bool(true).Raw("........").End()));
-  EXPECT_EQ(set.SegmentCount(), 0);
 }
 
 TEST(BaseSelect, ReadsAMillionSingleNumbersInAFewAllocations)

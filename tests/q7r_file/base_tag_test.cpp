@@ -15,8 +15,6 @@ namespace
 
 using namespace _torvane_;
 
-constexpr Long kUnknownTagType = 1234567;
-
 // The node chunks of a tag with no name and the counting marker.
 std::string NodeHex(const std::string& container)
 {
@@ -59,27 +57,6 @@ TEST(BaseTag, WritesItsChunksByteForByte)
   EXPECT_EQ(ToHex(BytesOf(plugin)), ToHex(FromHex(NodeHex("") + "01 0001ADF0 00000000" + head + "02")));
   plugin.SetNodeData(NewObj<AnsweringData>());
   EXPECT_EQ(ToHex(BytesOf(plugin)), ToHex(FromHex(NodeHex("") + "01 0001ADF0 00000002" + head + "0F 00000007 02")));
-}
-
-TEST(BaseTag, KeepsTheChunkOfAnUnknownTypeByteForByteThroughReadCopyAndWrite)
-{
-  counting_memory::BalanceCheck balance;
-  BaseTag* tag = MakeTag(kTagPlugin);
-  EXPECT_EQ(tag->GetType(), -1);
-  ASSERT_TRUE(ReadInto(*tag, UnknownChunk()));
-  EXPECT_EQ(tag->GetType(), kUnknownTagType);
-  EXPECT_EQ(tag->GetDiskType(), kTagPlugin);
-  EXPECT_EQ(tag->GetName(), String("Tg"));
-  EXPECT_EQ(tag->GetRawLevel(), 6);
-  SetCountingMarker(*tag);
-  auto* clone = static_cast<BaseTag*>(tag->MakeClone(0, nullptr));
-  ASSERT_NE(clone, nullptr);
-  EXPECT_EQ(clone->GetDiskType(), kTagPlugin);
-  for (BaseTag* one : {tag, clone}) {
-    const std::string hex = ToHex(BytesOf(*one));
-    EXPECT_NE(hex.find(ToHex(UnknownChunk())), std::string::npos) << hex;
-    DeleteObj(one);
-  }
 }
 
 TEST(BaseTag, SkipsChunksThatItDoesNotKnowAndKeepsItsOwnName)

@@ -33,29 +33,6 @@ std::string Entries(const BaseContainer& data, std::initializer_list<Long> ids)
   return text;
 }
 
-// The old compositing chunk, with other values than the defaults.
-Bytes OldCompositing(Long level)
-{
-  ByteWriter chunk;
-  chunk.Start(5637, level).Bool(false).Bool(false).Bool(false).Bool(false).Bool(true);
-  if (level >= 1)
-    chunk.Bool(true).Long(41).Long(42);
-  if (level >= 2)
-    chunk.Bool(true).Real(9.0);
-  if (level >= 3) {
-    chunk.Real(0.5);
-    for (Long i = 0; i < 6; ++i)
-      chunk.Bool(i == 5).Long(50 + i);
-  }
-  if (level >= 4)
-    chunk.Bool(false);
-  if (level >= 5) {
-    for (Long i = 0; i < 6; ++i)
-      chunk.Bool(i == 0).Long(60 + i);
-  }
-  return chunk.Long(99).End().bytes;
-}
-
 } // namespace
 
 TEST(CompositingTag, HasItsDefaultsAndItsOwnMoment)
@@ -74,29 +51,6 @@ TEST(CompositingTag, HasItsDefaultsAndItsOwnMoment)
   CompositingTag second;
   const Long passed = second.GetDataInstance().GetLong(kCompositingClock) - data.GetLong(kCompositingClock);
   EXPECT_TRUE(passed >= 1 && passed < 60000) << passed;
-}
-
-TEST(CompositingTag, TakesTheChunkOfOldFilesAtEveryLevel)
-{
-  const char* rows[] = {
-      "1000=0 1003=0 1004=1 1005=0 1006=0 1007=2 1016=0.1 1015=- 1110=1 1115=6 1017=1 1136=- 1120=7 1125=12",
-      "1000=0 1003=0 1004=1 1005=1 1006=41 1007=42 1016=0.1 1015=- 1110=1 1115=6 1017=1 1136=- 1120=7 1125=12",
-      "1000=0 1003=0 1004=1 1005=1 1006=41 1007=42 1016=0.1 1015=- 1110=1 1115=6 1017=1 1136=- 1120=7 1125=12",
-      "1000=0 1003=0 1004=1 1005=1 1006=41 1007=42 1016=0.5 1015=1 1110=50 1115=55 1017=1 1136=- 1120=7 1125=12",
-      "1000=0 1003=0 1004=1 1005=1 1006=41 1007=42 1016=0.5 1015=1 1110=50 1115=55 1017=0 1136=- 1120=7 1125=12",
-      "1000=0 1003=0 1004=1 1005=1 1006=41 1007=42 1016=0.5 1015=1 1110=50 1115=55 1017=0 1136=1 1120=60 1125=65",
-  };
-  for (Long level = 0; level < 6; ++level) {
-    CompositingTag tag;
-    EXPECT_TRUE(ReadInto(tag, OldCompositing(level))) << level;
-    EXPECT_EQ(Entries(tag.GetDataInstance(),
-                      {1000, 1003, 1004, 1005, 1006, 1007, 1016, 1015, 1110, 1115, 1017, 1136, 1120, 1125}),
-              rows[level])
-        << level;
-  }
-  CompositingTag tag;
-  EXPECT_TRUE(ReadInto(tag, ByteWriter().Start(5637, -1).Bool(false).End().bytes));
-  EXPECT_TRUE(tag.GetDataInstance().GetBool(1000));
 }
 
 TEST(DisplayTag, AnswersElevenParametersFromItsOwnSettings)
@@ -171,48 +125,4 @@ TEST(DisplayTag, TakesTheChunkOfOldFilesIntoItsContainer)
               row.entries)
         << row.level << " in " << row.version;
   }
-}
-
-TEST(DisplayTag, StaysInStepWithItsOwnChunk)
-{
-  AssertionCounter quiet;
-  DisplayTag tag;
-  const ByteWriter marker =
-      std::move(ByteWriter().Start(kChunkOldDisplay, 0).Long(0).Bool(true).Bool(true).Bool(true).Bool(true).End());
-  const ByteWriter inner =
-      std::move(ByteWriter().Start(5613, 0).Start(77, 1).Long(5).Start(1, 1).End().End().Long(6).End());
-  const ByteWriter empty = std::move(ByteWriter().Start(5613, 0).End());
-  EXPECT_TRUE(ReadInto(tag, ByteWriter(inner).Append(empty.bytes).Append(marker.bytes).bytes, 11000));
-  EXPECT_TRUE(tag.GetDataInstance().GetBool(1001)) << "the chunk behind both was read";
-  EXPECT_FALSE(ReadInto(tag, ByteWriter().Start(5613, 0).Long(5).End().bytes));
-}
-
-TEST(SelectionTag, KeepsItsSetThroughFileAndCopy)
-{
-  counting_memory::BalanceCheck balance;
-  for (const Long type : {kTagPolygonSelection, kTagPointSelection, kTagEdgeSelection}) {
-    BaseTag* made = MakeTag(type);
-    auto* tag = static_cast<SelectionTag*>(made);
-    tag->GetSelect().SelectAll(3, 5);
-    tag->GetSelect().SelectAdd(9);
-    const Bytes bytes = BytesOf(*tag);
-    const Bytes chunk = FromHex("01 0001ADBB 00000000 0F 00000002 0F 00000003 0F 00000005 0F 00000009 0F 00000009 02");
-    ASSERT_GT(bytes.size(), chunk.size());
-    EXPECT_TRUE(std::equal(chunk.begin(), chunk.end(), bytes.end() - static_cast<std::ptrdiff_t>(chunk.size())));
-    auto* clone = static_cast<SelectionTag*>(tag->MakeClone(0, nullptr));
-    DeleteObj(made);
-    SelectionTag again(type);
-    EXPECT_TRUE(ReadInto(again, bytes));
-    for (const SelectionTag* one : {clone, static_cast<SelectionTag*>(&again)}) {
-      EXPECT_EQ(one->GetSelect().SelectedCount(), 4);
-      EXPECT_TRUE(one->GetSelect().IsSelected(9));
-    }
-    DeleteObj(clone);
-  }
-  SelectionTag tag(kTagPointSelection);
-  const Bytes body = ByteWriter().Header().Long(1).Long(2).Long(2).End().bytes;
-  MemoryReadFile memory(body);
-  EXPECT_TRUE(tag.ReadChunk(memory.file, kChunkSelect, -1));
-  EXPECT_EQ(memory.file.GetPosition(), 13) << "a negative level isn't read";
-  EXPECT_EQ(tag.GetSelect().SegmentCount(), 0);
 }

@@ -195,27 +195,6 @@ TEST(Geometry, SurvivesLittleMemory)
   });
 }
 
-TEST(Geometry, RefusesEveryCutFile)
-{
-  AssertionCounter quiet;
-  counting_memory::BalanceCheck balance;
-  BaseObject* polygon = AllocObject(kObjectPolygon);
-  EXPECT_TRUE(ResizePolygons(*polygon, 2, 1, -1) && AddUVWTag(*polygon) && ReadInto(*polygon, AllPolygonChunks()));
-  BaseObject* spline = AllocSpline(2, 1);
-  EXPECT_TRUE(ResizeSpline(*spline, 2, 1));
-  for (BaseObject* object : {polygon, spline}) {
-    ByteWriter whole;
-    whole.Header().Append(BytesOf(*object)).End();
-    for (std::size_t size = 14; size < whole.bytes.size(); ++size) {
-      MemoryReadFile cut({whole.bytes.begin(), whole.bytes.begin() + static_cast<std::ptrdiff_t>(size)});
-      BaseObject* read = AllocObject(object->GetType());
-      EXPECT_FALSE(read->ReadChunkLoop(cut.file, true)) << size;
-      DeleteObj(read);
-    }
-    DeleteObj(object);
-  }
-}
-
 TEST(SplineObject, HasTangentsAsItsTypeAsks)
 {
   counting_memory::BalanceCheck balance;

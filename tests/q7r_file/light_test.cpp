@@ -294,26 +294,6 @@ TEST(Light, KeepsItsParametersApartAndLeavesOthersToTheObject)
   }
 }
 
-TEST(Light, WritesItsBodyByteForByte)
-{
-  const ObjectPtr light = ReadLight(Body(5).Bool(false).bytes, 6);
-  ASSERT_NE(light, nullptr);
-  EXPECT_EQ(Differing(light), (std::set<Long>{50004})); // the file holds it, the reader drops it
-  EXPECT_EQ(DataOf(light).GetKnots()[1].position, 110.1);
-  SetOwnValues(light);
-  EXPECT_EQ(ToHex(BodyOf(light)), ToHex(Body(5).Bool(false).bytes));
-  const std::string start =
-      "13 40F3882800000000  13 40F3883800000000  13 40F3880800000000  13 40F3881800000000"
-      "0F 00000002  0F 0001388E  0F 0001388F  15 01  15 00  15 01  15 00"
-      "13 405906666666666613 40590CCCCCCCCCCD 17 4059000000000000 4059400000000000 4059800000000000";
-  EXPECT_EQ(ToHex(BodyOf(light)).substr(0, 3 * FromHex(start).size() - 1), ToHex(FromHex(start)));
-  // Within its object.
-  const std::string whole = ToHex(BytesOf(*light));
-  ByteWriter w;
-  w.Start(110064, 6).Long(5102).Long(0).String(u"L").Append(Body(5).bytes).Bool(false).End();
-  EXPECT_NE(whole.find(ToHex(w.bytes)), std::string::npos);
-}
-
 TEST(Light, ReadsTheBodiesOfEveryLevelAndVersion)
 {
   // What differs without the values of a level. 91000 doesn't: its own value is the default.
@@ -388,22 +368,6 @@ TEST(Light, KeepsFortyKnotsAndPassesOverTheRest)
   }
 }
 
-TEST(Light, RefusesEveryCutBody)
-{
-  const counting_memory::BalanceCheck balance;
-  AssertionCounter silent;
-  const Bytes body = Body(5).Bool(true).Append(Stored(4).bytes).bytes;
-  for (std::size_t size = 0; size < body.size(); size += size < 60 || size > body.size() - 180 ? 1 : 7) {
-    const Bytes cut = ByteWriter().Header().Append({body.begin(), body.begin() + static_cast<long>(size)}).bytes;
-    MemoryReadFile memory(cut);
-    const ObjectPtr light = NewLight();
-    // Where the distribution is cut the light itself is whole.
-    const bool whole = size >= Body(5).Bool(true).bytes.size();
-    EXPECT_EQ(DataOf(light).ReadData(memory.file, 110064, 6), whole) << size;
-    EXPECT_EQ(DataOf(light).GetIES(), nullptr) << size;
-  }
-}
-
 TEST(Light, CarriesItsDistributionThroughAFileAndBack)
 {
   const ObjectPtr light = NewLight();
@@ -461,19 +425,6 @@ TEST(Light, LosesABadDistributionOnly)
   const Bytes large = Body(5).Bool(true).Long(4).Long(0).Long(1).Real(0).Long(1024).Long(1024).Real(1).bytes;
   EXPECT_EQ(ReadLight(large, 6), nullptr);
   EXPECT_LT(counting_memory::Get().peakBytes - before, 100000);
-}
-
-TEST(Light, CopiesAllThatItHolds)
-{
-  const counting_memory::BalanceCheck balance;
-  const ObjectPtr light = ReadLight(Body(5).Bool(true).Append(Stored(4).bytes).bytes, 6);
-  ASSERT_NE(light, nullptr);
-  const ObjectPtr clone(static_cast<BaseObject*>(light->MakeClone(0, nullptr)));
-  ASSERT_TRUE(clone && GetIESLight(clone.get()));
-  EXPECT_EQ(BodyOf(clone), BodyOf(light));
-  EXPECT_NE(GetIESLight(clone.get()), GetIESLight(light.get()));
-  const ObjectPtr camera(AllocObject(kObjectCamera));
-  EXPECT_FALSE(DataOf(light).CopyTo(*camera->GetObjectData(), 0, nullptr));
 }
 
 TEST(Light, TakesADistributionWithItsEntriesInTheUnitOfTheDocument)

@@ -260,42 +260,6 @@ TEST(Material, ReadsChannelsOfEveryAgeAndStaysInStep)
   }
 }
 
-TEST(Material, ReadsPreviewsOfEveryAgeAndStaysInStep)
-{
-  struct Case
-  {
-    Long version, level;
-    const char* name;
-    std::function<void(ByteWriter&)> tail;
-  };
-  const Case cases[] = {
-      {7499, 0, "Told", [](ByteWriter&) {}},
-      {7499, 1, "Told", [](ByteWriter& w) { w.Start(132, 1).Long(-1).End(); }},
-      {7499, 2, "Told", [](ByteWriter& w) { w.Start(132, 1).Long(-1).End().Bool(true); }},
-      {7500, 1, "", [](ByteWriter&) {}},
-      {13000, 2, "", [](ByteWriter& w) { w.Bool(false); }},
-      {13000, 3, "", [](ByteWriter& w) { w.Bool(false).Long(1).Start(3, 3).Long(1).End(); }},
-  };
-  for (const Case& c : cases) {
-    SCOPED_TRACE(::testing::Message() << "version " << c.version << " level " << c.level);
-    ByteWriter w;
-    w.Start(110012, c.level).String(u"Told").Image(kPicture).Image({9}).Image(kNothing);
-    c.tail(w);
-    w.End();
-    AppendWitness(w);
-    BaseMaterial material(kMaterialPlugin);
-    ASSERT_TRUE(ReadInto(material, w.bytes, c.version));
-    EXPECT_EQ(material.GetNBit(-1), 99U);
-    EXPECT_EQ(Utf8(material.GetName()), c.name);
-    EXPECT_EQ(material.GetPreview().GetEncodedSize(), 4);
-  }
-  ByteWriter negative;
-  AppendWitness(negative.Start(110012, -1).Long(1).End());
-  BaseMaterial material(kMaterialPlugin);
-  EXPECT_TRUE(ReadInto(material, negative.bytes));
-  EXPECT_EQ(material.GetNBit(-1), 99U);
-}
-
 TEST(Material, PassesOverOldChannelChunks)
 {
   for (Long version : {7499, 7500}) {

@@ -17,17 +17,6 @@ namespace
 
 using namespace _torvane_;
 
-// A node header of a level, up to the name, with one entry 5 = 7 in its container.
-ByteWriter HeaderStart(Long level)
-{
-  ByteWriter w;
-  w.Start(110050, level).Long(3).Long(0).Start(132, 1).Long(-1).Long(5).Long(15).Long(7).End().UChar(0).String(u"N");
-  return w;
-}
-
-// A chunk (110069, 2) that sets the first word: what follows in step is seen by it.
-void AppendNodeWitness(ByteWriter& w) { w.Start(110069, 2).Long(4).Long(99).Long(0).Long(0).Long(0).UChar(0).End(); }
-
 TEST(Node, WritesItsHeaderAndBitsByteForByte)
 {
   BaseList2D node(1);
@@ -42,71 +31,6 @@ TEST(Node, WritesItsHeaderAndBitsByteForByte)
                     "80 0000000E 616C69617332 0000000000000000"
                     "0C 01 80 00000010 000102030405060708090A0B0C0D0E0F  15 00  02"
                     "01 0001ADF5 00000002  0F 00000004  0F 00000000 0F 00000002 0F 00000000 0F 00000000  0C 00 02")));
-}
-
-TEST(Node, ReadsHeadersOfEveryLevelAndStaysInStep)
-{
-  struct Case
-  {
-    const char* name;
-    Long level;
-    Long version;
-    std::function<void(ByteWriter&)> tail; // behind the name
-    bool hasMarker;
-  };
-  const Bytes marker(16, 0xAB);
-  const ByteWriter link = ByteWriter().Memory(std::string_view("alias2\0\0\0\0\0\0\0\0", 14));
-  const Case cases[] = {
-      {"level 0 of today", 0, 13000, [](ByteWriter&) {}, false},
-      {"level 1: no dynamic parameters", 1, 13000, [](ByteWriter& w) { w.Long(0); }, false},
-      {"level 2 with an old list of two chunks", 2, 13000,
-       [](ByteWriter& w) { w.Long(0).Long(1).Long(2).Start(9, 9).Long(1).End().Start(8, 8).End(); }, false},
-      {"level 2 with another list number", 2, 13000, [](ByteWriter& w) { w.Long(0).Long(7); }, false},
-      {"level 4 below 11600 has old numbers", 4, 11599,
-       [](ByteWriter& w) { w.Long(0).Long(1).Long(0).Long(44).Long(2).Long(1).Long(2); }, false},
-      {"level 3 of 11600 has none", 3, 11600, [](ByteWriter& w) { w.Long(0).Long(1).Long(0); }, false},
-      {"level 6 with a marker", 6, 13000,
-       [&](ByteWriter& w) { w.Long(0).Long(1).Long(0).Append(link.bytes).UChar(1).Memory(marker); }, true},
-      {"level 9 with values of a newer program", 9, 13000,
-       [&](ByteWriter& w) {
-         w.Long(0).Long(1).Long(0).Append(link.bytes).UChar(1).Memory(marker).Bool(true).Real(1).Start(4, 4).End();
-       },
-       true},
-  };
-  for (const Case& c : cases) {
-    SCOPED_TRACE(c.name);
-    ByteWriter w = HeaderStart(c.level);
-    c.tail(w);
-    w.End();
-    AppendNodeWitness(w);
-    BaseList2D node;
-    ASSERT_TRUE(ReadInto(node, w.bytes, c.version));
-    EXPECT_EQ(node.GetInfo(), 3u);
-    EXPECT_EQ(node.GetDataInstance().GetLong(5), 7);
-    EXPECT_TRUE(node.GetName() == String("N"));
-    EXPECT_EQ(node.GetNBit(-1), 99u);
-    EXPECT_EQ(node.GetMarker().bytes[3] == 0xAB && node.GetMarker().bytes[15] == 0xAB, c.hasMarker);
-  }
-}
-
-TEST(Node, FilesBelow7500LeaveNameAndDataUnread)
-{
-  ByteWriter w;
-  w.Start(110050, 0).Long(3).Long(0).String(u"whatever stands here").End();
-  AppendNodeWitness(w);
-  BaseList2D node;
-  ASSERT_TRUE(ReadInto(node, w.bytes, 7499));
-  EXPECT_FALSE(node.GetName().Content());
-  EXPECT_EQ(node.GetNBit(-1), 99u);
-}
-
-TEST(Node, ReadsMoreWordsOfBitsThanItKeeps)
-{
-  BaseList2D node;
-  ASSERT_TRUE(ReadInto(
-      node, ByteWriter().Start(110069, 0).Long(6).Long(1).Long(2).Long(3).Long(4).Long(5).Long(6).End().bytes));
-  for (Long word = 1; word <= 4; ++word)
-    EXPECT_EQ(node.GetNBit(-word), static_cast<ULong>(word));
 }
 
 TEST(Node, BitOperationsTellWhatChanged)
@@ -231,37 +155,6 @@ TEST(NodeParameters, DynamicOnesTakeTheSmallestFreeKey)
   ASSERT_TRUE(ReadInto(back, BytesOf(node)));
   ASSERT_NE(back.FindDynamicParameter(second), nullptr);
   EXPECT_TRUE(back.FindDynamicParameter(second)->GetString(1) == String("Count"));
-}
-
-TEST(Layer, WritesItsSwitchesWithTheFirstOneLast)
-{
-  LayerObject layer;
-  Bytes written = BytesOf(layer);
-  const Bytes chunk = FromHex("01 0001AEE9 00000001 15 01 15 01 15 01 15 00 15 01 15 01 15 01 15 01"
-                              "17 3FF0000000000000 3FF0000000000000 3FF0000000000000 15 00 02");
-  ASSERT_GE(written.size(), chunk.size());
-  EXPECT_EQ(ToHex(Bytes(written.end() - static_cast<long>(chunk.size()), written.end())), ToHex(chunk));
-}
-
-TEST(Layer, ReadsLevelZeroAndTakesParameters)
-{
-  ByteWriter w;
-  w.Start(110313, 0);
-  for (int i = 0; i < 8; ++i)
-    w.Bool(i == 3);
-  LayerObject layer;
-  layer.SetFlag(0, true);
-  ASSERT_TRUE(ReadInto(layer, w.Vector(0.25, 0.5, 0.75).End().bytes));
-  EXPECT_TRUE(layer.GetFlag(0)); // not reached by this level
-  EXPECT_FALSE(layer.GetFlag(1));
-  EXPECT_TRUE(layer.GetFlag(4));
-  GeData value;
-  ASSERT_TRUE(layer.GetParameter(Path({1009, kDataVector, 0}, {kVectorZ, 0, 0}), value));
-  EXPECT_EQ(value.GetReal(), 0.75);
-  EXPECT_TRUE(layer.SetParameter(Path({1009, kDataVector, 0}, {kVectorX, 0, 0}), GeData(1.0)));
-  EXPECT_TRUE(layer.GetColor() == Vector(1.0, 0.5, 0.75));
-  EXPECT_TRUE(layer.SetParameterById(1000, GeData(false)));
-  EXPECT_FALSE(layer.GetFlag(0));
 }
 
 } // namespace

@@ -43,12 +43,6 @@ ByteWriter TypeChunk(Long type, Long level)
 // A member of a list of children, which holds `chunks`.
 Bytes Member(const Bytes& chunks) { return ByteWriter().Start(5707, 0).Append(chunks).End().bytes; }
 
-std::string LastBytes(BaseShader& shader, std::size_t count)
-{
-  const std::string all = ToHex(BytesOf(shader));
-  return all.substr(all.size() - (3 * count - 1));
-}
-
 } // namespace
 
 TEST(Shader, WritesItsChunksByteForByte)
@@ -70,28 +64,6 @@ TEST(Shader, WritesItsChunksByteForByte)
   const std::string children = "01 0001AE14 00000000  01 0000164B 00000000";
   const Bytes behind = BytesOf(*child);
   EXPECT_EQ(ToHex(BytesOf(shader)), ToHex(FromHex(node + own + children)) + " " + ToHex(behind) + " 02 02");
-}
-
-TEST(Shader, KeepsTypeLevelAndContentOfUnknownTypes)
-{
-  const Long levels[][2] = {{kUnknownType, 0}, {1012161, 5}, {1012166, 6}, {5833, 0}};
-  for (const auto& [type, level] : levels) {
-    BaseShader shader(type);
-    shader.SetName("S");
-    const Bytes expected = TypeChunk(type, level).bytes;
-    EXPECT_EQ(LastBytes(shader, expected.size()), ToHex(expected));
-  }
-  // A level and values of another program, in the file and in the copy.
-  ByteWriter w;
-  w.Start(110064, 3).Long(kUnknownType).Long(0).String(u"").Real(1.5).Start(7, 8).Long(9).End().End();
-  BaseShader shader;
-  ASSERT_TRUE(ReadInto(shader, w.bytes));
-  EXPECT_EQ(shader.GetType(), kUnknownType);
-  EXPECT_TRUE(shader.IsInstanceOf(kUnknownType) && shader.IsInstanceOf(kShaderLabel) && !shader.IsInstanceOf(5833));
-  EXPECT_EQ(LastBytes(shader, w.bytes.size()), ToHex(w.bytes));
-  auto* clone = static_cast<BaseShader*>(shader.MakeClone(0, nullptr));
-  EXPECT_EQ(LastBytes(*clone, w.bytes.size()), ToHex(w.bytes));
-  DeleteObj(clone);
 }
 
 TEST(Shader, KeepsAFilenameOnlyAsABitmap)

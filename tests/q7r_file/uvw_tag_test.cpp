@@ -84,27 +84,6 @@ TEST(PackedUVW, HoldsTheseBits)
   }
 }
 
-TEST(UVWTag, WritesAndReadsItsQuadsAndItsParameter)
-{
-  UVWTag tag;
-  EXPECT_EQ(ToHex(OwnChunks(tag)), ToHex(FromHex("01 00001627 00000003 0F 00000000 8C 00000001 03 15 00 02")));
-  ASSERT_TRUE(tag.ResizeTagArray(1));
-  const Vector quad[4] = {{0.25, 0.75, 0}, {0, 0.5, 1}, {-1.5, 0.75, 0.1}, {2e5, -2e5, 0}};
-  Vector back[4];
-  ASSERT_TRUE(tag.WritePolygonUVW(0, quad) && tag.ReadPolygonUVW(0, back));
-  EXPECT_EQ(back[0], quad[0]);
-  EXPECT_EQ(back[3], Vector(1e5, -1e5, 0));
-  EXPECT_FALSE(tag.WritePolygonUVW(1, quad) || tag.ReadPolygonUVW(-1, back));
-  ASSERT_TRUE(tag.SetParameterById(1000, GeData(Long{5})));
-  EXPECT_EQ(tag.GetDataInstance().FindData(1000), nullptr);
-  const std::string hex = std::string("01 00001627 00000003 0F 00000001 8C 00000021 03") + kQuad + "15 01 02";
-  EXPECT_EQ(ToHex(OwnChunks(tag)), ToHex(FromHex(hex)));
-  UVWTag copy;
-  ASSERT_TRUE(ReadInto(copy, FromHex(hex)));
-  EXPECT_EQ(Words(copy), Words(tag));
-  EXPECT_EQ(ParameterOf(copy), 1);
-}
-
 TEST(UVWTag, ReadsTheLayoutsOfEveryVersionAndLevel)
 {
   std::vector<ULong> quad;

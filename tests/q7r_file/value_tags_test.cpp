@@ -145,29 +145,6 @@ TEST(ValueTags, KeepOrDropTheirEntriesWhenAFileHasNone)
   }
 }
 
-TEST(ValueTags, RefuseCountsThatTheFileCannotHoldBeforeTakingMemory)
-{
-  for (const Layout& layout : kLayouts) {
-    for (Long count : {2147483647, 5}) {
-      auto tag = Make(layout.type);
-      layout.fill(*tag);
-      ByteWriter chunk;
-      chunk.Start(layout.type, 0).Long(count).Append(Bytes(60, 11)).End();
-      counting_memory::ResetPeak();
-      const LLong before = counting_memory::Get().bytes;
-      EXPECT_EQ(ReadError(*tag, chunk.bytes), -100) << layout.type;
-      EXPECT_LT(counting_memory::Get().peakBytes - before, 100000) << layout.type;
-    }
-    AssertionCounter silence;
-    const Bytes whole = ByteWriter().Header().Append(FromHex(layout.filled)).bytes;
-    for (std::size_t cut = 13; cut < whole.size(); ++cut) {
-      auto tag = Make(layout.type);
-      MemoryReadFile memory(Bytes(whole.begin(), whole.begin() + static_cast<std::ptrdiff_t>(cut)));
-      EXPECT_FALSE(tag->ReadChunkLoop(memory.file, true)) << layout.type << " cut at " << cut;
-    }
-  }
-}
-
 TEST(ValueTags, ReportMemoryThatIsShortAndKeepTheirEntries)
 {
   for (const Layout& layout : kLayouts) {

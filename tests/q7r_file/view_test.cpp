@@ -31,17 +31,6 @@ ViewPanel* FirstPanel(BaseDocument& document)
   return static_cast<ViewPanel*>(document.GetViewPanelRoot()->GetFirst());
 }
 
-// The chunk of a draw at a level, with a camera of one entry, 500, that stands at (1, 2, 3).
-Bytes DrawChunk(Long level)
-{
-  ByteWriter w;
-  w.Start(110305, level).String(u"").Start(132, 1).Long(-1).Long(500).Long(19).Real(24).End();
-  w.Vector(1, 2, 3).Vector(4, 5, 6).Vector(0.1, 0.2, 0.3);
-  for (Long link = 1; link <= level && link <= 2; ++link)
-    w.Memory(std::string_view("alias2\0\0\0\0\0\0\0\0", 14));
-  return w.bytes;
-}
-
 // The last bytes of what a node writes.
 std::string LastBytes(PrivateChunk& node, std::size_t count)
 {
@@ -127,45 +116,6 @@ TEST(View, MakesFourDrawsWithThePerspectiveFirst)
   }
   EXPECT_NE(made, own);
   EXPECT_EQ(DrawAt(some, 4), own);
-}
-
-TEST(View, WritesADrawByteForByte)
-{
-  BaseDraw draw;
-  draw.GetEditorCamera()->GetDataInstance().Flush();
-  draw.GetEditorCamera()->GetDataInstance().SetReal(500, 24);
-  draw.GetEditorCamera()->SetRelPos(Vector(1, 2, 3));
-  draw.GetEditorCamera()->SetRelScale(Vector(4, 5, 6));
-  draw.GetEditorCamera()->SetRelRot(Vector(0.5, 0.25, 2));
-  const Bytes expected = FromHex(
-      "01 0001AEE1 00000002  82 00000000"
-      "01 00000084 00000001 0F FFFFFFFF 0F 000001F4 0F 00000013 13 4038000000000000 02"
-      "17 3FF0000000000000 4000000000000000 4008000000000000  17 4010000000000000 4014000000000000 4018000000000000"
-      "17 3FE0000000000000 3FD0000000000000 4000000000000000"
-      "80 0000000E 616C69617332 0000000000000000  80 0000000E 616C69617332 0000000000000000  02");
-  EXPECT_EQ(LastBytes(draw, expected.size()), ToHex(expected));
-  // Before it stand the chunks of a node and nothing else.
-  const std::string node =
-      "01 0001ADF5 00000002  0F 00000004  0F 00000000 0F 00000000 0F 00000000 0F 00000000  0C 00  02";
-  EXPECT_EQ(LastBytes(draw, FromHex(node).size() + expected.size()), ToHex(FromHex(node)) + " " + ToHex(expected));
-}
-
-TEST(View, ReadsADrawOfEveryLevel)
-{
-  for (Long level = 0; level <= 4; ++level) {
-    SCOPED_TRACE(level);
-    BaseDraw draw;
-    ByteWriter w;
-    w.Append(DrawChunk(level)).Real(5).Start(9, 9).String(u"later").End().End().Start(77, 0).End();
-    ASSERT_TRUE(ReadInto(draw, w.bytes));
-    const BaseObject& camera = *draw.GetEditorCamera();
-    EXPECT_EQ(camera.GetDataInstance().GetCount(), 1);
-    EXPECT_EQ(camera.GetDataInstance().GetReal(500), 24);
-    EXPECT_TRUE(camera.GetRelPos() == Vector(1, 2, 3));
-    EXPECT_TRUE(camera.GetRelScale() == Vector(4, 5, 6));
-    EXPECT_TRUE(camera.GetRelRot() == Vector(0.1, 0.2, 0.3));
-    EXPECT_EQ(draw.GetSceneCamera().GetLink(), nullptr);
-  }
 }
 
 TEST(View, WritesAndReadsAPanel)

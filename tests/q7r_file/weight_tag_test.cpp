@@ -98,42 +98,6 @@ TEST(WeightTag, BeginsWithItsEntriesAndNoJoints)
   EXPECT_FALSE(WeightTagData().Init()); // without a tag
 }
 
-TEST(WeightTag, WritesItsJointsByteForByte)
-{
-  Rig rig;
-  BaseObject joint(kObjectJoint);
-  ASSERT_EQ(rig.data->InsertJointRecord(&joint), 0);
-  JointRecord& record = *rig.data->GetJoint(0);
-  record.joint->ClearLink(); // ids of goals are another test's business
-  rig.data->SetGlobalMatrix(Frame(1, 1));
-  record.bindMatrix = Frame(2, 1);
-  record.restMatrix = Frame(4, 1);
-  record.length = 0.5;
-  record.flags = 3;
-  record.weights.WritePointWeight(6, 1.0);
-  record.pairs.tail = -1;
-  JointEntry* entry = record.AddEntry();
-  entry->number = 21;
-  entry->value = 22;
-  const std::string zero = "0000000000000000";
-  const std::string one = "3FF0000000000000";
-  const std::string axes = one + zero + zero + zero + one + zero + zero + zero + one;
-  auto frame = [&](const char* offset) { return std::string("19") + offset + zero + zero + axes; };
-  const std::string link = "80 0000000E 616C69617332 0000000000000000";
-  const std::string list = "10 00000000 10 00000000 10 00000000 10 00000000";
-  EXPECT_EQ(ToHex(OwnChunks(*rig.tag)),
-            ToHex(FromHex("01 0001ADF0 00000006  0F 000F8DE5  0F 00000000  82 00000000"
-                          "0F 00000001" +
-                          frame(one.c_str()) + "0F 00000000" + link + frame("4000000000000000") +
-                          "13 3FE0000000000000"
-                          "0F 00000000 0F 00000000 0F 00000001 8C 0000000D 03 00000006 00000006 00000000" +
-                          list + "0F 00000000  0F 00000001 8C 00000003 02 FFFF  0F 00000003" + list +
-                          "0F FFFFFFFF  0F 00000001 10 00000015" + link +
-                          "0F 00000016"
-                          "01 000F9561 00000001" +
-                          frame("4010000000000000") + link + "02 02")));
-}
-
 TEST(WeightTag, ReadsTheDataOfEveryLevel)
 {
   for (Long level = 0; level <= 7; ++level) {

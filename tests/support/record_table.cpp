@@ -155,7 +155,9 @@ const std::vector<RecordSample>& RecordSamples()
   static const Text frameless = "U0 L8@928";
   static const std::vector<RecordSample> samples = {
       // Every node.
-      {"node header", New<BaseList2D>, 110050, 7, kHeader2 + kHeaderEnd},
+      {"node header", New<BaseList2D>, 110050, 7, kHeader2 + "k C=1 M=000102030405060708090A0B0C0D0E0F B=0", "same", -1,
+       13000, false}, // a copy has its own marker
+      {"node header 2 with another list", New<BaseList2D>, 110050, 2, kHeader1 + "L=7", kHeader2 + kHeaderEnd, 7},
       {"node header 6", New<BaseList2D>, 110050, 6, kHeader2 + "k C=1 " + kNoMarker, kHeader2 + kHeaderEnd, 7},
       {"node header 5", New<BaseList2D>, 110050, 5, kHeader2 + "k", kHeader2 + kHeaderEnd, 7},
       {"node header 2", New<BaseList2D>, 110050, 2, kHeader2, kHeader2 + kHeaderEnd, 7},
@@ -226,6 +228,11 @@ const std::vector<RecordSample>& RecordSamples()
       {"transform 5 before 11600", NewOf<BaseObject, kObjectGeneric>, 110052, 5,
        kTransformHead + kMatrices + kTransformModes + "B1 B=1 V4 L5 V6 L7 Y8 B=0 B=0 ",
        kTransformHead + kTransformModes + kTransformDisplay + "U0 L6", 9, 11599},
+      {"transform 4 before 11600", NewOf<BaseObject, kObjectGeneric>, 110052, 4,
+       kTransformHead + kMatrices + kTransformModes + "B1 B=1 V4 L5 V6 L7 Y8",
+       kTransformHead + kTransformModes + kTransformDisplay + "U0 L6", 9, 11599},
+      {"transform 2 before 11600", NewOf<BaseObject, kObjectGeneric>, 110052, 2,
+       kTransformHead + kMatrices + kTransformModes + "B1 B=1 V4 L5@907", unknown, -1, 11599},
       {"transform 1 before 11600", NewOf<BaseObject, kObjectGeneric>, 110052, 1,
        kTransformHead + kMatrices + kTransformModes + "B1 B=1 V4", unknown, -1, 11599},
       {"transform 1 before 7500", NewOf<BaseObject, kObjectGeneric>, 110052, 1,
@@ -298,6 +305,7 @@ const std::vector<RecordSample>& RecordSamples()
       {"old channels 4", New<Material>, 5703, 4,
        "13( B=1 ) B=0 B=0 5( R=1 ) B=0 V=0 B=0 B=0 B=0 R=1 R=1 L=1 5( R=1 ) B=0 R=1 R=1 B=0 B=0 B=0 K=0 B=0",
        "13( B1 [5899,0 ] ) B0 [5899,0 ]", 0, 7499},
+      {"pictures with one", New<Material>, 110012, 2, "S= X810000000401020304 2( X8100000000 ) B=0"},
       {"pictures", New<Material>, 110012, 2, "S= " + kPictures + "B=0"},
       {"pictures 0", New<Material>, 110012, 0, "S= " + kPictures, "S= " + kPictures + "B=0", 2},
       {"pictures 1 before 7500", New<Material>, 110012, 1, "Sname " + kPictures + "K=0", "Sname " + kPictures + "B=0",
