@@ -326,6 +326,29 @@ TEST(PaintTextures, FailOnWhatCannotBe)
   EXPECT_EQ("error -7", Load(AlphaFile(2, 3, 1, 1, empty), refuses));
 }
 
+// Rows that are packed as well as can be: 64 times the size of the file.
+TEST(PaintTextures, TakeLittleMemoryForTheirRows)
+{
+  const struct
+  {
+    Long type, components;
+  } cases[] = {{2, 1}, {3, 2}, {4, 3}, {5, 4}};
+  for (const auto& c : cases) {
+    Bytes plane;
+    for (int i = 0; i < 100000 / c.components; ++i)
+      plane.insert(plane.end(), {129, 7});
+    ByteWriter row;
+    for (Long i = 0; i < c.components; ++i)
+      row.UChar(1).Memory(plane);
+    const auto width = static_cast<Long>(plane.size() / 2 * 128);
+    const Bytes file = AlphaFile(c.type, width, 1, c.components, row);
+    const LLong before = counting_memory::Get().bytes;
+    counting_memory::ResetPeak();
+    EXPECT_EQ(kMade, Load(file));
+    EXPECT_LE(counting_memory::Get().peakBytes - before, 100 * static_cast<LLong>(file.size())) << c.type;
+  }
+}
+
 TEST(PaintTextures, OfOtherLevelsAreReadAsFarAsTheyGo)
 {
   // Level 0 tells no depth; newer levels add values and chunks behind what is known.

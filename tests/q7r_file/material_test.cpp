@@ -141,9 +141,9 @@ TEST(Material, StartsWithEveryDefault)
 TEST(Material, AnswersForEveryChannelNumber)
 {
   Material material;
-  EXPECT_EQ(&material.ChannelAt(50), &material.ChannelAt(0));
-  EXPECT_NE(&material.ChannelAt(-1), &material.ChannelAt(0));
-  EXPECT_EQ(material.ChannelAt(3).GetType(), 5899);
+  EXPECT_EQ(material.ChannelAt(50), material.ChannelAt(0));
+  EXPECT_NE(material.ChannelAt(-1), material.ChannelAt(0));
+  EXPECT_EQ(material.ChannelAt(3)->GetType(), 5899);
   material.SwitchChannel(-1, 1);
   material.SwitchChannel(12, 1);
   for (Long none : {-2, 13, 50}) {

@@ -5,6 +5,9 @@
 #include "support/assertion_counter.h"
 #include "torvane/tags/base_tag.h"
 
+// The bytes of a link on the goal of an id.
+inline std::string Link(std::uint8_t id) { return std::string("alias2\0\0\0\0\0\0\0", 13) + static_cast<char>(id); }
+
 // The chunks that `tag` writes behind those of a plain tag.
 inline Bytes OwnChunks(_torvane_::BaseTag& tag)
 {

@@ -41,8 +41,6 @@ Real RealOf(TextureTag& tag, Long id)
   return value.GetType() == kDataLong ? value.GetLong() : value.GetReal();
 }
 
-std::string Link(std::uint8_t id) { return std::string("alias2\0\0\0\0\0\0\0", 13) + static_cast<char>(id); }
-
 ByteWriter OldChunk(Long version, Long level, Long height, Real pixelHeight)
 {
   const bool old = version < 11600;

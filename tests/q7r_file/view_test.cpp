@@ -40,31 +40,9 @@ std::string LastBytes(PrivateChunk& node, std::size_t count)
 
 } // namespace
 
-TEST(View, StartsWithItsDisplaySettings)
+TEST(View, ADrawHasACameraOfItsOwn)
 {
-  // b is a switch, i an integer, r a Real, v a Vector.
-  std::istringstream entries(
-      "1019 b 1; 1020 b 0; 1021 b 0; 1022 b 1; 1023 r 0.8; 1024 r 0.9; 1025 b 0; 1026 r 0.8; 1027 b 0; 1028 r 1;"
-      "1029 b 1; 1031 r 0.25; 1032 r 0.1; 1038 b 10; 1037 r 0; 1044 b 0; 1045 b 1; 1046 r 1; 1047 r 1; 1048 r 1;"
-      "1049 b 1; 1050 b 1; 1051 r 0; 1064 r 0.75; 1052 r 100; 1053 i 100; 1054 i 10; 1056 i 1; 1058 b 1; 1059 b 1;"
-      "1060 b 1; 1061 b 0; 1062 b 1; 3026 b 1; 3028 b 1; 1065 b 1; 1066 r 0.10000000149011612; 1068 b 0; 1070 b 0;"
-      "1071 b 0; 1072 b 0; 2007 v 1 0.67 0.1; 2001 v 0.2 0.2 0.2; 2002 v 0.8 0.8 0.8; 3001 b 1; 3002 b 1; 3003 b 1;"
-      "3004 b 1; 3005 b 1; 3006 b 1; 3027 b 1; 3007 b 1; 3008 b 1");
   BaseDraw draw;
-  const BaseContainer& settings = draw.GetDataInstance();
-  Long count = 0;
-  for (std::string entry; std::getline(entries, entry, ';'); ++count) {
-    std::istringstream words(entry);
-    Long id = 0;
-    char kind = 0;
-    Vector value;
-    words >> id >> kind >> value.x >> value.y >> value.z;
-    ASSERT_EQ(settings.GetIndexId(count), id);
-    const GeData& set = settings.GetData(id);
-    EXPECT_EQ(set.GetType(), kind == 'v' ? 23 : kind == 'r' ? 19 : 15) << entry;
-    EXPECT_TRUE(kind == 'v' ? set.GetVector() == value : set.GetReal() == value.x) << entry;
-  }
-  EXPECT_EQ(settings.GetCount(), count);
   const BaseObject& camera = *draw.GetEditorCamera();
   EXPECT_TRUE(camera.GetDataInstance().GetBool(1123));
   EXPECT_TRUE(camera.GetRelPos() == Vector(600.0001, 300, -600));

@@ -24,8 +24,6 @@ void PutFrame(ByteWriter& writer, Real n, Real scale)
   writer.Matrix({n, 0, 0, scale, 0, 0, 0, scale, 0, 0, 0, scale});
 }
 
-std::string Link(std::uint8_t id) { return std::string("alias2\0\0\0\0\0\0\0", 13) + static_cast<char>(id); }
-
 // The values of a joint up to its entries; 2.0 and 8.0 are the scales of bind and rest pose.
 void PutJoint(ByteWriter& writer, Long level, Real bind)
 {

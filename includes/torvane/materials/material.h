@@ -46,6 +46,7 @@ class Material : public BaseMaterial
 
   // With every default; the channels 0 and 8 are on.
   Material();
+  ~Material() override;
 
   Bool IsInstanceOf(Long type) const override;
   Bool ReadChunk(HyperFile& file, Long id, Long level) override;
@@ -57,8 +58,9 @@ class Material : public BaseMaterial
   Long ChannelIsOn(Long channel) const;
   // Other channel numbers are ignored.
   void SwitchChannel(Long channel, Long value);
-  // Channel 0 for a number that no channel has.
-  BaseChannel& ChannelAt(Long channel);
+  // Channel 0 for a number that no channel has. The channels are made when one is first asked for: null when memory is
+  // short. The material owns them.
+  BaseChannel* ChannelAt(Long channel);
   // The ids of a channel's parameters; 0 where the channel lacks one.
   static void ChannelParameterIds(Long channel, Long& colorId, Long& brightnessId, Long& mixId, Long& modeId);
   // The shader that the link parameter `id` names, or null.
@@ -76,7 +78,8 @@ class Material : public BaseMaterial
   Bool ReadOldChannels(HyperFile& file, Long level);
 
   Long channelState_[kMaterialChannelCount]; // 0 or 1, by place
-  BaseChannel channels_[kMaterialChannelCount];
+  struct Channels;
+  Channels* channels_ = nullptr; // owned
 };
 
 // A new standard material that the caller owns; null when memory is short.

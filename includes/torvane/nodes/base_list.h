@@ -122,7 +122,7 @@ class BaseList2D : public GeListNode
 
   // Parameters added at run time. Adding takes the smallest free key from 1 on and gives the path (700, 5, 0),
   // (key, type, 0), or an empty path on failure. The others take such a path.
-  BaseContainer& GetDynamicParameters() { return dynamicParameters_; }
+  const BaseContainer* GetDynamicParameters() const { return dynamicParameters_; } // null while there are none
   ParameterPath AddDynamicParameter(const BaseContainer& settings);
   Bool RemoveDynamicParameter(const ParameterPath& path);
   const BaseContainer* FindDynamicParameter(const ParameterPath& path) const;
@@ -136,9 +136,9 @@ class BaseList2D : public GeListNode
   GeAliasLink link_;
   mutable NodeMarker marker_;
   mutable Bool markerDrawn_ = false;
-  UniqueIDArray* uniqueIds_ = nullptr; // owned; null until the first extra identifier
-  BaseContainer dynamicParameters_;
-  BaseDocument* document_ = nullptr; // not owned; null outside a document
+  UniqueIDArray* uniqueIds_ = nullptr;         // owned; null until the first extra identifier
+  BaseContainer* dynamicParameters_ = nullptr; // owned; null until the first one
+  BaseDocument* document_ = nullptr;           // not owned; null outside a document
   Long type_;
   ULong info_ = 0;
   RootShader* shaders_ = nullptr; // owned, as the tracks; most nodes, every key for one, have neither
@@ -158,6 +158,7 @@ class BaseList2D : public GeListNode
   Bool ReadRoot(Root*& root, HyperFile& file);
   template <class Root>
   Bool CopyRoot(const Root* root, BaseList2D& target, Root*& targetRoot, ULong flags, TransArray* translation);
+  BaseContainer* NeedDynamicParameters();
   static Bool SkipOneChunk(HyperFile& file);
   Bool ReadUniqueIds(HyperFile& file);
   void WriteUniqueIds(HyperFile& file);

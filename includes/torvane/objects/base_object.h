@@ -93,29 +93,29 @@ class BaseObject : public BaseList4D
   const Vector& GetRelPos() const { return relPos_; }
   const Vector& GetRelRot() const { return relRot_; }
   const Vector& GetRelScale() const { return relScale_; }
-  const Vector& GetFrozenPos() const { return frozenPos_; }
-  const Vector& GetFrozenRot() const { return frozenRot_; }
-  const Vector& GetFrozenScale() const { return frozenScale_; }
-  const Vector& GetAbsPos() const { return absPos_; }
-  const Vector& GetAbsRot() const { return absRot_; }
-  const Vector& GetAbsScale() const { return absScale_; }
+  const Vector& GetFrozenPos() const { return Frozen().pos; }
+  const Vector& GetFrozenRot() const { return Frozen().rot; }
+  const Vector& GetFrozenScale() const { return Frozen().scale; }
+  const Vector& GetAbsPos() const { return frozen_ ? frozen_->absPos : relPos_; }
+  const Vector& GetAbsRot() const { return frozen_ ? frozen_->absRot : relRot_; }
+  const Vector& GetAbsScale() const { return frozen_ ? frozen_->absScale : relScale_; }
   ULong GetFrozenFlags() const { return frozenFlags_; }
   Long GetRotationOrder() const { return rotationOrder_; }
 
-  // Maps the object's space to that of its parent: the absolute values. Valid until the next setter.
-  const Matrix& GetLocalMatrix();
-  Matrix GetGlobalMatrix();         // the object's space to the world
+  // Maps the object's space to that of its parent: the absolute values.
+  Matrix GetLocalMatrix() const;
+  Matrix GetGlobalMatrix() const;   // the object's space to the world
   Matrix GetUpGlobalMatrix() const; // the parent's space to the world; identity without a parent
   // As the local and the global matrix, with axes of length 1.
   Matrix GetNormalizedLocalMatrix() const;
-  Matrix GetNormalizedGlobalMatrix();
+  Matrix GetNormalizedGlobalMatrix() const;
   // The object's space to that of its frozen transform: the relative values, with and without their scale.
   Matrix GetRelativeMatrix() const;
   Matrix GetRelativeNormalizedMatrix() const;
   // The frozen transform's space to that of the parent, without scale; identity when nothing is frozen.
   Matrix GetFrozenTransformMatrix() const;
   // A matrix that a file holds and the library hands on without a meaning of its own.
-  const Matrix& GetStoredMatrix() const { return storedMatrix_; }
+  const Matrix& GetStoredMatrix() const { return Display().storedMatrix; }
 
   // Every setter of the transform does nothing on an object with a Protection Tag (5629). The matrices are taken apart
   // into position, rotation and scale; each maps what the getter of its name maps.
@@ -141,33 +141,44 @@ class BaseObject : public BaseList4D
   void SetDisabled(Long disabled) { disabled_ = disabled; }
 
  protected:
-  Matrix matrixCache_;
-  Bool matrixDirty_ = true;
+  // The frozen part of the transform, and the absolute values, which differ from the relative ones only with it.
+  struct FrozenPart
+  {
+    Vector pos;
+    Vector scale = Vector(1.0, 1.0, 1.0);
+    Vector rot;
+    Vector absPos;
+    Vector absRot;
+    Vector absScale = Vector(1.0, 1.0, 1.0);
+    Matrix matrix;
+    Matrix inverse;
+  };
+
+  // How the editor shows the object, and values that are kept and handed on.
+  struct DisplayPart
+  {
+    Vector color = Vector(1.0, 1.0, 1.0);
+    Vector storedVector;
+    Matrix storedMatrix;
+    Long colorMode = 0;
+    Long storedMode = 0;
+    Long flag = 0;
+    Long unused = 0; // no padding: parts are compared byte by byte
+  };
+
   RawChunkBody raw_; // of the chunk kChunkNodeData, when there is no object data
   Vector relPos_;
   Vector relRot_;
   Vector relScale_ = Vector(1.0, 1.0, 1.0);
-  Vector frozenPos_;
-  Vector frozenScale_ = Vector(1.0, 1.0, 1.0);
-  Vector frozenRot_;
-  Vector absRot_;
-  Vector absPos_;
-  Vector absScale_ = Vector(1.0, 1.0, 1.0);
-  Matrix frozenMatrix_;
-  Matrix frozenInverse_;
+  Matrix rotationMatrix_;
+  FrozenPart* frozen_ = nullptr;   // owned; made with the first frozen value
+  DisplayPart* display_ = nullptr; // owned; made with the first value that isn't the default
   ULong frozenFlags_ = 0;
   Long rotationOrder_ = kRotationOrderScene;
-  Matrix rotationMatrix_;
-  Matrix storedMatrix_; // kept and handed on
   RootTag tags_;
   Long editorMode_ = kObjectModeUndefined;
   Long renderMode_ = kObjectModeUndefined;
   Long disabled_ = 0;
-  Bool displayFlag_ = false;
-  Vector displayColor_ = Vector(1.0, 1.0, 1.0);
-  Long colorMode_ = 0;
-  Long storedMode_ = 0;
-  Vector storedVector_;
   RootObject* legacyListA_ = nullptr; // read from old files only; owned
   RootObject* legacyListB_ = nullptr;
   NodeData* objectData_ = nullptr; // owned
@@ -184,12 +195,21 @@ class BaseObject : public BaseList4D
   Bool IsProtected() const { return GetTag(kTagProtection) != nullptr; }
   Bool HasFrozenTransform() const { return (frozenFlags_ & (kFrozenPos | kFrozenRot | kFrozenScale)) != 0; }
   Matrix GetRotation() const;
+  static const FrozenPart kNoFrozenPart;
+  static const DisplayPart kPlainDisplay;
+
+  const FrozenPart& Frozen() const { return frozen_ ? *frozen_ : kNoFrozenPart; }
+  const DisplayPart& Display() const { return display_ ? *display_ : kPlainDisplay; }
+  FrozenPart* NeedFrozen();
+  Bool SetDisplay(const DisplayPart& part);
+  template <class Change>
+  void ChangeDisplay(Change&& change);
   Vector DerivedAbsPos() const;
   Vector DerivedAbsRot() const;
   Vector DerivedAbsScale() const;
   void TakeRelAsAbs();
   void SetFrozenFlag(ULong flag, Bool set) { frozenFlags_ = set ? frozenFlags_ | flag : frozenFlags_ & ~flag; }
-  Vector GetGlobalAngles();
+  Vector GetGlobalAngles() const;
   void SetGlobalPos(const Vector& value);
   void SetGlobalAngles(const Vector& value);
   Vector TakeDisplayColor();
@@ -211,7 +231,7 @@ class BaseObject : public BaseList4D
   DataForm GetDataForm() const;
   void WriteObjectData(HyperFile& file);
   Bool CopyObjectData(BaseObject& destination, ULong flags, TransArray* translation) const;
-  void CopyTransform(BaseObject& destination) const;
+  Bool CopyTransform(BaseObject& destination) const;
   Bool CloneChildren(BaseObject& destination, ULong flags, TransArray* translation) const;
 };
 

@@ -48,12 +48,18 @@ class IESLight : public GeMemory
   // from y to x.
   Real SampleIESLight(const Vector& direction) const;
 
-  // Computes maxCandela from the table, and totalFlux from 65536 samples that are the same each time.
+  // Computes maxCandela and the total flux from the table.
   void Normalise();
+
+  // The flux of the relative intensity, over the sphere: 4 pi when it is 1 everywhere, and on a new distribution. What
+  // Normalise computes, and a stored form without a flux leaves open, comes from 65536 samples that are the same each
+  // time; they are taken when the flux is first asked for.
+  Real GetTotalFlux() const;
+  void SetTotalFlux(Real flux);
 
   // The light output of the table, in lumens when it is in candela, by the zonal method that makers use: between two
   // neighbouring vertical angles, the mean intensity all around times the solid angle. It differs by up to 1 % from
-  // maxCandela times totalFlux, which is sampled. 0 for a table that isn't complete.
+  // maxCandela times the total flux, which is sampled. 0 for a table that isn't complete.
   Real GetLumens() const;
 
   // The stored form within a light's chunk. Reading also takes the versions 1 to 3 of the form; it fails on a table
@@ -74,16 +80,21 @@ class IESLight : public GeMemory
   GeTempDynArray<Real> horizontalAngles; // degrees, ascending
   GeTempDynArray<Real> candela;          // a row of all vertical angles for each horizontal angle
   Real maxCandela = 0.0;
-  Real totalFlux = 12.566370614359172; // of the relative intensity, over the sphere: 4 pi when it is 1 everywhere
 
  private:
+  friend IESLight* CopyIESLight(const IESLight* source);
   struct Interval;
+
+  void FindMaximum();
 
   Real GetHorizontalPosition(Real angle) const;
   Real GetMeanIntensity(Long vertical) const;
   Real SampleRow(Long row, const Interval& vertical) const;
   template <class Visitor>
   Bool VisitStored(Visitor& visitor);
+
+  mutable Real totalFlux_ = 12.566370614359172;
+  mutable Bool fluxIsOpen_ = false; // and to be computed
 };
 
 // A new distribution equal to `source`, which the caller owns; null for null and when memory is short.

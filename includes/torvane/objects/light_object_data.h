@@ -43,6 +43,8 @@ struct LightExtraBlock
   LightKnot knots[kCount];
 };
 
+struct LightBody;
+
 class LightObjectData : public NodeData
 {
  public:
@@ -51,7 +53,7 @@ class LightObjectData : public NodeData
   const NodeKind& GetOwnerKind() const override;
 
   // With the defaults of kLightParameters.
-  LightObjectData();
+  LightObjectData() = default;
   ~LightObjectData() override;
 
   Bool IsInstanceOf(Long type) const override { return type == kObjectLight || NodeData::IsInstanceOf(type); }
@@ -66,8 +68,9 @@ class LightObjectData : public NodeData
   // The body of every level and file version. A distribution that reads badly is left out; the light stays.
   Bool ReadData(HyperFile& file, Long id, Long level) override;
 
-  LightKnot* GetKnots() { return settings_.knots; } // kMaxLightKnots, of which kLightKnotCount count
-  LightExtraBlock& GetExtraBlock() { return settings_.extraBlock; }
+  // Null when memory is short. There are kMaxLightKnots knots, of which kLightKnotCount count.
+  LightKnot* GetKnots() { return NeedSettings() ? settings_->knots : nullptr; }
+  LightExtraBlock* GetExtraBlock() { return NeedSettings() ? &settings_->extraBlock : nullptr; }
 
   // The measured distribution, or null. The light owns it.
   IESLight* GetIES() const { return iesLight_; }
@@ -75,32 +78,7 @@ class LightObjectData : public NodeData
   void AdoptIES(IESLight* light);
 
  private:
-  struct OldFactor;
-
-  template <class Visitor>
-  Bool VisitBody(Visitor& visitor, OldFactor& factor);
-  template <class Visitor>
-  void VisitKnots(Visitor& visitor);
-  template <class Visitor>
-  void VisitFirstGroups(Visitor& visitor);
-  template <class Visitor>
-  void VisitMainGroup(Visitor& visitor);
-  template <class Visitor>
-  void VisitLaterGroups(Visitor& visitor, OldFactor& factor);
-  template <class Visitor>
-  void VisitExtraBlock(Visitor& visitor);
-  template <class Visitor>
-  void VisitIES(Visitor& visitor);
-  template <Long... ids, class Visitor>
-  void VisitFields(Visitor& visitor);
-  template <Long id, class Visitor>
-  void VisitField(Visitor& visitor);
-  template <Long id>
-  Long& LongOf();
-  template <Long id>
-  Real& RealOf();
-  void TakeOldFactor(Real factor);
-  void SplitOldVector();
+  friend struct LightBody; // the order of a light in a file
 
   struct Settings
   {
@@ -112,7 +90,11 @@ class LightObjectData : public NodeData
     LightExtraBlock extraBlock;
   };
 
-  Settings settings_;
+  static const Settings& GetDefaults();
+  const Settings& GetSettings() const { return settings_ ? *settings_ : GetDefaults(); }
+  Settings* NeedSettings();
+
+  Settings* settings_ = nullptr; // owned; null while all are the defaults
   IESLight* iesLight_ = nullptr; // owned
 };
 

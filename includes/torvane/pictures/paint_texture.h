@@ -147,6 +147,7 @@ class K2VImageFilter : public PrivateChunk
   // The filter that a file belongs to, or null.
   static K2VImageFilter* Of(HyperFile& file) { return static_cast<K2VImageFilter*>(file.GetExtraData()); }
   Bool Open(const Filename& name, K2VClient& client, Long mode);
+  Bool AllowsRow(LLong count);
   Bool SpendRowBytes(LLong count);
 
   HyperFile file_;

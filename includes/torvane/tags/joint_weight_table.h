@@ -45,12 +45,10 @@ class WeightRuns
   UWord Get(Long point) const;
   // 0 takes the point out of the runs. False, with nothing changed, when memory is short.
   Bool Set(Long point, UWord value);
-  // Takes over the values of the points 0 to count - 1. False when memory is short: it then holds a part.
-  Bool SetAll(const UWord* values, Long count);
-  // Writes the values of all runs into an array of `count` points; those beyond it are left out.
-  void GetAll(UWord* values, Long count) const;
-  // One behind the last point that has a weight.
-  LLong GetEnd() const { return runs_.GetCount() > 0 ? LLong{runs_[runs_.GetCount() - 1].last} + 1 : 0; }
+  // Adds a point behind all that have a weight; one without a weight does nothing. False when memory is short.
+  Bool Append(Long point, UWord value);
+  // Empties the runs; what else they hold stays.
+  void Reset();
 
   Bool CopyTo(WeightRuns& destination) const;
   void Flush();
@@ -76,6 +74,42 @@ class WeightRuns
   Bool packed_ = true; // the values stand in the order of the runs, without gaps
 };
 
+// The weights of a table that is edited: pages of consecutive points in the order of their points. A page is made with
+// the first weight on it.
+class WeightPages
+{
+ public:
+  WeightPages() = default;
+  ~WeightPages() { Flush(); }
+  WeightPages(const WeightPages&) = delete; // use CopyTo
+  WeightPages& operator=(const WeightPages&) = delete;
+
+  // Room for the pages of so many points. False when memory is short.
+  Bool Reserve(Long pointCount) { return pointCount <= 0 || pages_.Reserve((pointCount - 1) / kPageSize + 1); }
+  UWord Get(Long point) const;
+  // False, with nothing changed, when memory is short.
+  Bool Set(Long point, UWord value);
+  // False when memory is short: the destination then holds a part.
+  Bool Take(const WeightRuns& runs);
+  Bool Give(WeightRuns& runs) const;
+  Bool CopyTo(WeightPages& destination) const;
+  void Flush();
+
+ private:
+  static constexpr Long kPageSize = 512; // points
+
+  struct Page
+  {
+    Long number;
+    UWord* values; // owned
+  };
+
+  Long FindPage(Long number) const;
+  Page* NeedPage(Long number);
+
+  GeTempDynArray<Page> pages_;
+};
+
 // The table of one joint. Every operation may be called on any thread at any time: those that read hold the reader
 // side of the table's lock, the others the writer side. In use elsewhere a table must not be destroyed.
 class JointWeightTable
@@ -96,8 +130,8 @@ class JointWeightTable
   // False for an index out of range.
   Bool GetRun(Long index, WeightRun& run) const;
 
-  // Between the two the weights stand in a dense table of at least `pointCount` points, which makes writing any of
-  // them quick. False when memory is short: beginning then changes nothing, and ending leaves the dense table.
+  // Between the two the weights stand in pages, which makes writing any of them quick; there is room for `pointCount`
+  // points at once. False when memory is short: beginning then changes nothing, and ending leaves the pages.
   Bool BeginEdit(Long pointCount);
   Bool EndEdit();
   Bool IsEdited() const;
@@ -118,7 +152,7 @@ class JointWeightTable
   mutable ReadWriteSpinLock lock_;
   WeightRuns runs_;
   JointPairList list_;
-  GeTempDynArray<UWord> dense_; // while edited: what counts
+  WeightPages pages_; // while edited: what counts
   Bool edited_ = false;
 };
 

@@ -25,12 +25,9 @@ class BaseDraw : public BaseList2D
   static constexpr NodeKindOf<BaseDraw> kNodeKind{"draw", &BaseList2D::kNodeKind};
   const NodeKind& GetNodeKind() const override { return kNodeKind; }
 
-  // With every default display setting, and an editor camera of its own; see IsComplete.
+  // With every default display setting.
   BaseDraw();
   ~BaseDraw() override;
-
-  // False when the editor camera could not be made: the draw is of no use then.
-  Bool IsComplete() const { return editorCamera_ != nullptr; }
 
   Bool ReadChunk(HyperFile& file, Long id, Long level) override;
   void WriteChunks(HyperFile& file) override;
@@ -40,7 +37,8 @@ class BaseDraw : public BaseList2D
 
   BaseDraw* GetNext() const { return NodeCast<BaseDraw>(BaseList2D::GetNext()); }
   GeAliasLink& GetSceneCamera() { return sceneCamera_; }
-  BaseObject* GetEditorCamera() const { return editorCamera_; } // the draw owns it
+  // The draw's own camera, made when it is first asked for; null when memory is short.
+  BaseObject* GetEditorCamera();
 
  private:
   template <class Visitor>
@@ -48,7 +46,7 @@ class BaseDraw : public BaseList2D
 
   BaseDrawPref pref_;
   GeAliasLink sceneCamera_;
-  BaseObject* editorCamera_ = nullptr; // owned
+  BaseObject* editorCamera_ = nullptr; // owned; null until it is needed
 };
 
 class ViewPanel : public BaseList2D

@@ -2,8 +2,6 @@
 
 #include "torvane/memory/owned.h"
 
-#include <cstring>
-
 #include "k2v_file/pictures/pixel_block.h"
 
 namespace _torvane_
@@ -23,6 +21,10 @@ constexpr Long kLevelTexture = 1;
 constexpr Long kLevelImagePixels = 2;
 constexpr Long kLevelLayerHead = 0;
 constexpr Long kLevelLayerPixels = 1;
+
+// How far a file may be unpacked.
+constexpr LLong kAlwaysGranted = LLong{1} << 24;
+constexpr LLong kMostPerByte = 64;
 
 // How the grey of a pixel comes about, by layer type: the mean of some of its bytes.
 struct GreyRule
@@ -86,18 +88,16 @@ Bool ReadPlane(HyperFile& file, PlaneBuffers& buffers, Long width, Long componen
   if (!file.ReadUChar(form) || !file.ReadMemory(data, size))
     return false;
   const auto* bytes = static_cast<const UChar*>(data);
-  const UChar* plane = bytes;
+  UChar* place = buffers.Row() + component;
   Bool whole = size >= width;
-  if (form == kPlanePacked) {
-    whole = UnpackRuns(bytes, size, buffers.Plane(), width);
-    plane = buffers.Plane();
+  if (form == kPlanePacked)
+    whole = UnpackRuns(bytes, size, place, width, components);
+  else if (form == kPlanePlain && whole)
+    SpreadPlane(bytes, place, width, components);
+  if (!whole && (form == kPlanePlain || form == kPlanePacked)) {
+    for (Long i = 0; i < width; ++i)
+      place[LLong{i} * components] = 0;
   }
-  if (!whole) {
-    std::memset(buffers.Plane(), 0, static_cast<std::size_t>(width));
-    plane = buffers.Plane();
-  }
-  if (form == kPlanePlain || form == kPlanePacked)
-    SpreadPlane(plane, buffers.Row() + component, width, components);
   GeFree(data);
   return true;
 }
@@ -145,9 +145,9 @@ Bool K2VPaintLayer::ReadRows(HyperFile& file, const PixelBlock& block, K2VImageF
   if (block.width < 1 || block.height < 1 || block.components < 1)
     return true;
   LLong rowSize = LLong{block.width} * block.components;
-  if (!filter.SpendRowBytes(rowSize)) // the buffer
+  if (!filter.AllowsRow(rowSize) || !filter.SpendRowBytes(rowSize)) // the buffer
     return false;
-  PlaneBuffers buffers(block.width, block.components);
+  PlaneBuffers buffers(block.width, block.components, false);
   if (!buffers.IsComplete()) {
     file.SetError(FILEERROR_MEMORY);
     return false;
@@ -250,6 +250,10 @@ Bool K2VAlpha::SetLayerLine(HyperFile& file, Long x, Long y, Long count, const U
   const GreyRule* rule = FindGreyRule(type_);
   if (!rule || components < rule->components || count < 1)
     return true;
+  if (rule->components == 1) {
+    filter->client_->SetAlphaLine(index_, x, y, count, buffer);
+    return true;
+  }
   const Owned<UChar> grey(static_cast<UChar*>(GeAllocNC(count)));
   if (!grey) {
     file.SetError(FILEERROR_MEMORY);
@@ -340,8 +344,17 @@ Bool K2VImageFilter::Open(const Filename& name, K2VClient& client, Long mode)
   return file_.Open(kPaintTextureIdent, name, mode);
 }
 
-// A run of 128 bytes takes two, so that a good file unpacks to 64 times its size at the most. Damaged planes may read
-// as zeros of any size: in all no more than this, or a small file could ask for any amount of memory and time.
+// A run of 128 bytes takes two, so that a good file unpacks to 64 times its size at the most, and so does a row of it.
+// Damaged planes may read as zeros of any size: of all rows together twice as much is taken, or a small file could ask
+// for any amount of memory and time.
+Bool K2VImageFilter::AllowsRow(LLong count)
+{
+  if (count <= kAlwaysGranted + file_.GetLength() * kMostPerByte)
+    return true;
+  file_.SetError(FILEERROR_WRONG_VALUE);
+  return false;
+}
+
 Bool K2VImageFilter::SpendRowBytes(LLong count)
 {
   if (count > rowBytesLeft_) {
@@ -355,10 +368,8 @@ Bool K2VImageFilter::SpendRowBytes(LLong count)
 // The loop over the whole file ends with the file and not with an end mark, so its own result says nothing.
 Bool K2VImageFilter::Load(const Filename& name, K2VClient& client)
 {
-  constexpr LLong kAlwaysGranted = LLong{1} << 24;
-  constexpr LLong kMostPerByte = 128;
   if (Open(name, client, kHyperFileRead)) {
-    rowBytesLeft_ = kAlwaysGranted + file_.GetLength() * kMostPerByte;
+    rowBytesLeft_ = kAlwaysGranted + file_.GetLength() * 2 * kMostPerByte;
     ReadChunks(file_, false);
   }
   file_.Close();

@@ -35,14 +35,14 @@ enum PlaneForm : UChar
   kPlanePacked = 1,
 };
 
-// Memory for one row, one of its planes, and that plane packed.
+// Memory for one row and, for writing, one of its planes and that plane packed.
 class PlaneBuffers
 {
  public:
-  PlaneBuffers(Long width, Long components)
+  PlaneBuffers(Long width, Long components, Bool toWrite)
       : width_(width),
         rowSize_(LLong{width} * components),
-        memory_(static_cast<UChar*>(GeAlloc(rowSize_ + 3 * LLong{width})))
+        memory_(static_cast<UChar*>(GeAlloc(rowSize_ + (toWrite ? 3 * LLong{width} : 0))))
   {}
   ~PlaneBuffers() { GeFree(memory_); }
   PlaneBuffers(const PlaneBuffers&) = delete;
@@ -78,7 +78,7 @@ Bool WritePixelBlock(HyperFile& file, Long width, Long height, Long depth, GetRo
     return false;
   if (width < 1 || height < 1)
     return true;
-  PlaneBuffers buffers(width, block.components);
+  PlaneBuffers buffers(width, block.components, true);
   if (!buffers.IsComplete()) {
     file.SetError(FILEERROR_MEMORY);
     return false;

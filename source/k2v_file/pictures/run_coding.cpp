@@ -1,7 +1,5 @@
 #include "k2v_file/pictures/run_coding.h"
 
-#include <cstring>
-
 namespace _torvane_
 {
 
@@ -50,7 +48,7 @@ LLong PackRuns(const UChar* bytes, LLong size, UChar* packed, LLong limit)
   return written;
 }
 
-Bool UnpackRuns(const UChar* packed, LLong packedSize, UChar* bytes, LLong size)
+Bool UnpackRuns(const UChar* packed, LLong packedSize, UChar* bytes, LLong size, LLong step)
 {
   LLong read = 0;
   LLong written = 0;
@@ -62,10 +60,8 @@ Bool UnpackRuns(const UChar* packed, LLong packedSize, UChar* bytes, LLong size)
     LLong count = run ? kRunBase - control : control + 1;
     if (count > size - written || (run ? 1 : count) > packedSize - read)
       return false;
-    if (run)
-      std::memset(bytes + written, packed[read], static_cast<std::size_t>(count));
-    else
-      std::memcpy(bytes + written, packed + read, static_cast<std::size_t>(count));
+    for (LLong i = 0; i < count; ++i)
+      bytes[(written + i) * step] = packed[read + (run ? 0 : i)];
     read += run ? 1 : count;
     written += count;
   }

@@ -11,7 +11,8 @@ namespace _torvane_
 // no bytes.
 LLong PackRuns(const UChar* bytes, LLong size, UChar* packed, LLong limit);
 
-// Unpacks just `size` bytes. False unless the coding ends right there; what was unpacked before the fault then stays.
-Bool UnpackRuns(const UChar* packed, LLong packedSize, UChar* bytes, LLong size);
+// Unpacks just `size` bytes, each `step` bytes behind the one before. False unless the coding ends right there; what
+// was unpacked before the fault then stays.
+Bool UnpackRuns(const UChar* packed, LLong packedSize, UChar* bytes, LLong size, LLong step = 1);
 
 } // namespace _torvane_

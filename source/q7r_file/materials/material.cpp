@@ -63,6 +63,13 @@ Material::Material() : BaseMaterial(kMaterialStandard), channelState_{}
   SetMaterialDefaults(data_);
 }
 
+struct Material::Channels
+{
+  BaseChannel places[kMaterialChannelCount];
+};
+
+Material::~Material() { DeleteObj(channels_); }
+
 Bool Material::IsInstanceOf(Long type) const { return type == kMaterialStandard || BaseMaterial::IsInstanceOf(type); }
 
 // Each switch is followed by the channel's own chunk, which this node reads: nothing in it belongs to the channel.
@@ -76,7 +83,7 @@ Bool Material::VisitChannels(Visitor& v)
     if constexpr (Visitor::kReading)
       v.Note(v.Good() && ReadChunks(v.File(), true));
     else
-      channels_[i].WriteChunks(v.File());
+      BaseChannel().WriteChunks(v.File());
   }
   return v.Good();
 }
@@ -145,10 +152,12 @@ void Material::SwitchChannel(Long channel, Long value)
     channelState_[place] = value;
 }
 
-BaseChannel& Material::ChannelAt(Long channel)
+BaseChannel* Material::ChannelAt(Long channel)
 {
+  if (!channels_)
+    channels_ = NewObj<Channels>();
   const Long place = PlaceOf(channel);
-  return channels_[place < 0 ? 0 : place];
+  return channels_ ? &channels_->places[place < 0 ? 0 : place] : nullptr;
 }
 
 void Material::ChannelParameterIds(Long channel, Long& colorId, Long& brightnessId, Long& mixId, Long& modeId)

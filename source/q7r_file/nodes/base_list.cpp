@@ -18,6 +18,7 @@ BaseList2D::~BaseList2D()
   DeleteObj(tracks_);
   DeleteObj(shaders_);
   DeleteObj(uniqueIds_);
+  DeleteObj(dynamicParameters_);
 }
 
 // The list, made if there is none; null when memory is short.
@@ -79,10 +80,14 @@ Bool BaseList2D::VisitHeader(Visitor& v)
   v.Goal(goal_);
   v.String(name_);
   if (v.Level() >= 1) {
-    Long present = dynamicParameters_.GetCount() > 0 ? 1 : 0;
+    Long present = dynamicParameters_ && dynamicParameters_->GetCount() > 0 ? 1 : 0;
     v.Long(present);
-    if (present >= 1 && v.Good())
-      v.Container(dynamicParameters_);
+    if (present >= 1 && v.Good()) {
+      if (NeedDynamicParameters())
+        v.Container(*dynamicParameters_);
+      else
+        v.File().SetError(FILEERROR_MEMORY);
+    }
   }
   if (v.Level() >= 2) {
     // A list that old programs kept here: always empty now, its chunks are passed over.
@@ -207,7 +212,10 @@ Bool BaseList2D::CopyTo(PrivateChunk& destination, ULong flags, TransArray* tran
   target->name_ = name_;
   if (!GeListNode::CopyTo(destination, flags, translation))
     return false;
-  if (!dynamicParameters_.CopyTo(target->dynamicParameters_, flags, translation))
+  if (!dynamicParameters_)
+    DeleteObj(target->dynamicParameters_);
+  else if (!target->NeedDynamicParameters() ||
+           !dynamicParameters_->CopyTo(*target->dynamicParameters_, flags, translation))
     return false;
   if (!(flags & kCopyNoBranches) && !CopyRoot(shaders_, *target, target->shaders_, flags, translation))
     return false;

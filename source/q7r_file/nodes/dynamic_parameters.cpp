@@ -133,12 +133,20 @@ BaseContainer MakeDynamicSettings(Long type, const String& name)
   return settings;
 }
 
+// The container, made if there is none; null when memory is short.
+BaseContainer* BaseList2D::NeedDynamicParameters()
+{
+  if (!dynamicParameters_)
+    dynamicParameters_ = NewObj<BaseContainer>();
+  return dynamicParameters_;
+}
+
 ParameterPath BaseList2D::AddDynamicParameter(const BaseContainer& settings)
 {
   Long key = 1;
-  while (dynamicParameters_.FindIndex(key) >= 0)
+  while (dynamicParameters_ && dynamicParameters_->FindIndex(key) >= 0)
     ++key;
-  if (!dynamicParameters_.InsertData(key, GeData(settings)))
+  if (!NeedDynamicParameters() || !dynamicParameters_->InsertData(key, GeData(settings)))
     return {};
   return {ParameterLevel{kDynamicParameters, kDataGroup, 0}, ParameterLevel{key, settings.GetId(), 0}};
 }
@@ -146,19 +154,20 @@ ParameterPath BaseList2D::AddDynamicParameter(const BaseContainer& settings)
 Bool BaseList2D::RemoveDynamicParameter(const ParameterPath& path)
 {
   Long key = KeyOf(path);
-  return key != 0 && dynamicParameters_.RemoveData(key);
+  return key != 0 && dynamicParameters_ && dynamicParameters_->RemoveData(key);
 }
 
 const BaseContainer* BaseList2D::FindDynamicParameter(const ParameterPath& path) const
 {
   Long key = KeyOf(path);
-  return key != 0 ? dynamicParameters_.GetContainerInstance(key) : nullptr;
+  return key != 0 && dynamicParameters_ ? dynamicParameters_->GetContainerInstance(key) : nullptr;
 }
 
 Bool BaseList2D::SetDynamicParameter(const ParameterPath& path, const BaseContainer& settings)
 {
   Long key = KeyOf(path);
-  return key != 0 && dynamicParameters_.FindIndex(key) >= 0 && dynamicParameters_.SetData(key, GeData(settings));
+  return key != 0 && dynamicParameters_ && dynamicParameters_->FindIndex(key) >= 0 &&
+         dynamicParameters_->SetData(key, GeData(settings));
 }
 
 } // namespace _torvane_

@@ -28,6 +28,8 @@ BaseObject::BaseObject(Long type) : BaseList4D(type), tags_(this)
 
 BaseObject::~BaseObject()
 {
+  DeleteObj(frozen_);
+  DeleteObj(display_);
   DeleteObj(legacyListA_);
   DeleteObj(legacyListB_);
   DeleteObj(objectData_);
@@ -139,20 +141,27 @@ void BaseObject::VisitDisplay(Visitor& v)
 {
   const Bool old = v.VersionBelow(kVersionTransform);
   auto holds = [&](Long level) { return !old || v.Level() >= level; };
+  DisplayPart part = Display();
   if (holds(1)) {
-    v.Bool(displayFlag_);
+    v.Bool(part.flag);
     if (old)
       v.template Skip<Bool>();
-    v.Vector(displayColor_);
+    v.Vector(part.color);
   }
   if (holds(2))
-    v.Long(colorMode_);
+    v.Long(part.colorMode);
   if (holds(3)) {
-    v.Vector(storedVector_);
-    v.Long(storedMode_);
+    v.Vector(part.storedVector);
+    v.Long(part.storedMode);
   }
   if (holds(4))
-    v.Matrix(storedMatrix_);
+    v.Matrix(part.storedMatrix);
+  if constexpr (Visitor::kReading) {
+    if (!SetDisplay(part)) {
+      v.File().SetError(FILEERROR_MEMORY);
+      v.Note(false);
+    }
+  }
   if (holds(5)) {
     VisitLegacyList(v, legacyListA_);
     VisitLegacyList(v, legacyListB_);
@@ -188,12 +197,19 @@ void BaseObject::VisitFrozen(Visitor& v)
   v.ULong(frozenFlags_);
   if (!HasFrozenTransform())
     return;
-  v.Vector(frozenPos_);
-  v.Vector(frozenScale_);
-  v.Vector(frozenRot_);
-  v.Vector(absPos_);
-  v.Vector(absScale_);
-  v.Vector(absRot_);
+  FrozenPart* part = NeedFrozen();
+  if (!part) {
+    frozenFlags_ = 0;
+    v.File().SetError(FILEERROR_MEMORY);
+    v.Note(false);
+    return;
+  }
+  v.Vector(part->pos);
+  v.Vector(part->scale);
+  v.Vector(part->rot);
+  v.Vector(part->absPos);
+  v.Vector(part->absScale);
+  v.Vector(part->absRot);
 }
 
 Bool BaseObject::ReadTransform(HyperFile& file, Long level)
@@ -203,14 +219,13 @@ Bool BaseObject::ReadTransform(HyperFile& file, Long level)
   const Long order = hasOrder ? rotationOrder_ : kRotationOrderScene;
   rotationMatrix_ = AnglesToMatrix(relRot_, order);
   if (HasFrozenTransform()) {
-    frozenMatrix_ = AnglesToMatrix(frozenRot_, order);
-    frozenInverse_ = Invert(frozenMatrix_);
-  } else {
-    frozenMatrix_ = Matrix();
-    frozenInverse_ = Matrix();
+    frozen_->matrix = AnglesToMatrix(frozen_->rot, order);
+    frozen_->inverse = Invert(frozen_->matrix);
+  } else if (frozen_) {
+    frozen_->matrix = Matrix();
+    frozen_->inverse = Matrix();
     TakeRelAsAbs();
   }
-  matrixDirty_ = true;
   return true;
 }
 
@@ -344,32 +359,27 @@ Bool BaseObject::CopyObjectData(BaseObject& destination, ULong flags, TransArray
   return !data || objectData_->CopyTo(*data, flags, translation);
 }
 
-void BaseObject::CopyTransform(BaseObject& destination) const
+// False when memory is short: the destination then holds a part.
+Bool BaseObject::CopyTransform(BaseObject& destination) const
 {
-  destination.displayColor_ = displayColor_;
-  destination.colorMode_ = colorMode_;
-  destination.displayFlag_ = displayFlag_;
-  destination.storedVector_ = storedVector_;
-  destination.storedMode_ = storedMode_;
   destination.editorMode_ = editorMode_;
   destination.renderMode_ = renderMode_;
   destination.disabled_ = disabled_;
-  destination.storedMatrix_ = storedMatrix_;
-  destination.frozenFlags_ = frozenFlags_;
   destination.rotationMatrix_ = rotationMatrix_;
-  destination.frozenMatrix_ = frozenMatrix_;
-  destination.frozenInverse_ = frozenInverse_;
   destination.relPos_ = relPos_;
   destination.relRot_ = relRot_;
   destination.relScale_ = relScale_;
-  destination.frozenPos_ = frozenPos_;
-  destination.frozenRot_ = frozenRot_;
-  destination.frozenScale_ = frozenScale_;
-  destination.absPos_ = absPos_;
-  destination.absRot_ = absRot_;
-  destination.absScale_ = absScale_;
   destination.rotationOrder_ = rotationOrder_;
-  destination.matrixDirty_ = true;
+  if (!frozen_) {
+    DeleteObj(destination.frozen_);
+  } else {
+    FrozenPart* part = destination.NeedFrozen();
+    if (!part)
+      return false;
+    *part = *frozen_;
+  }
+  destination.frozenFlags_ = frozenFlags_;
+  return destination.SetDisplay(Display());
 }
 
 Bool BaseObject::CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation)
@@ -383,8 +393,7 @@ Bool BaseObject::CopyTo(PrivateChunk& destination, ULong flags, TransArray* tran
     return false;
   if (GetType() != target->GetType() && !(flags & kCopyNoBranches))
     ReportAssertion("q7r_file", __LINE__, "an object was copied onto an object of another type");
-  CopyTransform(*target);
-  return true;
+  return CopyTransform(*target);
 }
 
 Bool BaseObject::CloneChildren(BaseObject& destination, ULong flags, TransArray* translation) const

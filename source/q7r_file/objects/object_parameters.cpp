@@ -1,6 +1,8 @@
 // The parameters of every scene object.
 #include "torvane/objects/base_object.h"
 
+#include <cstring>
+
 #include "q7r_file/nodes/node_tools.h"
 #include "torvane/values/ge_data.h"
 
@@ -40,11 +42,35 @@ Real Clamp01(Real value) { return value < 0.0 ? 0.0 : value > 1.0 ? 1.0 : value;
 
 } // namespace
 
+constinit const BaseObject::DisplayPart BaseObject::kPlainDisplay{};
+
+// False when memory is short: the part stays as it was.
+Bool BaseObject::SetDisplay(const DisplayPart& part)
+{
+  if (!display_ && std::memcmp(&part, &kPlainDisplay, sizeof part) == 0)
+    return true;
+  if (!display_)
+    display_ = NewObj<DisplayPart>();
+  if (display_)
+    *display_ = part;
+  return display_ != nullptr;
+}
+
+template <class Change>
+void BaseObject::ChangeDisplay(Change&& change)
+{
+  DisplayPart part = Display();
+  change(part);
+  SetDisplay(part);
+}
+
 // The colour as it is stored; from then on its components lie between 0 and 1.
 Vector BaseObject::TakeDisplayColor()
 {
-  Vector color = displayColor_;
-  displayColor_ = {Clamp01(color.x), Clamp01(color.y), Clamp01(color.z)};
+  Vector color = Display().color;
+  ChangeDisplay([](DisplayPart& part) {
+    part.color = {Clamp01(part.color.x), Clamp01(part.color.y), Clamp01(part.color.z)};
+  });
   return color;
 }
 
@@ -55,12 +81,12 @@ constinit const BaseObject::LongParameter BaseObject::kLongParameters[] = {
      [](BaseObject& o, Long value) { o.renderMode_ = value; }},
     {kObjectEnabled, [](const BaseObject& o) -> Long { return o.disabled_ == 0; },
      [](BaseObject& o, Long value) { o.disabled_ = value == 0; }},
-    {kObjectColorMode, [](const BaseObject& o) { return o.colorMode_; },
-     [](BaseObject& o, Long value) { o.colorMode_ = value; }},
-    {kObjectDisplayFlag, [](const BaseObject& o) -> Long { return o.displayFlag_; },
-     [](BaseObject& o, Long value) { o.displayFlag_ = value != 0; }},
-    {kObjectStoredMode, [](const BaseObject& o) { return o.storedMode_; },
-     [](BaseObject& o, Long value) { o.storedMode_ = value; }},
+    {kObjectColorMode, [](const BaseObject& o) { return o.Display().colorMode; },
+     [](BaseObject& o, Long value) { o.ChangeDisplay([=](DisplayPart& part) { part.colorMode = value; }); }},
+    {kObjectDisplayFlag, [](const BaseObject& o) -> Long { return o.Display().flag; },
+     [](BaseObject& o, Long value) { o.ChangeDisplay([=](DisplayPart& part) { part.flag = value != 0 ? 1 : 0; }); }},
+    {kObjectStoredMode, [](const BaseObject& o) { return o.Display().storedMode; },
+     [](BaseObject& o, Long value) { o.ChangeDisplay([=](DisplayPart& part) { part.storedMode = value; }); }},
     {kObjectRotationOrder, [](const BaseObject& o) { return o.rotationOrder_; },
      [](BaseObject& o, Long value) { o.SetRotationOrder(value); }},
 };
@@ -73,24 +99,26 @@ constinit const BaseObject::VectorParameter BaseObject::kVectorParameters[] = {
     {kObjectRelScale, [](BaseObject& o) { return o.relScale_; },
      [](BaseObject& o, const Vector& value) { o.SetRelScale(value); }},
     {kObjectDisplayColor, [](BaseObject& o) { return o.TakeDisplayColor(); },
-     [](BaseObject& o, const Vector& value) { o.displayColor_ = value; }},
+     [](BaseObject& o, const Vector& value) { o.ChangeDisplay([&](DisplayPart& part) { part.color = value; }); }},
     {kObjectGlobalPos, [](BaseObject& o) { return o.GetGlobalMatrix().off; },
      [](BaseObject& o, const Vector& value) { o.SetGlobalPos(value); }},
     {kObjectGlobalRot, [](BaseObject& o) { return o.GetGlobalAngles(); },
      [](BaseObject& o, const Vector& value) { o.SetGlobalAngles(value); }},
-    {kObjectStoredVector, [](BaseObject& o) { return o.storedVector_; },
-     [](BaseObject& o, const Vector& value) { o.storedVector_ = value; }},
-    {kObjectFrozenPos, [](BaseObject& o) { return o.frozenPos_; },
+    {kObjectStoredVector, [](BaseObject& o) { return o.Display().storedVector; },
+     [](BaseObject& o, const Vector& value) {
+       o.ChangeDisplay([&](DisplayPart& part) { part.storedVector = value; });
+     }},
+    {kObjectFrozenPos, [](BaseObject& o) { return o.GetFrozenPos(); },
      [](BaseObject& o, const Vector& value) { o.SetFrozenPos(value); }},
-    {kObjectFrozenRot, [](BaseObject& o) { return o.frozenRot_; },
+    {kObjectFrozenRot, [](BaseObject& o) { return o.GetFrozenRot(); },
      [](BaseObject& o, const Vector& value) { o.SetFrozenRot(value); }},
-    {kObjectFrozenScale, [](BaseObject& o) { return o.frozenScale_; },
+    {kObjectFrozenScale, [](BaseObject& o) { return o.GetFrozenScale(); },
      [](BaseObject& o, const Vector& value) { o.SetFrozenScale(value); }},
-    {kObjectAbsPos, [](BaseObject& o) { return o.absPos_; },
+    {kObjectAbsPos, [](BaseObject& o) { return o.GetAbsPos(); },
      [](BaseObject& o, const Vector& value) { o.SetAbsPos(value); }},
-    {kObjectAbsRot, [](BaseObject& o) { return o.absRot_; },
+    {kObjectAbsRot, [](BaseObject& o) { return o.GetAbsRot(); },
      [](BaseObject& o, const Vector& value) { o.SetAbsRot(value); }},
-    {kObjectAbsScale, [](BaseObject& o) { return o.absScale_; },
+    {kObjectAbsScale, [](BaseObject& o) { return o.GetAbsScale(); },
      [](BaseObject& o, const Vector& value) { o.SetAbsScale(value); }},
 };
 

@@ -47,46 +47,56 @@ void Mirror(Vector& axis, Real& length)
 
 } // namespace
 
-Vector BaseObject::DerivedAbsPos() const
+constinit const BaseObject::FrozenPart BaseObject::kNoFrozenPart{};
+
+// The frozen part, made if there is none; null when memory is short.
+BaseObject::FrozenPart* BaseObject::NeedFrozen()
 {
-  return HasFrozenTransform() ? frozenMatrix_ * relPos_ + frozenPos_ : relPos_;
+  if (!frozen_ && (frozen_ = NewObj<FrozenPart>()))
+    TakeRelAsAbs();
+  return frozen_;
 }
 
-Vector BaseObject::DerivedAbsScale() const { return MultiplyEach(relScale_, frozenScale_); }
+Vector BaseObject::DerivedAbsPos() const
+{
+  return HasFrozenTransform() ? Frozen().matrix * relPos_ + Frozen().pos : relPos_;
+}
+
+Vector BaseObject::DerivedAbsScale() const { return MultiplyEach(relScale_, Frozen().scale); }
 
 Vector BaseObject::DerivedAbsRot() const
 {
-  return NearestAngles(relRot_, Multiply(frozenMatrix_, rotationMatrix_), rotationOrder_);
+  return NearestAngles(relRot_, Multiply(Frozen().matrix, rotationMatrix_), rotationOrder_);
 }
 
+// Without a frozen part they are the same anyway.
 void BaseObject::TakeRelAsAbs()
 {
-  absPos_ = relPos_;
-  absRot_ = relRot_;
-  absScale_ = relScale_;
+  if (!frozen_)
+    return;
+  frozen_->absPos = relPos_;
+  frozen_->absRot = relRot_;
+  frozen_->absScale = relScale_;
 }
 
 // The rotation from the object to its parent, frozen part included, without scale and offset.
 Matrix BaseObject::GetRotation() const
 {
-  return (frozenFlags_ & kFrozenRot) ? Multiply(frozenMatrix_, rotationMatrix_) : rotationMatrix_;
+  return (frozenFlags_ & kFrozenRot) ? Multiply(Frozen().matrix, rotationMatrix_) : rotationMatrix_;
 }
 
-const Matrix& BaseObject::GetLocalMatrix()
+Matrix BaseObject::GetLocalMatrix() const
 {
-  if (matrixDirty_) {
-    matrixCache_ = GetRotation();
-    ScaleAxes(matrixCache_, absScale_);
-    matrixCache_.off = absPos_;
-    matrixDirty_ = false;
-  }
-  return matrixCache_;
+  Matrix matrix = GetRotation();
+  ScaleAxes(matrix, GetAbsScale());
+  matrix.off = GetAbsPos();
+  return matrix;
 }
 
-Matrix BaseObject::GetGlobalMatrix()
+Matrix BaseObject::GetGlobalMatrix() const
 {
   Matrix matrix = GetLocalMatrix();
-  for (BaseObject* up = GetUp(); up; up = up->GetUp())
+  for (const BaseObject* up = GetUp(); up; up = up->GetUp())
     matrix = Multiply(up->GetLocalMatrix(), matrix);
   return matrix;
 }
@@ -100,14 +110,14 @@ Matrix BaseObject::GetUpGlobalMatrix() const
 Matrix BaseObject::GetNormalizedLocalMatrix() const
 {
   Matrix matrix = GetRotation();
-  matrix.off = absPos_;
+  matrix.off = GetAbsPos();
   return matrix;
 }
 
-Matrix BaseObject::GetNormalizedGlobalMatrix()
+Matrix BaseObject::GetNormalizedGlobalMatrix() const
 {
   Matrix matrix = GetNormalizedLocalMatrix();
-  for (BaseObject* up = GetUp(); up; up = up->GetUp())
+  for (const BaseObject* up = GetUp(); up; up = up->GetUp())
     matrix = Multiply(up->GetNormalizedLocalMatrix(), matrix);
   matrix.off = GetGlobalMatrix().off;
   return matrix;
@@ -131,8 +141,8 @@ Matrix BaseObject::GetFrozenTransformMatrix() const
 {
   if (!HasFrozenTransform())
     return Matrix();
-  Matrix matrix = frozenMatrix_;
-  matrix.off = frozenPos_;
+  Matrix matrix = frozen_->matrix;
+  matrix.off = frozen_->pos;
   return matrix;
 }
 
@@ -141,8 +151,8 @@ void BaseObject::SetRelPos(const Vector& value)
   if (value == relPos_ || IsProtected())
     return;
   relPos_ = value;
-  absPos_ = DerivedAbsPos();
-  matrixDirty_ = true;
+  if (frozen_)
+    frozen_->absPos = DerivedAbsPos();
 }
 
 void BaseObject::SetRelScale(const Vector& value)
@@ -150,8 +160,8 @@ void BaseObject::SetRelScale(const Vector& value)
   if (IsProtected())
     return;
   relScale_ = value;
-  absScale_ = (frozenFlags_ & kFrozenScale) ? DerivedAbsScale() : relScale_;
-  matrixDirty_ = true;
+  if (frozen_)
+    frozen_->absScale = (frozenFlags_ & kFrozenScale) ? DerivedAbsScale() : relScale_;
 }
 
 void BaseObject::SetRelRot(const Vector& value)
@@ -160,8 +170,8 @@ void BaseObject::SetRelRot(const Vector& value)
     return;
   relRot_ = value;
   rotationMatrix_ = AnglesToMatrix(relRot_, rotationOrder_);
-  absRot_ = (frozenFlags_ & kFrozenRot) ? DerivedAbsRot() : relRot_;
-  matrixDirty_ = true;
+  if (frozen_)
+    frozen_->absRot = (frozenFlags_ & kFrozenRot) ? DerivedAbsRot() : relRot_;
 }
 
 // The setters of absolute values go through the relative ones and then store the value itself: the way there and back
@@ -169,15 +179,14 @@ void BaseObject::SetRelRot(const Vector& value)
 
 void BaseObject::SetAbsPos(const Vector& value)
 {
-  if (value == absPos_ || IsProtected())
+  if (value == GetAbsPos() || IsProtected())
     return;
   if (!HasFrozenTransform()) {
     SetRelPos(value);
     return;
   }
-  SetRelPos(frozenInverse_ * (value - frozenPos_));
-  absPos_ = value;
-  matrixDirty_ = true;
+  SetRelPos(frozen_->inverse * (value - frozen_->pos));
+  frozen_->absPos = value;
 }
 
 void BaseObject::SetAbsScale(const Vector& value)
@@ -188,58 +197,54 @@ void BaseObject::SetAbsScale(const Vector& value)
     SetRelScale(value);
     return;
   }
-  SetRelScale(DivideEach(value, frozenScale_));
-  absScale_ = value;
-  matrixDirty_ = true;
+  SetRelScale(DivideEach(value, frozen_->scale));
+  frozen_->absScale = value;
 }
 
 void BaseObject::SetAbsRot(const Vector& value)
 {
-  if (value == absRot_ || IsProtected())
+  if (value == GetAbsRot() || IsProtected())
     return;
   if (!HasFrozenTransform()) {
     SetRelRot(value);
     return;
   }
-  Matrix relative = Multiply(frozenInverse_, AnglesToMatrix(value, rotationOrder_));
+  Matrix relative = Multiply(frozen_->inverse, AnglesToMatrix(value, rotationOrder_));
   Vector angles = NearestAngles(value, relative, rotationOrder_);
   SetRelRot(angles);
   if (angles == relRot_)
-    absRot_ = value;
+    frozen_->absRot = value;
 }
 
 void BaseObject::SetFrozenPos(const Vector& value)
 {
-  if (value == frozenPos_ || IsProtected())
+  if (value == GetFrozenPos() || IsProtected() || !NeedFrozen())
     return;
-  frozenPos_ = value;
+  frozen_->pos = value;
   SetFrozenFlag(kFrozenPos, value != Vector());
-  absPos_ = DerivedAbsPos();
-  matrixDirty_ = true;
+  frozen_->absPos = DerivedAbsPos();
 }
 
 void BaseObject::SetFrozenScale(const Vector& value)
 {
-  if (value == frozenScale_ || IsProtected())
+  if (value == GetFrozenScale() || IsProtected() || !NeedFrozen())
     return;
-  frozenScale_ = value;
+  frozen_->scale = value;
   SetFrozenFlag(kFrozenScale, value != kNoScale);
-  absScale_ = HasFrozenTransform() ? DerivedAbsScale() : relScale_;
-  matrixDirty_ = true;
+  frozen_->absScale = HasFrozenTransform() ? DerivedAbsScale() : relScale_;
 }
 
 void BaseObject::SetFrozenRot(const Vector& value)
 {
-  if (value == frozenRot_ || IsProtected())
+  if (value == GetFrozenRot() || IsProtected() || !NeedFrozen())
     return;
-  frozenRot_ = value;
-  frozenMatrix_ = AnglesToMatrix(frozenRot_, rotationOrder_);
-  Bool turned = frozenMatrix_ != Matrix();
-  frozenInverse_ = turned ? Invert(frozenMatrix_) : Matrix();
+  frozen_->rot = value;
+  frozen_->matrix = AnglesToMatrix(value, rotationOrder_);
+  Bool turned = frozen_->matrix != Matrix();
+  frozen_->inverse = turned ? Invert(frozen_->matrix) : Matrix();
   SetFrozenFlag(kFrozenRot, turned);
-  absPos_ = DerivedAbsPos();
-  absRot_ = HasFrozenTransform() ? DerivedAbsRot() : relRot_;
-  matrixDirty_ = true;
+  frozen_->absPos = DerivedAbsPos();
+  frozen_->absRot = HasFrozenTransform() ? DerivedAbsRot() : relRot_;
 }
 
 void BaseObject::SetRotationOrder(Long order)
@@ -249,8 +254,8 @@ void BaseObject::SetRotationOrder(Long order)
   rotationOrder_ = order;
   relRot_ = MatrixToAngles(rotationMatrix_, order);
   rotationMatrix_ = AnglesToMatrix(relRot_, order);
-  absRot_ = (frozenFlags_ & kFrozenRot) ? DerivedAbsRot() : relRot_;
-  matrixDirty_ = true;
+  if (frozen_)
+    frozen_->absRot = (frozenFlags_ & kFrozenRot) ? DerivedAbsRot() : relRot_;
 }
 
 // A matrix tells mirroring only by its handedness. Which axes are the mirrored ones is taken from the scale that the
@@ -276,12 +281,11 @@ void BaseObject::SetRelativeMatrix(const Matrix& matrix)
   relRot_ = angles;
   relScale_ = scale;
   rotationMatrix_ = relScale_ != Vector() ? AnglesToMatrix(relRot_, rotationOrder_) : Matrix();
-  matrixDirty_ = true;
   TakeRelAsAbs();
   if (HasFrozenTransform()) {
-    absPos_ = DerivedAbsPos();
-    absRot_ = DerivedAbsRot();
-    absScale_ = DerivedAbsScale();
+    frozen_->absPos = DerivedAbsPos();
+    frozen_->absRot = DerivedAbsRot();
+    frozen_->absScale = DerivedAbsScale();
   }
 }
 
@@ -294,11 +298,11 @@ void BaseObject::SetLocalMatrix(const Matrix& matrix)
     return;
   }
   Matrix relative = matrix;
-  relative.off -= frozenPos_;
-  relative = Multiply(frozenInverse_, relative);
-  UnscaleAxis(relative.v1, frozenScale_.x);
-  UnscaleAxis(relative.v2, frozenScale_.y);
-  UnscaleAxis(relative.v3, frozenScale_.z);
+  relative.off -= frozen_->pos;
+  relative = Multiply(frozen_->inverse, relative);
+  UnscaleAxis(relative.v1, frozen_->scale.x);
+  UnscaleAxis(relative.v2, frozen_->scale.y);
+  UnscaleAxis(relative.v3, frozen_->scale.z);
   SetRelativeMatrix(relative);
 }
 
@@ -310,7 +314,7 @@ void BaseObject::SetGlobalMatrix(const Matrix& matrix)
   SetLocalMatrix(up ? Multiply(Invert(up->GetGlobalMatrix()), matrix) : matrix);
 }
 
-Vector BaseObject::GetGlobalAngles() { return NearestAngles(relRot_, GetGlobalMatrix(), rotationOrder_); }
+Vector BaseObject::GetGlobalAngles() const { return NearestAngles(relRot_, GetGlobalMatrix(), rotationOrder_); }
 
 void BaseObject::SetGlobalPos(const Vector& value) { SetAbsPos(Invert(GetUpGlobalMatrix()) * value); }
 

@@ -18,24 +18,25 @@ constexpr Vector kEditorRot(DegreesToRadians(45.0), DegreesToRadians(-20.0), 0.0
 
 } // namespace
 
-BaseDraw::BaseDraw() : BaseList2D(kTypeBaseDraw), editorCamera_(AllocObject(kObjectCamera))
-{
-  if (!editorCamera_)
-    return;
-  editorCamera_->GetDataInstance().SetBool(kKeyCameraOfDraw, true);
-  editorCamera_->SetRelPos(kEditorPos);
-  editorCamera_->SetRelRot(kEditorRot);
-  SetDrawDefaults(data_);
-}
+BaseDraw::BaseDraw() : BaseList2D(kTypeBaseDraw) { SetDrawDefaults(data_); }
 
 BaseDraw::~BaseDraw() { DeleteObj(editorCamera_); }
 
-BaseDraw* MakeBaseDraw()
+BaseDraw* MakeBaseDraw() { return NewObj<BaseDraw>(); }
+
+BaseObject* BaseDraw::GetEditorCamera()
 {
-  BaseDraw* draw = NewObj<BaseDraw>();
-  if (draw && !draw->IsComplete())
-    DeleteObj(draw);
-  return draw;
+  if (editorCamera_)
+    return editorCamera_;
+  editorCamera_ = AllocObject(kObjectCamera);
+  if (editorCamera_ && !editorCamera_->GetDataInstance().SetData(kKeyCameraOfDraw, GeData(true)))
+    DeleteObj(editorCamera_);
+  if (!editorCamera_)
+    return nullptr;
+  editorCamera_->SetRelPos(kEditorPos);
+  editorCamera_->SetRelRot(kEditorRot);
+  editorCamera_->SetDocument(document_);
+  return editorCamera_;
 }
 
 void BaseDraw::SetDocument(BaseDocument* document)
@@ -48,6 +49,10 @@ void BaseDraw::SetDocument(BaseDocument* document)
 template <class Visitor>
 Bool BaseDraw::VisitBody(Visitor& v)
 {
+  if (!GetEditorCamera()) {
+    v.File().SetError(FILEERROR_MEMORY);
+    return v.Note(false);
+  }
   BaseObject& camera = *editorCamera_;
   Vector pos = camera.GetRelPos();
   Vector scale = camera.GetRelScale();
@@ -73,16 +78,14 @@ void BaseDraw::WriteChunks(HyperFile& file)
 {
   BaseList2D::WriteChunks(file);
   pref_.WriteChunks(file);
-  if (editorCamera_)
-    WriteChunk(file, kChunkBaseDraw, kLevelBaseDraw, [this](ChunkWriter& v) { return VisitBody(v); });
+  WriteChunk(file, kChunkBaseDraw, kLevelBaseDraw, [this](ChunkWriter& v) { return VisitBody(v); });
 }
 
 Bool BaseDraw::ReadChunk(HyperFile& file, Long id, Long level)
 {
   if (BaseList2D::ReadChunk(file, id, level))
     return true;
-  return id == kChunkBaseDraw && editorCamera_ &&
-         ReadChunkBody(file, level, [this](ChunkReader& v) { return VisitBody(v); });
+  return id == kChunkBaseDraw && ReadChunkBody(file, level, [this](ChunkReader& v) { return VisitBody(v); });
 }
 
 Bool BaseDraw::CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation)
@@ -90,9 +93,14 @@ Bool BaseDraw::CopyTo(PrivateChunk& destination, ULong flags, TransArray* transl
   auto* target = NodeCast<BaseDraw>(&destination);
   if (!target)
     return false;
-  return BaseList2D::CopyTo(destination, flags, translation) && IsComplete() && target->IsComplete() &&
-         editorCamera_->CopyWithTranslation(*target->editorCamera_, flags, translation) &&
-         sceneCamera_.CopyLinkTo(&target->sceneCamera_, translation);
+  if (!BaseList2D::CopyTo(destination, flags, translation))
+    return false;
+  // Two cameras that are still to be made are equal.
+  if ((editorCamera_ || target->editorCamera_) &&
+      (!GetEditorCamera() || !target->GetEditorCamera() ||
+       !editorCamera_->CopyWithTranslation(*target->editorCamera_, flags, translation)))
+    return false;
+  return sceneCamera_.CopyLinkTo(&target->sceneCamera_, translation);
 }
 
 GeListNode* BaseDraw::MakeClone(ULong flags, TransArray* translation)
@@ -152,7 +160,7 @@ Bool ViewPanel::MakeDraws()
   BaseDraw* draws[kDrawCount] = {};
   for (BaseDraw*& draw : draws) {
     draw = MakeBaseDraw();
-    if (draw)
+    if (draw && draw->GetEditorCamera())
       continue;
     for (BaseDraw*& made : draws)
       DeleteObj(made);

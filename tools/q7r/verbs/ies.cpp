@@ -115,7 +115,7 @@ void PrintIES(const IESLight& light)
   Row("vertical angles", AnglesText(light.verticalAngles));
   Row("horizontal angles", AnglesText(light.horizontalAngles));
   Row("maxCandela", NumberText(light.maxCandela));
-  Row("totalFlux", NumberText(light.totalFlux));
+  Row("totalFlux", NumberText(light.GetTotalFlux()));
   Row("lumens", NumberText(light.GetLumens()));
 }
 
@@ -155,7 +155,7 @@ Json IESJson(const IESLight& light)
           {"horizontalAngles", Numbers(light.horizontalAngles)},
           {"candela", RowsJson(light)},
           {"maxCandela", light.maxCandela},
-          {"totalFlux", light.totalFlux}};
+          {"totalFlux", light.GetTotalFlux()}};
 }
 
 void AddIES(CLI::App& program, int& status)

@@ -167,16 +167,36 @@ Real IESLight::SampleIESLight(const Vector& direction) const
   return value > 0.0 ? value : 0.0;
 }
 
-void IESLight::Normalise()
+void IESLight::FindMaximum()
 {
   maxCandela = candela.GetCount() > 0 ? candela[0] : 0.0;
   for (Real value : candela)
     maxCandela = value > maxCandela ? value : maxCandela;
+  fluxIsOpen_ = true;
+}
+
+void IESLight::Normalise()
+{
+  FindMaximum();
+  GetTotalFlux();
+}
+
+Real IESLight::GetTotalFlux() const
+{
+  if (!fluxIsOpen_)
+    return totalFlux_;
   RandomGenerator random(kFluxSeed);
   Real sum = 0.0;
   for (Long i = 0; i < kFluxSamples && candela.GetCount() > 0; ++i) // without a table every sample is 0
     sum += SampleIESLight(DrawDirection(random));
-  totalFlux = sum * kFluxOfSample;
+  fluxIsOpen_ = false;
+  return totalFlux_ = sum * kFluxOfSample;
+}
+
+void IESLight::SetTotalFlux(Real flux)
+{
+  totalFlux_ = flux;
+  fluxIsOpen_ = false;
 }
 
 // The mean all around of the intensities at a vertical angle. A table of a part of the circle stands for the rest by
@@ -220,7 +240,8 @@ IESLight* CopyIESLight(const IESLight* source)
   copy->shape = source->shape;
   copy->size = source->size;
   copy->maxCandela = source->maxCandela;
-  copy->totalFlux = source->totalFlux;
+  copy->totalFlux_ = source->totalFlux_;
+  copy->fluxIsOpen_ = source->fluxIsOpen_;
   if (!CopyText(source->manufacturer, copy->manufacturer) ||
       !CopyText(source->luminaireCatalogue, copy->luminaireCatalogue) ||
       !CopyText(source->luminaire, copy->luminaire) || !CopyText(source->lampCatalogue, copy->lampCatalogue) ||
@@ -255,10 +276,11 @@ Bool IESLight::VisitStored(Visitor& v)
     v.Long(shape);
     v.Vector(size);
   }
-  if (version >= kVersionFlux)
-    VisitNumber(v, version, totalFlux);
-  else if (v.Good())
-    Normalise();
+  Real flux = Visitor::kReading ? 0.0 : GetTotalFlux();
+  if (version < kVersionFlux)
+    FindMaximum();
+  else if (VisitNumber(v, version, flux))
+    SetTotalFlux(flux);
   return v.Good();
 }
 

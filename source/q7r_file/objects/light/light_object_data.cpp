@@ -57,39 +57,41 @@ Long ClampKnotCount(Long count) { return count < 0 ? 0 : count > kMaxLightKnots 
 
 } // namespace
 
-// The factor of a shadow map's size, which old files hold in the place of the size itself.
-struct LightObjectData::OldFactor
+const LightObjectData::Settings& LightObjectData::GetDefaults()
 {
-  Bool present = false;
-  Real value = 0.0;
-};
-
-LightObjectData::LightObjectData()
-{
-  for (const LightParameterRange& range : kLightParameters) {
-    for (Long id = range.first; id <= range.last; ++id) {
-      const LightSlot slot = FindLightSlot(id);
-      switch (slot.kind) {
-      case LightKind::kLong:
-        settings_.longs[slot.index] = static_cast<Long>(range.number);
-        break;
-      case LightKind::kReal:
-        settings_.reals[slot.index] = range.number;
-        break;
-      case LightKind::kBool:
-        settings_.bools[slot.index] = range.number != 0.0;
-        break;
-      case LightKind::kVector:
-        settings_.vectors[slot.index] = Vector(range.number, range.number, range.number);
-        break;
-      case LightKind::kNone:
-        break;
+  static const Settings kDefaults = [] {
+    Settings settings{};
+    for (const LightParameterRange& range : kLightParameters) {
+      for (Long id = range.first; id <= range.last; ++id) {
+        const LightSlot slot = FindLightSlot(id);
+        if (slot.kind == LightKind::kLong)
+          settings.longs[slot.index] = static_cast<Long>(range.number);
+        else if (slot.kind == LightKind::kReal)
+          settings.reals[slot.index] = range.number;
+        else if (slot.kind == LightKind::kBool)
+          settings.bools[slot.index] = range.number != 0.0;
+        else
+          settings.vectors[slot.index] = Vector(range.number, range.number, range.number);
       }
     }
-  }
+    return settings;
+  }();
+  return kDefaults;
 }
 
-LightObjectData::~LightObjectData() { DeleteObj(iesLight_); }
+// The light's own settings, made from the defaults if there are none; null when memory is short.
+LightObjectData::Settings* LightObjectData::NeedSettings()
+{
+  if (!settings_)
+    settings_ = NewObj<Settings>(GetDefaults());
+  return settings_;
+}
+
+LightObjectData::~LightObjectData()
+{
+  DeleteObj(settings_);
+  DeleteObj(iesLight_);
+}
 
 NodeData* MakeLightObjectData() { return NewObj<LightObjectData>(); }
 
@@ -106,16 +108,16 @@ Bool LightObjectData::GetParameter(const ParameterPath& path, GeData& value)
   const LightSlot slot = FindLightSlot(path[0].id);
   switch (slot.kind) {
   case LightKind::kLong:
-    value = GeData(settings_.longs[slot.index]);
+    value = GeData(GetSettings().longs[slot.index]);
     return true;
   case LightKind::kReal:
-    value = GeData(settings_.reals[slot.index]);
+    value = GeData(GetSettings().reals[slot.index]);
     return true;
   case LightKind::kBool:
-    value = GeData(settings_.bools[slot.index]);
+    value = GeData(GetSettings().bools[slot.index]);
     return true;
   case LightKind::kVector:
-    return GetVectorParameter(settings_.vectors[slot.index], path, value);
+    return GetVectorParameter(GetSettings().vectors[slot.index], path, value);
   default:
     return NodeData::GetParameter(path, value);
   }
@@ -124,74 +126,114 @@ Bool LightObjectData::GetParameter(const ParameterPath& path, GeData& value)
 Bool LightObjectData::SetParameter(const ParameterPath& path, const GeData& value)
 {
   const LightSlot slot = FindLightSlot(path[0].id);
+  if (slot.kind == LightKind::kNone)
+    return NodeData::SetParameter(path, value);
+  if (!NeedSettings())
+    return true;
   switch (slot.kind) {
   case LightKind::kLong:
-    settings_.longs[slot.index] = path[0].id == kLightKnotCount ? ClampKnotCount(value.GetLong()) : value.GetLong();
+    settings_->longs[slot.index] = path[0].id == kLightKnotCount ? ClampKnotCount(value.GetLong()) : value.GetLong();
     return true;
   case LightKind::kReal:
-    settings_.reals[slot.index] = value.GetReal();
+    settings_->reals[slot.index] = value.GetReal();
     return true;
   case LightKind::kBool:
-    settings_.bools[slot.index] = value.GetBool();
+    settings_->bools[slot.index] = value.GetBool();
     return true;
   case LightKind::kVector:
-    return SetVectorParameter(settings_.vectors[slot.index], path, value);
-  default:
-    return NodeData::SetParameter(path, value);
+    return SetVectorParameter(settings_->vectors[slot.index], path, value);
+  case LightKind::kNone:
+    break;
   }
+  return false;
 }
 
+// The body of a light in a file: the settings in their order.
+struct LightBody
+{
+  LightObjectData& light;
+  LightObjectData::Settings& settings;
+  // The factor of a shadow map's size, which old files hold in the place of the size itself.
+  Bool hasOldFactor = false;
+  Real oldFactor = 0.0;
+
+  template <class Visitor>
+  Bool VisitBody(Visitor& visitor);
+  template <class Visitor>
+  void VisitKnots(Visitor& visitor);
+  template <class Visitor>
+  void VisitFirstGroups(Visitor& visitor);
+  template <class Visitor>
+  void VisitMainGroup(Visitor& visitor);
+  template <class Visitor>
+  void VisitLaterGroups(Visitor& visitor);
+  template <class Visitor>
+  void VisitExtraBlock(Visitor& visitor);
+  template <class Visitor>
+  void VisitIES(Visitor& visitor);
+  template <Long... ids, class Visitor>
+  void VisitFields(Visitor& visitor);
+  template <Long id, class Visitor>
+  void VisitField(Visitor& visitor);
+  template <Long id>
+  Long& LongOf();
+  template <Long id>
+  Real& RealOf();
+  void TakeOldFactor();
+  void SplitOldVector();
+};
+
 template <Long id>
-Real& LightObjectData::RealOf()
+Real& LightBody::RealOf()
 {
   constexpr LightSlot kSlot = FindLightSlot(id);
   static_assert(kSlot.kind == LightKind::kReal);
-  return settings_.reals[kSlot.index];
+  return settings.reals[kSlot.index];
 }
 
 template <Long id>
-Long& LightObjectData::LongOf()
+Long& LightBody::LongOf()
 {
   constexpr LightSlot kSlot = FindLightSlot(id);
   static_assert(kSlot.kind == LightKind::kLong);
-  return settings_.longs[kSlot.index];
+  return settings.longs[kSlot.index];
 }
 
 template <Long id, class Visitor>
-void LightObjectData::VisitField(Visitor& v)
+void LightBody::VisitField(Visitor& v)
 {
   constexpr LightSlot kSlot = FindLightSlot(id);
   static_assert(kSlot.kind != LightKind::kNone, "no parameter has this id");
   if constexpr (kSlot.kind == LightKind::kLong)
-    v.Long(settings_.longs[kSlot.index]);
+    v.Long(settings.longs[kSlot.index]);
   else if constexpr (kSlot.kind == LightKind::kReal)
-    v.Real(settings_.reals[kSlot.index]);
+    v.Real(settings.reals[kSlot.index]);
   else if constexpr (kSlot.kind == LightKind::kBool)
-    v.Bool(settings_.bools[kSlot.index]);
+    v.Bool(settings.bools[kSlot.index]);
   else
-    v.Vector(settings_.vectors[kSlot.index]);
+    v.Vector(settings.vectors[kSlot.index]);
 }
 
 template <Long... ids, class Visitor>
-void LightObjectData::VisitFields(Visitor& v)
+void LightBody::VisitFields(Visitor& v)
 {
   (VisitField<ids>(v), ...);
 }
 
 // The records that kLightKnotCount counts. What a file holds beyond the places for them is dropped.
 template <class Visitor>
-void LightObjectData::VisitKnots(Visitor& v)
+void LightBody::VisitKnots(Visitor& v)
 {
   Long& count = LongOf<kLightKnotCount>();
   for (Long i = 0; i < count && v.Good(); ++i) {
     LightKnot beyond;
-    VisitKnot(v, i < kMaxLightKnots ? settings_.knots[i] : beyond);
+    VisitKnot(v, i < kMaxLightKnots ? settings.knots[i] : beyond);
   }
   count = ClampKnotCount(count);
 }
 
 template <class Visitor>
-void LightObjectData::VisitFirstGroups(Visitor& v)
+void LightBody::VisitFirstGroups(Visitor& v)
 {
   const Bool oldest = v.VersionBelow(kVersionNodeHeader);
   VisitFields<80002, 80003, 80000, 80001, kLightKnotCount, 80014, 80015, 80007, 80008, 80009, 80010>(v);
@@ -228,7 +270,7 @@ void LightObjectData::VisitFirstGroups(Visitor& v)
 }
 
 template <class Visitor>
-void LightObjectData::VisitMainGroup(Visitor& v)
+void LightBody::VisitMainGroup(Visitor& v)
 {
   VisitFields<kLightColor, kLightBrightness, kLightType, kLightShadow, 90004, 90005>(v);
   VisitFields<90006, 90008, 90007, 90009>(v);
@@ -241,14 +283,14 @@ void LightObjectData::VisitMainGroup(Visitor& v)
 }
 
 template <class Visitor>
-void LightObjectData::VisitLaterGroups(Visitor& v, OldFactor& factor)
+void LightBody::VisitLaterGroups(Visitor& v)
 {
   if (HoldsLevel(v, 1, kTagBool)) {
     VisitFields<70022>(v);
-    factor.value = RealOf<90032>();
-    factor.present = v.Real(factor.value);
+    oldFactor = RealOf<90032>();
+    hasOldFactor = v.Real(oldFactor);
   } else {
-    settings_.bools[FindLightSlot(70022).index] = true;
+    settings.bools[FindLightSlot(70022).index] = true;
   }
   if (HoldsLevel(v, 2, kTagVector))
     VisitFields<60009, 60003, 50015>(v);
@@ -262,10 +304,10 @@ void LightObjectData::VisitLaterGroups(Visitor& v, OldFactor& factor)
 }
 
 template <class Visitor>
-void LightObjectData::VisitExtraBlock(Visitor& v)
+void LightBody::VisitExtraBlock(Visitor& v)
 {
-  VisitKnot(v, settings_.extraBlock.head);
-  for (LightExtraBlock::Layer& layer : settings_.extraBlock.layers) {
+  VisitKnot(v, settings.extraBlock.head);
+  for (LightExtraBlock::Layer& layer : settings.extraBlock.layers) {
     for (Bool& flag : layer.flags)
       v.Bool(flag);
     for (Long& mode : layer.modes)
@@ -275,33 +317,33 @@ void LightObjectData::VisitExtraBlock(Visitor& v)
     v.Vector(layer.color);
     v.Long(layer.last);
   }
-  for (LightKnot& knot : settings_.extraBlock.knots)
+  for (LightKnot& knot : settings.extraBlock.knots)
     VisitKnot(v, knot);
 }
 
 // A distribution that reads badly is left out, and the light is read all the same; one that could not be read again
 // isn't written.
 template <class Visitor>
-void LightObjectData::VisitIES(Visitor& v)
+void LightBody::VisitIES(Visitor& v)
 {
-  Bool present = iesLight_ && iesLight_->IsComplete();
+  Bool present = light.iesLight_ && light.iesLight_->IsComplete();
   if (!v.Bool(present) || !present)
     return;
   if constexpr (Visitor::kReading) {
-    AdoptIES(NewObj<IESLight>());
-    if (iesLight_ && !iesLight_->Read(v.File()))
-      DeleteObj(iesLight_);
+    light.AdoptIES(NewObj<IESLight>());
+    if (light.iesLight_ && !light.iesLight_->Read(v.File()))
+      DeleteObj(light.iesLight_);
   } else {
-    v.Note(iesLight_->Write(v.File()));
+    v.Note(light.iesLight_->Write(v.File()));
   }
 }
 
 template <class Visitor>
-Bool LightObjectData::VisitBody(Visitor& v, OldFactor& factor)
+Bool LightBody::VisitBody(Visitor& v)
 {
   VisitFirstGroups(v);
   VisitMainGroup(v);
-  VisitLaterGroups(v, factor);
+  VisitLaterGroups(v);
   if (v.VersionBelow(kVersionNodeHeader))
     return v.Good();
   VisitExtraBlock(v);
@@ -315,26 +357,19 @@ Bool LightObjectData::VisitBody(Visitor& v, OldFactor& factor)
   return v.Good();
 }
 
-void LightObjectData::WriteChunks(HyperFile& file)
+void LightBody::TakeOldFactor()
 {
-  ChunkWriter writer(file, kLevelLight);
-  OldFactor factor;
-  VisitBody(writer, factor);
-}
-
-void LightObjectData::TakeOldFactor(Real factor)
-{
-  Real size = factor * kOldMapFactor;
+  Real size = oldFactor * kOldMapFactor;
   size = !(size > kOldSmallestMap) ? kOldSmallestMap : size > kOldLargestMap ? kOldLargestMap : size;
-  if (node_)
-    node_->GetDataInstance().SetLong(kKeyMapSize, static_cast<Long>(size));
+  if (light.node_)
+    light.node_->GetDataInstance().SetLong(kKeyMapSize, static_cast<Long>(size));
 }
 
 // The oldest files hold a strength and a colour as one Vector.
-void LightObjectData::SplitOldVector()
+void LightBody::SplitOldVector()
 {
   constexpr LightSlot kSlot = FindLightSlot(70028);
-  Vector& color = settings_.vectors[kSlot.index];
+  Vector& color = settings.vectors[kSlot.index];
   const Real largest =
       color.x > color.y ? (color.x > color.z ? color.x : color.z) : (color.y > color.z ? color.y : color.z);
   RealOf<70027>() = largest;
@@ -342,17 +377,29 @@ void LightObjectData::SplitOldVector()
     color = Vector(color.x / largest, color.y / largest, color.z / largest);
 }
 
+void LightObjectData::WriteChunks(HyperFile& file)
+{
+  if (!NeedSettings())
+    return file.SetError(FILEERROR_MEMORY);
+  ChunkWriter writer(file, kLevelLight);
+  LightBody{*this, *settings_}.VisitBody(writer);
+}
+
 Bool LightObjectData::ReadData(HyperFile& file, Long id, Long level)
 {
   if (id != kChunkNodeData)
     return false;
+  if (!NeedSettings()) {
+    file.SetError(FILEERROR_MEMORY);
+    return false;
+  }
   ChunkReader reader(file, level);
-  OldFactor factor;
-  const Bool read = VisitBody(reader, factor);
-  if (factor.present && file.GetFileVersion() < kVersionLightSize)
-    TakeOldFactor(factor.value);
+  LightBody body{*this, *settings_};
+  const Bool read = body.VisitBody(reader);
+  if (body.hasOldFactor && file.GetFileVersion() < kVersionLightSize)
+    body.TakeOldFactor();
   if (read && file.GetFileVersion() < kVersionNodeHeader)
-    SplitOldVector();
+    body.SplitOldVector();
   return read;
 }
 
@@ -363,7 +410,12 @@ Bool LightObjectData::CopyTo(PrivateChunk& destination, ULong flags, TransArray*
     return false;
   if (target == this)
     return true;
-  target->settings_ = settings_;
+  if (!settings_)
+    DeleteObj(target->settings_);
+  else if (target->NeedSettings())
+    *target->settings_ = *settings_;
+  else
+    return false;
   target->AdoptIES(CopyIESLight(iesLight_));
   return !iesLight_ || target->iesLight_;
 }

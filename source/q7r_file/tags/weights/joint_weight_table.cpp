@@ -118,14 +118,6 @@ namespace
 
 LLong LengthOf(const WeightRun& run) { return LLong{run.last} - run.first + 1; }
 
-// With room to spare, so that points that come one by one don't move the array each time.
-Bool Lengthen(GeTempDynArray<UWord>& array, Long count)
-{
-  if (count > array.GetCapacity() && array.GetCapacity() < INT32_MAX / 2 && count < 2 * array.GetCapacity())
-    array.Reserve(2 * array.GetCapacity());
-  return array.SetCount(count);
-}
-
 } // namespace
 
 LLong WeightRuns::GetWeightCount() const
@@ -222,33 +214,29 @@ Bool WeightRuns::Remove(Long run, Long point)
   return true;
 }
 
-Bool WeightRuns::SetAll(const UWord* values, Long count)
+Bool WeightRuns::Append(Long point, UWord value)
+{
+  if (value == 0)
+    return true;
+  const Long place = values_.GetCount();
+  if (!values_.Append(value))
+    return false;
+  WeightRun* last = runs_.GetCount() > 0 ? &runs_[runs_.GetCount() - 1] : nullptr;
+  if (last && last->last + 1 == point) {
+    last->last = point;
+    return true;
+  }
+  if (runs_.Append({point, point, place}))
+    return true;
+  values_.Pop();
+  return false;
+}
+
+void WeightRuns::Reset()
 {
   runs_.Reset();
   values_.Reset();
   packed_ = true;
-  for (Long point = 0; point < count; ++point) {
-    if (values[point] == 0)
-      continue;
-    const Long place = values_.GetCount();
-    WeightRun* last = runs_.GetCount() > 0 ? &runs_[runs_.GetCount() - 1] : nullptr;
-    if (last && last->last + 1 == point)
-      last->last = point;
-    else if (!runs_.Append({point, point, place}))
-      return false;
-    if (!values_.Append(values[point]))
-      return false;
-  }
-  return true;
-}
-
-void WeightRuns::GetAll(UWord* values, Long count) const
-{
-  for (const WeightRun& run : runs_) {
-    const LLong length = LengthOf(run) < LLong{count} - run.first ? LengthOf(run) : LLong{count} - run.first;
-    if (length > 0)
-      GeCopyMem(values + run.first, values_.Data() + run.offset, length * static_cast<LLong>(sizeof(UWord)));
-  }
 }
 
 // Runs of a file: in order, without overlaps, with values of their own.
@@ -335,7 +323,7 @@ Real JointWeightTable::ReadPointWeight(Long point) const
   ReadGuard guard(lock_);
   if (!edited_)
     return runs_.Get(point) / kFullWeight;
-  return point >= 0 && point < dense_.GetCount() ? dense_[point] / kFullWeight : 0.0;
+  return point >= 0 ? pages_.Get(point) / kFullWeight : 0.0;
 }
 
 Bool JointWeightTable::WritePointWeight(Long point, Real weight)
@@ -344,16 +332,7 @@ Bool JointWeightTable::WritePointWeight(Long point, Real weight)
   if (point < 0)
     return false;
   const UWord value = PackWeight(weight);
-  if (!edited_)
-    return runs_.Set(point, value);
-  if (point >= dense_.GetCount()) {
-    if (value == 0)
-      return true;
-    if (point == INT32_MAX || !Lengthen(dense_, point + 1))
-      return false;
-  }
-  dense_[point] = value;
-  return true;
+  return edited_ ? pages_.Set(point, value) : runs_.Set(point, value);
 }
 
 Long JointWeightTable::GetWeightCount() const
@@ -382,12 +361,10 @@ Bool JointWeightTable::BeginEdit(Long pointCount)
   WriteGuard guard(lock_);
   if (edited_)
     return true;
-  const LLong count = pointCount > runs_.GetEnd() ? pointCount : runs_.GetEnd();
-  if (count > INT32_MAX || !dense_.SetCount(static_cast<Long>(count)))
-    return false;
-  runs_.GetAll(dense_.Data(), dense_.GetCount());
-  edited_ = true;
-  return true;
+  edited_ = pages_.Reserve(pointCount) && pages_.Take(runs_);
+  if (!edited_)
+    pages_.Flush();
+  return edited_;
 }
 
 Bool JointWeightTable::EndEdit()
@@ -395,9 +372,9 @@ Bool JointWeightTable::EndEdit()
   WriteGuard guard(lock_);
   if (!edited_)
     return true;
-  if (!runs_.SetAll(dense_.Data(), dense_.GetCount()))
+  if (!pages_.Give(runs_))
     return false;
-  dense_.Flush();
+  pages_.Flush();
   edited_ = false;
   return true;
 }
@@ -437,7 +414,7 @@ Bool JointWeightTable::Write(HyperFile& file) const
   if (!edited_)
     return WriteContent(file, runs_);
   WeightRuns edited;
-  if (!edited.SetAll(dense_.Data(), dense_.GetCount())) {
+  if (!pages_.Give(edited)) {
     file.SetError(FILEERROR_MEMORY);
     return false;
   }
@@ -470,7 +447,7 @@ Bool JointWeightTable::CopyTo(JointWeightTable& destination) const
 Bool JointWeightTable::CopyContent(JointWeightTable& destination) const
 {
   destination.edited_ = edited_;
-  return runs_.CopyTo(destination.runs_) && list_.CopyTo(destination.list_) && dense_.CopyTo(destination.dense_);
+  return runs_.CopyTo(destination.runs_) && list_.CopyTo(destination.list_) && pages_.CopyTo(destination.pages_);
 }
 
 void JointWeightTable::Flush()
@@ -483,7 +460,7 @@ void JointWeightTable::FlushContent()
 {
   runs_.Flush();
   list_.Flush();
-  dense_.Flush();
+  pages_.Flush();
   edited_ = false;
 }
 
