@@ -12,6 +12,7 @@ namespace _torvane_
 namespace
 {
 
+// What readers of the log know these reports by.
 constexpr Long kLineGradientGet = 1235;
 constexpr Long kLineGradientSet = 1259;
 

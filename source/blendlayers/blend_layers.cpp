@@ -12,6 +12,7 @@ namespace _torvane_
 namespace
 {
 
+// What readers of the log know these reports by.
 constexpr Long kLineAllocObject = 16;
 constexpr Long kLineUnknownType = 41;
 constexpr Long kLineReadUnknownType = 152;

@@ -16,7 +16,7 @@ namespace
 {
 
 constexpr const char* kModule = "int_customgui_gradient";
-constexpr Long kLineStaleCache = 107;
+constexpr Long kLineStaleCache = 107; // what readers of the log know the report by
 
 constexpr Vector kWhite(1.0, 1.0, 1.0);
 

@@ -8,6 +8,9 @@ namespace
 {
 
 constexpr const char* kModule = "q7r_smart_link";
+// What readers of the log know these reports by.
+constexpr Long kLineOfGoal = 794;
+constexpr Long kLineOfLink = 843;
 constexpr LLong kFirstTable = 16;
 constexpr Long kFirstBlock = 8;
 constexpr Long kLargestBlock = 1024;
@@ -121,7 +124,7 @@ Bool TransArray::RegisterGoal(GeAliasID id, GeAliasGoal& goal)
   if (GeAliasGoal* present = entry->current.GetGoal())
     present->MoveLinksTo(goal);
   else
-    ReportAssertion(kModule, 794, "the goal of this id has gone");
+    ReportAssertion(kModule, kLineOfGoal, "the goal of this id has gone");
   return true;
 }
 
@@ -137,7 +140,7 @@ Bool TransArray::RegisterLink(GeAliasID id, GeAliasLink& link, GeAliasGoal* sour
     return false;
   GeAliasGoal* goal = entry->current.GetGoal();
   if (!goal) {
-    ReportAssertion(kModule, 843, "the goal of this id has gone");
+    ReportAssertion(kModule, kLineOfLink, "the goal of this id has gone");
     return true;
   }
   if (!link.SetLinkGoal(goal))

@@ -1,4 +1,6 @@
 // The place of a layer's object: anchors, parents, rotation, targets, and what all kinds of layer share.
+#include <algorithm>
+
 #include <gtest/gtest.h>
 
 #include "export_fixture.h"
@@ -193,6 +195,34 @@ TEST(Layers, CarryTheirIdAndSwitches)
     EXPECT_EQ(object.GetRenderMode() == 1, mode == 1) << name;
   }
   EXPECT_EQ(exported.Root()->GetDataInstance().GetLong(kLayerId, -1), -1);
+}
+
+// The calls in which an export fails when each of them in turn is made to.
+std::vector<std::string> CallsOf(const std::string& json)
+{
+  std::vector<std::string> calls;
+  for (std::uint64_t n = 1;; ++n) {
+    host::StandaloneHost host(host::LoadCompositionText(json, "test.json", "/"));
+    host.Start(EntryPointFunc);
+    const std::uint64_t started = host.CallCount();
+    host.FailCall(started + n);
+    const Owned<BaseDocument> document(BaseDocument::Alloc());
+    exporter::ExportComposition(document.get());
+    if (started + n > host.CallCount())
+      return calls;
+    calls.push_back(host.LastError().substr(0, host.LastError().find(':')));
+  }
+}
+
+TEST(LayerPlace, AsksForTheSizeOfTheParentBehindTheValuesOfTheLayer)
+{
+  const std::vector<std::string> calls =
+      CallsOf(Composition(Child(R"("parent":9)") + "," + Layer(3, "P", "", R"("ind":9)")));
+  const auto named = std::find(calls.begin(), calls.end(), "AEGP_GetLayerID");
+  const auto next = std::find(named, calls.end(), "AEGP_GetCompLayerByIndex");
+  const auto value = std::find(named, next, "AEGP_GetNewStreamValue");
+  ASSERT_NE(value, next);
+  EXPECT_NE(std::find(value, next, "AEGP_GetItemDimensions"), next);
 }
 
 } // namespace
