@@ -3,6 +3,7 @@
 #include <cstddef>
 #include <cstdint>
 
+#include "support/document_invariants.h"
 #include "torvane/document/base_document.h"
 #include "torvane/memory/assertion.h"
 #include "torvane/stream/hyper_file.h"
@@ -32,12 +33,15 @@ void WriteAndReadAgain(BaseDocument& document)
   Filename name;
   name.SetMemoryWrite(&description);
   FileProblem problem;
-  Require(SaveDocument(&document, name, 0, &problem) && problem.code == FILEERROR_NONE);
+  Require(SaveDocument(&document, name, 0, &problem));
+  if (problem.code == FILEERROR_TOO_DEEP) // old files say less of each node: they may nest deeper
+    return;
+  Require(problem.code == FILEERROR_NONE);
   const void* data = nullptr;
   LLong size = 0;
   Require(name.GetMemoryContinuous(data, size));
   BaseDocument* again = Load(data, size, problem);
-  Require(again != nullptr);
+  Require(again && !DocumentInvariants::FindBroken(*again));
   BaseDocument::Free(again);
 }
 
@@ -51,9 +55,12 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
   Require(document || problem.code != FILEERROR_NONE);
   if (!document)
     return 0;
+  Require(!DocumentInvariants::FindBroken(*document));
   WriteAndReadAgain(*document);
   BaseDocument* copy = BaseDocument::Alloc();
-  Require(copy && document->CopyWithTranslation(*copy, 0, nullptr));
+  // An object of a type that has no class can't be copied; what fails leaves nothing behind.
+  Require(copy && (document->CopyWithTranslation(*copy, 0, nullptr) || !copy->GetFirstObject()));
+  Require(!DocumentInvariants::FindBroken(*copy));
   BaseDocument::Free(copy);
   BaseDocument::Free(document);
   return 0;

@@ -4,6 +4,7 @@
 #include "q7r_file/node_bytes.h"
 #include "support/assertion_counter.h"
 #include "support/counting_memory.h"
+#include "support/scene_bytes.h"
 #include "torvane/torvane.h"
 
 namespace
@@ -124,6 +125,26 @@ TEST(NodeKind, WhatLeavesItsListForgetsWhereItStood)
   EXPECT_EQ(material->GetListHead(), nullptr);
   DeleteObj(parent);
   DeleteObj(material);
+}
+
+TEST(NodeKind, TheCheckOfADocumentSeesWhatIsBroken)
+{
+  DocumentPtr document = NewDocument();
+  BaseObject* object = AllocObject(kObjectCamera);
+  document->InsertObject(object);
+  BaseTag* tag = object->MakeTag(kTagProtection);
+  EXPECT_EQ(DocumentInvariants::FindBroken(*document), nullptr);
+  const auto breaks = [&](auto&& change, auto&& mend) {
+    change();
+    EXPECT_NE(DocumentInvariants::FindBroken(*document), nullptr);
+    mend();
+    EXPECT_EQ(DocumentInvariants::FindBroken(*document), nullptr);
+  };
+  breaks([&] { tag->SetObject(nullptr); }, [&] { tag->SetObject(object); });
+  breaks([&] { tag->SetDocument(nullptr); }, [&] { tag->SetDocument(document.get()); });
+  breaks([&] { object->SetListHead(&object->GetTagRoot()); }, [&] { object->SetListHead(document->GetObjectRoot()); });
+  breaks([&] { object->GetObjectData()->SetNode(tag); }, [&] { object->GetObjectData()->SetNode(object); });
+  breaks([&] { object->GetTagRoot().SetOwner(nullptr); }, [&] { object->GetTagRoot().SetOwner(object); });
 }
 
 TEST(NodeKind, ALinkToAnythingGivesOnlyWhatIsAskedFor)
