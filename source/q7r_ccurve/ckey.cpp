@@ -88,7 +88,7 @@ Bool CKey::ReadChunk(HyperFile& file, Long id, Long level)
 {
   if (BaseList2D::ReadChunk(file, id, level))
     return true;
-  return id == kChunkKey && ReadChunkBody(file, level, [this](ChunkReader& v) { return VisitBody(v); });
+  return id == kChunkKey && level >= 0 && ReadChunkBody(file, level, [this](ChunkReader& v) { return VisitBody(v); });
 }
 
 Bool CKey::CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation)

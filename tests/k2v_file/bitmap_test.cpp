@@ -226,6 +226,16 @@ TEST(BmpFiles, KeepTheRowsBeforeACut)
   }
 }
 
+TEST(BmpFiles, CutInTheHeaderAreRefusedWhateverTheirWidth)
+{
+  const Bytes whole = With(FromHex(kSmallBmp), 18, 0);
+  for (std::size_t size = 30; size < 54; ++size) {
+    Bitmap bitmap;
+    EXPECT_EQ(IMAGERESULT_FILE,
+              LoadFromMemory(BmpLoader(), Bytes(whole.begin(), whole.begin() + static_cast<long>(size)), bitmap));
+  }
+}
+
 TEST(ImageValues, HoldAPictureSavedInTheWantedFormat)
 {
   Bitmap bitmap;

@@ -300,20 +300,59 @@ TEST_F(GeDataTest, TakesTheUnitScaleOfASinglePrecisionFile)
   EXPECT_EQ(value.GetCustomDataType(kCustomGradient), nullptr);
 }
 
-// Such a body, kept as it is, would throw the double-precision file that it is written to out of step.
-TEST_F(GeDataTest, WidensTheRealsOfBodiesThatAreKeptFromASinglePrecisionFile)
+// What a kept body holds in a file of that version and precision, and what it must hold in a current one: in another
+// form it would throw everything behind it out of step.
+ByteWriter KeptBody(Long type, std::int32_t version, std::uint8_t precision, bool current)
 {
-  for (Long type : {1011153, 1000486}) {
-    const auto compose = [&](bool single) {
-      ByteWriter body;
-      body.Header("Q7R6", 13000, single ? 1 : 0).Long(type).Start(0, 3).Long(7).Real(0.5).Time(1, 25);
-      body.Vector(1, 2, 3).Start(9, 0).IdentityMatrix().String(u"x").SReal(2.5F).LReal(3.5).End().Memory("ab").End();
-      return body.bytes;
-    };
-    MemoryReadFile source(compose(true));
-    GeData value;
-    ASSERT_TRUE(value.Read(source.file));
-    EXPECT_EQ(ToHex(WriteToMemory([&](HyperFile& file) { value.Write(file); }, true)), ToHex(compose(false)));
+  const bool single = precision != 0;
+  const bool columns = single || version < 11925;
+  ByteWriter body;
+  body.Header("Q7R6", current ? 13000 : version, current ? 0 : precision).Long(type).Start(0, 3).Long(7).Real(0.5);
+  body.Time(1, 25).Vector(1, 2, 3).Start(9, 0).IdentityMatrix().String(u"x").LReal(3.5).End().Memory("ab");
+  const auto reals = [&](int count) {
+    for (int i = 0; i < count; ++i)
+      body.RawReal(i + 0.5);
+  };
+  // Two points by count and by bytes; an old array of two elements of 44 bytes that take 84.
+  body.U8(133).U32(current && columns ? 48 : 24);
+  reals(columns ? 6 : 3);
+  const int bytes = !single && columns ? 168 : 88;
+  body.U8(136).U32(current ? static_cast<std::uint32_t>(bytes) : 88);
+  body.bytes.resize(body.bytes.size() + static_cast<std::size_t>(bytes), 0x61);
+  if (version < 11904 && !current)
+    body.OldArrayHead(5, 8).F32(1).F32(2);
+  else
+    body.ArrayHead(5, 8).F32(1).F32(2);
+  // An old container with another one in it, whose lengths tell the bytes behind them.
+  const std::uint32_t inner = 5 + 5 + 1 + (body.singlePrecision ? 4 : 8) + 5;
+  body.U8(132).U32(5 + 5 + 5 + 5 + inner + 5 + 7 + 5).Long(3).I32(1).U8(128).I32(2).U8(132);
+  body.U8(132).U32(inner).Long(4).I32(1).U8(19).Real(0.25).I32(-1).U8(3);
+  body.I32(3).U8(130).String(u"y").I32(-1).U8(3);
+  // One of another form is left as it is.
+  return body.Block(132, {15, 0, 0, 0, 1, 0, 0, 0, 1, 19, 19, 0, 0}).Real(0.75).End();
+}
+
+// They would become truth values.
+static_assert(!std::is_constructible_v<GeData, const char*> && !std::is_constructible_v<GeData, GeData*> &&
+              std::is_constructible_v<GeData, void*>);
+
+TEST_F(GeDataTest, KeepsBodiesInTheFormThatCurrentFilesHave)
+{
+  for (auto [version, precision] : {std::pair{13000, 1}, {13000, 0}, {11924, 0}, {11924, 1}, {11903, 0}, {11903, 1}}) {
+    for (Long type : {1011153, 1000486}) {
+      SCOPED_TRACE(std::to_string(version) + "/" + std::to_string(precision) + " " + std::to_string(type));
+      const auto single = static_cast<std::uint8_t>(precision);
+      MemoryReadFile source(KeptBody(type, version, single, false).bytes);
+      GeData value;
+      ASSERT_TRUE(value.Read(source.file));
+      const auto written = WriteToMemory([&](HyperFile& file) { value.Write(file); }, true);
+      EXPECT_EQ(ToHex(written), ToHex(KeptBody(type, version, single, true).bytes));
+      MemoryReadFile again(written);
+      Long id = 0;
+      EXPECT_TRUE(again.file.ReadLong(id) && again.file.ExpectTag(kTagChunkStart) &&
+                  again.file.SkipValue(kTagChunkStart));
+      EXPECT_TRUE(again.file.SkipToEndChunk() && again.file.GetPosition() == again.file.GetLength());
+    }
   }
 }
 

@@ -212,12 +212,13 @@ TEST(HyperFileRawChunk, FailsWithoutALeakWhereverItIsCut)
   }
 }
 
-TEST(HyperFileContainer, WritesEveryKindButPointers)
+TEST(HyperFileContainer, WritesEveryKindThatCanBeReadAgain)
 {
   counting_memory::BalanceCheck balance;
   BaseContainer container(9);
   container.SetLong(1, -7);
   container.SetPointer(3, &container);
+  container.InsertData(3, GeData())->SetType(kDataRawBlock);
   BaseContainer nested(10);
   nested.SetReal(4, 1.5);
   container.SetContainer(2, nested);
@@ -226,7 +227,6 @@ TEST(HyperFileContainer, WritesEveryKindButPointers)
   EXPECT_EQ(ToHex(written), ToHex(SmallContainerBytes()));
   EXPECT_EQ(ToHex(Bytes(written.begin(), written.begin() + 24)),
             "01 00 00 00 84 00 00 00 01 0F 00 00 00 09 0F 00 00 00 01 0F 00 00 00 0F");
-  container.RemoveData(3);
   MemoryReadFile read(ByteWriter().Header().Append(written).Long(77).bytes);
   BaseContainer found;
   found.SetLong(50, 1);
@@ -352,4 +352,38 @@ TEST(HyperFileContainer, ReadsTheOldFormOfEveryKind)
   MemoryReadFile wrongEnd(compose(0));
   BaseContainer container;
   EXPECT_FALSE(wrongEnd.file.ReadContainer(container, true));
+}
+
+// Old containers with many entries, with many containers, and with one container in many parts: the work grows as the
+// file does.
+TEST(HyperFileContainer, FindsTheElementsOfOldContainersWithoutASearch)
+{
+  const int count = 20000;
+  const auto end = [](ByteWriter& writer) { writer.I32(-1).U8(3); };
+  const auto open = [](ByteWriter& writer, int id) { writer.I32(id).U8(132).U8(132).U32(0).Long(1); };
+  for (int shape = 0; shape < 4; ++shape) {
+    ByteWriter writer;
+    writer.Header("Q7R6", 7000).U8(132).U32(0).Long(9);
+    if (shape == 0)
+      open(writer, 5);
+    for (int i = count; i > 0; --i) {
+      if (shape > 0)
+        open(writer, shape == 1 ? i : 5);
+      if (shape > 1)
+        open(writer, shape == 2 ? i : 6);
+      writer.I32(i).U8(15).Long(i);
+      for (int level = 0; level < shape && level < 2; ++level)
+        end(writer);
+    }
+    if (shape == 0)
+      end(writer);
+    end(writer);
+    MemoryReadFile read(writer.bytes);
+    BaseContainer container;
+    ASSERT_TRUE(read.file.ReadContainer(container, true)) << shape;
+    EXPECT_LE(read.file.GetLookupCount(), 12LL * count) << shape;
+    const BaseContainer* inner = shape == 1 ? &container : container.GetContainerInstance(5);
+    inner = shape == 3 ? inner->GetContainerInstance(6) : inner;
+    EXPECT_TRUE(inner->GetCount() == count && inner->GetIndexId(0) == count);
+  }
 }

@@ -459,3 +459,19 @@ TEST(HyperFile, RefusesWhatDoesNotFitItsMode)
   HyperFile closed;
   EXPECT_FALSE(closed.WriteLong(1));
 }
+
+TEST(HyperFile, ReportsTheLineOfEachFailure)
+{
+  AssertionCounter log;
+  MemoryReadFile a(ByteWriter().Header().Long(1).bytes);
+  MemoryReadFile b(ByteWriter().Header().bytes);
+  Real number = 0;
+  EXPECT_FALSE(a.file.ReadReal(number));
+  const Long first = log.GetLastLine();
+  a.file.SetError(FILEERROR_MEMORY);
+  const Long second = log.GetLastLine();
+  EXPECT_EQ(second, __LINE__ - 2);
+  EXPECT_FALSE(b.file.Fail(FILEERROR_MEMORY, 0));
+  EXPECT_EQ(log.GetLastLine(), __LINE__ - 1);
+  EXPECT_NE(first, second);
+}

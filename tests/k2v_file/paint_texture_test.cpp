@@ -300,6 +300,10 @@ TEST(PaintTextures, FailOnWhatCannotBe)
   ByteWriter manyEmpty;
   for (int i = 0; i < 20000; ++i)
     manyEmpty.UChar(1).Memory(Bytes());
+  ByteWriter lists;
+  lists.Append(start).Start(599, 0);
+  for (int i = 0; i < 4000; ++i)
+    lists.Start(110100, 0);
   const struct
   {
     const char* name;
@@ -310,6 +314,7 @@ TEST(PaintTextures, FailOnWhatCannotBe)
       {"pixels of an older form", ByteWriter().Append(start).Start(kPixels, 1).End().End().bytes, "error -7"},
       {"a string for a size", ByteWriter().Append(start).Start(kTexture, 1).String(u"4").End().End().bytes,
        "error -100"},
+      {"lists in lists", lists.bytes, "error -103"},
       {"no rows", AlphaFile(2, 3, 1, 1, empty), "error -100"},
       {"wider than the file explains", AlphaFile(2, 2147483647, 1, 1, empty), "error -100"},
       {"more components than the file explains", AlphaFile(2, 3, 1, 2147483647, empty), "error -100"},

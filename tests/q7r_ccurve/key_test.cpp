@@ -23,6 +23,21 @@ void Fill(CKey& key)
   key.SetGeData(nullptr, Long{7});
 }
 
+TEST(Key, ReadsItsChunkAtAnyLevel)
+{
+  for (Long level : {-1, 0, 5}) { // the first is none of its levels
+    ByteWriter w;
+    w.Start(110416, level).Time(3, 2).Time(-1, 4).Time(1, 8).Real(1.5).Real(-5).Real(6).Long(3).Long(15).Long(7);
+    if (level > 0)
+      w.String(u"of a newer program").Start(1, 1).End();
+    CKey key;
+    CKey expected;
+    Fill(expected);
+    EXPECT_TRUE(ReadInto(key, w.End().bytes));
+    EXPECT_EQ(key.IsEqual(expected), level >= 0) << level;
+  }
+}
+
 TEST(Key, ParametersReachFieldsAndBits)
 {
   CKey key;

@@ -182,7 +182,7 @@ TEST(DocumentFile, RefusesWhatIsNoSceneFile)
       {"a value inside the frame", ByteWriter().Header().Start(110059, 0).Long(1).bytes, 3, FILEERROR_CHUNK_STRUCTURE},
       {"an old version where a current one is asked for",
        ByteWriter().Header("Q7R6", 12599).Start(110059, 0).End().bytes, LoadObjects | LoadRequireCurrent,
-       FILEERROR_PREMATURE_END},
+       FILEERROR_OLD_VERSION},
   };
   AssertionCounter quiet;
   for (const Case& c : cases) {
@@ -405,6 +405,12 @@ TEST(Document, MergesBehindNothingButAboveWhatIsThere)
   EXPECT_FALSE(MergeDocument(target.get(), name, LoadObjects, &problem));
   EXPECT_EQ(problem.code, FILEERROR_OPEN);
   EXPECT_FALSE(SaveDocument(target.get(), Filename(), 0, &problem));
+  for (auto refuse : {+[](const Filename&n, FileProblem&p) { return SaveDocument(nullptr, n, 0, &p); },
+                      +[](const Filename&n, FileProblem&p) { return MergeDocument(nullptr, n, 3, &p); }}) {
+    problem = {};
+    EXPECT_FALSE(refuse(name, problem));
+    EXPECT_EQ(problem.code, FILEERROR_INVALID);
+  }
 }
 
 TEST(Document, AThousandLevelsOfParentsWork)
@@ -490,6 +496,8 @@ TEST(Document, NestingWithoutEndIsAnErrorAndNoCrash)
   FileProblem problem;
   EXPECT_EQ(LoadFromBytes(w.bytes, 3, &problem), nullptr);
   EXPECT_EQ(problem.code, FILEERROR_CHUNK_STRUCTURE);
+  EXPECT_EQ(Utf8(GetChunkPathText(problem)), "110059/110107/110100/5154/110100/110100/5154/110100/.../"
+                                             "5154/110100/110100/5154/110100/110100/5154/110100");
 }
 
 TEST(RootLists, SkipWhatTheyDoNotKnowAndKeepTheNeighbours)

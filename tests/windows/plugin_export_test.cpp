@@ -118,12 +118,13 @@ TEST(Plugin, ExportsALongChainOfParentsOnTheUsualStack)
   ::CloseHandle(thread);
   EXPECT_EQ(job.error, 0);
   // Each object's children stand in chunks of its own.
-  q7r::StreamWalker walker(job.output.string());
-  q7r::StreamValue value;
-  std::size_t depth = 0;
+  _torvane_::StreamWalker walker;
+  ASSERT_TRUE(walker.Open(q7r::ToFilename(job.output.string())));
+  _torvane_::StreamValue value;
+  _torvane_::Long depth = 0;
   while (walker.Next(value))
-    depth = std::max(depth, walker.Path().size());
-  EXPECT_GT(depth, 1000u);
+    depth = std::max(depth, walker.GetDepth());
+  EXPECT_GT(depth, 1000);
 }
 
 TEST(Plugin, TellsTheHostThatTheFileCannotBeOpened)

@@ -9,7 +9,8 @@
 #include <vector>
 
 #include "support/temp_folder.h"
-#include "tools/q7r/stream_walker.h"
+#include "tools/q7r/scene_file.h"
+#include "torvane/stream/stream_walker.h"
 
 namespace scene_comparison
 {
@@ -38,15 +39,15 @@ inline std::string LastComponent(const std::string& path)
 class Scene
 {
  public:
-  explicit Scene(const std::string& path) : bytes_(ReadWholeFile(path)), walker_(path) {}
+  explicit Scene(const std::string& path) : bytes_(ReadWholeFile(path)) { walker_.Open(q7r::ToFilename(path)); }
 
   bool Next()
   {
     const bool found = walker_.Next(value_);
-    chunk_ = q7r::PathText(walker_.Path());
+    chunk_ = q7r::ToUtf8(walker_.GetPathText());
     return found;
   }
-  const q7r::StreamValue& Value() const { return value_; }
+  const _torvane_::StreamValue& Value() const { return value_; }
   const std::string& Chunk() const { return chunk_; }
   // A block with its tag and its length, which stands in front of it.
   std::vector<std::uint8_t> Bytes() const
@@ -62,8 +63,8 @@ class Scene
 
  private:
   std::vector<std::uint8_t> bytes_;
-  q7r::StreamWalker walker_;
-  q7r::StreamValue value_;
+  _torvane_::StreamWalker walker_;
+  _torvane_::StreamValue value_;
   std::string chunk_;
 };
 
@@ -73,7 +74,7 @@ class Identifiers
 {
  public:
   // Whether the values hold identifiers that stand for one another.
-  bool Match(const q7r::StreamValue& a, const q7r::StreamValue& b)
+  bool Match(const _torvane_::StreamValue& a, const _torvane_::StreamValue& b)
   {
     const std::string idA = IdOf(a);
     const std::string idB = IdOf(b);
@@ -81,7 +82,7 @@ class Identifiers
            toA_.try_emplace(idB, idA).first->second == idA;
   }
 
-  static bool IsOne(const q7r::StreamValue& value)
+  static bool IsOne(const _torvane_::StreamValue& value)
   {
     return value.tag == _torvane_::kTagMemory &&
            (value.size == kMarkerSize ||
@@ -93,13 +94,13 @@ class Identifiers
   static constexpr std::int64_t kMarkerSize = 16;
   static constexpr std::ptrdiff_t kWordSize = 6;
 
-  static std::string KindOf(const q7r::StreamValue& value)
+  static std::string KindOf(const _torvane_::StreamValue& value)
   {
-    return value.size == kMarkerSize ? "" : std::string(value.head.begin(), value.head.begin() + kWordSize);
+    return value.size == kMarkerSize ? "" : std::string(value.head, value.head + kWordSize);
   }
-  static std::string IdOf(const q7r::StreamValue& value)
+  static std::string IdOf(const _torvane_::StreamValue& value)
   {
-    return {value.head.begin() + (value.size == kMarkerSize ? 0 : kWordSize), value.head.end()};
+    return {value.head + (value.size == kMarkerSize ? 0 : kWordSize), value.head + value.headCount};
   }
 
   std::map<std::string, std::string> toA_;
@@ -108,21 +109,21 @@ class Identifiers
 
 inline bool IsSameValue(const Scene& sceneA, const Scene& sceneB, Identifiers& identifiers)
 {
-  const q7r::StreamValue& a = sceneA.Value();
-  const q7r::StreamValue& b = sceneB.Value();
+  const _torvane_::StreamValue& a = sceneA.Value();
+  const _torvane_::StreamValue& b = sceneB.Value();
   if (a.tag != b.tag || sceneA.Chunk() != sceneB.Chunk())
     return false;
   if (a.tag == _torvane_::kTagChunkStart)
     return a.chunk.id == b.chunk.id && a.chunk.level == b.chunk.level;
   if (a.tag == _torvane_::kTagFilename)
-    return LastComponent(a.text) == LastComponent(b.text);
+    return LastComponent(q7r::ToUtf8(a.text)) == LastComponent(q7r::ToUtf8(b.text));
   if (a.tag == _torvane_::kTagString)
     return a.text == b.text;
   if (Identifiers::IsOne(a) && Identifiers::IsOne(b))
     return identifiers.Match(a, b);
   if (a.tag >= _torvane_::kTagMemory)
     return a.size == b.size && sceneA.Bytes() == sceneB.Bytes();
-  return std::equal(a.reals.begin(), a.reals.end(), b.reals.begin(), b.reals.end(), IsNear) &&
+  return std::equal(a.reals, a.reals + a.realCount, b.reals, b.reals + b.realCount, IsNear) &&
          (a.integer == b.integer || (a.tag == _torvane_::kTagLLong && IsDate(a.integer) && IsDate(b.integer)));
 }
 
@@ -139,8 +140,8 @@ inline std::string FirstDifference(const std::string& pathA, const std::string& 
     if (!moreInA)
       return {};
     if (!IsSameValue(a, b, identifiers))
-      return q7r::TagName(a.Value().tag) + " at " + a.Place() + " against " + q7r::TagName(b.Value().tag) + " at " +
-             b.Place();
+      return std::string(_torvane_::GetValueTagName(a.Value().tag)) + " at " + a.Place() + " against " +
+             _torvane_::GetValueTagName(b.Value().tag) + " at " + b.Place();
   }
 }
 

@@ -99,12 +99,9 @@ std::string ToUtf8(const String& text)
 
 std::string ProblemText(const std::string& path, const FileProblem& problem)
 {
-  std::string text = path + ": ";
-  if (problem.systemError != 0)
-    return text + std::generic_category().message(problem.systemError);
-  if (problem.code != FILEERROR_OPEN)
-    text += "byte " + std::to_string(problem.position) + ": ";
-  return text + GetFileErrorText(problem.code);
+  const std::string reason =
+      problem.systemError != 0 ? std::generic_category().message(problem.systemError) : ToUtf8(GetProblemText(problem));
+  return path + ": " + reason;
 }
 
 DocumentPtr LoadScene(const std::string& path)

@@ -22,7 +22,8 @@ std::string ReadInput(const std::string& path);
 // Text of the library as UTF-8; unpaired surrogates become U+FFFD.
 std::string ToUtf8(const _torvane_::String& text);
 
-// "scene.q7r: byte 1234: a read came short", or the system's own words: "scene.q7r: Permission denied".
+// "scene.q7r: byte 1234, in chunk 110059/110107: a read came short", or the system's own words: "scene.q7r: Permission
+// denied".
 std::string ProblemText(const std::string& path, const _torvane_::FileProblem& problem);
 
 // Loads a scene file; throws Failure.

@@ -25,6 +25,7 @@ struct NodeMarker
 struct UniqueIDEntry
 {
   Long appId;
+  Long order; // of entries that are read: the place in the file
   LLong size;
   void* data; // owned by the array
 };
@@ -39,6 +40,10 @@ class UniqueIDArray : public GeTempDynSortSearchArray<UniqueIDEntry, Long, GeMem
   Bool SetEntry(Long appId, const void* data, LLong size);
   // Replaces or adds an entry with a block that the array then owns; on failure the block stays the caller's.
   Bool AdoptEntry(Long appId, void* data, LLong size);
+  // For reading many: takes the block without a search. SettleEntries is due before anything else.
+  Bool AppendEntry(Long appId, void* data, LLong size);
+  // Sorts what was appended. Of entries with equal ids the last one stays.
+  void SettleEntries();
   void FreeEntries();
 };
 

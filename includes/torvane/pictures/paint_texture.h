@@ -103,7 +103,10 @@ class K2VAlpha : public K2VPaintTarget
   Bool GetLayerLine(HyperFile& file, Long x, Long y, Long count, UChar* buffer) override;
 
  private:
+  static constexpr Long kMaxLists = 16; // in one another, where files hold one
+
   K2VPaintLayer layer_;
+  Long lists_ = 0; // that are being read
   Long index_ = 0; // of the layer in hand
   Long type_ = 0;  // of its rows
 };

@@ -14,7 +14,7 @@ inline constexpr Long kVersionGreyAlpha = 11005;  // before: a gradient's transp
 inline constexpr Long kVersionTransform = 11600;  // the whole transform; Arrays in place of Memory values
 inline constexpr Long kVersionDisplay = 11611;    // before: a display tag's settings in a chunk of their own
 inline constexpr Long kVersionArrayOrder = 11904; // before: the type of an Array before its length
-inline constexpr Long kVersionColumns = 11925;    // before: legacy arrays, and their lengths too large by a few
+inline constexpr Long kVersionColumns = 11925;    // before: legacy arrays, some with lengths by another element size
 inline constexpr Long kVersionRequired = 12600;   // what LoadRequireCurrent asks for
 inline constexpr Long kVersionCurrent = 13000;    // what is written
 

@@ -17,8 +17,10 @@ namespace _torvane_
 class BaseContainer;
 class BaseDocument;
 class Bitmap;
+class ContainerIndex;
 class GeData;
 class TransArray;
+struct ValueForm;
 
 // Four characters as a 32-bit number, the first in the high byte.
 constexpr ULong FourCharacters(const char (&text)[5])
@@ -93,6 +95,13 @@ enum HyperFileMode : Long
   kHyperFileWrite = 2,
 };
 
+// A chunk as its start tells it.
+struct ChunkPlace
+{
+  Long id = 0;
+  Long level = 0;
+};
+
 // A polygon of a legacy polygon array: four point numbers.
 struct LegacyPolygon
 {
@@ -122,8 +131,11 @@ class HyperFile : public GeMemory
   Bool Close();
 
   Long GetError() const { return error_; }
-  // Overwrites the sticky error and reports to the assertion log; only Open clears it.
-  void SetError(Long error);
+  // Overwrites the sticky error and reports to the assertion log, with the caller's line; only Open clears it.
+  void SetError(Long error, Long line = __builtin_LINE());
+  // The one place that every failure of a stream passes: a breakpoint here finds the first. `position` is where the
+  // value in hand begins. Gives false.
+  Bool Fail(Long error, LLong position, Long line = __builtin_LINE());
   // False once a part of what was read or written since Open could not be held in memory, which then is the error of
   // the file, or after any other error. Loops over chunks ask it behind each chunk, so that nothing is left out of a
   // file without an error.
@@ -141,6 +153,11 @@ class HyperFile : public GeMemory
   LLong GetPosition() const { return file_.GetPosition(); }
   LLong GetLength() const { return length_; } // taken at open; 0 when writing
   Long GetChunkDepth() const { return chunkDepth_; }
+  // A chunk around the place of reading, 0 for the outermost one; zeros outside of the depth.
+  ChunkPlace GetChunk(Long index) const
+  {
+    return index >= 0 && index < chunkDepth_ && index < chunkRoom_ ? chunks_[index] : ChunkPlace();
+  }
   void SetExtraData(void* data) { extraData_ = data; }
   void* GetExtraData() const { return extraData_; }
   // Carries the links of this file; null before Open.
@@ -222,6 +239,8 @@ class HyperFile : public GeMemory
   // without it elements of the same id are replaced. Also gives false, with no error set, on a stray tag inside the
   // chunk form.
   Bool ReadContainer(BaseContainer& container, Bool flush);
+  // How many places were looked at to find elements by their ids, in all containers so far: a measure of the work.
+  LLong GetLookupCount() const { return lookups_; }
 
   // Arrays of files below version 11925. Each gives a new block that the caller owns and its count; a count of 0
   // gives a null block and true.
@@ -307,10 +326,8 @@ class HyperFile : public GeMemory
   Bool ReadPlainLong(Long& value);
   Bool SaveImage(Bitmap& image, Long format, BaseContainer* settings, Long flags);
   Bool ReadHeaderSlow(UChar& tag);
-  // Both give false. `position` is where the value in hand begins.
-  Bool Fail(Long error, LLong position);
-  Bool FailFromFile(LLong position);
-  Bool FailFromFile() { return FailFromFile(file_.GetPosition()); }
+  // As Fail, with the error of the byte file; false without a failure if that has none.
+  Bool FailFromFile(LLong position, Long line = __builtin_LINE());
   void TickWrite()
   {
     if (ticks_ == kWriteTicks)
@@ -338,13 +355,16 @@ class HyperFile : public GeMemory
   Bool ReadElements(void* data, Long type, Long storedType, LLong stride, LLong count);
   Bool ReadLegacyElements(LLong start, Long type, Long storedType, LLong count, void*& block);
   Bool GetMemoryLength(LLong& length);
-  Bool ReadContainerChunk(BaseContainer& container, Bool flush);
-  Bool ReadContainerLegacy(BaseContainer& container, Bool flush);
-  GeData* PlaceElement(BaseContainer& container, Bool flush, Long id);
-  Bool ReadLegacyEntry(BaseContainer& container, Bool flush, Long id, UChar type);
-  template <class Value>
-  Bool ReadLegacyValue(BaseContainer& container, Bool flush, Long id, Bool (HyperFile::*read)(Value&));
-  Bool ReadLegacyNested(BaseContainer& container, Bool flush, Long id);
+  Bool ReadChunkHead(Long& id, Long& level);
+  Bool GrowChunks();
+  void NotePath();
+  Bool ReadBodySize(const ValueForm& form, LLong& left);
+  Bool ReadContainer(ContainerIndex& target, Bool flush);
+  Bool ReadContainerChunk(ContainerIndex& target, Bool flush);
+  Bool ReadContainerLegacy(ContainerIndex& target, Bool flush);
+  GeData* PlaceElement(ContainerIndex& target, Bool flush, Long id);
+  Bool ReadLegacyEntry(ContainerIndex& target, Bool flush, Long id, UChar type);
+  Bool ReadLegacyNested(ContainerIndex& target, Bool flush, Long id);
   Bool Drop(LLong count, LLong position);
 
   static constexpr LLong kWriteTicks = 50000;
@@ -362,7 +382,10 @@ class HyperFile : public GeMemory
   BaseDocument* document_;
   Long version_ = kVersionUnknown;
   Long chunkDepth_ = 0;
+  Long chunkRoom_ = 0;
+  ChunkPlace* chunks_ = nullptr; // owned: the chunks that are open, outermost first
   Long loopDepth_ = 0;
+  LLong lookups_ = 0;
   ReadProgressHook readHook_ = nullptr;
   WriteProgressHook writeHook_ = nullptr;
   void* readHookData_ = nullptr;

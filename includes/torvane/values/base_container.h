@@ -15,6 +15,7 @@ namespace _torvane_
 
 class BaseDocument;
 class BaseList2D;
+class ContainerIndex;
 struct ContainerDefault;
 class TransArray;
 
@@ -139,6 +140,8 @@ class BaseContainer
   Bool SetParameter(const ParameterPath& path, const GeData& value);
 
  private:
+  friend class ContainerIndex; // finds elements by id while a file is read
+
   struct Block;
 
   Element* NewElement(Long id);

@@ -46,13 +46,17 @@ class GeData
   GeData(SReal value) : GeData(static_cast<Real>(value)) {}                   // NOLINT
   GeData(LLong value) : type_(kDataLLong) { payload_.wide = value; }          // NOLINT
   GeData(void* pointer) : type_(kDataPointer) { payload_.pointer = pointer; } // NOLINT
-  GeData(const Vector& value);                                                // NOLINT
-  GeData(const Matrix& value);                                                // NOLINT
-  GeData(const BaseTime& value);                                              // NOLINT
-  GeData(const String& value);                                                // NOLINT
-  GeData(const Filename& value);                                              // NOLINT
-  GeData(const BaseContainer& value);                                         // NOLINT
-  GeData(const GeAliasLink& value);                                           // NOLINT: a link on the same target
+  // A pointer to characters is no text, and would become a truth value: GeData(String("...")).
+  GeData(const void*) = delete;
+  template <class T>
+  GeData(T*) = delete;
+  GeData(const Vector& value);        // NOLINT
+  GeData(const Matrix& value);        // NOLINT
+  GeData(const BaseTime& value);      // NOLINT
+  GeData(const String& value);        // NOLINT
+  GeData(const Filename& value);      // NOLINT
+  GeData(const BaseContainer& value); // NOLINT
+  GeData(const GeAliasLink& value);   // NOLINT: a link on the same target
   // A custom value copied from `source`, which is of that type.
   GeData(Long type, const CustomData& source);
   // A copy of a link points at the same target.
@@ -96,6 +100,9 @@ class GeData
   // The type as a Long and then the value, see docs/format.md.
   Bool Read(HyperFile& file);
   Bool Write(HyperFile& file) const;
+  // False for what a file can't hold so that it is read again: pointers, raw blocks, types that don't exist. Containers
+  // are written without such elements.
+  Bool IsStored() const;
 
   Long GetLong() const; // of a Real: truncated; out of range gives the nearest Long
   Bool GetBool() const { return GetLong() != 0; }
@@ -136,6 +143,7 @@ class GeData
   };
 
   friend class BaseContainer; // takes nested containers out and puts them in without a recursion
+  friend class HyperFile;     // reads values whose type stands elsewhere
 
   // False for the kinds that are stored in the value itself, the most frequent ones.
   Bool OwnsPayload() const
@@ -157,6 +165,7 @@ class GeData
   Bool BuildBlock(const void* block);
   Bool BuildUnknown(const UnknownRecord& source);
   Bool MakeCustom(Long type);
+  Bool ReadAs(HyperFile& file, Long type); // the value alone, of a type that files hold
   Bool ReadPayload(HyperFile& file);
   Bool ReadCustom(HyperFile& file, Long type);
   Bool ReadUnknown(HyperFile& file, Long type, Long level);

@@ -25,6 +25,7 @@ constexpr ErrorText kErrorTexts[] = {
     {FILEERROR_CHUNK_STRUCTURE, "the chunk structure is damaged"},
     {FILEERROR_TOO_DEEP, "the content nests too deep to be read again"},
     {FILEERROR_PREMATURE_END, "the file ends inside a chunk"},
+    {FILEERROR_OLD_VERSION, "the file is of an older version than is asked for"},
 };
 
 } // namespace
@@ -36,6 +37,31 @@ const char* GetFileErrorText(Long code)
       return error.text;
   }
   return "unknown error";
+}
+
+String GetChunkPathText(const FileProblem& problem)
+{
+  constexpr Long kKept = FileProblem::kChunks;
+  String text;
+  for (Long i = 0; i < problem.depth && i < kKept; ++i) {
+    if (i > 0)
+      text += problem.depth > kKept && i == kKept / 2 ? String("/.../") : String("/");
+    text += String::FromLong(problem.chunks[i]);
+  }
+  return text.Content() ? text : String("-");
+}
+
+String GetProblemText(const FileProblem& problem)
+{
+  return GetProblemText(problem, String(GetFileErrorText(problem.code)));
+}
+
+String GetProblemText(const FileProblem& problem, const String& reason)
+{
+  if (problem.code == FILEERROR_OPEN)
+    return reason;
+  const String place = String("byte ") + String::FromLLong(problem.position);
+  return place + (problem.depth > 0 ? String(", in chunk ") + GetChunkPathText(problem) : String()) + ": " + reason;
 }
 
 } // namespace _torvane_

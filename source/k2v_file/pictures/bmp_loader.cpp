@@ -84,7 +84,7 @@ Long LoadRows(BaseFile& file, Bitmap& bitmap, const BmpHeader& header)
   auto width = static_cast<Long>(Magnitude(header.width));
   auto height = static_cast<Long>(Magnitude(header.height));
   if (width < 1 || height < 1)
-    return IMAGERESULT_OK;
+    return file.GetError() == FILEERROR_NONE ? IMAGERESULT_OK : IMAGERESULT_FILE;
   const Owned<UChar> row(static_cast<UChar*>(GeAllocNC(GetPaddedRowSize(width, header.bits))));
   if (!row)
     return IMAGERESULT_MEMORY;

@@ -211,8 +211,13 @@ Bool K2VAlpha::ReadChunk(HyperFile& file, Long id, Long)
   if (!K2VImageFilter::Of(file))
     return false;
   if (id == kChunkList) {
+    if (lists_ >= kMaxLists)
+      return file.Fail(FILEERROR_CHUNK_STRUCTURE, file.GetPosition());
     index_ = 0;
-    return ReadChunks(file, false);
+    ++lists_;
+    const Bool list = ReadChunks(file, false);
+    --lists_;
+    return list;
   }
   if (id != kChunkAlphaLayer)
     return false;

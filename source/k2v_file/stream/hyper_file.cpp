@@ -52,6 +52,7 @@ HyperFile::~HyperFile()
 {
   EndTranslation();
   DeleteObj(translator_);
+  GeFree(chunks_);
   file_.Close();
 }
 
@@ -129,16 +130,31 @@ Bool HyperFile::Close()
   return error_ == FILEERROR_NONE;
 }
 
-// The one place that every failure passes. What goes wrong after a failed allocation went wrong by it.
-Bool HyperFile::Fail(Long error, LLong position)
+// What goes wrong after a failed allocation went wrong by it.
+Bool HyperFile::Fail(Long error, LLong position, Long line)
 {
   if (memory_.Failed())
     error = FILEERROR_MEMORY;
-  if (problem_.code == FILEERROR_NONE)
-    problem_ = FileProblem{error, position, file_.GetSystemError()};
+  if (problem_.code == FILEERROR_NONE) {
+    problem_.code = error;
+    problem_.position = position;
+    problem_.systemError = file_.GetSystemError();
+    NotePath();
+  }
   error_ = error;
-  ReportAssertion("k2v_file", __LINE__, GetFileErrorText(error));
+  ReportAssertion("k2v_file", line, GetFileErrorText(error));
   return false;
+}
+
+// Keeps the chunks around the failure; of a deep nest the outermost and the innermost ones.
+void HyperFile::NotePath()
+{
+  constexpr Long kKept = FileProblem::kChunks;
+  const Long known = chunkDepth_ < chunkRoom_ ? chunkDepth_ : chunkRoom_;
+  problem_.depth = known > 0 ? known : 0;
+  const Long left = known > kKept ? known - kKept : 0; // out in the middle
+  for (Long i = 0; i < kKept && i < known; ++i)
+    problem_.chunks[i] = chunks_[i < kKept / 2 ? i : i + left].id;
 }
 
 Bool HyperFile::HasMemory()
@@ -148,16 +164,16 @@ Bool HyperFile::HasMemory()
   return error_ == FILEERROR_NONE;
 }
 
-Bool HyperFile::FailFromFile(LLong position)
+Bool HyperFile::FailFromFile(LLong position, Long line)
 {
   Long error = file_.GetError();
-  return error != FILEERROR_NONE && Fail(error, position);
+  return error != FILEERROR_NONE && Fail(error, position, line);
 }
 
-void HyperFile::SetError(Long error)
+void HyperFile::SetError(Long error, Long line)
 {
   if (error != FILEERROR_NONE)
-    Fail(error, file_.GetPosition());
+    Fail(error, file_.GetPosition(), line);
 }
 
 void HyperFile::SetReadProgress(ReadProgressHook hook, void* userData)

@@ -1,5 +1,6 @@
 // Array values: many elements behind one tag, converted a piece at a time.
 #include "k2v_file/stream/array_elements.h"
+#include "k2v_file/stream/value_forms.h"
 #include "torvane/stream/hyper_file.h"
 
 namespace _torvane_
@@ -9,7 +10,6 @@ namespace
 {
 
 constexpr LLong kPieceSize = 65536;
-constexpr Long kTypeBehindLength = 11904; // in files below this version the type stands before the length
 constexpr LLong kLargestArray = UINT32_MAX - 1;
 
 Bool IsFloatType(Long type) { return type == kArraySReal || type == kArrayLReal; }
@@ -59,7 +59,7 @@ Bool HyperFile::ReadArray(void* data, Long type, LLong stride, LLong count)
     return false;
   UChar storedType = 0;
   ULong storedLength = 0;
-  Bool behind = version_ >= kTypeBehindLength;
+  Bool behind = version_ >= kVersionArrayOrder;
   if (!(behind ? file_.ReadULong(storedLength) && file_.ReadUChar(storedType)
                : file_.ReadUChar(storedType) && file_.ReadULong(storedLength)))
     return FailFromFile(start);

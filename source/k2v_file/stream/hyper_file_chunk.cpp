@@ -1,5 +1,6 @@
 // Walking by tags: skipping values and chunks, raw chunks, containers.
-#include "k2v_file/stream/value_sizes.h"
+#include "k2v_file/stream/value_forms.h"
+#include "k2v_file/values/container_index.h"
 #include "torvane/stream/hyper_file.h"
 #include "torvane/values/base_container.h"
 
@@ -12,16 +13,13 @@ namespace
 constexpr Long kContainerChunk = 132;
 constexpr Long kContainerLevel = 1;
 
-// Files below this version count some legacy arrays by another element size than they hold, unless their Reals are
-// floats.
-constexpr Long kTrueLegacyLengths = 11925;
-
 // Where the type and the value of a container's element stand, with their tags, behind its id, and the sizes of whole
 // elements.
-constexpr LLong kElementType = 5;
-constexpr LLong kElementValue = 10;
-constexpr LLong kLongElementSize = 15;
-constexpr LLong kRealElementSize = 19;
+constexpr LLong kElementType = StoredSize(kTagLong);
+constexpr LLong kElementValue = StoredSize(kTagLong, kTagLong);
+constexpr LLong kLongElementSize = StoredSize(kTagLong, kTagLong, kTagLong);
+constexpr LLong kRealElementSize = StoredSize(kTagLong, kTagLong, kTagReal);
+static_assert(kElementType == 5 && kElementValue == 10 && kLongElementSize == 15 && kRealElementSize == 19);
 
 // The id and value of an element that is a Long or a double, and its size; 0 for any other one. `next` is null or the
 // place of kRealElementSize bytes.
@@ -78,9 +76,35 @@ Bool HyperFile::ReadChunkStart(Long& id, Long& level)
 {
   if (error_ != FILEERROR_NONE)
     return false;
-  if (!ReadPlainLong(id) || !ReadPlainLong(level))
+  if (!ReadChunkHead(id, level))
     return false;
   TickRead();
+  return true;
+}
+
+// The chunk counts as one that encloses what follows once its id and level are known.
+Bool HyperFile::ReadChunkHead(Long& id, Long& level)
+{
+  --chunkDepth_;
+  if (!ReadPlainLong(id) || !ReadPlainLong(level))
+    return false;
+  ++chunkDepth_;
+  if (chunkDepth_ > 0 && (chunkDepth_ <= chunkRoom_ || GrowChunks()))
+    chunks_[chunkDepth_ - 1] = {id, level};
+  return true;
+}
+
+// Where memory is short the inner chunks aren't told: a failure then has a shorter path.
+Bool HyperFile::GrowChunks()
+{
+  constexpr Long kFirst = 32;
+  const Long room = chunkDepth_ <= kFirst / 2 ? kFirst : 2 * chunkDepth_;
+  void* grown = GeRealloc(chunks_, room * static_cast<LLong>(sizeof(ChunkPlace)));
+  if (!grown)
+    return false;
+  chunks_ = static_cast<ChunkPlace*>(grown);
+  for (; chunkRoom_ < room; ++chunkRoom_)
+    chunks_[chunkRoom_] = ChunkPlace();
   return true;
 }
 
@@ -110,29 +134,36 @@ Bool HyperFile::SkipValue(UChar tag)
 {
   if (error_ != FILEERROR_NONE)
     return false;
-  LLong start = file_.GetPosition() - 1;
-  LLong count = 0;
-  if (tag < kTagMemory) {
-    count = kBodySizeTable.size[singlePrecision_ ? 1 : 0][tag];
-    if (count == kNoValue)
-      return Fail(FILEERROR_WRONG_VALUE, start);
-  } else if (tag <= kTagArray) {
-    // All of them by a 32-bit length, so that a memory block with a 64-bit length can't be passed over.
-    Long length = 0;
-    if (!ReadPlainLong(length))
-      return false;
-    count = static_cast<ULong>(length);
-    if (version_ < kTrueLegacyLengths && !singlePrecision_ && tag == kTagLegacyPointArray)
-      count *= 2;
-    if (version_ < kTrueLegacyLengths && !singlePrecision_ && tag == kTagLegacyArray)
-      count = count / 44 * 84;
-  } else {
-    return Fail(FILEERROR_WRONG_VALUE, start);
+  if (tag == kTagChunkStart) {
+    Long id = 0;
+    Long level = 0;
+    return ReadChunkStart(id, level);
   }
-  if (!Drop(count, start))
+  LLong start = file_.GetPosition() - 1;
+  const ValueForm* form = FindSkippedForm(tag);
+  if (!form)
+    return Fail(FILEERROR_WRONG_VALUE, start);
+  LLong left = 0;
+  if (!ReadBodySize(*form, left))
+    return false;
+  if (!Drop(left, start))
     return false;
   TickRead();
   return true;
+}
+
+// Reads what tells the length of a body and gives the bytes that are left of it.
+Bool HyperFile::ReadBodySize(const ValueForm& form, LLong& left)
+{
+  const FileForm layout = FormOf(*this);
+  const LLong headSize = GetValueHeadSize(form, layout);
+  const LLong start = file_.GetPosition();
+  UChar spare[kLargestValueHead];
+  const UChar* head = headSize > 0 ? TakeBytes(spare, headSize) : nullptr;
+  if (headSize > 0 && !head)
+    return FailFromFile(start);
+  left = GetValueBodySize(form, layout, head) - headSize;
+  return left >= 0 || Fail(FILEERROR_WRONG_VALUE, start);
 }
 
 Bool HyperFile::SkipToEndChunk()
@@ -202,7 +233,7 @@ Bool HyperFile::WriteContainer(const BaseContainer& container)
   const GeData* value = nullptr;
   for (Bool more = container.BrowseFirst(iterator, id, value); more && error_ == FILEERROR_NONE;
        more = container.BrowseNext(iterator, id, value)) {
-    if (value->GetType() == kDataPointer)
+    if (!value->IsStored())
       continue;
     WriteLong(id);
     value->Write(*this);
@@ -213,18 +244,26 @@ Bool HyperFile::WriteContainer(const BaseContainer& container)
 
 Bool HyperFile::ReadContainer(BaseContainer& container, Bool flush)
 {
+  if (error_ != FILEERROR_NONE)
+    return false;
+  ContainerIndex target(container, lookups_);
+  return ReadContainer(target, flush);
+}
+
+Bool HyperFile::ReadContainer(ContainerIndex& target, Bool flush)
+{
   if (!EnterLoop())
     return false;
   if (flush)
-    container.Flush();
+    target.GetContainer().Flush();
   LLong start = file_.GetPosition();
   UChar tag = 0;
   Bool read = false;
   if (ReadValueHeader(tag)) {
     if (tag == kTagChunkStart)
-      read = ReadContainerChunk(container, flush);
+      read = ReadContainerChunk(target, flush);
     else if (tag == kTagLegacyContainer)
-      read = ReadContainerLegacy(container, flush);
+      read = ReadContainerLegacy(target, flush);
     else
       Fail(FILEERROR_WRONG_VALUE, start);
   }
@@ -232,12 +271,13 @@ Bool HyperFile::ReadContainer(BaseContainer& container, Bool flush)
   return read && HasMemory();
 }
 
-Bool HyperFile::ReadContainerChunk(BaseContainer& container, Bool flush)
+Bool HyperFile::ReadContainerChunk(ContainerIndex& target, Bool flush)
 {
+  BaseContainer& container = target.GetContainer();
   LLong start = file_.GetPosition() - 1;
   Long id = 0;
   Long level = 0;
-  if (!ReadPlainLong(id) || !ReadPlainLong(level))
+  if (!ReadChunkHead(id, level))
     return false;
   if (id != kContainerChunk)
     return Fail(FILEERROR_WRONG_VALUE, start);
@@ -261,10 +301,10 @@ Bool HyperFile::ReadContainerChunk(BaseContainer& container, Bool flush)
     if (!ReadValueHeader(tag) || tag == kTagChunkEnd)
       break;
     if (tag != kTagLong)
-      return FailFromFile();
+      return FailFromFile(file_.GetPosition());
     if (!ReadPlainLong(id))
       return false;
-    GeData* value = PlaceElement(container, flush, id);
+    GeData* value = PlaceElement(target, flush, id);
     if (!value || !value->Read(*this))
       return false;
   }
@@ -272,9 +312,9 @@ Bool HyperFile::ReadContainerChunk(BaseContainer& container, Bool flush)
 }
 
 // The element that a value of that id is to be read into, empty.
-GeData* HyperFile::PlaceElement(BaseContainer& container, Bool flush, Long id)
+GeData* HyperFile::PlaceElement(ContainerIndex& target, Bool flush, Long id)
 {
-  GeData* value = flush ? container.InsertData(id, GeData()) : container.SetData(id, GeData());
+  GeData* value = flush ? target.Append(id) : target.Set(id);
   if (!value)
     Fail(FILEERROR_MEMORY, file_.GetPosition());
   return value;

@@ -1,26 +1,20 @@
 // Values that only files of old versions hold. They are read and never written.
 #include "k2v_file/stream/array_elements.h"
+#include "k2v_file/stream/value_forms.h"
+#include "k2v_file/values/container_index.h"
 #include "torvane/memory/assertion.h"
 #include "torvane/stream/hyper_file.h"
-#include "torvane/values/base_container.h"
 
 namespace _torvane_
 {
 
-namespace
-{
-
-constexpr UChar kLegacyEnd = 3; // closes a legacy container, with the id -1
-
-} // namespace
-
-Bool HyperFile::ReadContainerLegacy(BaseContainer& container, Bool flush)
+Bool HyperFile::ReadContainerLegacy(ContainerIndex& target, Bool flush)
 {
   Long length = 0; // of no use: the end mark closes the container
   Long id = 0;
   if (!ReadPlainLong(length) || !ReadLong(id))
     return false;
-  container.SetId(id);
+  target.GetContainer().SetId(id);
   for (;;) {
     LLong start = file_.GetPosition();
     UChar type = 0;
@@ -28,62 +22,41 @@ Bool HyperFile::ReadContainerLegacy(BaseContainer& container, Bool flush)
       return false;
     if (!file_.ReadUChar(type))
       return FailFromFile(start);
-    if (type == kLegacyEnd)
+    if (type == kLegacyEnd) // with the id -1
       return id == -1 || Fail(FILEERROR_WRONG_VALUE, start);
-    if (!ReadLegacyEntry(container, flush, id, type))
+    if (!ReadLegacyEntry(target, flush, id, type))
       return false;
   }
 }
 
-Bool HyperFile::ReadLegacyEntry(BaseContainer& container, Bool flush, Long id, UChar type)
+// The kinds of value that an entry holds as it is held anywhere else.
+Bool HyperFile::ReadLegacyEntry(ContainerIndex& target, Bool flush, Long id, UChar type)
 {
   switch (type) {
   case kDataLong:
-    return ReadLegacyValue<Long>(container, flush, id, &HyperFile::ReadLong);
   case kDataReal:
-    return ReadLegacyValue<Real>(container, flush, id, &HyperFile::ReadReal);
   case kDataTime:
-    return ReadLegacyValue<BaseTime>(container, flush, id, &HyperFile::ReadTime);
   case kDataVector:
-    return ReadLegacyValue<Vector>(container, flush, id, &HyperFile::ReadVector);
   case kDataMatrix:
-    return ReadLegacyValue<Matrix>(container, flush, id, &HyperFile::ReadMatrix);
   case kDataString:
-    return ReadLegacyValue<String>(container, flush, id, &HyperFile::ReadString);
-  case kDataFilename:
-    return ReadLegacyValue<Filename>(container, flush, id, &HyperFile::ReadFilename);
-  case kDataOldMemory:
-    return PlaceElement(container, flush, id) != nullptr;
+  case kDataFilename: {
+    GeData* place = PlaceElement(target, flush, id);
+    return place && place->ReadAs(*this, type);
+  }
+  case kDataOldMemory: // without a value
+    return PlaceElement(target, flush, id) != nullptr;
   case kDataContainer:
-    return ReadLegacyNested(container, flush, id);
+    return ReadLegacyNested(target, flush, id);
   default:
     ReportAssertion("k2v_file", __LINE__, "a container of an old file holds an entry of an unknown type");
     return true;
   }
 }
 
-template <class Value>
-Bool HyperFile::ReadLegacyValue(BaseContainer& container, Bool flush, Long id, Bool (HyperFile::*read)(Value&))
-{
-  Value value{};
-  GeData* place = PlaceElement(container, flush, id);
-  if (!place || !(this->*read)(value))
-    return false;
-  *place = GeData(value);
-  return place->GetType() != kDataNil || Fail(FILEERROR_MEMORY, file_.GetPosition());
-}
-
 // A nested container is read into the one of that id if there is one.
-Bool HyperFile::ReadLegacyNested(BaseContainer& container, Bool flush, Long id)
+Bool HyperFile::ReadLegacyNested(ContainerIndex& target, Bool flush, Long id)
 {
-  BaseContainer* nested = container.GetContainerInstance(id);
-  if (!nested) {
-    GeData* place = PlaceElement(container, flush, id);
-    if (!place)
-      return false;
-    *place = GeData(BaseContainer());
-    nested = place->GetContainer();
-  }
+  ContainerIndex* nested = target.Enter(id, flush);
   return nested ? ReadContainer(*nested, false) : Fail(FILEERROR_MEMORY, file_.GetPosition());
 }
 

@@ -17,12 +17,7 @@ Bool RawChunkBody::Read(HyperFile& file, Long level)
 {
   Free();
   level_ = level;
-  if (!file.ReadRawChunk(data_, size_, true))
-    return false;
-  if (!file.IsSinglePrecision() || WidenReals(data_, size_))
-    return true;
-  file.SetError(FILEERROR_MEMORY);
-  return false;
+  return file.ReadRawChunk(data_, size_, true) && ModernizeValues(data_, size_, file);
 }
 
 void RawChunkBody::Write(HyperFile& file) const { file.WriteRawChunk(data_, size_, true); }

@@ -1,6 +1,6 @@
 #include "k2v_file/stream/raw_values.h"
 
-#include "k2v_file/stream/value_sizes.h"
+#include "torvane/values/parameter_path.h"
 
 namespace _torvane_
 {
@@ -8,71 +8,192 @@ namespace _torvane_
 namespace
 {
 
+constexpr LLong kFloatSize = 4;
+constexpr LLong kDoubleSize = 8;
 constexpr LLong kLengthSize = 4;
+constexpr LLong kGrowth = 2; // a float that becomes a double is what grows most
 
-// The bytes behind a tag as they stand and as they will; false for a value that isn't there as a whole.
-Bool MeasureBody(UChar tag, const UChar* body, LLong left, LLong& narrow, LLong& wide)
+// A legacy container has an id and a type in front of each value.
+constexpr LLong kEntryIdSize = 4;
+constexpr LLong kEntryHeadSize = kEntryIdSize + 1;
+
+// Works through a block from front to back. `target` has room for kGrowth times its size.
+class Converter
 {
-  if (tag < kTagMemory) {
-    narrow = kBodySizeTable.size[1][tag];
-    wide = kBodySizeTable.size[0][tag];
-    return narrow != kNoValue && narrow <= left;
+ public:
+  Converter(const UChar* source, LLong size, UChar* target, const FileForm& file)
+      : source_(source), target_(target), size_(size), file_(file)
+  {}
+
+  // Gives the size of what was written.
+  LLong Run()
+  {
+    while (position_ < size_) {
+      if (!ConvertValue(size_))
+        Copy(size_ - position_);
+    }
+    return written_;
   }
-  if (tag > kTagArray || left < kLengthSize)
+
+ private:
+  void Copy(LLong count)
+  {
+    GeCopyMem(target_ + written_, source_ + position_, count);
+    position_ += count;
+    written_ += count;
+  }
+
+  // Floats up to `end`, which stand at a distance of whole floats.
+  void Widen(LLong end)
+  {
+    for (; position_ < end; position_ += kFloatSize, written_ += kDoubleSize) {
+      const Real number = bytes::CleanReal(bytes::GetBig<ULong>(source_ + position_));
+      bytes::PutBig(target_ + written_, bytes::CleanBits(number));
+    }
+  }
+
+  void PutLength(LLong place, LLong length) { bytes::PutBig(target_ + place, static_cast<ULong>(length)); }
+
+  // False for what is no value that ends before `end`: nothing is converted then.
+  Bool ConvertValue(LLong end)
+  {
+    const ValueForm* form = FindSkippedForm(source_[position_]);
+    const UChar* body = source_ + position_ + kTagSize;
+    const LLong left = end - position_ - kTagSize;
+    if (!form || GetValueHeadSize(*form, file_) > left)
+      return false;
+    const LLong size = GetValueBodySize(*form, file_, body);
+    if (size > left)
+      return false;
+    if (form->tag == kTagLegacyContainer && file_.singlePrecision && ConvertContainers(position_ + kTagSize + size))
+      return true;
+    ConvertBody(*form, size);
+    return true;
+  }
+
+  void ConvertBody(const ValueForm& form, LLong size)
+  {
+    const LLong end = position_ + kTagSize + size;
+    Copy(kTagSize);
+    if (form.part == ValuePart::kReal && file_.singlePrecision)
+      return Widen(end);
+    if (IsOldArray(form, file_, source_ + position_)) {
+      PutLength(written_, size - kLengthSize);
+      target_[written_ + kLengthSize] = source_[position_];
+      position_ += 1 + kLengthSize;
+      written_ += 1 + kLengthSize;
+      return Copy(end - position_);
+    }
+    if (form.tag != kTagLegacyPointArray && form.tag != kTagLegacyArray)
+      return Copy(size);
+    const LLong place = written_;
+    Copy(kLengthSize);
+    if (form.tag == kTagLegacyPointArray && file_.singlePrecision)
+      Widen(position_ + (end - position_) / kFloatSize * kFloatSize);
+    Copy(end - position_);
+    PutLength(place, written_ - place - kLengthSize);
+  }
+
+  // A legacy container up to `end`, with all that are nested in it. Each open one keeps the place of the one around it
+  // where its length will stand. False, and nothing is converted, if it isn't of the known form.
+  Bool ConvertContainers(LLong end)
+  {
+    const LLong position = position_;
+    const LLong written = written_;
+    open_ = written_;
+    depth_ = 0;
+    Bool known = OpenContainer(end);
+    while (known && depth_ > 0)
+      known = ConvertEntry(end);
+    if (known && position_ == end)
+      return true;
+    position_ = position;
+    written_ = written;
     return false;
-  narrow = wide = kLengthSize + static_cast<LLong>(bytes::GetBig<ULong>(body));
-  return narrow <= left;
-}
+  }
 
-// The size of the converted block, which is written too if `target` isn't null.
-LLong Convert(const UChar* source, LLong size, UChar* target)
-{
-  LLong written = 0;
-  LLong position = 0;
-  const auto copy = [&](LLong count) {
-    if (target)
-      GeCopyMem(target + written, source + position, count);
-    written += count;
-    position += count;
-  };
-  while (position < size) {
-    LLong narrow = 0;
-    LLong wide = 0;
-    if (!MeasureBody(source[position], source + position + 1, size - position - 1, narrow, wide)) {
-      copy(size - position); // not understood
-      break;
-    }
-    if (narrow == wide) {
-      copy(1 + narrow);
-      continue;
-    }
-    copy(1);
-    for (const LLong end = position + narrow; position < end; position += 4, written += 8) {
-      if (target) {
-        const Real number = bytes::CleanReal(bytes::GetBig<ULong>(source + position));
-        bytes::PutBig(target + written, bytes::CleanBits(number));
-      }
+  // Goes into a container whose tag is next, inside of the one that was opened at `open_`.
+  Bool OpenContainer(LLong end)
+  {
+    constexpr LLong kHead = kTagSize + kLengthSize + StoredSize(kTagLong);
+    if (end - position_ < kHead || source_[position_] != kTagLegacyContainer ||
+        source_[position_ + kTagSize + kLengthSize] != kTagLong)
+      return false;
+    const LLong place = written_;
+    Copy(kHead);
+    PutLength(place + kTagSize, place - open_);
+    open_ = place;
+    ++depth_;
+    return true;
+  }
+
+  void CloseContainer()
+  {
+    const LLong outer = open_ - static_cast<LLong>(bytes::GetBig<ULong>(target_ + open_ + kTagSize));
+    PutLength(open_ + kTagSize, written_ - open_ - kTagSize - kLengthSize);
+    open_ = outer;
+    --depth_;
+  }
+
+  Bool ConvertEntry(LLong end)
+  {
+    if (end - position_ < kEntryHeadSize)
+      return false;
+    const UChar type = source_[position_ + kEntryIdSize];
+    Copy(kEntryHeadSize);
+    switch (type) {
+    case kLegacyEnd:
+      CloseContainer();
+      return true;
+    case kDataContainer:
+      return OpenContainer(end);
+    case kDataLong:
+    case kDataReal:
+    case kDataTime:
+    case kDataVector:
+    case kDataMatrix:
+    case kDataString:
+    case kDataFilename:
+      return position_ < end && source_[position_] == type && ConvertValue(end);
+    default: // without a value
+      return true;
     }
   }
-  return written;
-}
+
+  const UChar* source_;
+  UChar* target_;
+  LLong size_;
+  FileForm file_;
+  LLong position_ = 0;
+  LLong written_ = 0;
+  LLong open_ = 0;
+  LLong depth_ = 0;
+};
 
 } // namespace
 
-Bool WidenReals(void*& block, LLong& size)
+Bool ModernizeValues(void*& block, LLong& size, const FileForm& file)
 {
-  const UChar* source = static_cast<const UChar*>(block);
-  LLong wideSize = Convert(source, size, nullptr);
-  if (wideSize == size)
+  if (size <= 0 || (!file.singlePrecision && file.version >= kVersionColumns))
     return true;
-  void* wide = GeAllocNC(wideSize);
-  if (!wide)
+  void* fresh = size > INT64_MAX / kGrowth ? nullptr : GeAllocNC(size * kGrowth);
+  if (!fresh)
     return false;
-  Convert(source, size, static_cast<UChar*>(wide));
+  const LLong freshSize = Converter(static_cast<const UChar*>(block), size, static_cast<UChar*>(fresh), file).Run();
+  if (void* fitting = GeRealloc(fresh, freshSize))
+    fresh = fitting;
   GeFree(block);
-  block = wide;
-  size = wideSize;
+  block = fresh;
+  size = freshSize;
   return true;
+}
+
+Bool ModernizeValues(void*& block, LLong& size, HyperFile& file)
+{
+  if (ModernizeValues(block, size, FormOf(file)))
+    return true;
+  file.SetError(FILEERROR_MEMORY);
+  return false;
 }
 
 } // namespace _torvane_

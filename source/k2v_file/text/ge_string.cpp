@@ -30,8 +30,6 @@ Long TextLength(const UniChar* text)
   return static_cast<Long>(length);
 }
 
-constexpr UniChar Plain(UniChar c) { return c; }
-
 // The one comparison of texts; Fold is applied to characters that differ and to the one that decides an equal prefix.
 template <UniChar (*Fold)(UniChar)>
 Long CompareText(const UniChar* a, Long countA, const UniChar* b, Long countB)
@@ -142,7 +140,7 @@ void String::Trim() noexcept
 
 Long String::Compare(const String& other) const noexcept
 {
-  return CompareText<Plain>(block_, length_, other.block_, other.length_);
+  return CompareText<SameChar>(block_, length_, other.block_, other.length_);
 }
 
 Long String::ComparePart(const String& other, Long count, Long position) const noexcept
@@ -150,8 +148,8 @@ Long String::ComparePart(const String& other, Long count, Long position) const n
   Long limit = count > 0 ? count : 0;
   Long rest = position >= 0 && position < length_ ? length_ - position : 0;
   const UniChar* from = rest > 0 ? block_ + position : nullptr;
-  return CompareText<Plain>(from, rest < limit ? rest : limit, other.block_,
-                            other.length_ < limit ? other.length_ : limit);
+  return CompareText<SameChar>(from, rest < limit ? rest : limit, other.block_,
+                               other.length_ < limit ? other.length_ : limit);
 }
 
 Long String::LexCompare(const String& other) const noexcept

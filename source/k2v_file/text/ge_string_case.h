@@ -20,4 +20,7 @@ constexpr UniChar LowerChar(UniChar c)
   return upper ? static_cast<UniChar>(c + kCaseStep) : c;
 }
 
+// Where case counts.
+constexpr UniChar SameChar(UniChar c) { return c; }
+
 } // namespace _torvane_

@@ -17,8 +17,6 @@ struct Text
 
 Text TextOf(const String& string) { return {string.Data(), string.GetLength()}; }
 
-constexpr UniChar Plain(UniChar c) { return c; }
-
 template <UniChar (*Fold)(UniChar)>
 Bool MatchesAt(Text text, Text pattern, Long position)
 {
@@ -64,12 +62,12 @@ Bool FindBackward(Text text, Text pattern, Long& position, Long start)
 
 Bool String::FindFirst(const String& pattern, Long& position, Long start) const noexcept
 {
-  return FindForward<Plain>(TextOf(*this), TextOf(pattern), position, start);
+  return FindForward<SameChar>(TextOf(*this), TextOf(pattern), position, start);
 }
 
 Bool String::FindFirst(UniChar pattern, Long& position, Long start) const noexcept
 {
-  return FindForward<Plain>(TextOf(*this), {&pattern, 1}, position, start);
+  return FindForward<SameChar>(TextOf(*this), {&pattern, 1}, position, start);
 }
 
 Bool String::FindFirstUpper(const String& pattern, Long& position, Long start) const noexcept
@@ -84,12 +82,12 @@ Bool String::FindFirstUpper(UniChar pattern, Long& position, Long start) const n
 
 Bool String::FindLast(const String& pattern, Long& position, Long start) const noexcept
 {
-  return FindBackward<Plain>(TextOf(*this), TextOf(pattern), position, start);
+  return FindBackward<SameChar>(TextOf(*this), TextOf(pattern), position, start);
 }
 
 Bool String::FindLast(UniChar pattern, Long& position, Long start) const noexcept
 {
-  return FindBackward<Plain>(TextOf(*this), {&pattern, 1}, position, start);
+  return FindBackward<SameChar>(TextOf(*this), {&pattern, 1}, position, start);
 }
 
 Bool String::FindLastUpper(const String& pattern, Long& position, Long start) const noexcept

@@ -3,6 +3,7 @@
 #include <cstring>
 
 #include "k2v_file/stream/chunk_visitor.h"
+#include "k2v_file/stream/value_forms.h"
 #include "torvane/stream/hyper_file.h"
 
 namespace _torvane_
@@ -63,14 +64,15 @@ Bool UnitScaleData::Read(HyperFile& file, Long level)
 // Takes scale and unit out of the body if these two values are all that it holds.
 Bool UnitScaleData::TakeBody()
 {
-  constexpr LLong kRealOffset = 1;
-  constexpr LLong kUnitOffset = kRealOffset + 8;
-  constexpr LLong kBodySize = kUnitOffset + 5;
+  constexpr LLong kRealOffset = kTagSize;
+  constexpr LLong kUnitOffset = StoredSize(kTagReal);
+  constexpr LLong kBodySize = StoredSize(kTagReal, kTagLong);
+  static_assert(kUnitOffset == 9 && kBodySize == 14);
   const UChar* body = static_cast<const UChar*>(body_.GetData());
   if (body_.GetSize() != kBodySize || body[0] != kTagReal || body[kUnitOffset] != kTagLong)
     return false;
   scale = bytes::CleanReal(bytes::GetBig<ULLong>(body + kRealOffset));
-  unit = static_cast<Long>(bytes::GetBig<ULong>(body + kUnitOffset + 1));
+  unit = static_cast<Long>(bytes::GetBig<ULong>(body + kUnitOffset + kTagSize));
   return true;
 }
 

@@ -70,8 +70,11 @@ Bool GeData::Read(HyperFile& file)
     UChar tag = 0;
     return file.ReadValueHeader(tag) && file.SkipValue(tag);
   }
-  if (!IsStoredType(type))
-    return false;
+  return IsStoredType(type) && ReadAs(file, type);
+}
+
+Bool GeData::ReadAs(HyperFile& file, Long type)
+{
   if (!SetType(type)) {
     file.SetError(FILEERROR_MEMORY);
     return false;
@@ -135,12 +138,12 @@ Bool GeData::ReadUnknown(HyperFile& file, Long type, Long level)
     return file.SkipToEndChunk();
   }
   record.level = level;
-  if (!file.ReadRawChunk(record.data, record.size, false))
-    return false;
-  if (!file.IsSinglePrecision() || WidenReals(record.data, record.size))
-    return true;
-  file.SetError(FILEERROR_MEMORY);
-  return false;
+  return file.ReadRawChunk(record.data, record.size, false) && ModernizeValues(record.data, record.size, file);
+}
+
+Bool GeData::IsStored() const
+{
+  return type_ >= kDataFirstCustom || type_ == kDataUnknown || (type_ != kDataPointer && IsStoredType(type_));
 }
 
 Bool GeData::Write(HyperFile& file) const

@@ -277,6 +277,8 @@ BaseDocument* CreateDocument()
 
 Bool SaveDocument(BaseDocument* document, const Filename& name, Long, FileProblem* problem)
 {
+  if (problem)
+    *problem = {FILEERROR_INVALID};
   if (!document)
     return false;
   HyperFile file(document);
@@ -301,9 +303,13 @@ Bool ReadDocument(BaseDocument& document, HyperFile& file, const Filename& name,
   if (!file.Open(kSceneIdent, name, kHyperFileRead))
     return false;
   if ((loadFlags & LoadRequireCurrent) && file.GetFileVersion() < kVersionRequired)
+    return file.Fail(FILEERROR_OLD_VERSION, file.GetPosition());
+  if (!document.ReadChunks(file, true)) {
+    // A file that just ends sets no error.
+    if (file.GetError() == FILEERROR_NONE)
+      file.SetError(FILEERROR_PREMATURE_END);
     return false;
-  if (!document.ReadChunks(file, true))
-    return false;
+  }
   document.SetLoadedVersion(file.GetFileVersion());
   return true;
 }
@@ -313,19 +319,15 @@ Bool ReadDocument(BaseDocument& document, HyperFile& file, const Filename& name,
 BaseDocument* LoadDocument(const Filename& name, Long loadFlags, FileProblem* problem)
 {
   if (problem)
-    *problem = {FILEERROR_MEMORY, 0};
+    *problem = {FILEERROR_MEMORY};
   AllocationWatch watch;
   BaseDocument* document = BaseDocument::Alloc();
   if (!document)
     return nullptr;
   HyperFile file(document);
   Bool read = ReadDocument(*document, file, name, loadFlags);
-  if (problem) {
+  if (problem)
     *problem = file.GetProblem();
-    // A file that just ends, or an old one that is refused, sets no error.
-    if (!read && problem->code == FILEERROR_NONE)
-      *problem = {FILEERROR_PREMATURE_END, file.GetPosition()};
-  }
   file.Close();
   // What failed outside of the file, in names and links, makes the load fail as well.
   if (watch.Failed() && problem)
@@ -353,6 +355,8 @@ void MoveMembers(RootList2D& from, RootList2D& to)
 
 Bool MergeDocument(BaseDocument* target, const Filename& name, Long loadFlags, FileProblem* problem)
 {
+  if (problem)
+    *problem = {FILEERROR_INVALID};
   if (!target)
     return false;
   BaseDocument* document = LoadDocument(name, loadFlags, problem);

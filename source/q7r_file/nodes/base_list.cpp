@@ -143,11 +143,13 @@ Bool BaseList2D::ReadUniqueIds(HyperFile& file)
     LLong size = 0;
     if (!file.ReadLong(appId) || !file.ReadMemory(data, size))
       return false;
-    if (!uniqueIds_->AdoptEntry(appId, data, size)) {
+    if (!uniqueIds_->AppendEntry(appId, data, size)) {
       GeFree(data);
       return false;
     }
   }
+  if (count >= 1)
+    uniqueIds_->SettleEntries();
   return file.SkipToEndChunk();
 }
 

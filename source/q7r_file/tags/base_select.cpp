@@ -1,6 +1,7 @@
 #include "torvane/tags/base_select.h"
 
 #include "k2v_file/stream/counted_records.h"
+#include "k2v_file/stream/value_forms.h"
 #include "torvane/bytes/base_file.h"
 #include "torvane/memory/owned.h"
 #include "torvane/memory/private_ge_mtools.h"
@@ -12,8 +13,9 @@ namespace
 {
 
 constexpr LLong kSegmentSize = sizeof(SelectSegment);
-constexpr LLong kStoredPairSize = 8;             // two numbers
-constexpr LLong kStoredRecordSize = 2 * (1 + 4); // two numbers, each behind its tag
+constexpr LLong kStoredPairSize = 8; // two numbers
+constexpr LLong kStoredRecordSize = StoredSize(kTagLong, kTagLong);
+static_assert(kStoredRecordSize == 10);
 
 template <class Visitor, class Segment>
 Bool VisitSegment(Visitor& v, Segment& segment)

@@ -5,7 +5,7 @@
 #include "listing/json_text.h"
 #include "output/standard_output.h"
 #include "scene_file.h"
-#include "stream_walker.h"
+#include "torvane/stream/stream_walker.h"
 #include "verbs.h"
 
 namespace q7r
@@ -31,18 +31,16 @@ struct Options
 // Walks the values; the message of the first fault, or nothing.
 std::string WalkProblem(const std::string& file, long long& values)
 {
-  StreamWalker walker(file);
+  StreamWalker walker;
+  if (!walker.Open(ToFilename(file)))
+    throw Failure(file + ": " + ToUtf8(walker.GetProblemText()));
   StreamValue value;
-  try {
-    while (walker.Next(value)) {
-      if (value.tag != kTagChunkStart && value.tag != kTagChunkEnd && walker.Path().empty())
-        return file + ": byte " + std::to_string(value.offset) + ": a value outside all chunks";
-      ++values;
-    }
-  } catch (const Failure& failure) {
-    return failure.what();
+  while (walker.Next(value)) {
+    if (value.tag != kTagChunkStart && value.tag != kTagChunkEnd && walker.GetDepth() == 0)
+      return file + ": byte " + std::to_string(value.offset) + ": a value outside all chunks";
+    ++values;
   }
-  return {};
+  return walker.GetProblem().code == FILEERROR_NONE ? "" : file + ": " + ToUtf8(walker.GetProblemText());
 }
 
 int Check(const Options& options)

@@ -6,11 +6,14 @@
 
 #include "listing/json_text.h"
 #include "output/standard_output.h"
-#include "stream_walker.h"
+#include "scene_file.h"
+#include "torvane/stream/stream_walker.h"
 #include "verbs.h"
 
 namespace q7r
 {
+
+using namespace _torvane_;
 
 namespace
 {
@@ -39,8 +42,8 @@ std::string HexOf(const StreamValue& value)
 {
   std::string text;
   char buffer[4];
-  for (std::uint8_t byte : value.head) {
-    std::snprintf(buffer, sizeof buffer, " %02X", byte);
+  for (Long i = 0; i < value.headCount; ++i) {
+    std::snprintf(buffer, sizeof buffer, " %02X", value.head[i]);
     text += buffer;
   }
   return text;
@@ -48,7 +51,6 @@ std::string HexOf(const StreamValue& value)
 
 std::string BodyText(const StreamValue& value)
 {
-  using namespace _torvane_;
   switch (value.tag) {
   case kTagChunkStart:
     return std::to_string(value.chunk.id) + " level " + std::to_string(value.chunk.level);
@@ -56,7 +58,7 @@ std::string BodyText(const StreamValue& value)
     return {};
   case kTagString:
   case kTagFilename:
-    return JsonText(value.text);
+    return JsonText(ToUtf8(value.text));
   case kTagArray:
     return std::to_string(value.size) + " x " +
            (value.integer >= 1 && value.integer <= 6 ? kArrayNames[value.integer] : kArrayNames[0]) + HexOf(value);
@@ -65,12 +67,12 @@ std::string BodyText(const StreamValue& value)
   }
   if (value.tag >= kTagMemory)
     return std::to_string(value.size) + " bytes" + HexOf(value);
-  if (value.reals.empty())
+  if (value.realCount == 0)
     return value.tag == kTagULLong ? std::to_string(static_cast<std::uint64_t>(value.integer))
                                    : std::to_string(value.integer);
   std::string text;
-  for (double real : value.reals)
-    text += (text.empty() ? "" : " ") + JsonText(real);
+  for (Long i = 0; i < value.realCount; ++i)
+    text += (i == 0 ? "" : " ") + JsonText(value.reals[i]);
   return text;
 }
 
@@ -107,22 +109,21 @@ class Nesting
 
 void PrintJson(const Nesting& nesting, const StreamValue& value)
 {
-  using namespace _torvane_;
   nlohmann::json line = {{"offset", value.offset},
                          {"tag", value.tag},
-                         {"kind", TagName(value.tag)},
+                         {"kind", GetValueTagName(value.tag)},
                          {"depth", nesting.Depth()},
                          {"parent", nesting.Parent()}};
   if (value.tag == kTagChunkStart)
     line["chunk"] = {value.chunk.id, value.chunk.level};
   else if (value.tag == kTagString || value.tag == kTagFilename)
-    line["value"] = value.text;
+    line["value"] = ToUtf8(value.text);
   else if (value.tag >= kTagMemory)
     line["size"] = value.size;
-  else if (value.reals.size() == 1)
+  else if (value.realCount == 1)
     line["value"] = value.reals[0];
-  else if (!value.reals.empty())
-    line["value"] = value.reals;
+  else if (value.realCount > 0)
+    line["value"] = std::vector<double>(value.reals, value.reals + value.realCount);
   else if (value.tag != kTagChunkEnd)
     line["value"] = value.integer;
   PrintLine(line.dump(-1, ' ', false, nlohmann::json::error_handler_t::replace));
@@ -130,18 +131,21 @@ void PrintJson(const Nesting& nesting, const StreamValue& value)
 
 int Dump(const Options& options)
 {
-  StreamWalker walker(options.file);
+  StreamWalker walker;
+  const Bool good = walker.Open(ToFilename(options.file));
   StreamValue value;
   Nesting nesting;
-  while (walker.Next(value)) {
+  while (good && walker.Next(value)) {
     nesting.Leave(value);
     if (options.json)
       PrintJson(nesting, value);
     else
       PrintFormatted("%10lld  %s%s %s\n", static_cast<long long>(value.offset), nesting.Indent().c_str(),
-                     TagName(value.tag).c_str(), BodyText(value).c_str());
+                     GetValueTagName(value.tag), BodyText(value).c_str());
     nesting.Enter(value);
   }
+  if (walker.GetProblem().code != FILEERROR_NONE)
+    throw Failure(options.file + ": " + ToUtf8(walker.GetProblemText()));
   return kDone;
 }
 

@@ -1,4 +1,5 @@
 #include "k2v_file/stream/counted_records.h"
+#include "k2v_file/stream/value_forms.h"
 #include "torvane/objects/point_object_data.h"
 
 namespace _torvane_
@@ -9,7 +10,8 @@ namespace
 
 constexpr LLong kEntrySize = sizeof(NgonEntry);
 constexpr LLong kEdgeSize = sizeof(ULong);
-constexpr LLong kStoredNumberSize = 1 + 4; // a number behind its tag
+constexpr LLong kStoredNumberSize = StoredSize(kTagLong);
+static_assert(kStoredNumberSize == 5);
 
 } // namespace
 
