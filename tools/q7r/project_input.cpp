@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <cstdio>
 
+#include "export_account.h"
 #include "host/text.h"
 #include "verbs/verbs.h"
 
@@ -77,6 +78,7 @@ void AddProjectOptions(CLI::App& verb, ProjectOptions& options)
   verb.add_option("--images", options.images, "look here, and in all folders below, for footage that was moved");
   verb.add_option("--samples", options.samples,
                   "take the samples of this composition file, in place of expressions that aren't run");
+  verb.add_flag("--verbose", options.verbose, "list every warning, not one for each kind");
 }
 
 host::Project ReadProject(const ProjectOptions& options)
@@ -86,7 +88,7 @@ host::Project ReadProject(const ProjectOptions& options)
   const std::size_t chosen = Choose(file->Compositions(), options);
   const host::ReadOptions more{ToPath(options.images), ToPath(options.samples)};
   host::Project project = host::ReadProject(*file, chosen, host::OneLine(host::PathToUtf8(path.filename())), more);
-  for (const std::string& warning : project.warnings)
+  for (const std::string& warning : options.verbose ? project.warnings : MergedWarnings(project.warnings))
     std::fprintf(stderr, "warning: %s\n", warning.c_str());
   return project;
 }

@@ -16,9 +16,10 @@ struct ProjectOptions
   std::string composition; // name or id; empty: the one that is in front
   std::string images;
   std::string samples;
+  bool verbose = false; // every warning, not one for each kind
 };
 
-// Adds --composition, --images and --samples.
+// Adds --composition, --images, --samples and --verbose.
 void AddProjectOptions(CLI::App& verb, ProjectOptions& options);
 
 // Reads the composition that is meant and prints what it warns of. Throws Failure where there is none, or where several

@@ -232,12 +232,13 @@ void WriteOutput(const std::string& path, std::string_view bytes, const std::str
   });
 }
 
-void RequireReadable(const std::string& partial, const std::string& path)
+DocumentPtr ReadBack(const std::string& partial, const std::string& path)
 {
   FileProblem problem;
-  const DocumentPtr document(LoadDocument(ToFilename(partial), LoadObjects | LoadMaterials, &problem));
+  DocumentPtr document(LoadDocument(ToFilename(partial), LoadObjects | LoadMaterials, &problem));
   if (!document)
     throw Failure(ProblemText(path, problem) + " (what was written can't be read back)");
+  return document;
 }
 
 void WriteScene(BaseDocument& document, const std::string& path)
@@ -246,7 +247,7 @@ void WriteScene(BaseDocument& document, const std::string& path)
     FileProblem problem;
     if (!SaveDocument(&document, ToFilename(partial), 0, &problem) || problem.code != FILEERROR_NONE)
       throw Failure(ProblemText(path, problem));
-    RequireReadable(partial, path);
+    ReadBack(partial, path);
     return std::string();
   });
 }

@@ -40,7 +40,7 @@ void WriteOutput(const std::string& path, std::string_view bytes, const std::str
 std::unique_ptr<TemporaryFile> MakePlainFile();
 
 // Reads a written scene back; `path` is the name that the user knows it by.
-void RequireReadable(const std::string& partial, const std::string& path);
+DocumentPtr ReadBack(const std::string& partial, const std::string& path);
 
 // Saves a document so.
 void WriteScene(_torvane_::BaseDocument& document, const std::string& path);

@@ -6,6 +6,7 @@
 #include <memory>
 #include <new>
 
+#include "export_account.h"
 #include "exporter/entry/scene_writer.h"
 #include "exporter/host_api/aegp_entry.h"
 #include "gltf_file.h"
@@ -26,7 +27,8 @@ constexpr const char* kHelp = R"(Exports a composition of an After Effects proje
 
 Use it to turn a project (.aep, .aepx), or what its user published as Lottie JSON, into
 a scene of cameras, lights and image planes. docs/projects.md and docs/composition.md
-tell what is read.
+tell what is read. At the end it tells on standard error which layers the scene has and
+which were left out, and why.
 
 Example: q7r export shot.aep shot.q7r --composition "Main")";
 
@@ -89,13 +91,20 @@ bool PlayExport(host::StandaloneHost& player, const std::string& output, const s
   return quiet;
 }
 
+void TellAccount(const host::Composition& composition, _torvane_::BaseDocument& document)
+{
+  std::fprintf(stderr, "%s\n", AccountText(composition, CountScene(document)).c_str());
+}
+
 // Goes through the scene, which is kept in a temporary file meanwhile.
-int ExportAsGltf(host::StandaloneHost& player, const std::string& composition, const std::string& output)
+int ExportAsGltf(host::StandaloneHost& player, const host::Composition& composition, const std::string& source,
+                 const std::string& output)
 {
   const std::unique_ptr<TemporaryFile> scene = MakePlainFile();
   const bool quiet = PlayExport(player, output, scene->Path().string());
   const DocumentPtr document = LoadScene(scene->Path().string());
-  const int status = WriteGltf(*document, composition, output, {});
+  TellAccount(composition, *document);
+  const int status = WriteGltf(*document, source, output, {});
   return quiet ? status : kProblems;
 }
 
@@ -107,16 +116,22 @@ int Export(const Options& options)
     RequireGltfOutput(output, options.project.file, options.force);
   else
     RequireWritable(output, options.force);
-  host::StandaloneHost player(ReadProject(options.project));
-  if (asGltf)
-    return ExportAsGltf(player, options.project.file, output);
+  host::Project project = ReadProject(options.project);
+  const host::Composition& chosen = *project.root; // stays where it is when the project moves
+  const bool isWarned = !project.warnings.empty();
+  host::StandaloneHost player(std::move(project));
+  if (asGltf) {
+    const int status = ExportAsGltf(player, chosen, options.project.file, output);
+    return isWarned ? kProblems : status;
+  }
   bool quiet = true;
   WriteOutput(output, [&](const std::string& partial) {
     quiet = PlayExport(player, output, partial);
-    RequireReadable(partial, output);
+    const DocumentPtr document = ReadBack(partial, output);
+    TellAccount(chosen, *document);
     return std::string();
   });
-  return quiet ? kDone : kProblems;
+  return quiet && !isWarned ? kDone : kProblems;
 }
 
 } // namespace

@@ -5,14 +5,10 @@
 #include <memory>
 
 #include "listing/json_text.h"
+#include "listing/scene_counts.h"
 #include "listing/type_names.h"
 #include "output/standard_output.h"
 #include "scene_file.h"
-#include "torvane/animation/ctrack.h"
-#include "torvane/render/render_data.h"
-#include "torvane/shaders/base_shader.h"
-#include "torvane/tags/base_tag.h"
-#include "torvane/views/base_draw.h"
 #include "verbs.h"
 
 namespace q7r
@@ -33,67 +29,6 @@ struct Options
   std::string file;
   bool json = false;
 };
-
-struct Counts
-{
-  std::map<Long, long long> objects; // by type
-  std::map<Long, long long> tags;
-  long long tracks = 0;
-  long long keys = 0;
-};
-
-void CountTracks(const BaseList2D& node, Counts& counts)
-{
-  for (CTrack* track = node.GetFirstTrack(); track; track = track->GetNext()) {
-    ++counts.tracks;
-    for (Long number = 1; number <= kCurveLast; ++number) {
-      if (CCurve* curve = track->GetCurve(number, 0))
-        counts.keys += curve->GetKeyCount();
-    }
-  }
-}
-
-void CountNodes(BaseList2D* first, Counts& counts);
-
-// A node and all that it owns: every one of them may move.
-void CountNode(BaseList2D& node, Counts& counts)
-{
-  CountTracks(node, counts);
-  CountNodes(node.GetShaders(), counts);
-  if (auto* inTree = NodeCast<BaseList4D>(&node))
-    CountNodes(inTree->GetDown(), counts);
-  if (auto* object = NodeCast<BaseObject>(&node)) {
-    ++counts.objects[object->GetType()];
-    CountNodes(object->GetFirstTag(), counts);
-  } else if (NodeCast<BaseTag>(&node)) {
-    ++counts.tags[node.GetType()];
-  } else if (auto* settings = NodeCast<RenderData>(&node)) {
-    CountNodes(settings->GetVideoPosts().GetFirst(), counts);
-    CountNodes(settings->GetMultipasses().GetFirst(), counts);
-  } else if (auto* panel = NodeCast<ViewPanel>(&node)) {
-    CountNodes(panel->GetDraws().GetFirst(), counts);
-  } else if (auto* draw = NodeCast<BaseDraw>(&node)) {
-    CountTracks(*draw->GetEditorCamera(), counts); // not an object of the scene
-  }
-}
-
-void CountNodes(BaseList2D* first, Counts& counts)
-{
-  for (BaseList2D* node = first; node; node = node->GetNext())
-    CountNode(*node, counts);
-}
-
-Counts CountScene(BaseDocument& document)
-{
-  Counts counts;
-  CountNode(document, counts);
-  for (RootList2D* root :
-       {static_cast<RootList2D*>(document.GetObjectRoot()), static_cast<RootList2D*>(document.GetMaterialRoot()),
-        static_cast<RootList2D*>(document.GetLayerRoot()), static_cast<RootList2D*>(document.GetRenderDataRoot()),
-        static_cast<RootList2D*>(document.GetViewPanelRoot())})
-    CountNodes(root->GetFirst(), counts);
-  return counts;
-}
 
 long long Sum(const std::map<Long, long long>& counts)
 {
@@ -118,7 +53,7 @@ Json ByType(const std::map<Long, long long>& counts)
   return json;
 }
 
-Json InfoJson(BaseDocument& document, const Counts& counts, std::uintmax_t size)
+Json InfoJson(BaseDocument& document, const SceneCounts& counts, std::uintmax_t size)
 {
   const DocumentPref& pref = document.GetPref();
   return {{"size", size},
@@ -157,7 +92,7 @@ void Row(const char* label, const std::string& text)
     PrintFormatted("%-16s %s\n", label, text.c_str());
 }
 
-void PrintInfo(const Json& info, const Counts& counts)
+void PrintInfo(const Json& info, const SceneCounts& counts)
 {
   auto number = [&info](const char* key) { return info[key].dump(); };
   auto seconds = [&info](const char* key) { return info[key][0].get<double>() / info[key][1].get<double>(); };
@@ -182,7 +117,7 @@ void PrintInfo(const Json& info, const Counts& counts)
 int Info(const Options& options)
 {
   DocumentPtr document = LoadScene(options.file);
-  const Counts counts = CountScene(*document);
+  const SceneCounts counts = CountScene(*document);
   Json info = InfoJson(*document, counts, std::filesystem::file_size(options.file));
   if (options.json)
     PrintLine(info.dump(1, ' ', false, Json::error_handler_t::replace));
