@@ -209,3 +209,35 @@ TEST_F(Output, OfInfoCountsTheTracksOfEveryNode)
   const RunResult run = RunQ7r("info --json " + Quoted(folder_ / "tracks.q7r"));
   EXPECT_EQ(nlohmann::json::parse(run.out)["tracks"], wanted) << run.out;
 }
+
+// Layers by kind, with those of nested compositions; warnings by kind; the names that a user may have meant.
+TEST_F(Output, OfAnExportSaysWhatWasLeftOutAndWhy)
+{
+  const std::string layers = R"~({"ddd":1,"ty":13,"nm":"Eye","ks":{}},{"ddd":1,"ty":1,"nm":"Wall","sw":9,"sh":9,
+    "sc":"#fff","ks":{"p":{"k":[1,2,3],"x":"wiggle(1)"}}},{"ddd":1,"ty":1,"nm":"Floor","sw":9,"sh":9,"sc":"#fff",
+    "ks":{"p":{"k":[1,2,3],"x":"wiggle(2)"}}},{"ty":3,"nm":"Flat","ks":{}},{"ty":4,"nm":"S","ks":{}})~";
+  const std::string nested = R"~({"ddd":1,"ty":0,"refId":"n","w":9,"h":9,"nm":"In","ks":{}})~";
+  const auto run = [&](const std::string& inside, const std::string& more) {
+    const std::string text = R"~({"fr":25,"ip":0,"op":5,"w":9,"h":9,"nm":"Main","assets":[{"id":"n","nm":"In","layers":[
+      {"ddd":1,"ty":3,"nm":"N","ks":{}},{"ddd":1,"ty":5,"nm":"T","ks":{}}]}],"layers":[)~" +
+                             inside + "]}";
+    WriteWholeFile(folder_ / "c.json", {text.begin(), text.end()});
+    return Export(folder_ / "out.q7r", " --force" + more);
+  };
+  const RunResult some = run(layers + "," + nested, "");
+  EXPECT_EQ(some.status, 1);
+  EXPECT_NE(some.err.find("8 layers: 1 camera, 2 solids, 1 null, 1 nested composition; left out: 1 text layer, 1 shape "
+                          "layer, 1 layer with its 3D switch off; 0 tracks, 0 keys\n"),
+            std::string::npos)
+      << some.err;
+  EXPECT_NE(some.err.find("(and 1 more like this"), std::string::npos) << some.err;
+  EXPECT_EQ(some.err.find("Floor"), std::string::npos) << some.err;
+  EXPECT_NE(run(layers, " --verbose").err.find("Floor"), std::string::npos);
+  const RunResult none = run(R"~({"ty":4,"nm":"S","ks":{}})~", "");
+  EXPECT_EQ(none.status, 0) << none.err;
+  EXPECT_NE(none.err.find("1 layer; left out: 1 shape layer; 0 tracks, 0 keys\nthe scene is empty"), std::string::npos)
+      << none.err;
+  const RunResult unknown = run(layers, " --composition Moon");
+  EXPECT_EQ(unknown.status, 2);
+  EXPECT_NE(unknown.err.find("\"Moon\"; it has \"Main\", \"In\""), std::string::npos) << unknown.err;
+}
