@@ -150,6 +150,12 @@ const Fault kFaults[] = {
     {"/layers/1/ind", "1.5", "expected a whole number"},
     {"/layers/1/ind", "1", "another layer of the list has the same ind"},
     {"/layers/1/parent", "\"1\"", "expected a number"},
+    // What only this host reads
+    {"/ae/frameDuration", "[1, 25]", ""},
+    {"/ae/frameDuration", "25", "expected an array of two numbers"},
+    {"/ae/frameDuration", "[1, 2, 3]", "expected an array of two numbers"},
+    {"/assets/1/ae/path", "1", "expected a text"},
+    {"/layers/0/ae", R"({"id": 7, "color": [0, 0.5, 1]})", ""},
     {"/layers/1/parent", "2", "the chain of parents loops"},
 };
 
