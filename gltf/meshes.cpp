@@ -66,19 +66,36 @@ std::size_t Meshes::FindQuad(BaseObject& object)
 
 std::size_t Meshes::AddQuad(float width, float height, const Surface& surface)
 {
+  const std::size_t corners = CornersOf(width, height);
+  Json attributes = {{"POSITION", corners}, {"NORMAL", quadNormals_}};
+  if (surface.hasPicture)
+    attributes["TEXCOORD_0"] = CoordinatesOfQuads();
+  const Json primitive = {{"attributes", attributes}, {"indices", quadIndices_}, {"material", surface.material}};
+  return context_.output.meshes.Add({{"primitives", Json::array({primitive})}});
+}
+
+// The places of a quad's corners; quads of one size share them, and all quads share the rest.
+std::size_t Meshes::CornersOf(float width, float height)
+{
   Output& output = context_.output;
+  const auto [place, isNew] = corners_.try_emplace({width, height}, kNone);
+  if (!isNew)
+    return place->second;
   const float x = 0.5F * width;
   const float y = 0.5F * height;
-  const std::vector<float> points = {-x, -y, 0, x, -y, 0, x, y, 0, -x, y, 0};
-  Json attributes = {
-      {"POSITION", output.AddFloats(points, 3, ViewTarget::kVertices, true)},
-      {"NORMAL", output.AddFloats({0, 0, 1, 0, 0, 1, 0, 0, 1, 0, 0, 1}, 3, ViewTarget::kVertices, false)}};
-  if (surface.hasPicture)
-    attributes["TEXCOORD_0"] = output.AddFloats({0, 1, 1, 1, 1, 0, 0, 0}, 2, ViewTarget::kVertices, false);
-  const Json primitive = {{"attributes", attributes},
-                          {"indices", output.AddIndices({0, 1, 2, 0, 2, 3}, 4)},
-                          {"material", surface.material}};
-  return output.meshes.Add({{"primitives", Json::array({primitive})}});
+  place->second = output.AddFloats({-x, -y, 0, x, -y, 0, x, y, 0, -x, y, 0}, 3, ViewTarget::kVertices, true);
+  if (quadNormals_ == kNone) {
+    quadNormals_ = output.AddFloats({0, 0, 1, 0, 0, 1, 0, 0, 1, 0, 0, 1}, 3, ViewTarget::kVertices, false);
+    quadIndices_ = output.AddIndices({0, 1, 2, 0, 2, 3}, 4);
+  }
+  return place->second;
+}
+
+std::size_t Meshes::CoordinatesOfQuads()
+{
+  if (quadCoordinates_ == kNone)
+    quadCoordinates_ = context_.output.AddFloats({0, 1, 1, 1, 1, 0, 0, 0}, 2, ViewTarget::kVertices, false);
+  return quadCoordinates_;
 }
 
 Json NewMesh(const BaseObject& object)

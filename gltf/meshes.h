@@ -3,6 +3,7 @@
 
 #include <map>
 #include <tuple>
+#include <utility>
 
 #include "gltf/context.h"
 #include "gltf/materials.h"
@@ -23,10 +24,16 @@ class Meshes
 
   std::size_t FindQuad(_torvane_::BaseObject& object);
   std::size_t AddQuad(float width, float height, const Surface& surface);
+  std::size_t CornersOf(float width, float height);
+  std::size_t CoordinatesOfQuads();
 
   Context& context_;
   Materials materials_;
-  std::map<Quad, std::size_t> quads_; // of equal size and material one mesh
+  std::map<Quad, std::size_t> quads_;                      // of equal size and material one mesh
+  std::map<std::pair<float, float>, std::size_t> corners_; // accessors, as below
+  std::size_t quadNormals_ = kNone;
+  std::size_t quadIndices_ = kNone;
+  std::size_t quadCoordinates_ = kNone;
 };
 
 // The mesh of an object with polygons; kNone if none of them can be drawn.

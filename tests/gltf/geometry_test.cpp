@@ -21,7 +21,8 @@ class GltfGeometry : public GltfScene
     EXPECT_TRUE(ResizePolygons(*object, 5, static_cast<Long>(polygons.size()), -1));
     const Vector points[] = {{0, 0, 0}, {0, 100, 0}, {100, 100, 0}, {100, 0, 50}, {1e6, 0, 0}};
     std::copy(std::begin(points), std::end(points), GetPointTag(*object)->GetArray());
-    std::copy(polygons.begin(), polygons.end(), GetPolygonTag(*object)->GetArray());
+    if (PolygonTag* tag = GetPolygonTag(*object)) // there is none for no polygons
+      std::copy(polygons.begin(), polygons.end(), tag->GetArray());
     return object;
   }
   template <class Tag>
