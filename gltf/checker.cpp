@@ -15,7 +15,7 @@ namespace gltf
 namespace
 {
 
-using Json = nlohmann::json;
+using ParsedJson = nlohmann::json;
 
 struct Fault : std::runtime_error
 {
@@ -67,8 +67,8 @@ class GlbChecker
     Require(Word(kHeader + 4) == 0x4E4F534A && length % 4 == 0, "the first chunk isn't JSON");
     const std::size_t begin = kHeader + kChunkHeader;
     Require(begin + length <= file_.size(), "the JSON is cut");
-    json_ = Json::parse(file_.begin() + static_cast<std::ptrdiff_t>(begin),
-                        file_.begin() + static_cast<std::ptrdiff_t>(begin + length));
+    json_ = ParsedJson::parse(file_.begin() + static_cast<std::ptrdiff_t>(begin),
+                              file_.begin() + static_cast<std::ptrdiff_t>(begin + length));
     Require(json_.contains("buffers") == (begin + length < file_.size()), "bytes and buffers don't go together");
     if (!json_.contains("buffers"))
       return;
@@ -82,7 +82,7 @@ class GlbChecker
   std::size_t Count(const char* name) const { return json_.contains(name) ? json_.at(name).size() : 0; }
 
   // An index into one of the arrays.
-  std::size_t Index(const Json& value, const char* name) const
+  std::size_t Index(const ParsedJson& value, const char* name) const
   {
     Require(value.is_number_unsigned() && value.get<std::size_t>() < Count(name),
             std::string("no such one of ") + name);
@@ -98,9 +98,9 @@ class GlbChecker
   void CheckExtensions() const
   {
     std::set<std::string> used;
-    std::vector<const Json*> open = {&json_};
+    std::vector<const ParsedJson*> open = {&json_};
     while (!open.empty()) {
-      const Json& value = *open.back();
+      const ParsedJson& value = *open.back();
       open.pop_back();
       for (const auto& [name, inner] : value.items()) {
         if (name == "extensions" && value.is_object()) {
@@ -112,14 +112,14 @@ class GlbChecker
           open.push_back(&inner);
       }
     }
-    Require(Json(used) == json_.value("extensionsUsed", Json::array()), "the extensions used are others");
+    Require(ParsedJson(used) == json_.value("extensionsUsed", ParsedJson::array()), "the extensions used are others");
   }
 
   void CheckViews() const
   {
     std::size_t end = 0;
     for (std::size_t i = 0; i < Count("bufferViews"); ++i) {
-      const Json& view = json_.at("bufferViews")[i];
+      const ParsedJson& view = json_.at("bufferViews")[i];
       const std::size_t offset = view.at("byteOffset");
       const std::size_t length = view.at("byteLength");
       Require(offset % 4 == 0 && offset >= end && length > 0 && length <= bytesSize_ && offset <= bytesSize_ - length,
@@ -128,7 +128,7 @@ class GlbChecker
     }
   }
 
-  static std::size_t WidthOf(const Json& accessor)
+  static std::size_t WidthOf(const ParsedJson& accessor)
   {
     const std::string type = accessor.at("type");
     return type == "SCALAR" ? 1 : static_cast<std::size_t>(type.at(3) - '0');
@@ -136,8 +136,8 @@ class GlbChecker
 
   std::vector<double> Numbers(std::size_t index) const
   {
-    const Json& accessor = json_.at("accessors")[index];
-    const Json& view = json_.at("bufferViews").at(accessor.at("bufferView").get<std::size_t>());
+    const ParsedJson& accessor = json_.at("accessors")[index];
+    const ParsedJson& view = json_.at("bufferViews").at(accessor.at("bufferView").get<std::size_t>());
     const int type = accessor.at("componentType");
     const std::size_t size = type == 5123 ? 2 : 4;
     const std::size_t count = accessor.at("count").get<std::size_t>() * WidthOf(accessor);
@@ -153,7 +153,7 @@ class GlbChecker
 
   void CheckAccessor(std::size_t index) const
   {
-    const Json& accessor = json_.at("accessors")[index];
+    const ParsedJson& accessor = json_.at("accessors")[index];
     const std::size_t width = WidthOf(accessor);
     const std::vector<double> numbers = Numbers(index);
     const std::string name = "accessor " + std::to_string(index);
@@ -182,19 +182,19 @@ class GlbChecker
   void CheckNodes() const
   {
     std::vector<bool> hasParent(Count("nodes"));
-    auto take = [&](const Json& list) {
-      for (const Json& child : list) {
+    auto take = [&](const ParsedJson& list) {
+      for (const ParsedJson& child : list) {
         const std::size_t index = Index(child, "nodes");
         Require(!hasParent[index], "node " + std::to_string(index) + " hangs in two places");
         hasParent[index] = true;
       }
     };
-    const Json& scene = json_.at("scenes").at(json_.at("scene").get<std::size_t>());
+    const ParsedJson& scene = json_.at("scenes").at(json_.at("scene").get<std::size_t>());
     if (scene.contains("nodes"))
       take(scene.at("nodes"));
     std::set<std::string> names;
     for (std::size_t i = 0; i < Count("nodes"); ++i) {
-      const Json& node = json_.at("nodes")[i];
+      const ParsedJson& node = json_.at("nodes")[i];
       CheckNode(node);
       if (node.contains("children"))
         take(node.at("children"));
@@ -204,7 +204,7 @@ class GlbChecker
     Require(std::find(hasParent.begin(), hasParent.end(), false) == hasParent.end(), "a node hangs nowhere");
   }
 
-  void CheckNode(const Json& node) const
+  void CheckNode(const ParsedJson& node) const
   {
     if (node.contains("mesh"))
       Index(node.at("mesh"), "meshes");
@@ -212,7 +212,7 @@ class GlbChecker
       Index(node.at("camera"), "cameras");
     if (node.contains("rotation"))
       RequireUnit(node.at("rotation").get<std::vector<double>>().data(), 4, "a rotation");
-    const Json light = node.value("/extensions/KHR_lights_punctual/light"_json_pointer, Json());
+    const ParsedJson light = node.value("/extensions/KHR_lights_punctual/light"_json_pointer, ParsedJson());
     Require(light.is_null() || light < json_.at("extensions").at("KHR_lights_punctual").at("lights").size(),
             "no such light");
   }
@@ -220,21 +220,21 @@ class GlbChecker
   void CheckMeshes() const
   {
     for (std::size_t i = 0; i < Count("meshes"); ++i) {
-      for (const Json& primitive : json_.at("meshes")[i].at("primitives"))
+      for (const ParsedJson& primitive : json_.at("meshes")[i].at("primitives"))
         CheckPrimitive(primitive);
     }
   }
 
-  void CheckPrimitive(const Json& primitive) const
+  void CheckPrimitive(const ParsedJson& primitive) const
   {
-    const Json& attributes = primitive.at("attributes");
-    const Json& accessors = json_.at("accessors");
-    const Json& position = accessors.at(Index(attributes.at("POSITION"), "accessors"));
+    const ParsedJson& attributes = primitive.at("attributes");
+    const ParsedJson& accessors = json_.at("accessors");
+    const ParsedJson& position = accessors.at(Index(attributes.at("POSITION"), "accessors"));
     Require(position.contains("min"), "places without bounds");
     for (const auto& [name, index] : attributes.items())
       Require(accessors.at(Index(index, "accessors")).at("count") == position.at("count"),
               name + " is of another count");
-    const Json& material = json_.at("materials").at(Index(primitive.at("material"), "materials"));
+    const ParsedJson& material = json_.at("materials").at(Index(primitive.at("material"), "materials"));
     const bool hasPicture = material.contains("/pbrMetallicRoughness/baseColorTexture"_json_pointer);
     Require(!hasPicture || attributes.contains("TEXCOORD_0"), "a picture without coordinates");
     if (!primitive.contains("indices"))
@@ -252,8 +252,8 @@ class GlbChecker
   void CheckMaterials() const
   {
     for (std::size_t i = 0; i < Count("materials"); ++i) {
-      const Json& surface = json_.at("materials")[i].at("pbrMetallicRoughness");
-      for (const Json& factor : surface.at("baseColorFactor"))
+      const ParsedJson& surface = json_.at("materials")[i].at("pbrMetallicRoughness");
+      for (const ParsedJson& factor : surface.at("baseColorFactor"))
         Require(factor >= 0.0 && factor <= 1.0, "a colour out of range");
       if (surface.contains("baseColorTexture"))
         Index(surface.at("baseColorTexture").at("index"), "textures");
@@ -272,10 +272,10 @@ class GlbChecker
   {
     if (!json_.contains("animations"))
       return;
-    const Json& animation = json_.at("animations").at(0);
+    const ParsedJson& animation = json_.at("animations").at(0);
     std::set<std::string> targets;
-    for (const Json& channel : animation.at("channels")) {
-      const Json& target = channel.at("target");
+    for (const ParsedJson& channel : animation.at("channels")) {
+      const ParsedJson& target = channel.at("target");
       Require(targets.insert(target.dump()).second, "two channels for one value");
       if (target.contains("node"))
         Index(target.at("node"), "nodes");
@@ -285,13 +285,13 @@ class GlbChecker
     }
   }
 
-  void CheckPointer(const Json& target) const
+  void CheckPointer(const ParsedJson& target) const
   {
     const std::string pointer = target.at("extensions").at("KHR_animation_pointer").at("pointer");
-    Require(json_.contains(Json::json_pointer(pointer)), pointer + " leads nowhere");
+    Require(json_.contains(ParsedJson::json_pointer(pointer)), pointer + " leads nowhere");
   }
 
-  void CheckSampler(const Json& sampler, const std::string& path) const
+  void CheckSampler(const ParsedJson& sampler, const std::string& path) const
   {
     const std::size_t input = Index(sampler.at("input"), "accessors");
     const std::size_t output = Index(sampler.at("output"), "accessors");
@@ -306,7 +306,7 @@ class GlbChecker
   }
 
   const std::vector<std::uint8_t>& file_;
-  Json json_;
+  ParsedJson json_;
   std::size_t bytes_ = 0; // where the buffer begins
   std::size_t bytesSize_ = 0;
 };
