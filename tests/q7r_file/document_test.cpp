@@ -445,7 +445,10 @@ TEST(Document, WhatIsSavedCanBeLoadedAndWhatNestsTooDeepIsRefused)
   int saved = 0;
   for (int depth = 1; depth <= HyperFile::kMaxLoopDepth + 1; ++depth) {
     BaseObject* object = AllocObject(kObjectNull);
-    last ? object->InsertUnder(last) : document->InsertObject(object);
+    if (last)
+      object->InsertUnder(last);
+    else
+      document->InsertObject(object);
     last = object;
     if (depth < HyperFile::kMaxLoopDepth - 5 && depth != 2000)
       continue;
