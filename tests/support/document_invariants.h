@@ -88,7 +88,6 @@ class DocumentInvariants
     } else if (auto* panel = NodeCast<ViewPanel>(&node)) {
       Add(&panel->GetDraws(), &node);
     } else if (auto* draw = NodeCast<BaseDraw>(&node)) {
-      Require(draw->IsComplete(), "a draw has no camera");
       CheckLink(draw->GetSceneCamera());
     } else if (auto* track = NodeCast<CTrack>(&node)) {
       CheckCurves(*track);
