@@ -63,6 +63,7 @@ bool WriteSceneFile(const char* path)
   if (!document)
     return false;
   if (!file.Open(kSceneIdent, name, kHyperFileWrite, false)) {
+    lastProblem = file.GetProblem();
     file.Close();
     return false;
   }

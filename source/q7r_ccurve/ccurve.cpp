@@ -151,13 +151,18 @@ Bool CCurve::DelKey(Long index)
   return true;
 }
 
-// Takes a key out of the index: it is about to leave the list.
+// Takes a key out of the index: it is about to leave the list. The keys of a damaged file may be out of order.
 void CCurve::ForgetKey(const CKey& key)
 {
-  Long place = PlaceOf(key.GetTime());
-  while (GetKey(place) && GetKey(place) != &key)
-    ++place;
-  keys_.Remove(place);
+  const Long starts[] = {PlaceOf(key.GetTime()), 0};
+  for (Long first : starts) {
+    for (Long place = first; GetKey(place); ++place) {
+      if (GetKey(place) == &key) {
+        keys_.Remove(place);
+        return;
+      }
+    }
+  }
 }
 
 // The index has room for the key again that it just gave up.

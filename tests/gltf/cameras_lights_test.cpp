@@ -169,6 +169,11 @@ TEST_F(GltfViews, MeasuredLightsShineAllAround)
   measured->manufacturer = "Maker";
   measured->luminaireCatalogue = "L-1";
   measured->maxCandela = 100;
+  measured->horizontalAngles.Append(0);
+  for (const double angle : {0, 90, 180}) {
+    measured->verticalAngles.Append(angle);
+    measured->candela.Append(100);
+  }
   NodeCast<LightObjectData>(light->GetObjectData())->AdoptIES(measured);
   const Converted scene = Convert();
   EXPECT_EQ(LightOf(scene, "measured")["type"], "point");

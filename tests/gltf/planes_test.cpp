@@ -146,16 +146,21 @@ TEST_F(GltfPlanes, AreLitWhereALightIsSeen)
 
 TEST_F(GltfPlanes, NameTheirPicturesFromWhereTheFileLies)
 {
-  Write("pictures/two words %#é.png", Png(6));
+#ifdef _WIN32 // a test's narrow text is no UTF-8 there
+  const std::string strange = "two words %#.png", encoded = "two%20words%20%25%23.png";
+#else
+  const std::string strange = "two words %#é.png", encoded = "two%20words%20%25%23%C3%A9.png";
+#endif
+  Write("pictures/" + strange, Png(6));
   Write("plain.jpg", Jpeg());
   options.outputFolder = folder_.Path() / "out";
-  AddPlane("a", 1, 1, AddPicture("a", folder_ / "pictures/two words %#é.png"));
+  AddPlane("a", 1, 1, AddPicture("a", folder_ / ("pictures/" + strange)));
   AddPlane("b", 1, 1, AddPicture("b", "plain.jpg"));
   AddPlane("c", 1, 1, AddPicture("c", folder_ / "out/../plain.jpg"));
   AddPlane("d", 1, 1, AddPicture("d", "C:\\films\\plain.jpg"));
   const Converted scene = Convert();
-  EXPECT_EQ(scene.json["images"], Json::parse(R"([{"uri": "../pictures/two%20words%20%25%23%C3%A9.png"},
-                                                  {"uri": "../plain.jpg"}])"));
+  EXPECT_EQ(scene.json["images"],
+            Json::parse(R"([{"uri": "../pictures/)" + encoded + R"("}, {"uri": "../plain.jpg"}])"));
   EXPECT_EQ(scene.json["samplers"],
             Json::parse(R"([{"magFilter": 9729, "minFilter": 9987, "wrapS": 33071, "wrapT": 33071}])"));
   EXPECT_EQ(scene.json["textures"].size(), 2U);

@@ -500,7 +500,7 @@ TEST(Document, NestingWithoutEndIsAnErrorAndNoCrash)
   EXPECT_EQ(LoadFromBytes(w.bytes, 3, &problem), nullptr);
   EXPECT_EQ(problem.code, FILEERROR_CHUNK_STRUCTURE);
   EXPECT_EQ(Utf8(GetChunkPathText(problem)), "110059/110107/110100/5154/110100/110100/5154/110100/.../"
-                                             "5154/110100/110100/5154/110100/110100/5154/110100");
+                                             "110100/5154/110100/110100/5154/110100/110100/5154");
 }
 
 TEST(RootLists, SkipWhatTheyDoNotKnowAndKeepTheNeighbours)

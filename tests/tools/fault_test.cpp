@@ -23,6 +23,8 @@ struct Verb
   std::string arguments; // the files of the folder in braces
   std::string output;    // what it writes, beside standard output
 };
+// How a test is named.
+void PrintTo(const Verb& verb, std::ostream* out) { *out << verb.arguments; }
 
 class Faults : public testing::TestWithParam<Verb>
 {

@@ -27,7 +27,7 @@ class ProjectVerbs : public testing::Test
   {
     const std::string scene = folder_ / "scene.q7r";
     const RunResult run = RunQ7r("export " + arguments + " --force " + Quoted(scene));
-    EXPECT_EQ(0, run.status) << arguments << run.err;
+    EXPECT_EQ(run.err.find("warning: ") == std::string::npos ? 0 : 1, run.status) << arguments << run.err;
     EXPECT_EQ(0, RunQ7r("check " + Quoted(scene)).status) << arguments;
     nlohmann::json tree = nlohmann::json::parse(RunQ7r("tree --json " + Quoted(scene)).out);
     tree["document"].erase("container"); // who wrote it, and when
@@ -178,7 +178,8 @@ TEST_F(ProjectVerbs, FindMovedFootageAndTakeSamples)
   std::filesystem::create_directories(folder_.Path() / "new/deep/pictures");
   Write("new/deep/pictures/sky.png", "");
   const std::string found = Tree(Quoted(shot) + " --images " + Quoted(folder_ / "new"))["materials"].dump();
-  EXPECT_NE(found.find("deep/pictures/sky.png"), std::string::npos) << found;
+  const bool isSlash = std::filesystem::path::preferred_separator == '/';
+  EXPECT_NE(found.find(isSlash ? "deep/pictures/sky.png" : "deep\\\\pictures\\\\sky.png"), std::string::npos) << found;
   Write("new/pictures/nothing", "");
   const RunResult lost = RunQ7r("extract " + Quoted(shot) + " -o " + Quoted(folder_ / "a.json") + " --images " +
                                 Quoted(folder_ / "new/deep/pictures/.."));

@@ -97,11 +97,25 @@ std::string ToUtf8(const String& text)
   return out;
 }
 
+namespace
+{
+
+// The system's own words, if it was the one that failed, else the library's.
+std::string ReasonText(const FileProblem& problem, const String& text)
+{
+  return problem.systemError != 0 ? std::generic_category().message(problem.systemError) : ToUtf8(text);
+}
+
+} // namespace
+
 std::string ProblemText(const std::string& path, const FileProblem& problem)
 {
-  const std::string reason =
-      problem.systemError != 0 ? std::generic_category().message(problem.systemError) : ToUtf8(GetProblemText(problem));
-  return path + ": " + reason;
+  return path + ": " + ReasonText(problem, GetProblemText(problem));
+}
+
+std::string ProblemText(const std::string& path, const StreamWalker& walker)
+{
+  return path + ": " + ReasonText(walker.GetProblem(), walker.GetProblemText());
 }
 
 DocumentPtr LoadScene(const std::string& path)

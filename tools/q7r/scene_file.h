@@ -7,6 +7,7 @@
 
 #include "torvane/document/base_document.h"
 #include "torvane/memory/owned.h"
+#include "torvane/stream/stream_walker.h"
 
 namespace q7r
 {
@@ -25,6 +26,7 @@ std::string ToUtf8(const _torvane_::String& text);
 // "scene.q7r: byte 1234, in chunk 110059/110107: a read came short", or the system's own words: "scene.q7r: Permission
 // denied".
 std::string ProblemText(const std::string& path, const _torvane_::FileProblem& problem);
+std::string ProblemText(const std::string& path, const _torvane_::StreamWalker& walker);
 
 // Loads a scene file; throws Failure.
 DocumentPtr LoadScene(const std::string& path);

@@ -89,12 +89,14 @@ Bool HyperFile::ReadChunkHead(Long& id, Long& level)
   if (!ReadPlainLong(id) || !ReadPlainLong(level))
     return false;
   ++chunkDepth_;
-  if (chunkDepth_ > 0 && (chunkDepth_ <= chunkRoom_ || GrowChunks()))
-    chunks_[chunkDepth_ - 1] = {id, level};
+  if (chunkDepth_ <= 0)
+    return true;
+  if (chunkDepth_ > chunkRoom_ && !GrowChunks())
+    return Fail(FILEERROR_MEMORY, file_.GetPosition());
+  chunks_[chunkDepth_ - 1] = {id, level};
   return true;
 }
 
-// Where memory is short the inner chunks aren't told: a failure then has a shorter path.
 Bool HyperFile::GrowChunks()
 {
   constexpr Long kFirst = 32;

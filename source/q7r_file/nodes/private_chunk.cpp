@@ -123,7 +123,10 @@ Bool PrivateChunk::ReadOneChunk(HyperFile& file, Loop& loop)
   }
   const LLong body = file.GetPosition();
   const Bool keepGoing = loop.keepGoing || loop.inside > 0;
-  if (!ReadChunk(file, id, level) && !(keepGoing && file.GetPosition() == body && KeepChunk(file, id, level))) {
+  const Bool taken = ReadChunk(file, id, level);
+  if (!taken && !file.HasMemory()) // not a chunk of somebody else: one that could not be built
+    return loop.End(false);
+  if (!taken && !(keepGoing && file.GetPosition() == body && KeepChunk(file, id, level))) {
     const Bool skipped = file.SkipToEndChunk();
     if (!keepGoing)
       return loop.End(skipped);
@@ -132,7 +135,7 @@ Bool PrivateChunk::ReadOneChunk(HyperFile& file, Loop& loop)
   }
   if (EndsPartialLoad(file, id, level))
     return loop.End(true);
-  return file.GetError() == FILEERROR_NONE || loop.End(false);
+  return file.HasMemory() || loop.End(false);
 }
 
 Bool PrivateChunk::ReadChunks(HyperFile& file, Bool consumeHeader)

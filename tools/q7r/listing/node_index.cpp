@@ -1,9 +1,25 @@
 #include "node_index.h"
 
+#include "torvane/document/base_document.h"
+#include "torvane/materials/base_material.h"
+
 namespace q7r
 {
 
 using namespace _torvane_;
+
+namespace
+{
+
+// The list that holds a node. Materials that were read don't name theirs.
+const RootList2D* ListOf(const BaseList2D& node)
+{
+  if (!node.GetListHead() && NodeCast<BaseMaterial>(&node) && node.GetDocument())
+    return node.GetDocument()->GetMaterialRoot();
+  return node.GetListHead();
+}
+
+} // namespace
 
 const NodeIndex::Places& NodeIndex::PlacesIn(const RootList2D& list)
 {
@@ -19,14 +35,13 @@ Json NodeIndex::PathOf(const GeListNode* node)
 {
   Json path = Json::array();
   const auto* named = NodeCast<BaseList2D>(node);
-  while (named && named->GetListHead()) {
-    const RootList2D& list = *named->GetListHead();
-    const Places& places = PlacesIn(list);
+  while (const RootList2D* list = named ? ListOf(*named) : nullptr) {
+    const Places& places = PlacesIn(*list);
     const auto found = places.find(named);
     if (found == places.end())
       return nullptr;
     path.insert(path.begin(), found->second);
-    named = list.GetOwner();
+    named = list->GetOwner();
   }
   return path.empty() ? Json() : path;
 }

@@ -33,14 +33,16 @@ std::string WalkProblem(const std::string& file, long long& values)
 {
   StreamWalker walker;
   if (!walker.Open(ToFilename(file)))
-    throw Failure(file + ": " + ToUtf8(walker.GetProblemText()));
+    throw Failure(ProblemText(file, walker));
   StreamValue value;
   while (walker.Next(value)) {
     if (value.tag != kTagChunkStart && value.tag != kTagChunkEnd && walker.GetDepth() == 0)
       return file + ": byte " + std::to_string(value.offset) + ": a value outside all chunks";
     ++values;
   }
-  return walker.GetProblem().code == FILEERROR_NONE ? "" : file + ": " + ToUtf8(walker.GetProblemText());
+  if (walker.GetProblem().systemError != 0) // nothing that the file could be blamed for
+    throw Failure(ProblemText(file, walker));
+  return walker.GetProblem().code == FILEERROR_NONE ? "" : ProblemText(file, walker);
 }
 
 int Check(const Options& options)
@@ -52,7 +54,7 @@ int Check(const Options& options)
     problems.push_back(walk);
   FileProblem problem;
   DocumentPtr document(LoadDocument(ToFilename(options.file), LoadObjects | LoadMaterials, &problem));
-  if (problem.systemError != 0) // nothing that the file could be blamed for
+  if (problem.systemError != 0)
     throw Failure(ProblemText(options.file, problem));
   if (!document)
     problems.push_back(ProblemText(options.file, problem) + " (the scene can't be loaded)");

@@ -145,7 +145,7 @@ int Dump(const Options& options)
     nesting.Enter(value);
   }
   if (walker.GetProblem().code != FILEERROR_NONE)
-    throw Failure(options.file + ": " + ToUtf8(walker.GetProblemText()));
+    throw Failure(ProblemText(options.file, walker));
   return kDone;
 }
 
