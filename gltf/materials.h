@@ -37,7 +37,7 @@ class Materials
     Real offset[2] = {0.0, 0.0};
     Real length[2] = {1.0, 1.0};
 
-    auto operator<=>(const Placement&) const = default;
+    auto operator<=>(const Placement&) const = default; // NOLINT(modernize-use-nullptr): a wrong alarm
   };
   struct Paint // the colour channel of a scene material
   {

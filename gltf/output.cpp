@@ -65,7 +65,8 @@ std::size_t Output::AddView(const void* data, std::size_t size, ViewTarget targe
   return views_.Add(view);
 }
 
-std::size_t Output::AddAccessor(std::size_t view, int componentType, std::size_t count, const char* type, Json bounds)
+std::size_t Output::AddAccessor(std::size_t view, int componentType, std::size_t count, const char* type,
+                                const Json& bounds)
 {
   Json accessor = {{"bufferView", view}, {"componentType", componentType}, {"count", count}, {"type", type}};
   accessor.update(bounds);

@@ -60,7 +60,7 @@ class Output
 
  private:
   std::size_t AddView(const void* data, std::size_t size, ViewTarget target);
-  std::size_t AddAccessor(std::size_t view, int componentType, std::size_t count, const char* type, Json bounds);
+  std::size_t AddAccessor(std::size_t view, int componentType, std::size_t count, const char* type, const Json& bounds);
 
   Section accessors_;
   Section views_;

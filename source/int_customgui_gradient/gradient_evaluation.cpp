@@ -146,7 +146,7 @@ void GradientData::StoreCache()
 // now stands before it: so each bias moves one knot forward, and the first one's, which rules no stretch, to the last.
 void GradientData::MirrorGradient()
 {
-  if (CountKnots(*this) < 2 || !PrepareGradient())
+  if (CountKnots(*this) < 2 || !PrepareGradient() || !knotCache_)
     return;
   for (Long low = 0, high = knotCount_ - 1; low < high; ++low, --high)
     SwapKnots(knotCache_[low], knotCache_[high]);

@@ -125,10 +125,10 @@ void SwitchTo3D(ProjectBytes& bytes)
   const std::string& mark = isXml ? xml : binary;
   for (auto at = bytes.begin(); (at = std::search(at, bytes.end(), mark.begin(), mark.end())) != bytes.end(); ++at) {
     if (!isXml) {
-      at[8 + kSwitches] |= 0x04; // behind id and size
+      *(at + static_cast<std::ptrdiff_t>(8 + kSwitches)) |= 0x04; // behind id and size
       continue;
     }
-    std::uint8_t& digit = at[static_cast<std::ptrdiff_t>(xml.size()) + 2 * kSwitches + 1];
+    std::uint8_t& digit = *(at + static_cast<std::ptrdiff_t>(xml.size() + 2 * kSwitches + 1));
     const std::string digits = "0123456789abcdef";
     digit = static_cast<std::uint8_t>(digits[digits.find(static_cast<char>(digit)) | 4]);
   }

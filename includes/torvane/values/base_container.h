@@ -168,11 +168,13 @@ class BaseContainer
   Element* head_ = nullptr;
   Element* tail_ = nullptr;
   Block* blocks_ = nullptr; // where the elements lie, the newest first; owned; null where they are shared
+  // NOLINTBEGIN(readability-identifier-naming): private, although members of an unnamed union
   union
   {
     Element* free_ = nullptr; // places of removed elements, linked through `next`
     BaseContainer* pending_;  // of a container that waits to be freed: the next one that does
   };
+  // NOLINTEND(readability-identifier-naming)
   Long id_;
   UWord dirty_ = 0;
   UWord savedDirty_ = 0;

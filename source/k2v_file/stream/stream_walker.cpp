@@ -14,7 +14,7 @@ LLong GetInteger(const UChar* body, const ValueForm& form)
   ULLong bits = 0;
   for (LLong i = 0; i < form.size; ++i)
     bits = bits << 8 | body[i];
-  if (form.part == ValuePart::kSigned && form.size < 8 && (bits >> (8 * form.size - 1)) != 0)
+  if (form.part == ValuePart::kSigned && form.size > 0 && form.size < 8 && (bits >> (8 * form.size - 1)) != 0)
     bits |= ~ULLong{0} << (8 * form.size);
   return static_cast<LLong>(bits);
 }
@@ -153,7 +153,6 @@ Bool StreamWalker::ReadBlock(StreamValue& value, const UChar* start, LLong start
       type = start[0];
     else if (bytes.ReadUChar(type))
       --size;
-    startSize = 0;
     value.integer = type;
   }
   const LLong elementSize = value.tag == kTagArray ? GetElementSize(static_cast<Long>(value.integer)) : 1;

@@ -128,6 +128,8 @@ constexpr LLong GetValueBodySize(const ValueForm& form, const FileForm& file, co
 {
   if (form.count != 0)
     return form.count * (form.part == ValuePart::kReal && file.singlePrecision ? form.size / 2 : form.size);
+  if (!head)
+    return -1;
   if (form.size == sizeof(LLong)) {
     const auto length = static_cast<LLong>(bytes::GetBig<ULLong>(head));
     return length < 0 || length > INT64_MAX - form.size ? -1 : form.size + length;

@@ -48,7 +48,7 @@ class DefaultElements
   alignas(BaseContainer) UChar places_[count * BaseContainer::kDefaultSize];
   union
   {
-    BaseContainer container_ = BaseContainer();
+    BaseContainer container_ = BaseContainer(); // NOLINT(readability-identifier-naming): private, in an unnamed union
   };
 };
 
