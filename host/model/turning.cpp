@@ -62,11 +62,8 @@ Value TurnBetween(const Value& from, const Value& to, double y)
     return from;
   const Quaternion a = FromAngles(from);
   Quaternion b = FromAngles(to);
-  double dot = Dot(a, b);
-  if (dot < 0) {
+  if (Dot(a, b) < 0)
     b = {-b.w, -b.x, -b.y, -b.z};
-    dot = -dot;
-  }
   // The angle from its sine, which a small one keeps exact.
   const Quaternion way{b.w - a.w, b.x - a.x, b.y - a.y, b.z - a.z};
   const double angle = 2 * std::asin(std::clamp(std::sqrt(Dot(way, way)) / 2, 0.0, 1.0));

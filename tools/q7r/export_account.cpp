@@ -158,6 +158,7 @@ std::vector<std::string> MergedWarnings(const std::vector<std::string>& warnings
     ++groups[place->second].count;
   }
   std::vector<std::string> lines;
+  lines.reserve(groups.size());
   for (const Group& group : groups)
     lines.push_back(group.count == 1 ? group.first
                                      : group.first + " (and " + std::to_string(group.count - 1) +

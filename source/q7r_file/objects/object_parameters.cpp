@@ -47,7 +47,9 @@ constinit const BaseObject::DisplayPart BaseObject::kPlainDisplay{};
 // False when memory is short: the part stays as it was.
 Bool BaseObject::SetDisplay(const DisplayPart& part)
 {
-  if (!display_ && std::memcmp(&part, &kPlainDisplay, sizeof part) == 0)
+  // Bit by bit, since -0 is kept apart from 0; gaps between the members can only make equal parts seem different.
+  const Bool isPlain = std::memcmp(&part, &kPlainDisplay, sizeof part) == 0; // NOLINT(bugprone-*)
+  if (!display_ && isPlain)
     return true;
   if (!display_)
     display_ = NewObj<DisplayPart>();

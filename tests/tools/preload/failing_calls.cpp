@@ -56,7 +56,7 @@ __attribute__((destructor)) void Report()
 
 } // namespace
 
-// NOLINTBEGIN(readability-inconsistent-declaration-parameter-name)
+// NOLINTBEGIN(readability-inconsistent-declaration-parameter-name,bugprone-macro-parentheses)
 #define FAILING(result, failure, name, parameters, arguments)                                                          \
   extern "C" result name parameters                                                                                    \
   {                                                                                                                    \
@@ -108,7 +108,7 @@ FAILING(off_t, -1, ftello, (std::FILE * file), (file))
 FAILING(off64_t, -1, ftello64, (std::FILE * file), (file))
 FAILING(std::size_t, 0, fwrite, (const void* bytes, std::size_t size, std::size_t count, std::FILE* file),
         (bytes, size, count, file))
-// NOLINTEND(readability-inconsistent-declaration-parameter-name)
+// NOLINTEND(readability-inconsistent-declaration-parameter-name,bugprone-macro-parentheses)
 
 // Without something to write it asks nothing of the system.
 extern "C" int fflush(std::FILE* file)
