@@ -80,8 +80,10 @@ TEST(FailedAllocations, MakeWholeNodesOrNone)
   for (Long type : {kObjectPolygon, kObjectSpline, kObjectLight, kObjectCamera, kObjectNull, kObjectPlane,
                     kObjectPointBased, kObjectJoint, kObjectSky, kObjectGeneric})
     ExpectWholeOrNone([type] { return AllocObject(type); });
-  for (Long type : {kTagPoint, kTagTexture, kTagDisplay, kTagCompositing, kTagUVW, kTagWeight, kTagTarget, kTagPlugin})
+  for (Long type : {kTagPoint, kTagTexture, kTagDisplay, kTagUVW, kTagWeight, kTagTarget, kTagPlugin})
     ExpectWholeOrNone([type] { return MakeTag(type); });
+  // This one holds the time at which it was made.
+  EveryFailedAllocation([] { return std::unique_ptr<BaseTag>(MakeTag(kTagCompositing)); });
   for (Long type : {kMaterialStandard, kMaterialPlugin, Long{1234567}})
     ExpectWholeOrNone([type] { return MakeMaterial(type); });
   ExpectWholeOrNone([] { return MakeShader(kShaderBitmap); });
