@@ -29,8 +29,8 @@ bool IsUsable(Real number) { return number >= 1e-12 && number <= 1e12; }
 
 Real UnitOf(const BaseDocument& document)
 {
-  const auto* unit = static_cast<const UnitScaleData*>(
-      document.GetDataInstance().GetCustomDataType(kKeyDocumentUnit, kCustomUnitScale));
+  const auto* unit =
+      NodeCast<UnitScaleData>(document.GetDataInstance().GetCustomDataType(kKeyDocumentUnit, kCustomUnitScale));
   const Real factor = unit ? GetUnitFactor(unit) : 0.0;
   return IsUsable(factor) ? factor : kDefaultUnit;
 }

@@ -84,10 +84,7 @@ class AlienPrimitiveObjectData : public _torvane_::NodeData
 };
 
 class AlienRootObject : public _torvane_::RootObject
-{
- public:
-  BaseObject* AllocMember(Long type) override;
-};
+{};
 
 class AlienRootMaterial : public _torvane_::RootMaterial
 {

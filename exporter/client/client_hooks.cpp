@@ -20,14 +20,6 @@ Long MaterialCounter = 0; // the number of the next material that runs
 
 } // namespace
 
-// Point and polygon objects stand under labels in a file that are no types.
-BaseObject* AlienRootObject::AllocMember(Long type)
-{
-  if (type == kObjectPoint)
-    return NewObj<PointObject>();
-  return AllocObject(type == kObjectPolygonLabel ? kObjectPolygon : type);
-}
-
 Bool AlienPolygonObjectData::Execute()
 {
   const auto* object = NodeCast<BaseObject>(GetNode());

@@ -31,6 +31,7 @@
 #include "torvane/nodes/node_kind.h"
 #include "torvane/nodes/private_chunk.h"
 #include "torvane/nodes/root_list.h"
+#include "torvane/nodes/type_name.h"
 #include "torvane/objects/base_object.h"
 #include "torvane/objects/camera_object_data.h"
 #include "torvane/objects/ies_light.h"

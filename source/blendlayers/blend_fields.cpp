@@ -30,11 +30,11 @@ Real IntoRange(const BlendField& field, Real value)
 
 Bool TakeGradient(const GeData* value, GradientData& gradient)
 {
-  const CustomData* source = value ? value->GetCustomDataType(kCustomGradient) : nullptr;
+  const auto* source = value ? NodeCast<GradientData>(value->GetCustomDataType(kCustomGradient)) : nullptr;
   if (!source)
     return false;
   gradient.FreeGradientCache();
-  return CopyGradient(static_cast<const GradientData&>(*source), gradient);
+  return CopyGradient(*source, gradient);
 }
 
 // Calls the operation with the field's value as what it is: the one place that tells kinds apart.

@@ -45,7 +45,7 @@ Bool HoldsLayer(const BaseContainer& settings, const BlendLayer& layer)
   Bool found = false;
   for (Bool more = settings.BrowseFirst(place, id, value); more && !found;
        more = settings.BrowseNext(place, id, value)) {
-    if (auto* stack = static_cast<const iBlendDataType*>(value->GetCustomDataType(kCustomBlendLayers)))
+    if (auto* stack = NodeCast<iBlendDataType>(value->GetCustomDataType(kCustomBlendLayers)))
       found = HoldsLayer(stack->GetLayers(), layer);
     else if (const BaseContainer* nested = value->GetContainer())
       found = HoldsLayer(*nested, layer);

@@ -291,15 +291,17 @@ Bool CBlendLayers::ReadList(HyperFile& file, Bool clear)
 
 Bool iBlendDataType::IsEqual(const CustomData& other) const
 {
-  const auto& stack = static_cast<const iBlendDataType&>(other);
-  return layers_.CompareLayers(stack.layers_) && blendVersion_ == stack.blendVersion_;
+  const auto* stack = NodeCast<iBlendDataType>(&other);
+  return stack && layers_.CompareLayers(stack->layers_) && blendVersion_ == stack->blendVersion_;
 }
 
 Bool iBlendDataType::CopyTo(CustomData& destination, TransArray* translation) const
 {
-  auto& stack = static_cast<iBlendDataType&>(destination);
-  stack.blendVersion_ = blendVersion_;
-  return layers_.CopyLayersTo(stack.layers_, translation);
+  auto* target = NodeCast<iBlendDataType>(&destination);
+  if (!target)
+    return false;
+  target->blendVersion_ = blendVersion_;
+  return layers_.CopyLayersTo(target->layers_, translation);
 }
 
 // A stack that can't be taken leaves the stream somewhere in its chunk, so it is an error of the file.
@@ -340,18 +342,6 @@ Bool iBlendDataType::SetValue(const ParameterPath& path, const GeData& value, UL
   Long sub = 0;
   BlendLayer* layer = FindLayer(path, sub);
   return layer && layer->SetLayerValue(sub, path.WithoutFirst(1), value, flags);
-}
-
-Bool iBlendDataType::GetParameter(const ParameterPath& path, GeData& value) const
-{
-  ULong flags = 0;
-  return GetValue(path, value, flags) && (flags & kParameterAnswered);
-}
-
-Bool iBlendDataType::SetParameter(const ParameterPath& path, const GeData& value)
-{
-  ULong flags = 0;
-  return SetValue(path, value, flags) && (flags & kParameterAnswered);
 }
 
 } // namespace _torvane_

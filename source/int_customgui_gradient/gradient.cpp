@@ -117,12 +117,14 @@ Bool GradientsDiffer(const GradientData& a, const GradientData& b)
 
 Bool GradientData::IsEqual(const CustomData& other) const
 {
-  return !GradientsDiffer(*this, static_cast<const GradientData&>(other));
+  const auto* gradient = NodeCast<GradientData>(&other);
+  return gradient && !GradientsDiffer(*this, *gradient);
 }
 
 Bool GradientData::CopyTo(CustomData& destination, TransArray* translation) const
 {
-  return CopyGradient(*this, static_cast<GradientData&>(destination), translation);
+  auto* target = NodeCast<GradientData>(&destination);
+  return target && CopyGradient(*this, *target, translation);
 }
 
 // ---------------------------------------------------------------------------------------------------------------
@@ -233,9 +235,9 @@ Bool GradientData::SetGradientValue(const ParameterPath& path, const GeData& val
   auto* part = const_cast<GradientData*>(PartOf(id)); // this gradient or its transparency
   Bool answered = false;
   if (id == 0) {
-    const CustomData* source = value.GetCustomDataType(kCustomGradient);
+    const auto* source = NodeCast<GradientData>(value.GetCustomDataType(kCustomGradient));
     FreeGradientCache();
-    answered = source && CopyGradient(static_cast<const GradientData&>(*source), *this);
+    answered = source && CopyGradient(*source, *this);
   } else if (part && id == kGradientInterpolation) {
     part->settings_.SetLong(kGradientInterpolation, value.GetLong());
     answered = true;
@@ -247,18 +249,6 @@ Bool GradientData::SetGradientValue(const ParameterPath& path, const GeData& val
   if (answered)
     flags |= kParameterAnswered;
   return answered;
-}
-
-Bool GradientData::GetParameter(const ParameterPath& path, GeData& value) const
-{
-  ULong flags = 0;
-  return GetGradientValue(path, value, flags);
-}
-
-Bool GradientData::SetParameter(const ParameterPath& path, const GeData& value)
-{
-  ULong flags = 0;
-  return SetGradientValue(path, value, flags);
 }
 
 } // namespace _torvane_

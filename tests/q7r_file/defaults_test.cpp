@@ -53,6 +53,14 @@ std::string TextOf(const BaseContainer& container)
   return text;
 }
 
+// The clock of a tag that a file is to fill stands still.
+BaseList2D* NewTagToRead()
+{
+  BaseTag* tag = MakeTag(kTagCompositing);
+  tag->PrepareToRead();
+  return tag;
+}
+
 struct Defaults
 {
   const char* name;
@@ -116,7 +124,7 @@ const Defaults kDefaults[] = {
      "20002:v0.3333333333333333,0.8745098039215686,0.5607843137254902 "
      "20003:v0.8980392156862745,0.3568627450980392,0.3568627450980392 20004:v0.6627450980392157,0.6,1 30000:i1 "
      "30002:i0 30006:i0 30007:i0 30008:i0 30010:i0 30009:i2"},
-    {"compositing tag", [] { return static_cast<BaseList2D*>(NewObj<CompositingTag>(true)); },
+    {"compositing tag", NewTagToRead,
      "1000:i1 1001:i1 1002:i1 1003:i1 1017:i1 1126:i1 1127:i1 1128:i1 1129:i1 1142:i1 1004:i0 1005:i0 1143:i0 "
      "1153:i0 1154:i0 1155:i0 1156:i0 1158:i0 1006:i0 1007:i2 1016:r0.1 1110:i1 1111:i2 1112:i3 1113:i4 "
      "1114:i5 1115:i6 1120:i7 1121:i8 1122:i9 1123:i10 1124:i11 1125:i12 1131:i1 1144:v0 1150:r1 1151:r1 "

@@ -128,7 +128,6 @@ class BaseDocument : public BaseList2D
   Bool CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation) override;
   Bool GetParameter(const ParameterPath& path, GeData& value) override;
   Bool SetParameter(const ParameterPath& path, const GeData& value) override;
-  GeListNode* MakeClone(ULong flags, TransArray* translation) override;
 
   // Fills the document with a scene. The client defines it.
   virtual Bool BuildScene(Long flag);
@@ -176,6 +175,9 @@ class BaseDocument : public BaseList2D
   void SetDirectory(const Filename& directory) { directory_ = directory; }
   void SetFileName(const Filename& name) { fileName_ = name; }
   BaseContainer& GetSettings(Long index) { return settings_[index]; } // 0 to 5
+
+ protected:
+  GeListNode* MakeEmpty() const override { return Alloc(); }
 
  private:
   template <class Visitor>

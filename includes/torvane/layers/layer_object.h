@@ -26,7 +26,6 @@ class LayerObject : public BaseList4D
   // 1000 to 1008: a flag; 1009: the colour, or one component with a second level of 1000 to 1002.
   Bool GetParameter(const ParameterPath& path, GeData& value) override;
   Bool SetParameter(const ParameterPath& path, const GeData& value) override;
-  GeListNode* MakeClone(ULong flags, TransArray* translation) override;
   // A hook for clients.
   virtual Bool Execute() { return false; }
 
@@ -36,6 +35,9 @@ class LayerObject : public BaseList4D
   Bool GetFlag(Long index) const { return flags_[index]; } // 0 to 8
   void SetFlag(Long index, Bool value) { flags_[index] = value; }
   const Vector& GetColor() const { return color_; }
+
+ protected:
+  GeListNode* MakeEmpty() const override { return NewObj<LayerObject>(); }
 
  private:
   template <class Visitor>

@@ -29,7 +29,6 @@ class BaseMaterial : public BaseList2D
   // The type that the outside sees: that of the plug-in for kMaterialPlugin.
   Long GetType() const override { return type_ == kMaterialPlugin ? pluginType_ : type_; }
   Long GetDiskType() const override { return type_; }
-  GeListNode* MakeClone(ULong flags, TransArray* translation) override;
   // A hook for clients.
   virtual Bool Execute() { return true; }
 
@@ -39,6 +38,10 @@ class BaseMaterial : public BaseList2D
   // The picture that is written with the material; empty on a new one.
   Bitmap& GetPreview() { return preview_; }
   const Bitmap& GetPreview() const { return preview_; }
+
+ protected:
+  // A plug-in's type that bears the number of the standard material gives a material of this class all the same.
+  GeListNode* MakeEmpty() const override;
 
  private:
   template <class Visitor>

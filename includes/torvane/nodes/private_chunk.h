@@ -100,13 +100,17 @@ class GeListNode : public PrivateChunk
   // The id that labels the node in its root list.
   virtual Long GetDiskType() const { return GetType(); }
   virtual void RemoveFromList();
-  // A new node with the same content, or null. The caller owns it.
+  // A new node with the same content: the flags are those of ids.h, the array as in CopyWithTranslation. Null for a
+  // class that has no copies, and when the copy fails. The caller owns it.
   virtual GeListNode* MakeClone(ULong flags, TransArray* translation);
 
   GeAliasGoal& GetGoal() { return goal_; }
   const GeAliasGoal& GetGoal() const { return goal_; }
 
  protected:
+  // A new node of this class, for MakeClone to copy onto; null when memory is short, and for a class without copies.
+  virtual GeListNode* MakeEmpty() const { return nullptr; }
+
   GeAliasGoal goal_;
   ULong nbits_[4] = {0, 0, 0, 0};
 

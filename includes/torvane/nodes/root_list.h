@@ -12,6 +12,7 @@ namespace _torvane_
 class BaseObject;
 class BaseDocument;
 class BaseTag;
+struct NodeType;
 
 class RootList2D : public PrivateChunk
 {
@@ -168,20 +169,17 @@ class RootBaseDraw : public RootList2D
 class FixedLabelRoot : public RootList2D
 {
  public:
-  FixedLabelRoot(Long label, const NodeKind& memberKind, BaseList2D* (*makeMember)())
-      : label_(label), memberKind_(memberKind), makeMember_(makeMember)
-  {}
-  const NodeKind& GetMemberKind() const override { return memberKind_; }
+  // The label is a number of the table of types, which tells the class.
+  explicit FixedLabelRoot(Long label);
+  const NodeKind& GetMemberKind() const override;
   Bool ReadChunk(HyperFile& file, Long id, Long level) override;
 
  protected:
-  Long GetMemberLabel(BaseList2D&) const override { return label_; }
+  Long GetMemberLabel(BaseList2D&) const override;
   Bool IsWrittenWhenEmpty() const override { return true; }
 
  private:
-  Long label_;
-  const NodeKind& memberKind_;
-  BaseList2D* (*makeMember_)();
+  const NodeType& type_;
 };
 
 class RootMultipass : public FixedLabelRoot

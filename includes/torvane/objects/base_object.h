@@ -183,8 +183,8 @@ class BaseObject : public BaseList4D
   RootObject* legacyListB_ = nullptr;
   NodeData* objectData_ = nullptr; // owned
 
-  // A new object of this class and type for MakeClone, or null; the object data are copied later.
-  virtual BaseObject* MakeEmpty() const;
+  // Of this object's type too; the object data are copied later.
+  BaseObject* MakeEmpty() const override;
 
  private:
   struct LongParameter;

@@ -35,7 +35,6 @@ class RenderData : public BaseList4D
   Bool ReadChunk(HyperFile& file, Long id, Long level) override;
   void WriteChunks(HyperFile& file) override;
   Bool CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation) override;
-  GeListNode* MakeClone(ULong flags, TransArray* translation) override;
   void SetDocument(BaseDocument* document) override;
 
   RenderData* GetNext() const { return NodeCast<RenderData>(BaseList4D::GetNext()); }
@@ -43,6 +42,9 @@ class RenderData : public BaseList4D
   RootVideoPost& GetVideoPosts() { return videoPosts_; }
   RootMultipass& GetMultipasses() { return multipasses_; }
   BaseContainer& GetExtraData() { return extraData_; }
+
+ protected:
+  GeListNode* MakeEmpty() const override { return NewObj<RenderData>(); }
 
  private:
   Bool MakeChildList();
@@ -63,9 +65,11 @@ class MultipassObject : public BaseList4D
   Bool ReadChunk(HyperFile& file, Long id, Long level) override;
   void WriteChunks(HyperFile& file) override;
   Bool CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation) override;
-  GeListNode* MakeClone(ULong flags, TransArray* translation) override;
 
   BaseContainer& GetSettings() { return settings_; }
+
+ protected:
+  GeListNode* MakeEmpty() const override { return NewObj<MultipassObject>(); }
 
  private:
   BaseContainer settings_;
@@ -82,11 +86,13 @@ class BaseVideoPost : public BaseList2D
   Bool ReadChunk(HyperFile& file, Long id, Long level) override;
   void WriteChunks(HyperFile& file) override;
   Bool CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation) override;
-  GeListNode* MakeClone(ULong flags, TransArray* translation) override;
 
   BaseContainer& GetSettings() { return settings_; }
   Long GetPluginId() const { return pluginId_; }
   void SetPluginId(Long id) { pluginId_ = id; }
+
+ protected:
+  GeListNode* MakeEmpty() const override { return NewObj<BaseVideoPost>(); }
 
  private:
   template <class Visitor>

@@ -359,24 +359,22 @@ class BlendEffectTransform : public BlendLayer
 };
 
 // The custom value: a stack and its version.
-class iBlendDataType : public CustomData // NOLINT(readability-identifier-naming): the type's own name
+class iBlendDataType : public ListedCustomData // NOLINT(readability-identifier-naming): the type's own name
 {
  public:
-  explicit iBlendDataType(const CustomDataType& type) : type_(type) {}
+  static constexpr NodeKindOf<iBlendDataType> kNodeKind{"blend layers", &CustomData::kNodeKind};
+  const NodeKind& GetNodeKind() const override { return kNodeKind; }
 
-  Long GetTypeId() const override { return type_.id; }
-  Long GetChunkLevel() const override { return type_.level; }
+  explicit iBlendDataType(const CustomDataType& type) : ListedCustomData(type) {}
+
   Bool IsEqual(const CustomData& other) const override;
   Bool CopyTo(CustomData& destination, TransArray* translation) const override;
   Bool Read(HyperFile& file, Long level) override;
   void Write(HyperFile& file) const override;
-  Bool GetParameter(const ParameterPath& path, GeData& value) const override;
-  Bool SetParameter(const ParameterPath& path, const GeData& value) override;
-
   // A layer's setting by its id in the container that holds the stack (see kBlendFirstId), and what stands below it in
   // the path. False when no layer has the id; a sub that the layer lacks is passed over, and the flags stay.
-  Bool GetValue(const ParameterPath& path, GeData& value, ULong& flags) const;
-  Bool SetValue(const ParameterPath& path, const GeData& value, ULong& flags);
+  Bool GetValue(const ParameterPath& path, GeData& value, ULong& flags) const override;
+  Bool SetValue(const ParameterPath& path, const GeData& value, ULong& flags) override;
 
   CBlendLayers& GetLayers() { return layers_; }
   const CBlendLayers& GetLayers() const { return layers_; }
@@ -386,7 +384,6 @@ class iBlendDataType : public CustomData // NOLINT(readability-identifier-naming
  private:
   BlendLayer* FindLayer(const ParameterPath& path, Long& sub) const;
 
-  const CustomDataType& type_;
   CBlendLayers layers_;
   Long blendVersion_ = 2;
 };

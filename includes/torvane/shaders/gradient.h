@@ -36,7 +36,6 @@ enum GradientKnotField : Long
 };
 
 // Set in the flags of a parameter call that was answered.
-inline constexpr ULong kParameterAnswered = 2;
 
 // A knot as the evaluation uses it.
 struct GradientKnot
@@ -51,6 +50,9 @@ struct GradientKnot
 class GradientData : public CustomData
 {
  public:
+  static constexpr NodeKindOf<GradientData> kNodeKind{"gradient", &CustomData::kNodeKind};
+  const NodeKind& GetNodeKind() const override { return kNodeKind; }
+
   // Without knots.
   GradientData();
   explicit GradientData(const CustomDataType&) : GradientData() {}
@@ -64,8 +66,14 @@ class GradientData : public CustomData
   Bool CopyTo(CustomData& destination, TransArray* translation) const override;
   Bool Read(HyperFile& file, Long level) override;
   void Write(HyperFile& file) const override;
-  Bool GetParameter(const ParameterPath& path, GeData& value) const override;
-  Bool SetParameter(const ParameterPath& path, const GeData& value) override;
+  Bool GetValue(const ParameterPath& path, GeData& value, ULong& flags) const override
+  {
+    return GetGradientValue(path, value, flags);
+  }
+  Bool SetValue(const ParameterPath& path, const GeData& value, ULong& flags) override
+  {
+    return SetGradientValue(path, value, flags);
+  }
 
   // The values of the chunk, without its end. Below level 1 nothing is read and the gradient stays as it is. Knots
   // without an id get one; the transparency of a file of version 11004 or below gets white knots whose brightness

@@ -26,6 +26,8 @@ class RawChunkBody
   Long GetLevel() const { return level_; }
   void SetLevel(Long level) { level_ = level; }
 
+  Bool IsEqual(const RawChunkBody& other) const;
+
   // Drops the bytes and sets the level to 0.
   void Free();
   // Replaces the content by the rest of the chunk that the stream stands in, whose end tag is consumed.

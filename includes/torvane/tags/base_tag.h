@@ -34,8 +34,9 @@ class BaseTag : public BaseList2D
   Bool CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation) override;
   Bool GetParameter(const ParameterPath& path, GeData& value) override;
   Bool SetParameter(const ParameterPath& path, const GeData& value) override;
-  GeListNode* MakeClone(ULong flags, TransArray* translation) override;
   void RemoveFromList() override; // the tag then has no object
+  // Called once for a new tag that a file is to fill, before anything is read.
+  virtual void PrepareToRead() {}
 
   BaseTag* GetNext() const { return NodeCast<BaseTag>(BaseList2D::GetNext()); }
   BaseObject* GetObject() const { return object_; }
@@ -56,6 +57,9 @@ class BaseTag : public BaseList2D
  protected:
   // Copies what a class adds beyond its container.
   virtual Bool CopyTagData(BaseTag& destination, ULong flags, TransArray* translation);
+
+  // A plug-in's type that is listed with another class, or is a label, gives a tag of this class all the same.
+  BaseTag* MakeEmpty() const override;
 
   Bool CopyPluginData(BaseTag& destination, ULong flags, TransArray* translation);
 

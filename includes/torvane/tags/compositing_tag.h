@@ -14,8 +14,11 @@ class CompositingTag : public BaseTag
   static constexpr NodeKindOf<CompositingTag> kNodeKind{"compositing tag", &BaseTag::kNodeKind};
   const NodeKind& GetNodeKind() const override { return kNodeKind; }
 
-  // With every default. The clock of a tag that is to be read stays 0 unless an old file's values come, which lack it.
-  explicit CompositingTag(Bool toRead = false);
+  // With every default.
+  CompositingTag();
+
+  // Sets the clock to 0, which it stays unless an old file's values come, which lack it.
+  void PrepareToRead() override;
 
   // Also takes the tag's own chunk of old files, whose values become entries.
   Bool ReadChunk(HyperFile& file, Long id, Long level) override;

@@ -26,6 +26,9 @@ struct JointRow
 class JointTreeData : public OpaqueCustomData
 {
  public:
+  static constexpr NodeKindOf<JointTreeData> kNodeKind{"joint tree", &OpaqueCustomData::kNodeKind};
+  const NodeKind& GetNodeKind() const override { return kNodeKind; }
+
   explicit JointTreeData(const CustomDataType& type) : OpaqueCustomData(type) {}
   ~JointTreeData() override;
 

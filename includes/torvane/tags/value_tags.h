@@ -38,6 +38,8 @@ class BaseArrayTag : public BaseTag
   virtual Long GetEntriesLevel() const { return 0; }
   // `target` is a tag of this class and not this one. The common way: resize it and copy the bytes.
   virtual Bool CopyEntries(BaseArrayTag& target);
+  // The way of tags that drop what the target has even if there is nothing to copy.
+  Bool CopyEntriesAfresh(BaseArrayTag& target);
   // The way of tags that a copy onto a filled tag empties: `target` then gets zeroed entries, this tag loses its own,
   // and the copy fails. Without entries on both sides there is nothing to do.
   Bool CopyEntriesOntoEmpty(BaseArrayTag& target);
@@ -79,11 +81,6 @@ class ColumnTag : public BaseArrayTag
   virtual Bool ReadOldEntries(HyperFile& file) = 0;
 
  private:
-  template <class Visitor>
-  Bool VisitEntries(Visitor& visitor);
-  template <class Visitor>
-  Bool VisitColumns(Visitor& visitor, void* block, LLong count) const;
-
   const ColumnLayout& layout_;
 };
 
@@ -100,6 +97,18 @@ class ArrayTag : public Base
   template <class... Args>
   explicit ArrayTag(Long type, Args&&... args) : Base(type, static_cast<LLong>(sizeof(Entry)), args...)
   {}
+};
+
+// A value tag whose entries stand in a file one behind the other, each as its values.
+template <class Entry>
+class RowTag : public ArrayTag<Entry, BaseArrayTag>
+{
+ protected:
+  using ArrayTag<Entry, BaseArrayTag>::ArrayTag;
+
+  Bool ReadEntries(HyperFile& file, Long level) override;
+  void WriteEntries(HyperFile& file) override;
+  Bool CopyEntries(BaseArrayTag& target) override { return this->CopyEntriesAfresh(target); }
 };
 
 // ---------------------------------------------------------------------------------------------------------------
@@ -144,7 +153,7 @@ struct SplineSegment
 };
 
 // The segments of a spline.
-class SegmentTag : public ArrayTag<SplineSegment, BaseArrayTag>
+class SegmentTag : public RowTag<SplineSegment>
 {
  public:
   static constexpr NodeKindOf<SegmentTag> kNodeKind{"segment tag", &BaseArrayTag::kNodeKind};
@@ -154,15 +163,6 @@ class SegmentTag : public ArrayTag<SplineSegment, BaseArrayTag>
 
   // False when the tag has no entries and gets none; -1 leaves the entries of a filled tag as they are.
   Bool ResizeTagArray(Long count) override;
-
- protected:
-  Bool ReadEntries(HyperFile& file, Long level) override;
-  void WriteEntries(HyperFile& file) override;
-  Bool CopyEntries(BaseArrayTag& target) override;
-
- private:
-  template <class Visitor>
-  Bool VisitEntries(Visitor& visitor);
 };
 
 // The two tangents of a spline point, relative to the point.
@@ -173,7 +173,7 @@ struct TangentPair
 };
 
 // The tangents of a spline, a pair for each point.
-class TangentTag : public ArrayTag<TangentPair, BaseArrayTag>
+class TangentTag : public RowTag<TangentPair>
 {
  public:
   static constexpr NodeKindOf<TangentTag> kNodeKind{"tangent tag", &BaseArrayTag::kNodeKind};
@@ -184,15 +184,6 @@ class TangentTag : public ArrayTag<TangentPair, BaseArrayTag>
   // Drops the entries and makes `count` new ones of zeros. False, with the old ones kept, when memory is short and for
   // a negative count.
   Bool ReplaceTagArray(Long count);
-
- protected:
-  Bool ReadEntries(HyperFile& file, Long level) override;
-  void WriteEntries(HyperFile& file) override;
-  Bool CopyEntries(BaseArrayTag& target) override;
-
- private:
-  template <class Visitor>
-  Bool VisitEntries(Visitor& visitor);
 };
 
 // A weight for each point.
@@ -205,9 +196,8 @@ class VertexMapTag : public ArrayTag<SReal, ColumnTag>
   // The other type is kTagOldVertexMap, which holds no array in files below version 11925.
   explicit VertexMapTag(Long type = kTagVertexMap);
 
-  GeListNode* MakeClone(ULong flags, TransArray* translation) override;
-
  protected:
+  BaseTag* MakeEmpty() const override { return NewObj<VertexMapTag>(GetType()); }
   Bool ReadOldEntries(HyperFile& file) override;
   Bool CopyEntries(BaseArrayTag& target) override { return CopyEntriesOntoEmpty(target); }
 };

@@ -32,13 +32,15 @@ class BaseDraw : public BaseList2D
   Bool ReadChunk(HyperFile& file, Long id, Long level) override;
   void WriteChunks(HyperFile& file) override;
   Bool CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation) override;
-  GeListNode* MakeClone(ULong flags, TransArray* translation) override;
   void SetDocument(BaseDocument* document) override;
 
   BaseDraw* GetNext() const { return NodeCast<BaseDraw>(BaseList2D::GetNext()); }
   GeAliasLink& GetSceneCamera() { return sceneCamera_; }
   // The draw's own camera, made when it is first asked for; null when memory is short.
   BaseObject* GetEditorCamera();
+
+ protected:
+  GeListNode* MakeEmpty() const override { return NewObj<BaseDraw>(); }
 
  private:
   template <class Visitor>
@@ -60,7 +62,6 @@ class ViewPanel : public BaseList2D
   Bool ReadChunk(HyperFile& file, Long id, Long level) override;
   void WriteChunks(HyperFile& file) override;
   Bool CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation) override;
-  GeListNode* MakeClone(ULong flags, TransArray* translation) override;
   void SetDocument(BaseDocument* document) override;
 
   ViewPanel* GetNext() const { return NodeCast<ViewPanel>(BaseList2D::GetNext()); }
@@ -70,6 +71,9 @@ class ViewPanel : public BaseList2D
   // The draw of an index, which is brought into the range 0 to 3. A panel with fewer than four draws first gets four
   // new ones at the head of its list: the perspective view, then the three along the axes. Null when memory is short.
   BaseDraw* GetBaseDraw(Long index);
+
+ protected:
+  GeListNode* MakeEmpty() const override { return NewObj<ViewPanel>(); }
 
  private:
   Bool MakeDraws();

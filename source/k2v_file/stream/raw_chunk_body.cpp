@@ -1,10 +1,18 @@
 #include "torvane/stream/raw_chunk_body.h"
 
+#include <cstring>
+
 #include "k2v_file/stream/raw_values.h"
 #include "torvane/stream/hyper_file.h"
 
 namespace _torvane_
 {
+
+Bool RawChunkBody::IsEqual(const RawChunkBody& other) const
+{
+  return level_ == other.level_ && size_ == other.size_ &&
+         (size_ == 0 || std::memcmp(data_, other.data_, static_cast<std::size_t>(size_)) == 0);
+}
 
 void RawChunkBody::Free()
 {

@@ -1,7 +1,5 @@
 #include "torvane/values/custom_data.h"
 
-#include <cstring>
-
 #include "k2v_file/stream/chunk_visitor.h"
 #include "k2v_file/stream/value_forms.h"
 #include "torvane/stream/hyper_file.h"
@@ -9,23 +7,48 @@
 namespace _torvane_
 {
 
-Bool CustomData::GetParameter(const ParameterPath&, GeData&) const { return false; }
+namespace
+{
 
-Bool CustomData::SetParameter(const ParameterPath&, const GeData&) { return false; }
+// The values of three numbers in a file.
+template <class Visitor, class Numbers>
+void VisitNumbers(Visitor& v, Numbers& numbers)
+{
+  v.Long(numbers.second);
+  v.Long(numbers.first);
+  v.Bool(numbers.third);
+}
+
+} // namespace
+
+Bool CustomData::GetValue(const ParameterPath&, GeData&, ULong&) const { return false; }
+
+Bool CustomData::SetValue(const ParameterPath&, const GeData&, ULong&) { return false; }
+
+Bool CustomData::GetParameter(const ParameterPath& path, GeData& value) const
+{
+  ULong flags = 0;
+  return GetValue(path, value, flags) && (flags & kParameterAnswered);
+}
+
+Bool CustomData::SetParameter(const ParameterPath& path, const GeData& value)
+{
+  ULong flags = 0;
+  return SetValue(path, value, flags) && (flags & kParameterAnswered);
+}
 
 // ---------------------------------------------------------------------------------------------------------------
 
 Bool OpaqueCustomData::IsEqual(const CustomData& other) const
 {
-  const RawChunkBody& body = static_cast<const OpaqueCustomData&>(other).body_;
-  return body_.GetLevel() == body.GetLevel() && body_.GetSize() == body.GetSize() &&
-         (body_.GetSize() == 0 ||
-          std::memcmp(body_.GetData(), body.GetData(), static_cast<std::size_t>(body_.GetSize())) == 0);
+  const auto* opaque = NodeCast<OpaqueCustomData>(&other);
+  return opaque && body_.IsEqual(opaque->body_);
 }
 
 Bool OpaqueCustomData::CopyTo(CustomData& destination, TransArray*) const
 {
-  return body_.CopyTo(static_cast<OpaqueCustomData&>(destination).body_);
+  auto* target = NodeCast<OpaqueCustomData>(&destination);
+  return target && body_.CopyTo(target->body_);
 }
 
 Bool OpaqueCustomData::Read(HyperFile& file, Long level) { return body_.Read(file, level); }
@@ -36,22 +59,22 @@ void OpaqueCustomData::Write(HyperFile& file) const { body_.Write(file); }
 
 Bool UnitScaleData::IsEqual(const CustomData& other) const
 {
-  const auto& units = static_cast<const UnitScaleData&>(other);
-  return OpaqueCustomData::IsEqual(other) && scale == units.scale && unit == units.unit;
+  const auto* units = NodeCast<UnitScaleData>(&other);
+  return units && OpaqueCustomData::IsEqual(other) && static_cast<const UnitScale&>(*this) == *units;
 }
 
 Bool UnitScaleData::CopyTo(CustomData& destination, TransArray* translation) const
 {
-  auto& units = static_cast<UnitScaleData&>(destination);
-  units.scale = scale;
-  units.unit = unit;
+  auto* target = NodeCast<UnitScaleData>(&destination);
+  if (!target)
+    return false;
+  static_cast<UnitScale&>(*target) = *this;
   return OpaqueCustomData::CopyTo(destination, translation);
 }
 
 Bool UnitScaleData::Read(HyperFile& file, Long level)
 {
-  scale = 1.0;
-  unit = 3;
+  static_cast<UnitScale&>(*this) = UnitScale();
   if (!OpaqueCustomData::Read(file, level))
     return false;
   if (TakeBody()) {
@@ -88,38 +111,29 @@ void UnitScaleData::Write(HyperFile& file) const
 
 // ---------------------------------------------------------------------------------------------------------------
 
-template <class Visitor, class Numbers>
-void ThreeNumbersData::VisitBody(Visitor& v, Numbers& numbers)
-{
-  v.Long(numbers.second);
-  v.Long(numbers.first);
-  v.Bool(numbers.third);
-}
-
 Bool ThreeNumbersData::IsEqual(const CustomData& other) const
 {
-  const auto& numbers = static_cast<const ThreeNumbersData&>(other);
-  return first == numbers.first && second == numbers.second && third == numbers.third;
+  const auto* numbers = NodeCast<ThreeNumbersData>(&other);
+  return numbers && static_cast<const ThreeNumbers&>(*this) == *numbers;
 }
 
 Bool ThreeNumbersData::CopyTo(CustomData& destination, TransArray*) const
 {
-  auto& numbers = static_cast<ThreeNumbersData&>(destination);
-  numbers.first = first;
-  numbers.second = second;
-  numbers.third = third;
-  return true;
+  auto* target = NodeCast<ThreeNumbersData>(&destination);
+  if (target)
+    static_cast<ThreeNumbers&>(*target) = *this;
+  return target != nullptr;
 }
 
 Bool ThreeNumbersData::Read(HyperFile& file, Long level)
 {
-  return ReadChunkBody(file, level, [this](ChunkReader& reader) { VisitBody(reader, *this); });
+  return ReadChunkBody(file, level, [this](ChunkReader& reader) { VisitNumbers(reader, *this); });
 }
 
 void ThreeNumbersData::Write(HyperFile& file) const
 {
   ChunkWriter writer(file, GetChunkLevel());
-  VisitBody(writer, *this);
+  VisitNumbers(writer, *this);
 }
 
 } // namespace _torvane_

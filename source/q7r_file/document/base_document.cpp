@@ -351,9 +351,4 @@ Bool BaseDocument::CopyRoots(BaseDocument& target, ULong flags, TransArray* tran
          objects_->CopyTo(*target.objects_, flags, translation) && layers_->CopyTo(*target.layers_, flags, translation);
 }
 
-GeListNode* BaseDocument::MakeClone(ULong flags, TransArray* translation)
-{
-  return CloneNode(*this, Alloc(), flags, translation);
-}
-
 } // namespace _torvane_

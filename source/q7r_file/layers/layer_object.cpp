@@ -92,11 +92,6 @@ Bool LayerObject::SetParameter(const ParameterPath& path, const GeData& value)
   return id == kLayerColor ? SetVectorParameter(color_, path, value) : BaseList4D::SetParameter(path, value);
 }
 
-GeListNode* LayerObject::MakeClone(ULong flags, TransArray* translation)
-{
-  return CloneNode(*this, AllocLayer(), flags, translation);
-}
-
 LayerObject* AllocLayer() { return NewObj<LayerObject>(); }
 
 } // namespace _torvane_

@@ -3,8 +3,6 @@
 #include "k2v_file/stream/chunk_visitor.h"
 #include "q7r_file/materials/material_defaults.h"
 #include "q7r_file/nodes/node_data_chunk.h"
-#include "q7r_file/nodes/node_tools.h"
-#include "torvane/materials/material.h"
 
 namespace _torvane_
 {
@@ -127,27 +125,14 @@ Bool BaseMaterial::CopyTo(PrivateChunk& destination, ULong flags, TransArray* tr
   return raw_.CopyTo(target->raw_);
 }
 
-GeListNode* BaseMaterial::MakeClone(ULong flags, TransArray* translation)
+GeListNode* BaseMaterial::MakeEmpty() const
 {
-  BaseMaterial* clone = MakeMaterial(GetType());
-  if (clone && clone->GetDiskType() != GetDiskType()) {
-    // A plug-in's type that bears the number of the standard material.
-    DeleteObj(clone);
-    clone = NewObj<BaseMaterial>(GetDiskType(), pluginType_);
+  BaseMaterial* material = MakeMaterial(GetType());
+  if (material && material->GetDiskType() != GetDiskType()) {
+    DeleteObj(material);
+    material = NewObj<BaseMaterial>(GetDiskType(), pluginType_);
   }
-  return CloneNode(*this, clone, flags, translation);
-}
-
-BaseMaterial* MakeMaterial(Long type)
-{
-  switch (type) {
-  case kMaterialStandard:
-    return NewObj<Material>();
-  case kMaterialPlugin:
-    return NewObj<BaseMaterial>(kMaterialPlugin);
-  default:
-    return NewObj<BaseMaterial>(kMaterialPlugin, type);
-  }
+  return material;
 }
 
 } // namespace _torvane_

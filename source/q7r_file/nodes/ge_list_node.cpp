@@ -1,4 +1,5 @@
 #include "k2v_file/stream/chunk_visitor.h"
+#include "q7r_file/nodes/node_tools.h"
 #include "torvane/memory/assertion.h"
 #include "torvane/nodes/private_chunk.h"
 
@@ -108,6 +109,9 @@ Bool GeListNode::ChangeNBit(Long bit, Long mode)
 
 void GeListNode::RemoveFromList() { Remove(); }
 
-GeListNode* GeListNode::MakeClone(ULong, TransArray*) { return nullptr; }
+GeListNode* GeListNode::MakeClone(ULong flags, TransArray* translation)
+{
+  return CloneNode(*this, MakeEmpty(), flags, translation);
+}
 
 } // namespace _torvane_

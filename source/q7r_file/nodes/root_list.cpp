@@ -1,8 +1,7 @@
 #include "torvane/nodes/root_list.h"
 
 #include "k2v_file/stream/chunk_visitor.h"
-#include "q7r_file/types/member_makers.h"
-#include "q7r_file/types/tag_makers.h"
+#include "q7r_file/types/node_types.h"
 #include "torvane/animation/ctrack.h"
 #include "torvane/layers/layer_object.h"
 #include "torvane/materials/base_material.h"
@@ -191,26 +190,7 @@ Bool RootObject::ReadChunk(HyperFile& file, Long id, Long level)
   return ReadMember(file, AllocMember(id), true);
 }
 
-BaseObject* RootObject::AllocMember(Long type)
-{
-  switch (type) {
-  case kObjectSpline:
-  case kObjectOldSpline: {
-    BaseObject* object = AllocObject(kObjectSpline);
-    if (object)
-      object->SetObjectData(MakePointObjectData());
-    return object;
-  }
-  case kObjectGeneric:
-    return NewObj<BaseObject>(kObjectGeneric);
-  case kObjectPoint: // a label alone; the object's chunks tell its type
-    return MakePointObject();
-  case kObjectPolygonLabel:
-    return AllocObject(kObjectPolygon);
-  default:
-    return AllocObject(type);
-  }
-}
+BaseObject* RootObject::AllocMember(Long type) { return MakeObjectOfLabel(type); }
 
 Bool RootTag::ReadChunk(HyperFile& file, Long id, Long level)
 {
@@ -218,11 +198,12 @@ Bool RootTag::ReadChunk(HyperFile& file, Long id, Long level)
     return true;
   if (id == kChunkNodeBits)
     return file.SkipToEndChunk();
-  BaseTag* tag = MakeTagToRead(id);
+  BaseTag* tag = MakeTag(id);
   if (!tag) {
     file.SetError(FILEERROR_MEMORY);
     return false;
   }
+  tag->PrepareToRead();
   return ReadMember(file, tag, false);
 }
 
@@ -270,16 +251,22 @@ Bool RootBaseDraw::ReadChunk(HyperFile& file, Long id, Long level)
 {
   if (RootList2D::ReadChunk(file, id, level))
     return true;
-  return id == kTypeBaseDraw && ReadMember(file, MakeBaseDraw(), false);
+  return id == kTypeBaseDraw && ReadMember(file, NewObj<BaseDraw>(), false);
 }
+
+FixedLabelRoot::FixedLabelRoot(Long label) : type_(*FindNodeType(label, BaseList2D::kNodeKind)) {}
+
+const NodeKind& FixedLabelRoot::GetMemberKind() const { return *type_.kind; }
+
+Long FixedLabelRoot::GetMemberLabel(BaseList2D&) const { return type_.label; }
 
 Bool FixedLabelRoot::ReadChunk(HyperFile& file, Long id, Long level)
 {
   if (RootList2D::ReadChunk(file, id, level))
     return true;
-  if (id != label_)
+  if (id != type_.label)
     return false;
-  BaseList2D* member = makeMember_();
+  BaseList2D* member = type_.make(type_, id);
   if (!member)
     return false;
   member->SetDocument(GetDocument());
@@ -288,25 +275,10 @@ Bool FixedLabelRoot::ReadChunk(HyperFile& file, Long id, Long level)
   return Append(member, true);
 }
 
-namespace
-{
-
-template <class Node>
-BaseList2D* Make()
-{
-  return NewObj<Node>();
-}
-
-} // namespace
-
-RootMultipass::RootMultipass() : FixedLabelRoot(kTypeMultipass, MultipassObject::kNodeKind, Make<MultipassObject>) {}
-
-RootVideoPost::RootVideoPost() : FixedLabelRoot(kTypeVideoPost, BaseVideoPost::kNodeKind, Make<BaseVideoPost>) {}
-
-RootShader::RootShader() : FixedLabelRoot(kShaderLabel, BaseShader::kNodeKind, Make<BaseShader>) {}
-
-RootCTrack::RootCTrack() : FixedLabelRoot(kLabelTrack, CTrack::kNodeKind, Make<CTrack>) {}
-
-RootCKey::RootCKey() : FixedLabelRoot(kLabelKey, CKey::kNodeKind, Make<CKey>) {}
+RootMultipass::RootMultipass() : FixedLabelRoot(kTypeMultipass) {}
+RootVideoPost::RootVideoPost() : FixedLabelRoot(kTypeVideoPost) {}
+RootShader::RootShader() : FixedLabelRoot(kShaderLabel) {}
+RootCTrack::RootCTrack() : FixedLabelRoot(kLabelTrack) {}
+RootCKey::RootCKey() : FixedLabelRoot(kLabelKey) {}
 
 } // namespace _torvane_

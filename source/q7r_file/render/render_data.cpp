@@ -77,11 +77,6 @@ Bool RenderData::CopyTo(PrivateChunk& destination, ULong flags, TransArray* tran
   return target->MakeChildList() && children_->CopyTo(*target->children_, flags, translation);
 }
 
-GeListNode* RenderData::MakeClone(ULong flags, TransArray* translation)
-{
-  return CloneNode(*this, AllocRenderData(), flags, translation);
-}
-
 void RenderData::SetDocument(BaseDocument* document)
 {
   if (document_ == document)
@@ -115,11 +110,6 @@ Bool MultipassObject::CopyTo(PrivateChunk& destination, ULong flags, TransArray*
   if (!target)
     return false;
   return BaseList4D::CopyTo(destination, flags, translation) && settings_.CopyTo(target->settings_, flags, translation);
-}
-
-GeListNode* MultipassObject::MakeClone(ULong flags, TransArray* translation)
-{
-  return CloneNode(*this, NewObj<MultipassObject>(), flags, translation);
 }
 
 BaseVideoPost::BaseVideoPost() : BaseList2D(kTypeVideoPost) {}
@@ -167,11 +157,6 @@ Bool BaseVideoPost::CopyTo(PrivateChunk& destination, ULong flags, TransArray* t
     return false;
   target->pluginId_ = pluginId_;
   return BaseList2D::CopyTo(destination, flags, translation) && settings_.CopyTo(target->settings_, flags, translation);
-}
-
-GeListNode* BaseVideoPost::MakeClone(ULong flags, TransArray* translation)
-{
-  return CloneNode(*this, NewObj<BaseVideoPost>(), flags, translation);
 }
 
 } // namespace _torvane_

@@ -3,7 +3,7 @@
 #include "k2v_file/stream/chunk_visitor.h"
 #include "k2v_file/values/container_defaults.h"
 #include "q7r_file/nodes/node_data_chunk.h"
-#include "q7r_file/types/tag_makers.h"
+#include "q7r_file/types/node_types.h"
 #include "torvane/hooks.h"
 
 namespace _torvane_
@@ -121,17 +121,14 @@ Bool BaseTag::SetParameter(const ParameterPath& path, const GeData& value)
   return (nodeData_ && nodeData_->SetParameter(path, value)) || BaseList2D::SetParameter(path, value);
 }
 
-GeListNode* BaseTag::MakeClone(ULong flags, TransArray* translation)
+BaseTag* BaseTag::MakeEmpty() const
 {
-  BaseTag* clone = MakeTag(GetType());
-  if (clone && (clone->GetDiskType() != GetDiskType() || clone->GetType() != GetType())) {
-    // A plug-in's type that the factory doesn't list, or that is a label: the copy is of the same kind all the same.
-    DeleteObj(clone);
-    clone = NewObj<BaseTag>(GetDiskType(), GetPluginId());
+  BaseTag* tag = MakeTag(GetType());
+  if (tag && (tag->GetDiskType() != GetDiskType() || tag->GetType() != GetType())) {
+    DeleteObj(tag);
+    tag = NewObj<BaseTag>(GetDiskType(), GetPluginId());
   }
-  if (clone && !CopyWithTranslation(*clone, flags, translation))
-    DeleteObj(clone);
-  return clone;
+  return tag;
 }
 
 } // namespace _torvane_

@@ -4,7 +4,6 @@
 
 #include "k2v_file/values/container_defaults.h"
 #include "q7r_file/tags/tag_entries.h"
-#include "q7r_file/types/tag_makers.h"
 
 namespace _torvane_
 {
@@ -71,15 +70,13 @@ void ReadOldValues(EntryReader& entries, Long level)
 
 } // namespace
 
-BaseTag* MakeCompositingTag() { return NewObj<CompositingTag>(); }
-BaseTag* MakeCompositingTagToRead() { return NewObj<CompositingTag>(true); }
-
-CompositingTag::CompositingTag(Bool toRead) : BaseTag(kTagCompositing)
+CompositingTag::CompositingTag() : BaseTag(kTagCompositing)
 {
   data_.SetDefaults(DefaultsOf<kCompositingDefaults>());
-  if (!toRead)
-    StartClock();
+  StartClock();
 }
+
+void CompositingTag::PrepareToRead() { data_.SetDefaults(DefaultsOf<kCompositingDefaults>()); }
 
 void CompositingTag::StartClock() { data_.SetLong(kCompositingClock, ReadMilliseconds()); }
 

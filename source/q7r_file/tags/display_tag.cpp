@@ -3,7 +3,6 @@
 #include "k2v_file/values/container_defaults.h"
 #include "q7r_file/nodes/node_tools.h"
 #include "q7r_file/tags/tag_entries.h"
-#include "q7r_file/types/tag_makers.h"
 
 namespace _torvane_
 {
@@ -54,8 +53,6 @@ constexpr DisplayTag::LongSetting DisplayTag::kLongSettings[kLongCount] = {
 };
 
 constexpr DisplayTag::RealSetting DisplayTag::kRealSettings[kRealCount] = {{1004, 1.0}, {1006, 1.0}};
-
-BaseTag* MakeDisplayTag() { return NewObj<DisplayTag>(); }
 
 DisplayTag::DisplayTag() : BaseTag(kTagDisplay)
 {

@@ -1,11 +1,7 @@
 #include "torvane/tags/selection_tag.h"
 
-#include "q7r_file/types/tag_makers.h"
-
 namespace _torvane_
 {
-
-BaseTag* MakeSelectionTag(Long type) { return NewObj<SelectionTag>(type); }
 
 Bool SelectionTag::ReadChunk(HyperFile& file, Long id, Long level)
 {

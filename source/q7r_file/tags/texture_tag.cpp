@@ -4,7 +4,6 @@
 
 #include "k2v_file/values/container_defaults.h"
 #include "q7r_file/tags/tag_entries.h"
-#include "q7r_file/types/tag_makers.h"
 #include "torvane/materials/base_material.h"
 #include "torvane/math/ge_math.h"
 
@@ -106,8 +105,6 @@ Real QuotientOrOne(Real a, Real b) { return b != 0.0 ? a / b : 1.0; }
 } // namespace
 
 TextureTag::TextureTag() : BaseTag(kTagTexture) { data_.SetDefaults(DefaultsOf<kTextureDefaults>()); }
-
-BaseTag* MakeTextureTag() { return NewObj<TextureTag>(); }
 
 Bool TextureTag::CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation)
 {

@@ -2,7 +2,6 @@
 
 #include "k2v_file/stream/chunk_visitor.h"
 #include "q7r_file/nodes/node_tools.h"
-#include "q7r_file/types/member_makers.h"
 #include "q7r_file/views/draw_defaults.h"
 #include "torvane/document/base_document.h"
 
@@ -21,8 +20,6 @@ constexpr Vector kEditorRot(DegreesToRadians(45.0), DegreesToRadians(-20.0), 0.0
 BaseDraw::BaseDraw() : BaseList2D(kTypeBaseDraw) { SetDrawDefaults(data_); }
 
 BaseDraw::~BaseDraw() { DeleteObj(editorCamera_); }
-
-BaseDraw* MakeBaseDraw() { return NewObj<BaseDraw>(); }
 
 BaseObject* BaseDraw::GetEditorCamera()
 {
@@ -103,11 +100,6 @@ Bool BaseDraw::CopyTo(PrivateChunk& destination, ULong flags, TransArray* transl
   return sceneCamera_.CopyLinkTo(&target->sceneCamera_, translation);
 }
 
-GeListNode* BaseDraw::MakeClone(ULong flags, TransArray* translation)
-{
-  return CloneNode(*this, MakeBaseDraw(), flags, translation);
-}
-
 ViewPanel::ViewPanel() : BaseList2D(kTypeViewPanel) { draws_.SetOwner(this); }
 
 void ViewPanel::SetDocument(BaseDocument* document)
@@ -149,17 +141,12 @@ Bool ViewPanel::CopyTo(PrivateChunk& destination, ULong flags, TransArray* trans
          settings_.CopyTo(target->settings_, flags, translation);
 }
 
-GeListNode* ViewPanel::MakeClone(ULong flags, TransArray* translation)
-{
-  return CloneNode(*this, NewObj<ViewPanel>(), flags, translation);
-}
-
 // All four or none. They go to the head of the list one after the other, the last view first.
 Bool ViewPanel::MakeDraws()
 {
   BaseDraw* draws[kDrawCount] = {};
   for (BaseDraw*& draw : draws) {
-    draw = MakeBaseDraw();
+    draw = NewObj<BaseDraw>();
     if (draw && draw->GetEditorCamera())
       continue;
     for (BaseDraw*& made : draws)

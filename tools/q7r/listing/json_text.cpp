@@ -32,11 +32,10 @@ Json ToJson(const String& text) { return ToUtf8(text); }
 
 Json LinkJson(const GeAliasLink& link)
 {
-  const GeListNode* target = link.GetLink();
   // A file may point a link at a thing that has a goal but is no named node.
-  if (!target || !target->GoalIsWrittenElsewhere())
+  const auto* node = NodeCast<BaseList2D>(link.GetLink());
+  if (!node)
     return nullptr;
-  const auto* node = static_cast<const BaseList2D*>(target);
   std::string path = ToUtf8(node->GetName());
   // A list head names the node above; only nodes of a hierarchy have one that leads to the root.
   for (const RootList2D* head = node->GetListHead(); head && head->GetOwner(); head = head->GetOwner()->GetListHead())

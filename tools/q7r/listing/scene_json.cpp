@@ -158,11 +158,11 @@ Json RenderJson(RenderData& data)
 // The length of one unit of the scene; null where the document doesn't say it.
 Json UnitJson(const BaseDocument& document)
 {
-  const CustomData* unit = document.GetDataInstance().GetCustomDataType(kKeyDocumentUnit, kCustomUnitScale);
+  const auto* unit =
+      NodeCast<UnitScaleData>(document.GetDataInstance().GetCustomDataType(kKeyDocumentUnit, kCustomUnitScale));
   if (!unit)
     return nullptr;
-  const auto& scale = static_cast<const UnitScaleData&>(*unit);
-  return {{"factor", scale.scale}, {"code", scale.unit}, {"metres", GetUnitFactor(&scale)}};
+  return {{"factor", unit->scale}, {"code", unit->unit}, {"metres", GetUnitFactor(unit)}};
 }
 
 Json DocumentJson(BaseDocument& document)

@@ -3,7 +3,6 @@
 #include <cmath>
 
 #include "k2v_file/values/container_defaults.h"
-#include "q7r_file/types/object_data_makers.h"
 #include "torvane/document/base_document.h"
 #include "torvane/tags/base_tag.h"
 #include "torvane/values/ge_data.h"
@@ -177,8 +176,6 @@ void UpdateDistancePair(BaseContainer& settings)
 }
 
 } // namespace
-
-NodeData* MakeCameraObjectData() { return NewObj<CameraObjectData>(); }
 
 const NodeKind& CameraObjectData::GetOwnerKind() const { return BaseObject::kNodeKind; }
 

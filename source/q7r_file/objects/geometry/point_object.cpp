@@ -1,15 +1,10 @@
 #include "torvane/objects/point_object.h"
 
 #include "q7r_file/objects/geometry/geometry_tags.h"
-#include "q7r_file/types/object_data_makers.h"
 #include "torvane/objects/point_object_data.h"
 
 namespace _torvane_
 {
-
-BaseObject* MakePointObject() { return NewObj<PointObject>(); }
-
-BaseObject* MakePolygonObject() { return NewObj<PolygonObject>(); }
 
 PointTag* GetPointTag(const BaseObject& object) { return FindTag<PointTag>(object, kTagPoint); }
 

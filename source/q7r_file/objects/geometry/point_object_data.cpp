@@ -2,7 +2,6 @@
 
 #include "k2v_file/stream/chunk_visitor.h"
 #include "q7r_file/nodes/node_tools.h"
-#include "q7r_file/types/object_data_makers.h"
 #include "torvane/objects/base_object.h"
 
 namespace _torvane_
@@ -43,8 +42,6 @@ Bool CopySelections(const Data& source, Data& target, const SelectionChunk<Data>
 }
 
 } // namespace
-
-NodeData* MakePointObjectData() { return NewObj<PointObjectData>(); }
 
 constexpr SelectionChunk<PointObjectData> PointObjectData::kSelections[] = {
     {kChunkPointSelection, &PointObjectData::pointSelection_},

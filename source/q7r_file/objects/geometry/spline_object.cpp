@@ -2,7 +2,6 @@
 
 #include "k2v_file/values/container_defaults.h"
 #include "q7r_file/objects/geometry/geometry_tags.h"
-#include "q7r_file/types/object_data_makers.h"
 #include "torvane/objects/point_object_data.h"
 
 namespace _torvane_
@@ -43,8 +42,6 @@ Bool ResizeSegments(BaseObject& object, Long count)
 }
 
 } // namespace
-
-BaseObject* MakeSplineObject() { return NewObj<SplineObject>(); }
 
 SplineObject::SplineObject(Long type) : PointObject(type) { data_.SetDefaults(DefaultsOf<kSplineDefaults>()); }
 

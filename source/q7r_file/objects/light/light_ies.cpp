@@ -33,7 +33,7 @@ Real UnitFactor(const BaseDocument* document)
   metres.scale = 1.0;
   metres.unit = kUnitMetre;
   const CustomData* unit = document->GetDataInstance().GetCustomDataType(kKeyDocumentUnit, kCustomUnitScale);
-  return ConvertUnits(&metres, static_cast<const UnitScaleData*>(unit));
+  return ConvertUnits(&metres, NodeCast<UnitScaleData>(unit));
 }
 
 void SetEntries(BaseContainer& settings, const IESLight& light, const Vector& size)

@@ -2,7 +2,6 @@
 
 #include "k2v_file/stream/chunk_visitor.h"
 #include "q7r_file/nodes/node_tools.h"
-#include "q7r_file/types/object_data_makers.h"
 #include "torvane/objects/base_object.h"
 #include "torvane/values/ge_data.h"
 
@@ -92,8 +91,6 @@ LightObjectData::~LightObjectData()
   DeleteObj(settings_);
   DeleteObj(iesLight_);
 }
-
-NodeData* MakeLightObjectData() { return NewObj<LightObjectData>(); }
 
 void LightObjectData::AdoptIES(IESLight* light)
 {

@@ -2,7 +2,6 @@
 #include <cstring>
 
 #include "k2v_file/stream/chunk_visitor.h"
-#include "q7r_file/types/tag_makers.h"
 #include "torvane/memory/owned.h"
 #include "torvane/tags/value_tags.h"
 #include "torvane/values/ge_data.h"
@@ -98,8 +97,6 @@ Vector UnpackUVW(const PackedUVW& packed)
 // ---------------------------------------------------------------------------------------------------------------
 
 UVWTag::UVWTag() : ArrayTag(kTagUVW) {}
-
-BaseTag* MakeUVWTag() { return NewObj<UVWTag>(); }
 
 Bool UVWTag::ReadPolygonUVW(Long index, Vector (&quad)[4]) const
 {

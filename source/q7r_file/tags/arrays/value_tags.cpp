@@ -1,17 +1,13 @@
 #include "torvane/tags/value_tags.h"
 
 #include "k2v_file/stream/chunk_visitor.h"
-#include "q7r_file/nodes/node_tools.h"
-#include "q7r_file/types/tag_makers.h"
+#include "k2v_file/stream/value_forms.h"
 
 namespace _torvane_
 {
 
 namespace
 {
-
-constexpr LLong kLeastVectorSize = 1 + 3 * 4; // a Vector of a file whose Reals are floats
-constexpr LLong kLeastSegmentSize = 5 + 2;    // Long, Bool
 
 // An array of floats may stand for one of doubles.
 constexpr ColumnLayout kPointLayout = {kArrayReal, 3, sizeof(Real), sizeof(Vector), 1, 3 * sizeof(SReal)};
@@ -99,6 +95,12 @@ Bool BaseArrayTag::CopyEntries(BaseArrayTag& target)
   return true;
 }
 
+Bool BaseArrayTag::CopyEntriesAfresh(BaseArrayTag& target)
+{
+  target.FreeEntries();
+  return !block_ || BaseArrayTag::CopyEntries(target);
+}
+
 Bool BaseArrayTag::CopyEntriesOntoEmpty(BaseArrayTag& target)
 {
   if (!block_ && !target.block_)
@@ -115,50 +117,48 @@ Bool BaseArrayTag::CopyEntriesOntoEmpty(BaseArrayTag& target)
 
 // ---------------------------------------------------------------------------------------------------------------
 
-template <class Visitor>
-Bool ColumnTag::VisitColumns(Visitor& v, void* block, LLong count) const
+namespace
 {
-  const LLong elements = count * layout_.elementsPerEntry;
-  for (Long column = 0; v.Good() && column < layout_.columns; ++column) {
-    UChar* first = static_cast<UChar*>(block) + column * layout_.step;
+
+template <class Visitor>
+Bool VisitColumns(Visitor& v, const ColumnLayout& layout, void* block, LLong count)
+{
+  const LLong elements = count * layout.elementsPerEntry;
+  for (Long column = 0; v.Good() && column < layout.columns; ++column) {
+    UChar* first = static_cast<UChar*>(block) + column * layout.step;
     if constexpr (Visitor::kReading)
-      v.Note(v.File().ReadArray(first, layout_.elementType, layout_.stride, elements));
+      v.Note(v.File().ReadArray(first, layout.elementType, layout.stride, elements));
     else
-      v.Note(v.File().WriteArray(first, layout_.elementType, layout_.stride, elements));
+      v.Note(v.File().WriteArray(first, layout.elementType, layout.stride, elements));
   }
   return v.Good();
 }
 
-template <class Visitor>
-Bool ColumnTag::VisitEntries(Visitor& v)
-{
-  Long count = count_;
-  if (!v.Long(count) || count <= 0)
-    return v.Good();
-  if constexpr (Visitor::kReading) {
-    void* block = nullptr;
-    if (!MakeEntries(v.File(), count, layout_.leastEntrySize, block))
-      return false;
-    if (VisitColumns(v, block, count))
-      AdoptEntries(block, count);
-    else
-      GeFree(block);
-    return v.Good();
-  } else {
-    return VisitColumns(v, block_, count);
-  }
-}
+} // namespace
 
 Bool ColumnTag::ReadEntries(HyperFile& file, Long level)
 {
   ChunkReader reader(file, level);
-  return reader.VersionBelow(kVersionColumns) ? ReadOldEntries(file) : VisitEntries(reader);
+  if (reader.VersionBelow(kVersionColumns))
+    return ReadOldEntries(file);
+  Long count = 0;
+  void* block = nullptr;
+  if (!reader.Long(count) || count <= 0)
+    return reader.Good();
+  if (!MakeEntries(file, count, layout_.leastEntrySize, block))
+    return false;
+  if (VisitColumns(reader, layout_, block, count))
+    AdoptEntries(block, count);
+  else
+    GeFree(block);
+  return reader.Good();
 }
 
 void ColumnTag::WriteEntries(HyperFile& file)
 {
   ChunkWriter writer(file, GetEntriesLevel());
-  VisitEntries(writer);
+  if (writer.Long(count_) && count_ > 0)
+    VisitColumns(writer, layout_, block_, count_);
 }
 
 // ---------------------------------------------------------------------------------------------------------------
@@ -191,11 +191,6 @@ Bool PolygonTag::ReadOldEntries(HyperFile& file)
 }
 
 VertexMapTag::VertexMapTag(Long type) : ArrayTag(type, kVertexMapLayout) {}
-
-GeListNode* VertexMapTag::MakeClone(ULong flags, TransArray* translation)
-{
-  return CloneNode(*this, NewObj<VertexMapTag>(GetType()), flags, translation);
-}
 
 Bool VertexMapTag::ReadOldEntries(HyperFile& file)
 {
@@ -252,7 +247,61 @@ Bool NormalTag::WritePolygonNormals(Long index, const Vector (&quad)[4])
 
 // ---------------------------------------------------------------------------------------------------------------
 
-SegmentTag::SegmentTag() : ArrayTag(kTagSegment) {}
+namespace
+{
+
+constexpr LLong LeastSize(const SplineSegment*) { return LeastStoredSize(kTagLong, kTagBool); }
+constexpr LLong LeastSize(const TangentPair*) { return LeastStoredSize(kTagVector, kTagVector); }
+
+template <class Visitor>
+void VisitEntry(Visitor& v, SplineSegment& segment)
+{
+  v.Long(segment.points);
+  v.Bool(segment.closed);
+}
+
+template <class Visitor>
+void VisitEntry(Visitor& v, TangentPair& pair)
+{
+  v.Vector(pair.left);
+  v.Vector(pair.right);
+}
+
+template <class Visitor, class Entry>
+Bool VisitRows(Visitor& v, Entry* entries, Long count)
+{
+  for (Long i = 0; v.Good() && i < count; ++i)
+    VisitEntry(v, entries[i]);
+  return v.Good();
+}
+
+} // namespace
+
+template <class Entry>
+Bool RowTag<Entry>::ReadEntries(HyperFile& file, Long level)
+{
+  this->FreeEntries();
+  Long count = 0;
+  void* block = nullptr;
+  if (!file.ReadLong(count) || !this->MakeEntries(file, count, LeastSize(this->GetArray()), block))
+    return false;
+  this->AdoptEntries(block, count);
+  ChunkReader reader(file, level);
+  return VisitRows(reader, this->GetArray(), count);
+}
+
+template <class Entry>
+void RowTag<Entry>::WriteEntries(HyperFile& file)
+{
+  ChunkWriter writer(file, this->GetEntriesLevel());
+  writer.Long(this->count_);
+  VisitRows(writer, this->GetArray(), this->count_);
+}
+
+template class RowTag<SplineSegment>;
+template class RowTag<TangentPair>;
+
+SegmentTag::SegmentTag() : RowTag(kTagSegment) {}
 
 Bool SegmentTag::ResizeTagArray(Long count)
 {
@@ -261,47 +310,7 @@ Bool SegmentTag::ResizeTagArray(Long count)
   return count == -1 || BaseArrayTag::ResizeTagArray(count);
 }
 
-template <class Visitor>
-Bool SegmentTag::VisitEntries(Visitor& v)
-{
-  for (Long i = 0; v.Good() && i < count_; ++i) {
-    v.Long(GetArray()[i].points);
-    v.Bool(GetArray()[i].closed);
-  }
-  return v.Good();
-}
-
-Bool SegmentTag::ReadEntries(HyperFile& file, Long level)
-{
-  FreeEntries();
-  Long count = 0;
-  void* block = nullptr;
-  if (!file.ReadLong(count) || !MakeEntries(file, count, kLeastSegmentSize, block))
-    return false;
-  AdoptEntries(block, count);
-  ChunkReader reader(file, level);
-  return VisitEntries(reader);
-}
-
-void SegmentTag::WriteEntries(HyperFile& file)
-{
-  ChunkWriter writer(file, GetEntriesLevel());
-  writer.Long(count_);
-  VisitEntries(writer);
-}
-
-Bool SegmentTag::CopyEntries(BaseArrayTag& target)
-{
-  auto* segments = NodeCast<SegmentTag>(&target);
-  if (!segments)
-    return false;
-  segments->FreeEntries();
-  return !block_ || BaseArrayTag::CopyEntries(target);
-}
-
-// ---------------------------------------------------------------------------------------------------------------
-
-TangentTag::TangentTag() : ArrayTag(kTagTangent) {}
+TangentTag::TangentTag() : RowTag(kTagTangent) {}
 
 Bool TangentTag::ReplaceTagArray(Long count)
 {
@@ -313,51 +322,5 @@ Bool TangentTag::ReplaceTagArray(Long count)
   AdoptEntries(block, count);
   return true;
 }
-
-template <class Visitor>
-Bool TangentTag::VisitEntries(Visitor& v)
-{
-  for (Long i = 0; v.Good() && i < count_; ++i) {
-    v.Vector(GetArray()[i].left);
-    v.Vector(GetArray()[i].right);
-  }
-  return v.Good();
-}
-
-Bool TangentTag::ReadEntries(HyperFile& file, Long level)
-{
-  Long count = 0;
-  void* block = nullptr;
-  if (!file.ReadLong(count) || !MakeEntries(file, count, 2 * kLeastVectorSize, block))
-    return false;
-  AdoptEntries(block, count);
-  ChunkReader reader(file, level);
-  return VisitEntries(reader);
-}
-
-void TangentTag::WriteEntries(HyperFile& file)
-{
-  ChunkWriter writer(file, GetEntriesLevel());
-  writer.Long(count_);
-  VisitEntries(writer);
-}
-
-Bool TangentTag::CopyEntries(BaseArrayTag& target)
-{
-  auto* tangents = NodeCast<TangentTag>(&target);
-  if (!tangents)
-    return false;
-  tangents->FreeEntries();
-  return !block_ || BaseArrayTag::CopyEntries(target);
-}
-
-// ---------------------------------------------------------------------------------------------------------------
-
-BaseTag* MakePointTag() { return NewObj<PointTag>(); }
-BaseTag* MakePolygonTag() { return NewObj<PolygonTag>(); }
-BaseTag* MakeTangentTag() { return NewObj<TangentTag>(); }
-BaseTag* MakeSegmentTag() { return NewObj<SegmentTag>(); }
-BaseTag* MakeVertexMapTag() { return NewObj<VertexMapTag>(); }
-BaseTag* MakeNormalTag() { return NewObj<NormalTag>(); }
 
 } // namespace _torvane_

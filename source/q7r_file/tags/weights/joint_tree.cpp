@@ -7,11 +7,11 @@ JointTreeData::~JointTreeData() { RemoveRows(0, rows_.GetCount()); }
 
 Bool JointTreeData::IsEqual(const CustomData& other) const
 {
-  const auto& tree = static_cast<const JointTreeData&>(other);
-  if (!OpaqueCustomData::IsEqual(other) || rows_.GetCount() != tree.rows_.GetCount())
+  const auto* tree = NodeCast<JointTreeData>(&other);
+  if (!tree || !OpaqueCustomData::IsEqual(other) || rows_.GetCount() != tree->rows_.GetCount())
     return false;
   for (Long i = 0; i < rows_.GetCount(); ++i) {
-    if (rows_[i]->node != tree.rows_[i]->node || !rows_[i]->settings.IsEqual(tree.rows_[i]->settings))
+    if (rows_[i]->node != tree->rows_[i]->node || !rows_[i]->settings.IsEqual(tree->rows_[i]->settings))
       return false;
   }
   return true;
@@ -19,16 +19,16 @@ Bool JointTreeData::IsEqual(const CustomData& other) const
 
 Bool JointTreeData::CopyTo(CustomData& destination, TransArray* translation) const
 {
-  auto& tree = static_cast<JointTreeData&>(destination);
-  if (&tree == this)
+  auto* tree = NodeCast<JointTreeData>(&destination);
+  if (tree == this)
     return true;
-  if (!OpaqueCustomData::CopyTo(destination, translation))
+  if (!tree || !OpaqueCustomData::CopyTo(destination, translation))
     return false;
-  tree.RemoveRows(0, tree.rows_.GetCount());
+  tree->RemoveRows(0, tree->rows_.GetCount());
   for (const JointRow* row : rows_) {
-    const Long end = tree.rows_.GetCount();
-    if (!tree.InsertRow(end, row->node, row->GetKind()) ||
-        !row->settings.CopyTo(tree.rows_[end]->settings, 0, translation))
+    const Long end = tree->rows_.GetCount();
+    if (!tree->InsertRow(end, row->node, row->GetKind()) ||
+        !row->settings.CopyTo(tree->rows_[end]->settings, 0, translation))
       return false;
   }
   return true;

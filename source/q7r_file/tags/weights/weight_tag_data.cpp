@@ -1,7 +1,6 @@
 #include "torvane/tags/weight_tag_data.h"
 
 #include "k2v_file/stream/chunk_visitor.h"
-#include "q7r_file/types/tag_makers.h"
 #include "torvane/math/ge_math.h"
 #include "torvane/objects/base_object.h"
 #include "torvane/tags/base_tag.h"
@@ -134,8 +133,6 @@ Bool PlaceRow(JointTreeData& tree, Long& place, GeAliasID node, Long kind)
 }
 
 } // namespace
-
-NodeData* MakeWeightTagData() { return NewObj<WeightTagData>(); }
 
 // ---------------------------------------------------------------------------------------------------------------
 
@@ -457,7 +454,7 @@ JointTreeData* WeightTagData::NeedTree()
     if (!tree.SetType(kCustomJointTree) || !settings.SetData(kWeightTree, tree))
       return nullptr;
   }
-  return static_cast<JointTreeData*>(settings.GetCustomDataType(kWeightTree, kCustomJointTree));
+  return NodeCast<JointTreeData>(settings.GetCustomDataType(kWeightTree, kCustomJointTree));
 }
 
 // Gives each joint and each of its entries a row in the tree, and takes out the rows of what is gone.
