@@ -42,22 +42,6 @@ Quaternion ToQuaternion(const Matrix& rotation)
 
 Quaternion Upright(const Quaternion& q) { return q.w < 0.0 ? Quaternion{-q.x, -q.y, -q.z, -q.w} : q; }
 
-Matrix LookAtMatrix(const Vector& from, const Vector& to, const Vector& up)
-{
-  Matrix frame;
-  frame.off = from;
-  const Vector forward = to - from;
-  const Vector down = from - up;
-  if (Length(forward) == 0.0 || Length(down) == 0.0)
-    return frame;
-  frame.v3 = Normalize(forward);
-  frame.v1 = Normalize(Cross(frame.v3, down));
-  if (frame.v1 == Vector())
-    frame.v1 = Vector(1.0, 0.0, 0.0);
-  frame.v2 = Normalize(Cross(frame.v3, frame.v1));
-  return frame;
-}
-
 Matrix Scaled(Matrix matrix, const Vector& scale)
 {
   matrix.v1 *= scale.x;

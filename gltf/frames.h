@@ -29,10 +29,6 @@ Quaternion ToQuaternion(const Matrix& rotation);
 // The one of the two that stand for a rotation with w >= 0.
 Quaternion Upright(const Quaternion& q);
 
-// A frame at `from` that looks at `to` with its third axis, its second one turned towards `up`. The identity, with that
-// offset, where there is no distance.
-Matrix LookAtMatrix(const Vector& from, const Vector& to, const Vector& up);
-
 // The matrix with its axes multiplied by the components of `scale`.
 Matrix Scaled(Matrix matrix, const Vector& scale);
 

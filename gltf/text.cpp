@@ -1,5 +1,9 @@
 #include "gltf/text.h"
 
+#include <iterator>
+
+#include <utf8.h>
+
 namespace gltf
 {
 
@@ -7,15 +11,6 @@ namespace fs = std::filesystem;
 
 namespace
 {
-
-void AppendUtf8(std::string& out, char32_t code)
-{
-  const int more = code < 0x80 ? 0 : code < 0x800 ? 1 : code < 0x10000 ? 2 : 3; // bytes that follow the first
-  constexpr unsigned kLead[] = {0, 0xC0, 0xE0, 0xF0};
-  out += static_cast<char>(kLead[more] | (code >> (6 * more)));
-  for (int i = more - 1; i >= 0; --i)
-    out += static_cast<char>(0x80 | ((code >> (6 * i)) & 63));
-}
 
 std::string ToBytes(const fs::path& path)
 {
@@ -43,7 +38,7 @@ std::string ToUtf8(const _torvane_::String& text)
       code = 0x10000 + ((code - 0xD800) << 10) + (text[++i] - 0xDC00U);
     else if (code >= 0xD800 && code < 0xE000)
       code = 0xFFFD;
-    AppendUtf8(out, code);
+    utf8::append(code, std::back_inserter(out));
   }
   return out;
 }

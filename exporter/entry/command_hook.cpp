@@ -18,7 +18,6 @@ namespace
 {
 
 constexpr A_Err kNoSceneFile = 2;
-constexpr const char* kSceneSuffix = "q7r";
 
 // The text that a script gives, valid as long as the handle is locked; null when the host fails.
 const char* RunScript(HostCalls& host, const char* script, HostText& result)

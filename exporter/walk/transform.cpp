@@ -56,22 +56,6 @@ SceneTransform ConvertTransform(const LayerSample& sample, const TransformRules&
   return result;
 }
 
-Matrix LookAtMatrix(const Vector& position, const Vector& target, const Vector& up)
-{
-  Matrix frame;
-  frame.off = position;
-  const Vector forward = target - position;
-  const Vector down = position - up;
-  if (Length(forward) == 0.0 || Length(down) == 0.0)
-    return frame;
-  frame.v3 = Normalize(forward);
-  frame.v1 = Normalize(Cross(frame.v3, down));
-  if (frame.v1 == Vector())
-    frame.v1 = Vector(1.0, 0.0, 0.0);
-  frame.v2 = Normalize(Cross(frame.v3, frame.v1));
-  return frame;
-}
-
 Real FieldOfView(Real zoom, Real width, Real pixelAspect)
 {
   return 2.0 * std::atan(width * 0.5 / (zoom / pixelAspect));

@@ -71,10 +71,6 @@ SceneTransform ConvertTransform(const LayerSample& sample, const TransformRules&
 // scene from its centre.
 constexpr Vector ParentShift(Real width, Real height) { return {-(width * 0.5), height * 0.5, 0.0}; }
 
-// A frame at `position` whose third axis points to `target`, upright towards `up`. The identity at `position` when one
-// of them lies on it.
-Matrix LookAtMatrix(const Vector& position, const Vector& target, const Vector& up);
-
 // The horizontal angle in radians of a camera with a zoom in pixels, for a composition of `width` pixels.
 Real FieldOfView(Real zoom, Real width, Real pixelAspect);
 

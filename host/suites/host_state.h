@@ -4,8 +4,11 @@
 #include "host/progress.h"
 #include "host/standalone_host.h"
 
+#include <algorithm>
+#include <functional>
 #include <map>
 #include <new>
+#include <type_traits>
 #include <unordered_map>
 #include <utility>
 
@@ -120,7 +123,65 @@ inline const Item* FromHandle(AEGP_ItemH item) { return reinterpret_cast<const I
 inline const Item* FromHandle(AEGP_FootageH footage) { return reinterpret_cast<const Item*>(footage); }
 inline const Composition* FromHandle(AEGP_CompH comp) { return reinterpret_cast<const Composition*>(comp); }
 inline const Layer* FromHandle(AEGP_LayerH layer) { return reinterpret_cast<const Layer*>(layer); }
-inline Property* FromHandle(AEGP_StreamRefH stream) { return reinterpret_cast<Property*>(stream); }
+// Null for a stream that isn't open.
+inline Property* FromHandle(AEGP_StreamRefH stream)
+{
+  auto* property = reinterpret_cast<Property*>(stream);
+  return property && property->openHandles > 0 ? property : nullptr;
+}
+
+// What an operation says of a handle that stands for nothing.
+constexpr Outcome NotGiven(AEGP_ItemH) { return "no item"; }
+constexpr Outcome NotGiven(AEGP_FootageH) { return "no footage"; }
+constexpr Outcome NotGiven(AEGP_CompH) { return "no composition"; }
+constexpr Outcome NotGiven(AEGP_LayerH) { return "no layer"; }
+constexpr Outcome NotGiven(AEGP_StreamRefH) { return "not a stream that is open"; }
+
+// Runs `body` with what a handle stands for and the place of the result, neither null.
+template <class Handle, class Result, class Body>
+A_Err Query(const char* operation, Handle handle, Result* result, Body&& body)
+{
+  return Operation(operation, [&](HostState& state) -> Outcome {
+    const auto* object = FromHandle(handle);
+    if (!object)
+      return NotGiven(handle);
+    if (!result)
+      return kNoPlace;
+    return body(state, *object);
+  });
+}
+
+// An operation's name as an argument of a template.
+template <std::size_t size>
+struct OperationName
+{
+  char text[size];
+
+  consteval OperationName(const char (&name)[size]) // NOLINT(google-explicit-constructor): a literal is meant
+  {
+    std::copy_n(name, size, text);
+  }
+};
+
+// What a plug-in gets of a value: a handle of an object, and else the value itself.
+template <class Result, class Value>
+Result ToResult(const Value& value)
+{
+  if constexpr (std::is_pointer_v<Value>)
+    return ToHandle(value);
+  else
+    return static_cast<Result>(value);
+}
+
+// The operation that tells one member of what a handle stands for: a suite's slot gives handle and result their types.
+template <OperationName name, auto member, class Handle, class Result>
+A_Err Tell(Handle handle, Result* result)
+{
+  return Query(name.text, handle, result, [&](HostState&, const auto& found) {
+    *result = ToResult<Result>(std::invoke(member, found));
+    return kDone;
+  });
+}
 
 // The suites, one file each family.
 AEGP_CommandSuite1 MakeCommandSuite();

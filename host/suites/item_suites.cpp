@@ -7,24 +7,6 @@ namespace host
 namespace
 {
 
-constexpr Outcome kNoItem = "no item";
-constexpr Outcome kNoComposition = "no composition";
-constexpr Outcome kNoFootage = "no footage";
-
-// Runs `body` with what a handle stands for and the place of the result, neither null.
-template <class Handle, class Result, class Body>
-A_Err Query(const char* operation, Handle handle, Outcome missing, Result* result, Body&& body)
-{
-  return Operation(operation, [&](HostState& state) -> Outcome {
-    const auto* object = FromHandle(handle);
-    if (!object)
-      return missing;
-    if (!result)
-      return kNoPlace;
-    return body(state, *object);
-  });
-}
-
 // --- Items
 
 A_Err GetActiveItem(AEGP_ItemH* item)
@@ -39,7 +21,7 @@ A_Err GetActiveItem(AEGP_ItemH* item)
 
 A_Err GetItemType(AEGP_ItemH item, AEGP_ItemType* type)
 {
-  return Query("AEGP_GetItemType", item, kNoItem, type, [&](HostState&, const Item& found) {
+  return Query("AEGP_GetItemType", item, type, [&](HostState&, const Item& found) {
     *type = found.composition ? AEGP_ItemType_COMP : AEGP_ItemType_FOOTAGE;
     return kDone;
   });
@@ -47,7 +29,7 @@ A_Err GetItemType(AEGP_ItemH item, AEGP_ItemType* type)
 
 A_Err GetItemName(AEGP_PluginID, AEGP_ItemH item, AEGP_MemHandle* name)
 {
-  return Query("AEGP_GetItemName", item, kNoItem, name, [&](HostState& state, const Item& found) {
+  return Query("AEGP_GetItemName", item, name, [&](HostState& state, const Item& found) {
     *name = state.NewUtf16(found.name);
     return kDone;
   });
@@ -55,7 +37,7 @@ A_Err GetItemName(AEGP_PluginID, AEGP_ItemH item, AEGP_MemHandle* name)
 
 A_Err GetItemDimensions(AEGP_ItemH item, A_long* width, A_long* height)
 {
-  return Query("AEGP_GetItemDimensions", item, kNoItem, height ? width : nullptr, [&](HostState&, const Item& found) {
+  return Query("AEGP_GetItemDimensions", item, height ? width : nullptr, [&](HostState&, const Item& found) {
     *width = found.width;
     *height = found.height;
     return kDone;
@@ -64,52 +46,8 @@ A_Err GetItemDimensions(AEGP_ItemH item, A_long* width, A_long* height)
 
 A_Err GetItemPixelAspectRatio(AEGP_ItemH item, A_Ratio* ratio)
 {
-  return Query("AEGP_GetItemPixelAspectRatio", item, kNoItem, ratio, [&](HostState&, const Item& found) {
+  return Query("AEGP_GetItemPixelAspectRatio", item, ratio, [&](HostState&, const Item& found) {
     *ratio = found.composition ? found.composition->pixelAspect : A_Ratio{1, 1};
-    return kDone;
-  });
-}
-
-// --- Compositions
-
-A_Err GetCompFromItem(AEGP_ItemH item, AEGP_CompH* comp)
-{
-  return Query("AEGP_GetCompFromItem", item, kNoItem, comp, [&](HostState&, const Item& found) {
-    *comp = ToHandle(found.composition); // null for footage
-    return kDone;
-  });
-}
-
-A_Err GetCompFramerate(AEGP_CompH comp, A_FpLong* framesPerSecond)
-{
-  return Query("AEGP_GetCompFramerate", comp, kNoComposition, framesPerSecond,
-               [&](HostState&, const Composition& found) {
-                 *framesPerSecond = found.frameRate;
-                 return kDone;
-               });
-}
-
-A_Err GetCompWorkAreaStart(AEGP_CompH comp, A_Time* start)
-{
-  return Query("AEGP_GetCompWorkAreaStart", comp, kNoComposition, start, [&](HostState&, const Composition& found) {
-    *start = found.workAreaStart;
-    return kDone;
-  });
-}
-
-A_Err GetCompWorkAreaDuration(AEGP_CompH comp, A_Time* duration)
-{
-  return Query("AEGP_GetCompWorkAreaDuration", comp, kNoComposition, duration,
-               [&](HostState&, const Composition& found) {
-                 *duration = found.workAreaDuration;
-                 return kDone;
-               });
-}
-
-A_Err GetCompFrameDuration(AEGP_CompH comp, A_Time* duration)
-{
-  return Query("AEGP_GetCompFrameDuration", comp, kNoComposition, duration, [&](HostState&, const Composition& found) {
-    *duration = found.frameDuration;
     return kDone;
   });
 }
@@ -118,7 +56,7 @@ A_Err GetCompFrameDuration(AEGP_CompH comp, A_Time* duration)
 
 A_Err GetMainFootageFromItem(AEGP_ItemH item, AEGP_FootageH* footage)
 {
-  return Query("AEGP_GetMainFootageFromItem", item, kNoItem, footage, [&](HostState&, const Item& found) {
+  return Query("AEGP_GetMainFootageFromItem", item, footage, [&](HostState&, const Item& found) {
     // Footage is known by its item; a composition has none.
     *footage = found.composition ? nullptr : reinterpret_cast<AEGP_FootageH>(item);
     return kDone;
@@ -129,7 +67,7 @@ A_Err GetFootageNumFiles(AEGP_FootageH footage, A_long* mainFiles, A_long* files
 {
   return Operation("AEGP_GetFootageNumFiles", [&](HostState&) -> Outcome {
     if (!footage)
-      return kNoFootage;
+      return NotGiven(footage);
     if (mainFiles)
       *mainFiles = FromHandle(footage)->files;
     if (filesPerFrame)
@@ -140,7 +78,7 @@ A_Err GetFootageNumFiles(AEGP_FootageH footage, A_long* mainFiles, A_long* files
 
 A_Err GetFootagePath(AEGP_FootageH footage, A_long frame, A_long file, AEGP_MemHandle* path)
 {
-  return Query("AEGP_GetFootagePath", footage, kNoFootage, path, [&](HostState& state, const Item& found) -> Outcome {
+  return Query("AEGP_GetFootagePath", footage, path, [&](HostState& state, const Item& found) -> Outcome {
     if (frame < 0 || frame >= found.files || file != 0)
       return "no such file of the footage";
     *path = state.NewUtf16(found.path);
@@ -150,7 +88,7 @@ A_Err GetFootagePath(AEGP_FootageH footage, A_long frame, A_long file, AEGP_MemH
 
 A_Err GetFootageSignature(AEGP_FootageH footage, AEGP_FootageSignature* signature)
 {
-  return Query("AEGP_GetFootageSignature", footage, kNoFootage, signature, [&](HostState&, const Item& found) {
+  return Query("AEGP_GetFootageSignature", footage, signature, [&](HostState&, const Item& found) {
     *signature = found.kind == ItemKind::kSolid ? AEGP_FootageSignature_SOLID : AEGP_FootageSignature_NONE;
     return kDone;
   });
@@ -158,7 +96,7 @@ A_Err GetFootageSignature(AEGP_FootageH footage, AEGP_FootageSignature* signatur
 
 A_Err GetSolidFootageColor(AEGP_ItemH item, A_Boolean, AEGP_ColorVal* color)
 {
-  return Query("AEGP_GetSolidFootageColor", item, kNoItem, color, [&](HostState&, const Item& found) -> Outcome {
+  return Query("AEGP_GetSolidFootageColor", item, color, [&](HostState&, const Item& found) -> Outcome {
     if (found.kind != ItemKind::kSolid)
       return "the item is no solid";
     *color = found.color;
@@ -182,11 +120,11 @@ AEGP_ItemSuite13 MakeItemSuite()
 AEGP_CompSuite15 MakeCompSuite()
 {
   AEGP_CompSuite15 suite{};
-  suite.AEGP_GetCompFromItem = GetCompFromItem;
-  suite.AEGP_GetCompFramerate = GetCompFramerate;
-  suite.AEGP_GetCompWorkAreaStart = GetCompWorkAreaStart;
-  suite.AEGP_GetCompWorkAreaDuration = GetCompWorkAreaDuration;
-  suite.AEGP_GetCompFrameDuration = GetCompFrameDuration;
+  suite.AEGP_GetCompFromItem = Tell<"AEGP_GetCompFromItem", &Item::composition>;
+  suite.AEGP_GetCompFramerate = Tell<"AEGP_GetCompFramerate", &Composition::frameRate>;
+  suite.AEGP_GetCompWorkAreaStart = Tell<"AEGP_GetCompWorkAreaStart", &Composition::workAreaStart>;
+  suite.AEGP_GetCompWorkAreaDuration = Tell<"AEGP_GetCompWorkAreaDuration", &Composition::workAreaDuration>;
+  suite.AEGP_GetCompFrameDuration = Tell<"AEGP_GetCompFrameDuration", &Composition::frameDuration>;
   return suite;
 }
 

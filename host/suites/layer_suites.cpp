@@ -9,23 +9,7 @@ namespace host
 namespace
 {
 
-constexpr Outcome kNoLayer = "no layer";
-constexpr Outcome kDeadStream = "not a stream that is open";
-
 // --- Layers
-
-// Runs `body` with a layer and the place of the result, neither null.
-template <class Result, class Body>
-A_Err QueryLayer(const char* operation, AEGP_LayerH layer, Result* result, Body&& body)
-{
-  return Operation(operation, [&](HostState& state) -> Outcome {
-    if (!layer)
-      return kNoLayer;
-    if (!result)
-      return kNoPlace;
-    return body(state, *FromHandle(layer));
-  });
-}
 
 A_Err GetCompNumLayers(AEGP_CompH comp, A_long* count)
 {
@@ -50,19 +34,11 @@ A_Err GetCompLayerByIndex(AEGP_CompH comp, A_long index, AEGP_LayerH* layer)
   });
 }
 
-A_Err GetLayerSourceItem(AEGP_LayerH layer, AEGP_ItemH* item)
-{
-  return QueryLayer("AEGP_GetLayerSourceItem", layer, item, [&](HostState&, const Layer& found) {
-    *item = ToHandle(found.source);
-    return kDone;
-  });
-}
-
 A_Err GetLayerName(AEGP_PluginID, AEGP_LayerH layer, AEGP_MemHandle* layerName, AEGP_MemHandle* sourceName)
 {
   return Operation("AEGP_GetLayerName", [&](HostState& state) -> Outcome {
     if (!layer)
-      return kNoLayer;
+      return NotGiven(layer);
     const Layer& found = *FromHandle(layer);
     state.progress.BeginLayer();
     if (layerName)
@@ -73,51 +49,11 @@ A_Err GetLayerName(AEGP_PluginID, AEGP_LayerH layer, AEGP_MemHandle* layerName, 
   });
 }
 
-A_Err GetLayerFlags(AEGP_LayerH layer, AEGP_LayerFlags* flags)
-{
-  return QueryLayer("AEGP_GetLayerFlags", layer, flags, [&](HostState&, const Layer& found) {
-    *flags = found.flags;
-    return kDone;
-  });
-}
-
-A_Err GetLayerObjectType(AEGP_LayerH layer, AEGP_ObjectType* type)
-{
-  return QueryLayer("AEGP_GetLayerObjectType", layer, type, [&](HostState&, const Layer& found) {
-    *type = found.type;
-    return kDone;
-  });
-}
-
-A_Err IsLayer3D(AEGP_LayerH layer, A_Boolean* is3D)
-{
-  return QueryLayer("AEGP_IsLayer3D", layer, is3D, [&](HostState&, const Layer& found) {
-    *is3D = found.is3D;
-    return kDone;
-  });
-}
-
-A_Err GetLayerID(AEGP_LayerH layer, AEGP_LayerIDVal* id)
-{
-  return QueryLayer("AEGP_GetLayerID", layer, id, [&](HostState&, const Layer& found) {
-    *id = found.id;
-    return kDone;
-  });
-}
-
-A_Err GetLayerParent(AEGP_LayerH layer, AEGP_LayerH* parent)
-{
-  return QueryLayer("AEGP_GetLayerParent", layer, parent, [&](HostState&, const Layer& found) {
-    *parent = ToHandle(found.parent);
-    return kDone;
-  });
-}
-
 // --- Cameras and lights
 
 A_Err GetCameraType(AEGP_LayerH layer, AEGP_CameraType* type)
 {
-  return QueryLayer("AEGP_GetCameraType", layer, type, [&](HostState&, const Layer& found) -> Outcome {
+  return Query("AEGP_GetCameraType", layer, type, [&](HostState&, const Layer& found) -> Outcome {
     if (found.type != AEGP_ObjectType_CAMERA)
       return "the layer is no camera";
     *type = found.cameraType;
@@ -127,19 +63,18 @@ A_Err GetCameraType(AEGP_LayerH layer, AEGP_CameraType* type)
 
 A_Err GetCameraFilmSize(AEGP_LayerH layer, AEGP_FilmSizeUnits* units, A_FpLong* size)
 {
-  return QueryLayer("AEGP_GetCameraFilmSize", layer, size ? units : nullptr,
-                    [&](HostState&, const Layer& found) -> Outcome {
-                      if (found.type != AEGP_ObjectType_CAMERA)
-                        return "the layer is no camera";
-                      *units = found.filmSizeUnits;
-                      *size = found.filmSize;
-                      return kDone;
-                    });
+  return Query("AEGP_GetCameraFilmSize", layer, size ? units : nullptr, [&](HostState&, const Layer& found) -> Outcome {
+    if (found.type != AEGP_ObjectType_CAMERA)
+      return "the layer is no camera";
+    *units = found.filmSizeUnits;
+    *size = found.filmSize;
+    return kDone;
+  });
 }
 
 A_Err GetLightType(AEGP_LayerH layer, AEGP_LightType* type)
 {
-  return QueryLayer("AEGP_GetLightType", layer, type, [&](HostState&, const Layer& found) -> Outcome {
+  return Query("AEGP_GetLightType", layer, type, [&](HostState&, const Layer& found) -> Outcome {
     if (found.type != AEGP_ObjectType_LIGHT)
       return "the layer is no light";
     *type = found.lightType;
@@ -158,7 +93,7 @@ Property* FindProperty(const Layer& layer, AEGP_LayerStream which)
 
 A_Err IsStreamLegal(AEGP_LayerH layer, AEGP_LayerStream which, A_Boolean* isLegal)
 {
-  return QueryLayer("AEGP_IsStreamLegal", layer, isLegal, [&](HostState&, const Layer& found) {
+  return Query("AEGP_IsStreamLegal", layer, isLegal, [&](HostState&, const Layer& found) {
     *isLegal = FindProperty(found, which) != nullptr;
     return kDone;
   });
@@ -166,7 +101,7 @@ A_Err IsStreamLegal(AEGP_LayerH layer, AEGP_LayerStream which, A_Boolean* isLega
 
 A_Err GetNewLayerStream(AEGP_PluginID, AEGP_LayerH layer, AEGP_LayerStream which, AEGP_StreamRefH* stream)
 {
-  return QueryLayer("AEGP_GetNewLayerStream", layer, stream, [&](HostState& state, const Layer& found) -> Outcome {
+  return Query("AEGP_GetNewLayerStream", layer, stream, [&](HostState& state, const Layer& found) -> Outcome {
     Property* property = FindProperty(found, which);
     if (!property)
       return "the stream is not legal on this layer";
@@ -181,38 +116,18 @@ A_Err GetNewLayerStream(AEGP_PluginID, AEGP_LayerH layer, AEGP_LayerStream which
 A_Err DisposeStream(AEGP_StreamRefH stream)
 {
   return Operation<CallKind::kRelease>("AEGP_DisposeStream", [&](HostState& state) -> Outcome {
-    if (!stream || FromHandle(stream)->openHandles == 0)
-      return kDeadStream;
-    --FromHandle(stream)->openHandles;
+    Property* property = FromHandle(stream);
+    if (!property)
+      return NotGiven(stream);
+    --property->openHandles;
     --state.balance.streams;
-    return kDone;
-  });
-}
-
-// Runs `body` with an open stream and the place of the result.
-template <class Result, class Body>
-A_Err QueryStream(const char* operation, AEGP_StreamRefH stream, Result* result, Body&& body)
-{
-  return Operation(operation, [&](HostState& state) -> Outcome {
-    if (!stream || FromHandle(stream)->openHandles == 0)
-      return kDeadStream;
-    if (!result)
-      return kNoPlace;
-    return body(state, *FromHandle(stream));
-  });
-}
-
-A_Err IsStreamTimevarying(AEGP_StreamRefH stream, A_Boolean* isTimevarying)
-{
-  return QueryStream("AEGP_IsStreamTimevarying", stream, isTimevarying, [&](HostState&, const Property& found) {
-    *isTimevarying = found.IsTimeVarying();
     return kDone;
   });
 }
 
 A_Err GetStreamType(AEGP_StreamRefH stream, AEGP_StreamType* type)
 {
-  return QueryStream("AEGP_GetStreamType", stream, type, [&](HostState&, const Property& found) {
+  return Query("AEGP_GetStreamType", stream, type, [&](HostState&, const Property& found) {
     *type = found.Info().type;
     return kDone;
   });
@@ -234,7 +149,7 @@ AEGP_StreamVal2 ToStreamValue(AEGP_StreamType type, const Value& value)
 A_Err GetNewStreamValue(AEGP_PluginID, AEGP_StreamRefH stream, AEGP_LTimeMode, const A_Time* time,
                         A_Boolean preExpression, AEGP_StreamValue2* value)
 {
-  return QueryStream("AEGP_GetNewStreamValue", stream, value, [&](HostState& state, const Property& found) -> Outcome {
+  return Query("AEGP_GetNewStreamValue", stream, value, [&](HostState& state, const Property& found) -> Outcome {
     if (!time || time->scale == 0)
       return "no time";
     const double frame = FrameAt(*time, state.project.frameDuration);
@@ -259,16 +174,8 @@ A_Err DisposeStreamValue(AEGP_StreamValue2* value)
 
 A_Err GetExpressionState(AEGP_PluginID, AEGP_StreamRefH stream, A_Boolean* isOn)
 {
-  return QueryStream("AEGP_GetExpressionState", stream, isOn, [&](HostState&, const Property& found) {
+  return Query("AEGP_GetExpressionState", stream, isOn, [&](HostState&, const Property& found) {
     *isOn = found.HasExpression();
-    return kDone;
-  });
-}
-
-A_Err GetStreamNumKFs(AEGP_StreamRefH stream, A_long* count)
-{
-  return QueryStream("AEGP_GetStreamNumKFs", stream, count, [&](HostState&, const Property& found) {
-    *count = static_cast<A_long>(found.KeyframeCount());
     return kDone;
   });
 }
@@ -280,13 +187,13 @@ AEGP_LayerSuite13 MakeLayerSuite()
   AEGP_LayerSuite13 suite{};
   suite.AEGP_GetCompNumLayers = GetCompNumLayers;
   suite.AEGP_GetCompLayerByIndex = GetCompLayerByIndex;
-  suite.AEGP_GetLayerSourceItem = GetLayerSourceItem;
+  suite.AEGP_GetLayerSourceItem = Tell<"AEGP_GetLayerSourceItem", &Layer::source>;
   suite.AEGP_GetLayerName = GetLayerName;
-  suite.AEGP_GetLayerFlags = GetLayerFlags;
-  suite.AEGP_GetLayerObjectType = GetLayerObjectType;
-  suite.AEGP_IsLayer3D = IsLayer3D;
-  suite.AEGP_GetLayerID = GetLayerID;
-  suite.AEGP_GetLayerParent = GetLayerParent;
+  suite.AEGP_GetLayerFlags = Tell<"AEGP_GetLayerFlags", &Layer::flags>;
+  suite.AEGP_GetLayerObjectType = Tell<"AEGP_GetLayerObjectType", &Layer::type>;
+  suite.AEGP_IsLayer3D = Tell<"AEGP_IsLayer3D", &Layer::is3D>;
+  suite.AEGP_GetLayerID = Tell<"AEGP_GetLayerID", &Layer::id>;
+  suite.AEGP_GetLayerParent = Tell<"AEGP_GetLayerParent", &Layer::parent>;
   return suite;
 }
 
@@ -311,7 +218,7 @@ AEGP_StreamSuite9 MakeStreamSuite()
   suite.AEGP_IsStreamLegal = IsStreamLegal;
   suite.AEGP_GetNewLayerStream = GetNewLayerStream;
   suite.AEGP_DisposeStream = DisposeStream;
-  suite.AEGP_IsStreamTimevarying = IsStreamTimevarying;
+  suite.AEGP_IsStreamTimevarying = Tell<"AEGP_IsStreamTimevarying", &Property::IsTimeVarying>;
   suite.AEGP_GetStreamType = GetStreamType;
   suite.AEGP_GetNewStreamValue = GetNewStreamValue;
   suite.AEGP_DisposeStreamValue = DisposeStreamValue;
@@ -329,7 +236,7 @@ AEGP_StreamSuite7 MakeOlderStreamSuite()
 AEGP_KeyframeSuite4 MakeKeyframeSuite()
 {
   AEGP_KeyframeSuite4 suite{};
-  suite.AEGP_GetStreamNumKFs = GetStreamNumKFs;
+  suite.AEGP_GetStreamNumKFs = Tell<"AEGP_GetStreamNumKFs", &Property::KeyframeCount>;
   return suite;
 }
 

@@ -50,11 +50,6 @@ Bool CCurve::CopyTo(PrivateChunk& destination, ULong flags, TransArray* translat
          target->RebuildIndex();
 }
 
-GeListNode* CCurve::MakeClone(ULong flags, TransArray* translation)
-{
-  return CloneNode(*this, NewObj<CCurve>(), flags, translation);
-}
-
 // Keys beyond the range of times stay in the list, but not in the index.
 Bool CCurve::RebuildIndex()
 {

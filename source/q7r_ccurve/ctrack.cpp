@@ -233,11 +233,6 @@ Bool CTrack::CopyTo(PrivateChunk& destination, ULong flags, TransArray* translat
   return true;
 }
 
-GeListNode* CTrack::MakeClone(ULong flags, TransArray* translation)
-{
-  return CloneNode(*this, NewObj<CTrack>(), flags, translation);
-}
-
 Bool CTrack::GetParameter(const ParameterPath& path, GeData& value)
 {
   switch (path[0].id) {

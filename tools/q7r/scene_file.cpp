@@ -20,25 +20,6 @@ using namespace _torvane_;
 namespace
 {
 
-void AppendUtf8(std::string& out, char32_t code)
-{
-  if (code < 0x80) {
-    out += static_cast<char>(code);
-  } else if (code < 0x800) {
-    out += static_cast<char>(0xC0 | (code >> 6));
-    out += static_cast<char>(0x80 | (code & 63));
-  } else if (code < 0x10000) {
-    out += static_cast<char>(0xE0 | (code >> 12));
-    out += static_cast<char>(0x80 | ((code >> 6) & 63));
-    out += static_cast<char>(0x80 | (code & 63));
-  } else {
-    out += static_cast<char>(0xF0 | (code >> 18));
-    out += static_cast<char>(0x80 | ((code >> 12) & 63));
-    out += static_cast<char>(0x80 | ((code >> 6) & 63));
-    out += static_cast<char>(0x80 | (code & 63));
-  }
-}
-
 // A name in plain characters for a file whose own name isn't text.
 std::string OpenedName(const std::filesystem::path& path)
 {
@@ -81,20 +62,6 @@ std::string ReadInput(const std::string& path)
   if (!file.is_open() || file.bad())
     throw Failure(path + ": " + std::generic_category().message(errno));
   return bytes;
-}
-
-std::string ToUtf8(const String& text)
-{
-  std::string out;
-  for (Long i = 0; i < text.GetLength(); ++i) {
-    char32_t code = text[i];
-    if (code >= 0xD800 && code < 0xDC00 && text[i + 1] >= 0xDC00 && text[i + 1] < 0xE000)
-      code = 0x10000 + ((code - 0xD800) << 10) + (text[++i] - 0xDC00U);
-    else if (code >= 0xD800 && code < 0xE000)
-      code = 0xFFFD;
-    AppendUtf8(out, code);
-  }
-  return out;
 }
 
 namespace

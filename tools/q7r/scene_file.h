@@ -5,6 +5,7 @@
 #include <memory>
 #include <string>
 
+#include "gltf/text.h"
 #include "torvane/document/base_document.h"
 #include "torvane/memory/owned.h"
 #include "torvane/stream/stream_walker.h"
@@ -20,8 +21,7 @@ _torvane_::Filename ToFilename(const std::string& path);
 // The bytes of any file; throws Failure with the system's cause.
 std::string ReadInput(const std::string& path);
 
-// Text of the library as UTF-8; unpaired surrogates become U+FFFD.
-std::string ToUtf8(const _torvane_::String& text);
+using gltf::ToUtf8;
 
 // "scene.q7r: byte 1234, in chunk 110059/110107: a read came short", or the system's own words: "scene.q7r: Permission
 // denied".

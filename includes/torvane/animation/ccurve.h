@@ -32,7 +32,6 @@ class CCurve : public BaseList2D
   Bool ReadChunk(HyperFile& file, Long id, Long level) override;
   void WriteChunks(HyperFile& file) override;
   Bool CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation) override;
-  GeListNode* MakeClone(ULong flags, TransArray* translation) override;
 
   // The key at `time`, made if there is none; a key that is there is reset to its defaults. Null for a time beyond
   // 10000 seconds either way and when memory is short. `index`, if given, is the key's place, or -1.
@@ -52,6 +51,9 @@ class CCurve : public BaseList2D
   // The curve's value at a time in seconds; 0 for a curve without keys.
   Real GetValue(Real time) const;
   Real GetValue(const BaseTime& time) const { return GetValue(time.Get()); }
+
+ protected:
+  GeListNode* MakeEmpty() const override { return NewObj<CCurve>(); }
 
  private:
   friend class CKey; // tells when it goes or changes its time

@@ -39,7 +39,6 @@ class CTrack : public BaseList2D
   Bool CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation) override;
   Bool GetParameter(const ParameterPath& path, GeData& value) override;
   Bool SetParameter(const ParameterPath& path, const GeData& value) override;
-  GeListNode* MakeClone(ULong flags, TransArray* translation) override;
 
   CTrack* GetNext() const { return NodeCast<CTrack>(BaseList2D::GetNext()); }
 
@@ -52,6 +51,9 @@ class CTrack : public BaseList2D
   Long GetKind() const { return kind_; }
   Long GetBefore() const { return before_; }
   Long GetAfter() const { return after_; }
+
+ protected:
+  GeListNode* MakeEmpty() const override { return NewObj<CTrack>(); }
 
  private:
   void WriteCurves(HyperFile& file);

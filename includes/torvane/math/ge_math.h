@@ -43,6 +43,10 @@ void MatrixToAxisAngle(const Matrix& matrix, Vector& axis, Real& angle) noexcept
 // The identity for an axis without length or an angle of 0.
 Matrix AxisAngleToMatrix(const Vector& axis, Real angle) noexcept;
 
+// A frame at `position` whose third axis points to `target`, its second one turned away from `up`. The identity at
+// `position` where the target or `up` lies on it.
+Matrix LookAtMatrix(const Vector& position, const Vector& target, const Vector& up) noexcept;
+
 // The arc functions, with arguments outside -1 to 1 taken as the limit.
 Real SafeAsin(Real x) noexcept;
 Real SafeAcos(Real x) noexcept;

@@ -64,10 +64,20 @@ class K2VPaintLayer : public K2VPaintTarget
 
   Bool ReadChunk(HyperFile& file, Long id, Long level) override;
   void WriteChunks(HyperFile& file) override;
-  Bool CreateLayer(HyperFile& file, Long width, Long height, Long type) override;
-  Bool SetLayerLine(HyperFile& file, Long x, Long y, Long count, const UChar* buffer, Long components) override;
-  Long GetLayerType(HyperFile& file) override;
-  Bool GetLayerLine(HyperFile& file, Long x, Long y, Long count, UChar* buffer) override;
+  // All four forward to the target.
+  Bool CreateLayer(HyperFile& file, Long width, Long height, Long type) override
+  {
+    return target_->CreateLayer(file, width, height, type);
+  }
+  Bool SetLayerLine(HyperFile& file, Long x, Long y, Long count, const UChar* buffer, Long components) override
+  {
+    return target_->SetLayerLine(file, x, y, count, buffer, components);
+  }
+  Long GetLayerType(HyperFile& file) override { return target_->GetLayerType(file); }
+  Bool GetLayerLine(HyperFile& file, Long x, Long y, Long count, UChar* buffer) override
+  {
+    return target_->GetLayerLine(file, x, y, count, buffer);
+  }
 
   // What the last head that was read told: the layer's type and, in kColorSize bytes, its colour.
   Long GetHeadType() const { return type_; }

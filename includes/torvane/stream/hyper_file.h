@@ -353,6 +353,17 @@ class HyperFile : public GeMemory
   Bool ReadHeader(ULong ident);
   void EndTranslation();
   Bool ReadElements(void* data, Long type, Long storedType, LLong stride, LLong count);
+  struct LegacyArrayForm
+  {
+    Long type;            // of the elements in memory, an ArrayType
+    Long storedType;      // in the file
+    Long elements = 1;    // of an entry
+    LLong entrySize = 0;  // of an entry in the length that the file tells; 0: that of the stored elements
+    Long narrowType = -1; // the stored type where a flag behind the length is set; -1: there is no flag
+  };
+  Bool ReadLegacyArray(UChar tag, LegacyArrayForm form, void*& block, LLong& count);
+  template <class Entry>
+  Bool ReadLegacyEntries(UChar tag, const LegacyArrayForm& form, Entry*& entries, LLong& count);
   Bool ReadLegacyElements(LLong start, Long type, Long storedType, LLong count, void*& block);
   Bool GetMemoryLength(LLong& length);
   Bool ReadChunkHead(Long& id, Long& level);

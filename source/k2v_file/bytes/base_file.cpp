@@ -12,21 +12,6 @@ namespace _torvane_
 namespace
 {
 
-constexpr LLong kSmallCopy = 16;
-
-// Most copies are of a few bytes: a loop is quicker for them than the call.
-void CopyBytes(void* destination, const void* source, LLong count)
-{
-  auto* to = static_cast<UChar*>(destination);
-  const auto* from = static_cast<const UChar*>(source);
-  if (count > kSmallCopy) {
-    std::memcpy(to, from, static_cast<std::size_t>(count));
-    return;
-  }
-  for (LLong i = 0; i < count; ++i)
-    to[i] = from[i];
-}
-
 // A description with one of these flags makes a name one of memory.
 Long MemoryFlagsFor(Long mode) { return mode == kFileRead ? kMemoryMayRead | kMemoryMayWrite : kMemoryMayWrite; }
 
@@ -146,7 +131,7 @@ void BaseFile::SetError(Long error)
 LLong BaseFile::TakeWindow(void* destination, LLong count)
 {
   const LLong taken = readLeft_ < count ? readLeft_ : count;
-  CopyBytes(destination, cursor_, taken);
+  GeCopyFewBytes(destination, cursor_, taken);
   CommitRead(taken);
   return taken;
 }
@@ -154,7 +139,7 @@ LLong BaseFile::TakeWindow(void* destination, LLong count)
 // Puts `count` bytes, for which there is room, behind the cursor.
 void BaseFile::FillWindow(const void* source, LLong count)
 {
-  CopyBytes(cursor_, source, count);
+  GeCopyFewBytes(cursor_, source, count);
   cursor_ += count;
 }
 

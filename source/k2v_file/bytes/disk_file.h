@@ -2,6 +2,7 @@
 // are any.
 #pragma once
 
+#include <cerrno>
 #include <cstdio>
 
 #include "torvane/text/ge_string.h"
@@ -14,6 +15,13 @@ namespace _torvane_
 // cause in errno, when that fails, for a directory and for a path that holds a character 0. The caller closes the
 // stream with fclose.
 std::FILE* OpenDiskFile(const String& path, Long mode);
+
+// What OpenDiskFile gives for a path that the system has no form of.
+inline std::FILE* RefusePath()
+{
+  errno = EINVAL;
+  return nullptr;
+}
 
 // Positions the stream, from its start.
 Bool SeekDiskFile(std::FILE* file, LLong position);

@@ -131,15 +131,12 @@ Bool MayBeOpened(int descriptor)
 std::FILE* OpenDiskFile(const String& path, Long mode)
 {
   const SystemPath systemPath(path);
-  if (!systemPath.Get()) {
-    errno = EINVAL;
-    return nullptr;
-  }
-  const OpenRule& rule = kOpenRules[mode];
-  const int descriptor = OpenDescriptor(systemPath.Get(), rule.flags);
+  if (!systemPath.Get())
+    return RefusePath();
+  const int descriptor = OpenDescriptor(systemPath.Get(), kOpenRules[mode].flags);
   if (descriptor < 0)
     return nullptr;
-  std::FILE* file = MayBeOpened(descriptor) ? ::fdopen(descriptor, rule.mode) : nullptr;
+  std::FILE* file = MayBeOpened(descriptor) ? ::fdopen(descriptor, kOpenRules[mode].mode) : nullptr;
   if (!file) {
     const int cause = errno;
     ::close(descriptor);

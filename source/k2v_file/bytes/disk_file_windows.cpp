@@ -133,10 +133,8 @@ PathKind LookUp(const wchar_t* path)
 std::FILE* OpenDiskFile(const String& path, Long mode)
 {
   const SystemPath systemPath(path);
-  if (!systemPath.Get()) {
-    errno = EINVAL;
-    return nullptr;
-  }
+  if (!systemPath.Get())
+    return RefusePath();
   const OpenRule& rule = kOpenRules[mode];
   const Bool exists = LookUp(systemPath.Get()) != PathKind::kNothing;
   return ::_wfsopen(systemPath.Get(), exists ? rule.mode : rule.newMode, rule.share);

@@ -13,17 +13,6 @@ namespace
 constexpr Long kTableStep = 1000;
 constexpr LLong kMinBlock = 50000;
 constexpr LLong kMaxBlock = 2000000;
-constexpr LLong kLoopLimit = 16; // writes up to this size are not worth a call
-
-void CopyBytes(UChar* destination, const UChar* source, LLong size)
-{
-  if (size > kLoopLimit) {
-    std::memcpy(destination, source, static_cast<std::size_t>(size));
-    return;
-  }
-  for (LLong i = 0; i < size; ++i)
-    destination[i] = source[i];
-}
 
 } // namespace
 
@@ -67,7 +56,7 @@ Bool MemoryBlockWriter::Write(const void* data, LLong size) noexcept
     const Block& block = table_[count_ - 1];
     LLong room = block.capacity - lastFill_;
     LLong part = size < room ? size : room;
-    CopyBytes(block.data + lastFill_, from, part);
+    GeCopyFewBytes(block.data + lastFill_, from, part);
     lastFill_ += part;
     size_ += part;
     from += part;

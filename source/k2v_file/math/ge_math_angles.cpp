@@ -227,4 +227,20 @@ Vector ClosestAngles(const Vector& reference, const Vector& angles, Long order) 
   return firstDistance > secondDistance ? second : first;
 }
 
+Matrix LookAtMatrix(const Vector& position, const Vector& target, const Vector& up) noexcept
+{
+  Matrix frame;
+  frame.off = position;
+  const Vector forward = target - position;
+  const Vector down = position - up;
+  if (Length(forward) == 0.0 || Length(down) == 0.0)
+    return frame;
+  frame.v3 = Normalize(forward);
+  frame.v1 = Normalize(Cross(frame.v3, down));
+  if (frame.v1 == Vector())
+    frame.v1 = Vector(1.0, 0.0, 0.0);
+  frame.v2 = Normalize(Cross(frame.v3, frame.v1));
+  return frame;
+}
+
 } // namespace _torvane_

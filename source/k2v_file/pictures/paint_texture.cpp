@@ -189,23 +189,6 @@ void K2VPaintLayer::WriteChunks(HyperFile& file)
     file.WriteChunkEnd();
 }
 
-Bool K2VPaintLayer::CreateLayer(HyperFile& file, Long width, Long height, Long type)
-{
-  return target_->CreateLayer(file, width, height, type);
-}
-
-Bool K2VPaintLayer::SetLayerLine(HyperFile& file, Long x, Long y, Long count, const UChar* buffer, Long components)
-{
-  return target_->SetLayerLine(file, x, y, count, buffer, components);
-}
-
-Long K2VPaintLayer::GetLayerType(HyperFile& file) { return target_->GetLayerType(file); }
-
-Bool K2VPaintLayer::GetLayerLine(HyperFile& file, Long x, Long y, Long count, UChar* buffer)
-{
-  return target_->GetLayerLine(file, x, y, count, buffer);
-}
-
 Bool K2VAlpha::ReadChunk(HyperFile& file, Long id, Long)
 {
   if (!K2VImageFilter::Of(file))

@@ -29,20 +29,13 @@ Bool HyperFile::ReadContainerLegacy(ContainerIndex& target, Bool flush)
   }
 }
 
-// The kinds of value that an entry holds as it is held anywhere else.
 Bool HyperFile::ReadLegacyEntry(ContainerIndex& target, Bool flush, Long id, UChar type)
 {
-  switch (type) {
-  case kDataLong:
-  case kDataReal:
-  case kDataTime:
-  case kDataVector:
-  case kDataMatrix:
-  case kDataString:
-  case kDataFilename: {
+  if (IsTaggedLegacyEntry(type)) {
     GeData* place = PlaceElement(target, flush, id);
     return place && place->ReadAs(*this, type);
   }
+  switch (type) {
   case kDataOldMemory: // without a value
     return PlaceElement(target, flush, id) != nullptr;
   case kDataContainer:
@@ -83,70 +76,56 @@ Bool HyperFile::ReadLegacyElements(LLong start, Long type, Long storedType, LLon
   return true;
 }
 
-Bool HyperFile::ReadLegacyPointArray(Vector*& points, LLong& count)
+// Reads one array of an old file as `count` entries in a new block; without one there is none and the count is 0.
+Bool HyperFile::ReadLegacyArray(UChar tag, LegacyArrayForm form, void*& block, LLong& count)
 {
-  points = nullptr;
+  block = nullptr;
   count = 0;
-  LLong start = file_.GetPosition();
+  const LLong start = file_.GetPosition();
   LLong length = 0;
-  void* block = nullptr;
-  if (!GetBlockHead(kTagLegacyPointArray, length))
+  Long narrow = 0;
+  if (!GetBlockHead(tag, length) || (form.narrowType >= 0 && !ReadPlainLong(narrow)))
     return false;
-  LLong found = length / 12; // whatever the precision
-  Long storedType = singlePrecision_ ? kArraySReal : kArrayLReal;
-  if (!ReadLegacyElements(start, kArrayLReal, storedType, found * 3, block))
+  if (narrow != 0)
+    form.storedType = form.narrowType;
+  const LLong entrySize = form.entrySize > 0 ? form.entrySize : form.elements * GetElementSize(form.storedType);
+  const LLong found = length / entrySize;
+  if (!ReadLegacyElements(start, form.type, form.storedType, found * form.elements, block))
     return false;
-  points = static_cast<Vector*>(block);
   count = found;
   return true;
+}
+
+// The entries as what they are in memory.
+template <class Entry>
+Bool HyperFile::ReadLegacyEntries(UChar tag, const LegacyArrayForm& form, Entry*& entries, LLong& count)
+{
+  void* block = nullptr;
+  const Bool read = ReadLegacyArray(tag, form, block, count);
+  entries = static_cast<Entry*>(block);
+  return read;
+}
+
+Bool HyperFile::ReadLegacyPointArray(Vector*& points, LLong& count)
+{
+  // The length counts 12 bytes a point, whatever the precision.
+  const Long storedType = singlePrecision_ ? kArraySReal : kArrayLReal;
+  return ReadLegacyEntries(kTagLegacyPointArray, {kArrayLReal, storedType, 3, 12}, points, count);
 }
 
 Bool HyperFile::ReadLegacyPolygonArray(LegacyPolygon*& polygons, LLong& count)
 {
-  polygons = nullptr;
-  count = 0;
-  LLong start = file_.GetPosition();
-  LLong length = 0;
-  Long narrow = 0;
-  void* block = nullptr;
-  if (!GetBlockHead(kTagLegacyPolygonArray, length) || !ReadPlainLong(narrow))
-    return false;
-  LLong found = length / (narrow != 0 ? 8 : 16);
-  if (!ReadLegacyElements(start, kArrayLong, narrow != 0 ? kArrayWord : kArrayLong, found * 4, block))
-    return false;
-  polygons = static_cast<LegacyPolygon*>(block);
-  count = found;
-  return true;
+  return ReadLegacyEntries(kTagLegacyPolygonArray, {kArrayLong, kArrayLong, 4, 0, kArrayWord}, polygons, count);
 }
 
 Bool HyperFile::ReadLegacyWordArray(UWord*& words, LLong& count)
 {
-  words = nullptr;
-  count = 0;
-  LLong start = file_.GetPosition();
-  LLong length = 0;
-  void* block = nullptr;
-  if (!GetBlockHead(kTagLegacyWordArray, length) ||
-      !ReadLegacyElements(start, kArrayWord, kArrayWord, length / 2, block))
-    return false;
-  words = static_cast<UWord*>(block);
-  count = length / 2;
-  return true;
+  return ReadLegacyEntries(kTagLegacyWordArray, {kArrayWord, kArrayWord}, words, count);
 }
 
 Bool HyperFile::ReadLegacyFloatArray(SReal*& floats, LLong& count)
 {
-  floats = nullptr;
-  count = 0;
-  LLong start = file_.GetPosition();
-  LLong length = 0;
-  void* block = nullptr;
-  if (!GetBlockHead(kTagLegacyFloatArray, length) ||
-      !ReadLegacyElements(start, kArraySReal, kArraySReal, length / 4, block))
-    return false;
-  floats = static_cast<SReal*>(block);
-  count = length / 4;
-  return true;
+  return ReadLegacyEntries(kTagLegacyFloatArray, {kArraySReal, kArraySReal}, floats, count);
 }
 
 } // namespace _torvane_

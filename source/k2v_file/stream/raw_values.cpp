@@ -141,20 +141,14 @@ class Converter
       return false;
     const UChar type = source_[position_ + kEntryIdSize];
     Copy(kEntryHeadSize);
+    if (IsTaggedLegacyEntry(type))
+      return position_ < end && source_[position_] == type && ConvertValue(end);
     switch (type) {
     case kLegacyEnd:
       CloseContainer();
       return true;
     case kDataContainer:
       return OpenContainer(end);
-    case kDataLong:
-    case kDataReal:
-    case kDataTime:
-    case kDataVector:
-    case kDataMatrix:
-    case kDataString:
-    case kDataFilename:
-      return position_ < end && source_[position_] == type && ConvertValue(end);
     default: // without a value
       return true;
     }

@@ -147,6 +147,17 @@ constexpr LLong GetValueBodySize(const ValueForm& form, const FileForm& file, co
   return form.size + length;
 }
 
+// True for an entry of an old container whose value stands behind its type as anywhere else, with its tag, which is the
+// type's number.
+constexpr Bool IsTaggedLegacyEntry(UChar type)
+{
+  for (const UChar each : {kTagLong, kTagReal, kTagTime, kTagVector, kTagMatrix, kTagString, kTagFilename}) {
+    if (each == type)
+      return true;
+  }
+  return false;
+}
+
 // The form that skipping goes by. It takes the length of a large memory block for one of 32 bits, so that such a block
 // can't be passed over.
 constexpr const ValueForm* FindSkippedForm(UChar tag)

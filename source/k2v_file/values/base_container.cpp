@@ -501,64 +501,57 @@ Bool BaseContainer::IsEqual(const BaseContainer& other) const
 
 // ---------------------------------------------------------------------------------------------------------------
 
+namespace
+{
+
+// What `get` gives of a value, or `missing` for an entry that isn't there.
+template <class Value, class Default>
+Value ValueOr(const GeData* data, Value (GeData::*get)() const, const Default& missing)
+{
+  return data ? (data->*get)() : static_cast<Value>(missing);
+}
+
+} // namespace
+
 Bool BaseContainer::GetBool(Long id, Bool defaultValue) const
 {
-  const GeData* value = FindData(id);
-  return value ? value->GetBool() : defaultValue;
+  return ValueOr(FindData(id), &GeData::GetBool, defaultValue);
 }
-
 Long BaseContainer::GetLong(Long id, Long defaultValue) const
 {
-  const GeData* value = FindData(id);
-  return value ? value->GetLong() : defaultValue;
+  return ValueOr(FindData(id), &GeData::GetLong, defaultValue);
 }
-
 LLong BaseContainer::GetLLong(Long id, LLong defaultValue) const
 {
-  const GeData* value = FindData(id);
-  return value ? value->GetLLong() : defaultValue;
+  return ValueOr(FindData(id), &GeData::GetLLong, defaultValue);
 }
-
 Real BaseContainer::GetReal(Long id, Real defaultValue) const
 {
-  const GeData* value = FindData(id);
-  return value ? value->GetReal() : defaultValue;
+  return ValueOr(FindData(id), &GeData::GetReal, defaultValue);
 }
-
 Vector BaseContainer::GetVector(Long id, const Vector& defaultValue) const
 {
-  const GeData* value = FindData(id);
-  return value ? value->GetVector() : defaultValue;
+  return ValueOr(FindData(id), &GeData::GetVector, defaultValue);
 }
-
 Matrix BaseContainer::GetMatrix(Long id, const Matrix& defaultValue) const
 {
-  const GeData* value = FindData(id);
-  return value ? value->GetMatrix() : defaultValue;
+  return ValueOr(FindData(id), &GeData::GetMatrix, defaultValue);
 }
-
 BaseTime BaseContainer::GetTime(Long id, const BaseTime& defaultValue) const
 {
-  const GeData* value = FindData(id);
-  return value ? value->GetTime() : defaultValue;
+  return ValueOr(FindData(id), &GeData::GetTime, defaultValue);
 }
-
 String BaseContainer::GetString(Long id, const String& defaultValue) const
 {
-  const GeData* value = FindData(id);
-  return value ? value->GetString() : defaultValue;
+  return ValueOr(FindData(id), &GeData::GetString, defaultValue);
 }
-
 Filename BaseContainer::GetFilename(Long id, const Filename& defaultValue) const
 {
-  const GeData* value = FindData(id);
-  return value ? value->GetFilename() : defaultValue;
+  return ValueOr(FindData(id), &GeData::GetFilename, defaultValue);
 }
-
 void* BaseContainer::GetPointer(Long id, void* defaultValue) const
 {
-  const GeData* value = FindData(id);
-  return value ? value->GetPointer() : defaultValue;
+  return ValueOr(FindData(id), &GeData::GetPointer, defaultValue);
 }
 
 BaseContainer* BaseContainer::GetContainerInstance(Long id) { return GetData(id).GetContainer(); }

@@ -20,39 +20,66 @@ BaseContainer* EnterContainer(BaseContainer& container, Long id)
 
 constexpr Long kStepOver = 1; // a level of this data type is passed over when reading
 
+// Whether the walk along a path goes on behind a level.
+enum class Step
+{
+  kOn,
+  kDone,   // the answer is true
+  kFailed, // the answer is false
+};
+
+// Takes the levels above the last one, each with the id below it, until a step ends the walk.
+template <class Take>
+Step WalkToLastLevel(const ParameterPath& path, const Take& take)
+{
+  const Long last = path.GetLevelCount() - 1;
+  Step step = last < 0 ? Step::kFailed : Step::kOn;
+  for (Long i = 0; i < last && step == Step::kOn; ++i)
+    step = take(path[i], path[i + 1].id);
+  return step;
+}
+
+// One component of a Vector of a container, if there is such a component.
+void GetComponent(const BaseContainer& container, Long id, Long component, GeData& value)
+{
+  Vector vector = container.GetVector(id);
+  if (const Real* place = ComponentOf(vector, component))
+    value = GeData(*place);
+}
+
+void SetComponent(BaseContainer& container, Long id, Long component, Real value)
+{
+  Vector vector = container.GetVector(id);
+  if (Real* place = ComponentOf(vector, component)) {
+    *place = value;
+    container.SetVector(id, vector);
+  }
+}
+
 } // namespace
 
 Bool BaseList2D::GetParameter(const ParameterPath& path, GeData& value)
 {
   const BaseContainer* container = &data_;
-  Long last = path.GetLevelCount() - 1;
-  if (last < 0)
-    return false;
-  for (Long i = 0; i < last; ++i) {
-    const ParameterLevel& level = path[i];
+  const Step step = WalkToLastLevel(path, [&](const ParameterLevel& level, Long below) {
     switch (level.dtype) {
     case kStepOver:
-      continue;
+      return Step::kOn;
     case kDataGroup:
       container = container->GetContainerInstance(level.id);
-      if (!container) {
+      if (!container)
         value.Free();
-        return true;
-      }
-      continue;
-    case kDataVector: {
-      // Always the top container's Vector, whatever containers were entered before.
-      Vector vector = data_.GetVector(level.id);
-      const Real* component = ComponentOf(vector, path[i + 1].id);
-      if (component)
-        value = GeData(*component);
-      return true;
-    }
+      return container ? Step::kOn : Step::kDone;
+    case kDataVector: // always the top container's, whatever containers were entered before
+      GetComponent(data_, level.id, below, value);
+      return Step::kDone;
     default:
-      return true;
+      return Step::kDone;
     }
-  }
-  const GeData* found = container->FindData(path[last].id);
+  });
+  if (step != Step::kOn)
+    return step == Step::kDone;
+  const GeData* found = container->FindData(path[-1].id);
   if (!found)
     return false;
   value = *found;
@@ -62,32 +89,23 @@ Bool BaseList2D::GetParameter(const ParameterPath& path, GeData& value)
 Bool BaseList2D::SetParameter(const ParameterPath& path, const GeData& value)
 {
   BaseContainer* container = &data_;
-  Long last = path.GetLevelCount() - 1;
-  if (last < 0)
-    return false;
-  for (Long i = 0; i < last; ++i) {
-    const ParameterLevel& level = path[i];
+  const Step step = WalkToLastLevel(path, [&](const ParameterLevel& level, Long below) {
     switch (level.dtype) {
     case kDataGroup:
       container->MarkDirty();
       container = EnterContainer(*container, level.id);
-      if (!container)
-        return false;
-      continue;
-    case kDataVector: {
-      Vector vector = data_.GetVector(level.id);
-      if (Real* component = ComponentOf(vector, path[i + 1].id)) {
-        *component = value.GetReal();
-        data_.SetVector(level.id, vector);
-      }
+      return container ? Step::kOn : Step::kFailed;
+    case kDataVector:
       // The walk goes on to the component's level, which leaves an entry of its own.
-      continue;
-    }
+      SetComponent(data_, level.id, below, value.GetReal());
+      return Step::kOn;
     default:
-      return true;
+      return Step::kDone;
     }
-  }
-  return container->SetData(path[last].id, value) != nullptr;
+  });
+  if (step != Step::kOn)
+    return step == Step::kDone;
+  return container->SetData(path[-1].id, value) != nullptr;
 }
 
 } // namespace _torvane_

@@ -7,6 +7,7 @@
 #include <new>
 
 #include "export_account.h"
+#include "exporter/entry/message_table.h"
 #include "exporter/entry/scene_writer.h"
 #include "exporter/host_api/aegp_entry.h"
 #include "gltf_file.h"
@@ -32,9 +33,6 @@ which were left out, and why.
 
 Example: q7r export shot.aep shot.q7r --composition "Main")";
 
-constexpr const char* kMenuEntry = "KORVEX Exporter...";
-constexpr const char* kSuffix = "q7r";
-
 struct Options
 {
   ProjectOptions project;
@@ -54,10 +52,10 @@ std::string WithSuffix(const std::string& path)
   if (!HasFileName(path) || IsDevice(path))
     return path;
   if (dot == std::string::npos || path[dot] != '.' || path.size() - dot > kLongest)
-    return path + "." + kSuffix;
+    return path + "." + exporter::kSceneSuffix;
   std::string suffix = path.substr(dot + 1);
   std::transform(suffix.begin(), suffix.end(), suffix.begin(), [](unsigned char c) { return std::tolower(c); });
-  return suffix == kSuffix ? path : path.substr(0, dot + 1) + kSuffix;
+  return suffix == exporter::kSceneSuffix ? path : path.substr(0, dot + 1) + exporter::kSceneSuffix;
 }
 
 // Plays one export into the file `partial`. True if the exporter showed no message.
@@ -75,7 +73,7 @@ bool PlayExport(host::StandaloneHost& player, const std::string& output, const s
   player.OnProgress([&](double share) { bar.Show(share); });
   if (A_Err error = player.Start(EntryPointFunc))
     throw Failure(output + ": the exporter didn't start (error " + std::to_string(error) + ")");
-  AEGP_Command command = player.FindCommand(kMenuEntry);
+  AEGP_Command command = player.FindCommand(exporter::GetMessage(exporter::Message::kMenuEntry));
   player.CallMenuHook();
   if (!command || !player.IsCommandEnabled(command))
     throw Failure(output + ": the exporter offers no export for this composition");
