@@ -8,6 +8,7 @@ namespace
 using namespace exporter;
 using _torvane_::kHalfPi;
 using _torvane_::kPi;
+using _torvane_::LookAtMatrix;
 
 void ExpectNear(const Vector& actual, const Vector& expected, const char* what)
 {
