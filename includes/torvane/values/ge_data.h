@@ -152,6 +152,8 @@ class GeData
         1U << kDataNil | 1U << kDataPointer | 1U << kDataLong | 1U << kDataReal | 1U << kDataLLong;
     return type_ < 0 || type_ > kDataLLong || ((kInline >> type_) & 1U) == 0;
   }
+  struct Kind; // a row of the table of kinds
+
   template <class T, class... Args>
   Bool Own(Long type, T* Payload::*member, Args&&... args);
   template <class T>
@@ -160,16 +162,11 @@ class GeData
   Bool Keep(Bool done);
   void Take(GeData& other);
   Bool Assign(const GeData& source, ULong flags, TransArray* translation);
-  Bool AssignInPlace(const GeData& source);
   Bool Build(const GeData& source, ULong flags, TransArray* translation);
-  Bool BuildBlock(const void* block);
-  Bool BuildUnknown(const UnknownRecord& source);
-  Bool MakeCustom(Long type);
+  Bool Make(const Kind& kind, Long type);
   Bool ReadAs(HyperFile& file, Long type); // the value alone, of a type that files hold
-  Bool ReadPayload(HyperFile& file);
   Bool ReadCustom(HyperFile& file, Long type);
   Bool ReadUnknown(HyperFile& file, Long type, Long level);
-  Bool WritePayload(HyperFile& file) const;
   Bool WriteUnknown(HyperFile& file) const;
   void ReportWrongType() const;
 

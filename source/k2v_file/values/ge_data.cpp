@@ -2,6 +2,7 @@
 
 #include <limits>
 
+#include "k2v_file/values/value_kinds.h"
 #include "torvane/links/alias.h"
 #include "torvane/memory/assertion.h"
 #include "torvane/values/base_container.h"
@@ -13,7 +14,6 @@ namespace
 {
 
 constexpr const char* kModule = "k2v_file";
-constexpr LLong kRawBlockSize = 16;
 
 constexpr Vector kNoVector;
 constexpr Matrix kNoMatrix;
@@ -99,7 +99,7 @@ GeData::GeData(const GeAliasLink& value)
 
 GeData::GeData(Long type, const CustomData& source)
 {
-  Keep(source.GetTypeId() == type && MakeCustom(type) && source.CopyTo(*payload_.custom, nullptr));
+  Keep(source.GetTypeId() == type && Make(Kind::Of(type), type) && source.CopyTo(*payload_.custom, nullptr));
 }
 
 GeData& GeData::operator=(GeData&& other) noexcept
@@ -122,90 +122,22 @@ void GeData::Take(GeData& other)
 
 void GeData::FreePayload()
 {
-  switch (type_) {
-  case kDataTime:
-    return DeleteObj(payload_.time);
-  case kDataVector:
-    return DeleteObj(payload_.vector);
-  case kDataMatrix:
-    return DeleteObj(payload_.matrix);
-  case kDataString:
-    return DeleteObj(payload_.string);
-  case kDataFilename:
-    return DeleteObj(payload_.filename);
-  case kDataContainer:
-    return DeleteObj(payload_.container);
-  case kDataLink:
-    return DeleteObj(payload_.link);
-  case kDataRawBlock:
-    return GeFree(payload_.block);
-  case kDataUnknown:
-    return DeleteObj(payload_.unknown);
-  default:
-    if (type_ >= kDataFirstCustom)
-      DeleteObj(payload_.custom);
-  }
+  if (const auto free = Kind::Of(type_).free)
+    free(payload_);
 }
 
 Bool GeData::SetType(Long type)
 {
   Free();
   type = GetCurrentType(type);
-  switch (type) {
-  case kDataTime:
-    return Own(type, &Payload::time);
-  case kDataVector:
-    return Own(type, &Payload::vector);
-  case kDataMatrix:
-    return Own(type, &Payload::matrix);
-  case kDataString:
-    return Own(type, &Payload::string);
-  case kDataFilename:
-    return Own(type, &Payload::filename);
-  case kDataContainer:
-    return Own(type, &Payload::container);
-  case kDataLink:
-    return Own(type, &Payload::link);
-  case kDataRawBlock:
-    return BuildBlock(nullptr);
-  case kDataUnknown:
-    return Own(type, &Payload::unknown);
-  default:
-    if (type >= kDataFirstCustom)
-      return MakeCustom(type);
-  }
-  type_ = type;
-  if (OwnsPayload())
-    ReportAssertion(kModule, __LINE__, "a value got a type that doesn't exist");
-  if (type == kDataReal)
-    payload_.real = 0.0;
-  else if (type == kDataPointer)
-    payload_.pointer = nullptr;
-  else if (type == kDataLong)
-    payload_.integer = 0;
-  else
-    payload_.wide = 0;
-  return true;
+  return Make(Kind::Of(type), type);
 }
 
-Bool GeData::BuildBlock(const void* block)
+// Gives this nil value an empty payload; it stays nil when that fails.
+Bool GeData::Make(const Kind& kind, Long type)
 {
-  void* copy = GeAlloc(kRawBlockSize);
-  if (!copy)
+  if (!kind.make(payload_, type))
     return false;
-  GeCopyMem(copy, block, kRawBlockSize);
-  payload_.block = copy;
-  type_ = kDataRawBlock;
-  return true;
-}
-
-Bool GeData::MakeCustom(Long type)
-{
-  const CustomDataType* row = FindCustomDataType(type);
-  CustomData* custom = row ? row->make(*row) : nullptr;
-  if (!custom)
-    return false;
-  payload_.custom = custom;
   type_ = type;
   return true;
 }
@@ -233,7 +165,8 @@ Bool GeData::Assign(const GeData& source, ULong flags, TransArray* translation)
     payload_ = payload;
     return true;
   }
-  if (type_ == source.type_ && AssignInPlace(source))
+  const Kind& kind = Kind::Of(type_);
+  if (type_ == source.type_ && kind.isCopiedInPlace && kind.copy(payload_, source.payload_, flags, translation))
     return true;
   GeData fresh;
   Bool done = fresh.Build(source, flags, translation);
@@ -241,74 +174,13 @@ Bool GeData::Assign(const GeData& source, ULong flags, TransArray* translation)
   return done;
 }
 
-// True if the value was stored in the object that is there.
-Bool GeData::AssignInPlace(const GeData& source)
-{
-  switch (type_) {
-  case kDataTime:
-    *payload_.time = *source.payload_.time;
-    return true;
-  case kDataVector:
-    *payload_.vector = *source.payload_.vector;
-    return true;
-  case kDataMatrix:
-    *payload_.matrix = *source.payload_.matrix;
-    return true;
-  case kDataString:
-    *payload_.string = *source.payload_.string;
-    return payload_.string->GetLength() == source.payload_.string->GetLength();
-  case kDataFilename:
-    *payload_.filename = *source.payload_.filename;
-    return payload_.filename->GetString().GetLength() == source.payload_.filename->GetString().GetLength();
-  default:
-    return false;
-  }
-}
-
 // Makes this nil value a copy of a source with a payload. False when memory is short: the value stays nil.
 Bool GeData::Build(const GeData& source, ULong flags, TransArray* translation)
 {
-  const Payload& from = source.payload_;
-  switch (source.type_) {
-  case kDataTime:
-    return Own(kDataTime, &Payload::time, *from.time);
-  case kDataVector:
-    return Own(kDataVector, &Payload::vector, *from.vector);
-  case kDataMatrix:
-    return Own(kDataMatrix, &Payload::matrix, *from.matrix);
-  case kDataString:
-    return Keep(Own(kDataString, &Payload::string) && AssignInPlace(source));
-  case kDataFilename:
-    return Keep(Own(kDataFilename, &Payload::filename) && AssignInPlace(source));
-  case kDataContainer:
-    return Keep(Own(kDataContainer, &Payload::container) &&
-                from.container->CopyTo(*payload_.container, flags, translation));
-  case kDataLink:
-    return Keep(Own(kDataLink, &Payload::link) && from.link->CopyLinkTo(payload_.link, translation));
-  case kDataRawBlock:
-    return BuildBlock(from.block);
-  case kDataUnknown:
-    return BuildUnknown(*from.unknown);
-  default:
-    if (source.type_ >= kDataFirstCustom)
-      return Keep(MakeCustom(source.type_) && from.custom->CopyTo(*payload_.custom, translation));
-  }
-  type_ = source.type_; // a type that doesn't exist: there is nothing else to copy
-  return true;
-}
-
-Bool GeData::BuildUnknown(const UnknownRecord& source)
-{
-  if (!Own(kDataUnknown, &Payload::unknown))
-    return false;
-  UnknownRecord& copy = *payload_.unknown;
-  copy.type = source.type;
-  copy.level = source.level;
-  copy.data = source.size > 0 ? GeAllocNC(source.size) : nullptr;
-  if (source.size > 0 && !copy.data)
-    return Keep(false);
-  GeCopyMem(copy.data, source.data, source.size);
-  copy.size = source.size;
+  const Kind& kind = Kind::Of(source.type_);
+  if (kind.free) // else a type that doesn't exist: there is nothing else to copy
+    return Make(kind, source.type_) && Keep(kind.copy(payload_, source.payload_, flags, translation));
+  type_ = source.type_;
   return true;
 }
 
@@ -320,34 +192,7 @@ Bool GeData::IsEqual(const GeData& other) const
     return static_cast<Real>(a.integer) == b.real;
   if (type_ == kDataReal && other.type_ == kDataLong)
     return a.real == static_cast<Real>(b.integer);
-  if (type_ != other.type_)
-    return false;
-  switch (type_) {
-  case kDataNil:
-    return true;
-  case kDataPointer:
-    return a.pointer == b.pointer;
-  case kDataLong:
-    return a.integer == b.integer;
-  case kDataReal:
-    return a.real == b.real;
-  case kDataLLong:
-    return a.wide == b.wide;
-  case kDataTime:
-    return *a.time == *b.time;
-  case kDataVector:
-    return *a.vector == *b.vector;
-  case kDataMatrix:
-    return *a.matrix == *b.matrix;
-  case kDataFilename:
-    return a.filename->IsEqual(*b.filename);
-  case kDataContainer:
-    return a.container->IsEqual(*b.container);
-  case kDataLink:
-    return a.link->IsEqual(*b.link);
-  default: // Strings are among these
-    return type_ >= kDataFirstCustom && a.custom->IsEqual(*b.custom);
-  }
+  return type_ == other.type_ && Kind::Of(type_).isEqual(a, b);
 }
 
 // ---------------------------------------------------------------------------------------------------------------

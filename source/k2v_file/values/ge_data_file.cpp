@@ -1,9 +1,8 @@
 // The file form of a GeData: the type as a Long, then the value.
 #include "k2v_file/stream/raw_values.h"
-#include "torvane/links/alias.h"
+#include "k2v_file/values/value_kinds.h"
 #include "torvane/stream/hyper_file.h"
 #include "torvane/values/base_container.h"
-#include "torvane/values/ge_data.h"
 
 namespace _torvane_
 {
@@ -29,28 +28,6 @@ Bool IsKept(const HyperFile& file, Long type)
   return false;
 }
 
-// The types below 1000000 that a file may hold with a value of their own.
-Bool IsStoredType(Long type)
-{
-  switch (type) {
-  case kDataNil:
-  case kDataPointer:
-  case kDataLong:
-  case kDataReal:
-  case kDataTime:
-  case kDataVector:
-  case kDataMatrix:
-  case kDataLLong:
-  case kDataString:
-  case kDataFilename:
-  case kDataContainer:
-  case kDataLink:
-    return true;
-  default:
-    return false;
-  }
-}
-
 } // namespace
 
 Bool GeData::Read(HyperFile& file)
@@ -70,7 +47,7 @@ Bool GeData::Read(HyperFile& file)
     UChar tag = 0;
     return file.ReadValueHeader(tag) && file.SkipValue(tag);
   }
-  return IsStoredType(type) && ReadAs(file, type);
+  return Kind::Of(type).storedAs != StoredAs::kNever && ReadAs(file, type);
 }
 
 Bool GeData::ReadAs(HyperFile& file, Long type)
@@ -79,35 +56,7 @@ Bool GeData::ReadAs(HyperFile& file, Long type)
     file.SetError(FILEERROR_MEMORY);
     return false;
   }
-  return Keep(ReadPayload(file));
-}
-
-Bool GeData::ReadPayload(HyperFile& file)
-{
-  switch (type_) {
-  case kDataLong:
-    return file.ReadLong(payload_.integer);
-  case kDataReal:
-    return file.ReadReal(payload_.real);
-  case kDataTime:
-    return file.ReadTime(*payload_.time);
-  case kDataVector:
-    return file.ReadVector(*payload_.vector);
-  case kDataMatrix:
-    return file.ReadMatrix(*payload_.matrix);
-  case kDataLLong:
-    return file.ReadLLong(payload_.wide);
-  case kDataString:
-    return file.ReadString(*payload_.string);
-  case kDataFilename:
-    return file.ReadFilename(*payload_.filename);
-  case kDataContainer:
-    return file.ReadContainer(*payload_.container, true);
-  case kDataLink:
-    return payload_.link->ReadLink(file);
-  default: // nil and pointer
-    return true;
-  }
+  return Keep(Kind::Of(type_).read(file, payload_));
 }
 
 Bool GeData::ReadCustom(HyperFile& file, Long type)
@@ -118,7 +67,7 @@ Bool GeData::ReadCustom(HyperFile& file, Long type)
     return false;
   if (!FindCustomDataType(type))
     return ReadUnknown(file, type, level);
-  if (!MakeCustom(type)) {
+  if (!Make(Kind::Of(type), type)) {
     file.SetError(FILEERROR_MEMORY);
     return false;
   }
@@ -141,50 +90,13 @@ Bool GeData::ReadUnknown(HyperFile& file, Long type, Long level)
   return file.ReadRawChunk(record.data, record.size, false) && ModernizeValues(record.data, record.size, file);
 }
 
-Bool GeData::IsStored() const
-{
-  return type_ >= kDataFirstCustom || type_ == kDataUnknown || (type_ != kDataPointer && IsStoredType(type_));
-}
+Bool GeData::IsStored() const { return type_ == kDataUnknown || Kind::Of(type_).storedAs == StoredAs::kValue; }
 
 Bool GeData::Write(HyperFile& file) const
 {
   if (type_ == kDataUnknown)
     return WriteUnknown(file);
-  return file.WriteLong(type_) && WritePayload(file);
-}
-
-Bool GeData::WritePayload(HyperFile& file) const
-{
-  switch (type_) {
-  case kDataLong:
-    return file.WriteLong(payload_.integer);
-  case kDataReal:
-    return file.WriteReal(payload_.real);
-  case kDataTime:
-    return file.WriteTime(*payload_.time);
-  case kDataVector:
-    return file.WriteVector(*payload_.vector);
-  case kDataMatrix:
-    return file.WriteMatrix(*payload_.matrix);
-  case kDataLLong:
-    return file.WriteLLong(payload_.wide);
-  case kDataString:
-    return file.WriteString(*payload_.string);
-  case kDataFilename:
-    return file.WriteFilename(*payload_.filename);
-  case kDataContainer:
-    return file.WriteContainer(*payload_.container);
-  case kDataLink:
-    return payload_.link->WriteLink(file);
-  default:
-    break;
-  }
-  if (type_ < kDataFirstCustom)
-    return true;
-  if (!file.WriteChunkStart(0, payload_.custom->GetChunkLevel()))
-    return false;
-  payload_.custom->Write(file);
-  return file.WriteChunkEnd();
+  return file.WriteLong(type_) && Kind::Of(type_).write(file, payload_);
 }
 
 // The bytes hold the end tag that the file had; a dropped record has none.
