@@ -163,6 +163,9 @@ class SegmentTag : public RowTag<SplineSegment>
 
   // False when the tag has no entries and gets none; -1 leaves the entries of a filled tag as they are.
   Bool ResizeTagArray(Long count) override;
+
+ protected:
+  Bool ReadEntries(HyperFile& file, Long level) override;
 };
 
 // The two tangents of a spline point, relative to the point.

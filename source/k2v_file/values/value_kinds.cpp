@@ -202,7 +202,7 @@ constexpr GeData::Kind GeData::Kind::kRows[] = {
     Owned<GeAliasLink, &Payload::link>::Row(kDataLink, false),
     {kDataRawBlock, StoredAs::kNever, false, Block::Make, Block::Free, Block::Copy, Nothing::AreNotEqual, Nothing::Read,
      Nothing::Write},
-    Owned<UnknownRecord, &Payload::unknown>::Row(kDataUnknown, false),
+    Owned<UnknownRecord, &Payload::unknown>::Row(kDataUnknown, false, StoredAs::kNever),
     {kDataFirstCustom, StoredAs::kValue, false, Custom::Make, Custom::Free, Custom::Copy, Custom::IsEqual,
      Nothing::Read, Custom::Write},
 };

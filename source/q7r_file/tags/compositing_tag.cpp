@@ -76,7 +76,12 @@ CompositingTag::CompositingTag() : BaseTag(kTagCompositing)
   StartClock();
 }
 
-void CompositingTag::PrepareToRead() { data_.SetDefaults(DefaultsOf<kCompositingDefaults>()); }
+// Back to the defaults that all new tags share: what is read comes over them.
+void CompositingTag::PrepareToRead()
+{
+  data_.Flush();
+  data_.SetDefaults(DefaultsOf<kCompositingDefaults>());
+}
 
 void CompositingTag::StartClock() { data_.SetLong(kCompositingClock, ReadMilliseconds()); }
 

@@ -280,7 +280,6 @@ Bool VisitRows(Visitor& v, Entry* entries, Long count)
 template <class Entry>
 Bool RowTag<Entry>::ReadEntries(HyperFile& file, Long level)
 {
-  this->FreeEntries();
   Long count = 0;
   void* block = nullptr;
   if (!file.ReadLong(count) || !this->MakeEntries(file, count, LeastSize(this->GetArray()), block))
@@ -302,6 +301,13 @@ template class RowTag<SplineSegment>;
 template class RowTag<TangentPair>;
 
 SegmentTag::SegmentTag() : RowTag(kTagSegment) {}
+
+// What can't be read leaves a tag without segments.
+Bool SegmentTag::ReadEntries(HyperFile& file, Long level)
+{
+  FreeEntries();
+  return RowTag::ReadEntries(file, level);
+}
 
 Bool SegmentTag::ResizeTagArray(Long count)
 {
