@@ -1,5 +1,4 @@
-// The chunks of scene objects, in every form that files hold them in, their parameters and their copies.
-#include <functional>
+// The chunks of scene objects, their parameters and their copies.
 #include <string>
 
 #include <gtest/gtest.h>
@@ -8,6 +7,7 @@
 #include "q7r_file/objects/opaque_object_data.h"
 #include "support/assertion_counter.h"
 #include "support/counting_memory.h"
+#include "support/record_samples.h"
 #include "torvane/document/base_document.h"
 #include "torvane/objects/base_object.h"
 #include "torvane/tags/base_tag.h"
@@ -20,37 +20,10 @@ using namespace _torvane_;
 
 constexpr Long kUnknownType = 1234567;
 
-// The chunks of a new null that is named "A", as of docs/format.md. `container` stands between the container's id and
-// its end.
-std::string NullHex(const std::string& container)
-{
-  const std::string zero = " 0000000000000000 ";
-  const std::string one = " 3FF0000000000000 ";
-  const std::string zeros = zero + zero + zero;
-  const std::string ones = one + one + one;
-  return "01 0001ADE2 00000007  0F 00000000  0F 00000000  01 00000084 00000001 0F FFFFFFFF" + container + "02" +
-         "0C 00  82 00000002 0041  0F 00000000  0F 00000001 0F 00000000"
-         "80 0000000E 616C69617332 0000000000000000"
-         "0C 01 80 00000010 000102030405060708090A0B0C0D0E0F  15 00  02"
-         "01 0001ADF5 00000002  0F 00000004  0F 00000000 0F 00000000 0F 00000000 0F 00000000  0C 00  02"
-         "01 0001ADF0 00000000  0F 00001414  0F 00000000  82 00000002 0041  02"
-         "01 0001ADE4 00000009  17" +
-         zeros + "17" + ones + "17" + zeros + "0F 00000002  0F 00000002  0F 00000000  15 00  17" + ones +
-         "0F 00000000  17" + zeros + "0F 00000000  19" + zeros + one + zero + zero + zero + one + zero + zero + zero +
-         one + "15 00  15 00  10 00000000  0F 00000006  02";
-}
-
-Bytes Chunk(Long id, Long level, const std::function<void(ByteWriter&)>& body)
-{
-  ByteWriter writer;
-  writer.Start(id, level);
-  body(writer);
-  return writer.End().bytes;
-}
-
 Bytes NodeDataChunk(Long type, Long level, const Bytes& body)
 {
-  return Chunk(110064, level, [&](ByteWriter& w) { w.Long(type).Long(0).String(u"from data").Append(body); });
+  ByteWriter writer;
+  return writer.Start(110064, level).Long(type).Long(0).String(u"from data").Append(body).End().bytes;
 }
 
 // A body of values and nested chunks that nobody knows.
@@ -101,6 +74,15 @@ class EntriesTag : public BaseTag
   std::string entries_;
 };
 
+// The chunks of a new null; `entries` is the inside of its container.
+Bytes NullBytes(const std::string& entries)
+{
+  return Record("[110050,7 L0 L0 [132,1 L-1 " + entries +
+                "] C0 SA L0 L1 L0 k C1 M000102030405060708090A0B0C0D0E0F B0 ]"
+                " [110069,2 L4 L0 L0 L0 L0 C0 ] [110064,0 L5140 L0 SA ] [110052,9 V0,0,0 V1,1,1 V0,0,0 L2 L2 L0 B0 "
+                "V1,1,1 L0 V0,0,0 L0 Y0,0,0,1,0,0,0,1,0,0,0,1 B0 B0 U0 L6 ]");
+}
+
 BaseObject* MakeNamed(const char* name, BaseObject* parent = nullptr)
 {
   BaseObject* object = AllocObject(kObjectNull);
@@ -115,8 +97,8 @@ TEST(BaseObject, WritesItsChunksByteForByteAndTheCheckSumOneWriteLater)
 {
   BaseObject* object = MakeNamed("A");
   SetCountingMarker(*object);
-  EXPECT_EQ(ToHex(BytesOf(*object)), ToHex(FromHex(NullHex(""))));
-  EXPECT_EQ(ToHex(BytesOf(*object)), ToHex(FromHex(NullHex("0F 000F9380 0F 0000000F 0F 00000000"))));
+  EXPECT_EQ(ToHex(BytesOf(*object)), ToHex(NullBytes("")));
+  EXPECT_EQ(ToHex(BytesOf(*object)), ToHex(NullBytes("L1020800 L15 L0 ")));
   DeleteObj(object);
 }
 
@@ -132,93 +114,50 @@ TEST(BaseObject, SumsThePointsAndPolygonsOfPolygonObjectsAlone)
   }
 }
 
-TEST(BaseObject, ReadsEveryFormOfTheTransformChunk)
+// The matrices and the values of the oldest files, which a new file doesn't hold.
+TEST(BaseObject, DerivesItsMatricesFromATransformThatIsRead)
 {
-  counting_memory::BalanceCheck balance;
-  for (Long version : {6000, 7499, 7500, 11599, 11600, 13000}) {
-    for (Long level = 0; level <= 10; ++level) {
-      SCOPED_TRACE(testing::Message() << "version " << version << ", level " << level);
-      const bool oldest = version < 7500;
-      const bool old = version < 11600;
-      auto from = [&](Long least) { return !oldest && (!old || level >= least); };
-      const bool frozen = from(6);
-      const bool ordered = !old && level >= 8;
-      Bytes chunk = Chunk(110052, level, [&](ByteWriter& w) {
-        if (oldest)
-          w.Start(132, 1).Long(-1).Long(77).Long(15).Long(5).End();
-        w.Vector(1, 2, 3).Vector(2, 3, 4).Vector(0.1, 0.2, 0.3);
-        if (old) // the second matrix mirrors x, and z by the number beside its diagonal
-          w.IdentityMatrix().Matrix({0, 0, 0, -1, 0, 0, 0, 1, -1, 0, 0, 1});
-        if (oldest)
-          w.String(u"old name");
-        if (!oldest || level >= 1)
-          w.Long(0).Long(1).Long(1);
-        if (from(1)) {
-          w.Bool(true);
-          if (old)
-            w.Bool(true);
-          w.Vector(0.1, 0.5, 0.9);
-        }
-        if (from(2))
-          w.Long(11);
-        if (from(3))
-          w.Vector(7, 8, 9).Long(12);
-        if (from(4))
-          w.Matrix({1, 2, 3, 4, 5, 6, 7, 8, 9, 10, 11, 12});
-        if (from(5)) {
-          w.Bool(true).Start(110107, 0).Start(110100, 0).Start(5154, 0).Append(NodeDataChunk(5140, 0, {}));
-          w.End().End().End().Bool(false);
-        }
-        if (frozen) {
-          w.ULong(2).Vector(10, 20, 30).Vector(1, 1, 1).Vector(0.4, 0, 0).Vector(11, 22, 33).Vector(3, 2, 1);
-          w.Vector(0.5, 0.6, 0.7);
-        }
-        if (ordered)
-          w.Long(3);
-        w.String(u"from a later level");
-      });
-      BaseObject object(kObjectNull);
-      ASSERT_TRUE(ReadInto(object, chunk, version));
-      EXPECT_EQ(object.GetRelPos(), Vector(1, 2, 3));
-      EXPECT_EQ(object.GetRelScale(), old ? Vector(-2, 3, -4) : Vector(2, 3, 4));
-      EXPECT_EQ(object.GetRelRot(), Vector(0.1, 0.2, 0.3));
-      EXPECT_EQ(object.GetName(), String(oldest ? "old name" : ""));
-      EXPECT_EQ(object.GetDataInstance().GetLong(77), oldest ? 5 : 0);
-      const bool modes = !oldest || level >= 1;
-      EXPECT_EQ(object.GetEditorMode(), modes ? 0 : 2);
-      EXPECT_EQ(object.GetRenderMode(), modes ? 1 : 2);
-      EXPECT_EQ(object.GetDisabled(), modes ? 1 : 0);
-      GeData value;
-      object.GetParameterById(kObjectDisplayFlag, value);
-      EXPECT_EQ(value.GetLong(), from(1) ? 1 : 0);
-      object.GetParameterById(kObjectDisplayColor, value);
-      EXPECT_EQ(value.GetVector(), from(1) ? Vector(0.1, 0.5, 0.9) : Vector(1, 1, 1));
-      object.GetParameterById(kObjectColorMode, value);
-      EXPECT_EQ(value.GetLong(), from(2) ? 11 : 0);
-      object.GetParameterById(kObjectStoredVector, value);
-      EXPECT_EQ(value.GetVector(), from(3) ? Vector(7, 8, 9) : Vector());
-      object.GetParameterById(kObjectStoredMode, value);
-      EXPECT_EQ(value.GetLong(), from(3) ? 12 : 0);
-      EXPECT_EQ(object.GetStoredMatrix().off, from(4) ? Vector(1, 2, 3) : Vector());
-      EXPECT_EQ(object.GetFrozenFlags(), frozen ? kFrozenPos : 0u);
-      EXPECT_EQ(object.GetFrozenRot(), frozen ? Vector(0.4, 0, 0) : Vector());
-      EXPECT_EQ(object.GetAbsPos(), frozen ? Vector(11, 22, 33) : object.GetRelPos());
-      EXPECT_EQ(object.GetAbsScale(), frozen ? Vector(3, 2, 1) : object.GetRelScale());
-      EXPECT_EQ(object.GetAbsRot(), frozen ? Vector(0.5, 0.6, 0.7) : object.GetRelRot());
-      EXPECT_EQ(object.GetRotationOrder(), ordered && level >= 9 ? 3 : 6);
-      Matrix rotation = AnglesToMatrix({0.1, 0.2, 0.3}, object.GetRotationOrder());
-      rotation.off = Vector(1, 2, 3);
-      EXPECT_EQ(object.GetRelativeNormalizedMatrix(), rotation);
-      EXPECT_EQ(object.GetFrozenTransformMatrix().v1,
-                frozen ? AnglesToMatrix({0.4, 0, 0}, object.GetRotationOrder()).v1 : Vector(1, 0, 0));
-    }
+  struct Row
+  {
+    const char* sample;
+    Long order;
+    bool frozen;
+  };
+  for (const Row& row : {Row{"transform 0 before 7500", 6, false},
+                         {"transform 1 before 7500", 6, false},
+                         {"transform 6 before 11600", 6, true},
+                         {"transform 8", 6, false},
+                         {"transform", 8, false},
+                         {"frozen transform", 4, true}}) {
+    SCOPED_TRACE(row.sample);
+    const RecordSample& sample = FindRecordSample(row.sample);
+    BaseObject object(kObjectNull);
+    ByteWriter chunk;
+    chunk.Start(110052, sample.level).Append(Record(sample.body, sample.version)).End();
+    ASSERT_TRUE(ReadInto(object, chunk.bytes, sample.version));
+    const bool oldest = sample.version < 7500;
+    const bool modes = !oldest || sample.level >= 1;
+    EXPECT_EQ(object.GetName(), String(oldest ? "name" : ""));
+    EXPECT_EQ(object.GetDataInstance().GetLong(3), oldest ? 3 : 0);
+    EXPECT_EQ(object.GetEditorMode(), modes ? 1 : 2);
+    EXPECT_EQ(object.GetRenderMode(), modes ? 0 : 2);
+    EXPECT_EQ(object.GetDisabled(), modes ? 1 : 0);
+    EXPECT_EQ(object.GetRotationOrder(), row.order);
+    EXPECT_EQ(object.GetStoredMatrix().off, oldest ? Vector() : Vector(8, 9, 10));
+    EXPECT_EQ(object.GetAbsPos(), row.frozen ? Vector(23, 23.5, 22.75) : object.GetRelPos());
+    EXPECT_EQ(object.GetAbsScale(), row.frozen ? Vector(24, 24.5, 23.75) : object.GetRelScale());
+    EXPECT_EQ(object.GetAbsRot(), row.frozen ? Vector(25, 25.5, 24.75) : object.GetRelRot());
+    Matrix rotation = AnglesToMatrix({3, 3.5, 2.75}, row.order);
+    rotation.off = Vector(1, 1.5, 0.75);
+    EXPECT_EQ(object.GetRelativeNormalizedMatrix(), rotation);
+    EXPECT_EQ(object.GetFrozenTransformMatrix().v1,
+              row.frozen ? AnglesToMatrix({22, 22.5, 21.75}, row.order).v1 : Vector(1, 0, 0));
   }
 }
 
 TEST(BaseObject, OpaqueDataLeaveTheEndTagToTheirOwner)
 {
   for (Long version : {6000, 13000}) {
-    const Bytes chunk = Chunk(110064, 5, [](ByteWriter& w) { w.Append(kStrangeBody); });
     ByteWriter whole;
     whole.Header("Q7R6", version).Append(kStrangeBody).End();
     MemoryReadFile memory(whole.bytes);
@@ -239,19 +178,17 @@ TEST(BaseObject, OpaqueDataLeaveTheEndTagToTheirOwner)
 TEST(BaseObject, ALoadedContainerStaysWhatItWasWhenDataAreMade)
 {
   // The client knows the plane but doesn't read it: the loop skips the chunk and the object lives.
-  ByteWriter chunks;
-  chunks.Start(110050, 0).Long(0).Long(0).Start(132, 1).Long(-1).Long(1100).Long(15).Long(3).End();
-  chunks.UChar(0).String(u"plane").End().Append(NodeDataChunk(kObjectPlane, 0, kStrangeBody));
-  chunks.Start(110052, 0).Vector(1, 2, 3).Vector(1, 1, 1).Vector(0, 0, 0).IdentityMatrix().IdentityMatrix();
-  chunks.Long(0).Long(0).Long(0).End();
   BaseObject object(kObjectGeneric);
-  ASSERT_TRUE(ReadInto(object, chunks.bytes, 7500));
+  ASSERT_TRUE(ReadInto(object,
+                       Record("[110050,0 L0 L0 K1100 C0 Splane ] [110064,0 L5168 L0 Sdata L42 [7,1 Sinner ] R0.5 ] "
+                              "[110052,0 V1,2,3 V1,1,1 V0,0,0 2( Y0,0,0,1,0,0,0,1,0,0,0,1 ) L0 L0 L0 ]"),
+                       7500));
   ASSERT_NE(object.GetObjectData(), nullptr);
   EXPECT_EQ(object.GetObjectData()->GetNode(), &object);
   EXPECT_TRUE(object.Execute());
   EXPECT_EQ(object.GetName(), String("plane"));
   EXPECT_EQ(object.GetDataInstance().GetCount(), 1);
-  EXPECT_EQ(object.GetDataInstance().GetLong(1100), 3);
+  EXPECT_EQ(object.GetDataInstance().GetLong(1100), 1100);
   EXPECT_EQ(object.GetRelPos(), Vector(1, 2, 3));
 }
 

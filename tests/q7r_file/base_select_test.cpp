@@ -13,6 +13,7 @@
 #include "q7r_file/node_bytes.h"
 #include "support/assertion_counter.h"
 #include "support/counting_memory.h"
+#include "support/record_samples.h"
 #include "torvane/tags/base_select.h"
 
 namespace
@@ -37,10 +38,10 @@ void Fill(BaseSelect& set, const Segments& segments)
     set.SegmentArray()[i] = {segments[i].first, segments[i].second};
 }
 
-bool ReadFrom(BaseSelect& set, const ByteWriter& body, Long level = 0)
+bool ReadFrom(BaseSelect& set, const Bytes& body, Long level = 0)
 {
   ByteWriter whole;
-  whole.Header().Append(body.bytes);
+  whole.Header().Append(body);
   MemoryReadFile memory(whole.bytes);
   const bool read = set.ReadChunk(memory.file, kChunkSelect, level);
   EXPECT_TRUE(!read || memory.file.GetPosition() == memory.file.GetLength());
@@ -246,27 +247,10 @@ TEST(BaseSelect, IsCopied)
 
 TEST(BaseSelect, BringsTheSegmentsOfAFileIntoOrder)
 {
-  const ByteWriter body = std::move(ByteWriter()
-                                        .Long(7)
-                                        .Long(8)
-                                        .Long(9)
-                                        .Long(-4)
-                                        .Long(1)
-                                        .Long(7)
-                                        .Long(3)
-                                        .Long(2)
-                                        .Long(2)
-                                        .Long(9)
-                                        .Long(12)
-                                        .Long(8)
-                                        .Long(8)
-                                        .Long(-9)
-                                        .Long(-5)
-                                        .End());
   BaseSelect set;
-  EXPECT_TRUE(ReadFrom(set, body));
+  EXPECT_TRUE(ReadFrom(set, Record("L7 L8 L9 L-4 L1 L7 L3 L2 L2 L9 L12 L8 L8 L-9 L-5 ]")));
   EXPECT_EQ(SegmentsOf(set), (Segments{{0, 2}, {8, 12}}));
-  EXPECT_TRUE(ReadFrom(set, ByteWriter().Long(1).Long(3).Long(2).End()));
+  EXPECT_TRUE(ReadFrom(set, Record("L1 L3 L2 ]")));
   EXPECT_EQ(set.SegmentArray(), nullptr);
 }
 
@@ -280,7 +264,7 @@ TEST(BaseSelect, ReadsAMillionSingleNumbersInAFewAllocations)
   body.End();
   BaseSelect set;
   const LLong before = counting_memory::Get().allocations;
-  ASSERT_TRUE(ReadFrom(set, body));
+  ASSERT_TRUE(ReadFrom(set, body.bytes));
   EXPECT_LT(counting_memory::Get().allocations - before, 30);
   EXPECT_EQ(set.SelectedCount(), kCount);
   EXPECT_TRUE(set.IsSelected(2 * kCount - 2));

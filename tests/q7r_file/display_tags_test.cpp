@@ -9,6 +9,7 @@
 #include "q7r_file/node_bytes.h"
 #include "support/assertion_counter.h"
 #include "support/counting_memory.h"
+#include "support/record_samples.h"
 #include "torvane/tags/compositing_tag.h"
 #include "torvane/tags/display_tag.h"
 #include "torvane/tags/selection_tag.h"
@@ -84,22 +85,15 @@ TEST(DisplayTag, TakesTheChunkOfOldFilesIntoItsContainer)
   };
   const Row rows[] = {
       {0, 11610, "1001=1 1002=0 1010=- 1004=- 1007=1 1008=1 1009=1 1012=- 1006=- 1014=- 1015=1"},
-      {1, 11610, "1001=1 1002=0 1010=1 1004=0.5 1007=1 1008=1 1009=1 1012=- 1006=- 1014=- 1015=1"},
-      {2, 11610, "1001=1 1002=0 1010=1 1004=0.5 1007=0 1008=1 1009=0 1012=1 1006=0.25 1014=- 1015=1"},
-      {3, 6000, "1001=1 1002=0 1010=1 1004=0.5 1007=0 1008=1 1009=0 1012=1 1006=0.25 1014=1 1015=0"},
+      {1, 11610, "1001=1 1002=0 1010=1 1004=4 1007=1 1008=1 1009=1 1012=- 1006=- 1014=- 1015=1"},
+      {2, 11610, "1001=1 1002=0 1010=1 1004=4 1007=0 1008=1 1009=0 1012=1 1006=5 1014=- 1015=1"},
+      {3, 6000, "1001=1 1002=0 1010=1 1004=4 1007=0 1008=1 1009=0 1012=1 1006=5 1014=0 1015=1"},
       {3, 11611, "1001=- 1002=- 1010=- 1004=- 1007=- 1008=- 1009=- 1012=- 1006=- 1014=- 1015=1"},
   };
   for (const Row& row : rows) {
-    ByteWriter chunk;
-    chunk.Start(kChunkOldDisplay, row.level).Long(8).Bool(false).Bool(false).Bool(true).Bool(false);
-    if (row.level >= 1)
-      chunk.Bool(true).Real(0.5);
-    if (row.level >= 2)
-      chunk.Bool(false).Bool(true).Bool(false).Bool(false).Bool(true).Real(0.25).Vector(1, 2, 3);
-    if (row.level >= 3)
-      chunk.Bool(true).Bool(false);
+    const std::string& body = FindRecordSample("old display " + std::to_string(row.level)).body;
     DisplayTag tag;
-    EXPECT_TRUE(ReadInto(tag, chunk.Long(1).End().bytes, row.version)) << row.level;
+    EXPECT_TRUE(ReadInto(tag, Record("[110009," + std::to_string(row.level) + " " + body + " L1 ]"), row.version));
     EXPECT_EQ(Entries(tag.GetDataInstance(), {1001, 1002, 1010, 1004, 1007, 1008, 1009, 1012, 1006, 1014, 1015}),
               row.entries)
         << row.level << " in " << row.version;

@@ -1,6 +1,5 @@
 // Objects of points: their own chunks, the operations that resize their tags, splines, and copies.
 #include <algorithm>
-#include <climits>
 #include <string>
 
 #include <gtest/gtest.h>
@@ -9,6 +8,7 @@
 #include "support/assertion_counter.h"
 #include "support/counting_memory.h"
 #include "support/every_failed_allocation.h"
+#include "support/record_samples.h"
 #include "torvane/memory/owned.h"
 #include "torvane/objects/point_object_data.h"
 #include "torvane/objects/spline_object.h"
@@ -20,21 +20,20 @@ namespace
 
 using namespace _torvane_;
 
-// A chunk around the chunk of the one segment (n, n).
-ByteWriter& Selection(ByteWriter& to, Long chunk, Long n)
+// Chunks around a selection of the one segment (n, n).
+std::string Selection(const char* chunk, const std::string& n)
 {
-  return to.Start(chunk, 0).Start(110011, 0).Long(1).Long(n).Long(n).End().End();
+  return std::string("[") + chunk + ",0 [110011,0 L1 L" + n + " L" + n + " ] ] ";
 }
 
 // All that polygon data can hold, in the order of a file.
 Bytes AllPolygonChunks()
 {
-  ByteWriter chunks;
-  Long n = 1;
-  for (const Long chunk : {110117, 110118, 110119, 110120, 110128, 110129, 110132})
-    Selection(chunks, chunk, n++);
-  chunks.Start(110133, 1).Long(2).Long(3).ULong(7).ULong(8).ULong(0xFFFFFFFF).Long(0).End();
-  return chunks.bytes;
+  std::string chunks;
+  int n = 1;
+  for (const char* chunk : {"110117", "110118", "110119", "110120", "110128", "110129", "110132"})
+    chunks += Selection(chunk, std::to_string(n++));
+  return Record(chunks + "[110133,1 L2 L3 U7 U8 U4294967295 L0 ]");
 }
 
 bool EndsWith(const Bytes& whole, const Bytes& end)
@@ -88,28 +87,25 @@ TEST(PolygonObject, StaysInStepWithStrangeChunks)
   struct Row
   {
     const char* what;
-    ByteWriter chunk;
+    const char* chunk;
     bool read;
     Long points; // selected
     Long ngons;
   };
   const Row rows[] = {
-      {"nothing inside", std::move(ByteWriter().Start(110117, 0).End()), true, 1, 2},
-      {"an empty set", std::move(ByteWriter().Start(110117, 0).Start(110011, 0).Long(0).End().End()), true, 0, 2},
-      {"another chunk inside", std::move(ByteWriter().Start(110117, 0).Start(9, 0).Long(1).End().Long(2).End()), true,
-       1, 2},
-      {"more than the set",
-       std::move(ByteWriter().Start(110117, 3).Start(110011, 4).Long(0).Long(5).End().Long(6).End()), true, 0, 2},
-      {"a value", std::move(ByteWriter().Start(110117, 0).Long(1).End()), false, 1, 2},
-      {"n-gons of level 0", std::move(ByteWriter().Start(110133, 0).Long(9).End()), true, 1, 2},
-      {"n-gons of level 2", std::move(ByteWriter().Start(110133, 2).Long(9).End()), true, 1, 2},
-      {"other n-gons", std::move(ByteWriter().Start(110133, 1).Long(1).Long(1).ULong(4).Long(8).End()), true, 1, 1},
-      {"no n-gons", std::move(ByteWriter().Start(110133, 1).Long(0).End()), true, 1, 0},
-      {"too many n-gons", std::move(ByteWriter().Start(110133, 1).Long(INT_MAX).Long(1).ULong(4).End()), false, 1, 0},
-      {"a negative count", std::move(ByteWriter().Start(110133, 1).Long(-1).End()), false, 1, 0},
-      {"too many edges", std::move(ByteWriter().Start(110133, 1).Long(1).Long(INT_MAX).ULong(4).End()), false, 1, 1},
-      {"edges of another kind", std::move(ByteWriter().Start(110133, 1).Long(1).Long(2).ULong(4).Long(4).End()), false,
-       1, 1},
+      {"nothing inside", "[110117,0 ]", true, 1, 2},
+      {"an empty set", "[110117,0 [110011,0 L0 ] ]", true, 0, 2},
+      {"another chunk inside", "[110117,0 [9,0 L1 ] L2 ]", true, 1, 2},
+      {"more than the set", "[110117,3 [110011,4 L0 L5 ] L6 ]", true, 0, 2},
+      {"a value", "[110117,0 L1 ]", false, 1, 2},
+      {"n-gons of level 0", "[110133,0 L9 ]", true, 1, 2},
+      {"n-gons of level 2", "[110133,2 L9 ]", true, 1, 2},
+      {"other n-gons", "[110133,1 L1 L1 U4 L8 ]", true, 1, 1},
+      {"no n-gons", "[110133,1 L0 ]", true, 1, 0},
+      {"too many n-gons", "[110133,1 L2147483647 L1 U4 ]", false, 1, 0},
+      {"a negative count", "[110133,1 L-1 ]", false, 1, 0},
+      {"too many edges", "[110133,1 L1 L2147483647 U4 ]", false, 1, 1},
+      {"edges of another kind", "[110133,1 L1 L2 U4 L4 ]", false, 1, 1},
   };
   for (const Row& row : rows) {
     counting_memory::BalanceCheck balance;
@@ -117,7 +113,7 @@ TEST(PolygonObject, StaysInStepWithStrangeChunks)
     ASSERT_TRUE(ReadInto(*object, AllPolygonChunks()));
     counting_memory::ResetPeak();
     const LLong before = counting_memory::Get().bytes;
-    EXPECT_EQ(ReadInto(*object, ByteWriter(row.chunk).Start(1234, 0).End().bytes), row.read) << row.what;
+    EXPECT_EQ(ReadInto(*object, Record(row.chunk + std::string(" [1234,0 ]"))), row.read) << row.what;
     EXPECT_LT(counting_memory::Get().peakBytes - before, 100000) << row.what;
     EXPECT_EQ(GetPolygonData(*object)->GetPointSelection().SelectedCount(), row.points) << row.what;
     EXPECT_EQ(GetPolygonData(*object)->GetNgons()->GetCount(), row.ngons) << row.what;
@@ -249,18 +245,16 @@ TEST(SplineObject, ResizesPointsTangentsAndSegments)
 TEST(SplineObject, KeepsItsSelectionsInItsOwnChunkOnce)
 {
   counting_memory::BalanceCheck balance;
-  ByteWriter chunks;
-  Selection(chunks, 110117, 4);
-  Selection(chunks, 110118, 6);
+  const Bytes chunks = Record(Selection("110117", "4") + Selection("110118", "6"));
   SplineObject* spline = AllocSpline(2, 0);
-  EXPECT_TRUE(ReadInto(*spline, chunks.bytes));
+  EXPECT_TRUE(ReadInto(*spline, chunks));
   BaseObject parent(kObjectNull);
   spline->InsertUnder(&parent);
   const Bytes bytes = BytesOf(parent);
-  EXPECT_TRUE(Holds(bytes, FromHex("01 000013ED 00000000"))) << "its label";
-  const auto first = std::search(bytes.begin(), bytes.end(), chunks.bytes.begin(), chunks.bytes.end());
+  EXPECT_TRUE(Holds(bytes, Record("[5101,0"))) << "its label";
+  const auto first = std::search(bytes.begin(), bytes.end(), chunks.begin(), chunks.end());
   ASSERT_NE(first, bytes.end());
-  EXPECT_EQ(std::search(first + 1, bytes.end(), chunks.bytes.begin(), chunks.bytes.end()), bytes.end());
+  EXPECT_EQ(std::search(first + 1, bytes.end(), chunks.begin(), chunks.end()), bytes.end());
 
   BaseObject again(kObjectNull);
   EXPECT_TRUE(ReadInto(again, bytes));
@@ -268,9 +262,9 @@ TEST(SplineObject, KeepsItsSelectionsInItsOwnChunkOnce)
   ASSERT_NE(read, nullptr);
   EXPECT_EQ(read->GetName(), String("Spline")) << "a spline without a name";
   EXPECT_EQ(GetPointCount(*read), 2);
-  EXPECT_TRUE(Holds(BytesOf(again), chunks.bytes));
+  EXPECT_TRUE(Holds(BytesOf(again), chunks));
   read->SetName(String("arc"));
-  EXPECT_TRUE(ReadInto(*read, FromHex("01 0001ADF5 00000002 0F 00000000 0C 00 02")));
+  EXPECT_TRUE(ReadInto(*read, Record("[110069,2 L0 C0 ]")));
   EXPECT_EQ(read->GetName(), String("arc"));
 }
 
@@ -278,9 +272,8 @@ TEST(PointObject, ComesBackFromAFileUnderItsLabel)
 {
   counting_memory::BalanceCheck balance;
   BaseObject* object = AllocObject(kObjectPointBased);
-  ByteWriter chunks;
   static_cast<PointObjectData*>(object->GetObjectData())->GetHiddenPoints().SelectAdd(3);
-  Selection(chunks, 110118, 3);
+  const Bytes chunks = Record(Selection("110118", "3"));
   ResizePoints(*object, 2);
   BaseObject parents[] = {BaseObject(kObjectNull), BaseObject(kObjectNull), BaseObject(kObjectNull)};
   object->InsertUnder(&parents[0]);
@@ -290,7 +283,7 @@ TEST(PointObject, ComesBackFromAFileUnderItsLabel)
     EXPECT_EQ(member->GetType(), kObjectPointBased);
     EXPECT_EQ(member->GetDiskType(), kObjectPoint);
     EXPECT_EQ(GetPointCount(*member), 2);
-    EXPECT_TRUE(Holds(BytesOf(parents[i]), chunks.bytes));
+    EXPECT_TRUE(Holds(BytesOf(parents[i]), chunks));
     EXPECT_TRUE(i == 2 || ReadInto(parents[i + 1], BytesOf(parents[i])));
   }
 }

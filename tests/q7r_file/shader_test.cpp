@@ -4,6 +4,7 @@
 #include "q7r_file/node_bytes.h"
 #include "support/assertion_counter.h"
 #include "support/counting_memory.h"
+#include "support/record_samples.h"
 #include "support/text.h"
 #include "torvane/shaders/base_shader.h"
 #include "torvane/values/ge_data.h"
@@ -34,37 +35,7 @@ std::string TypesBelow(const BaseShader& parent)
   return text;
 }
 
-// The chunks of a shader of today behind its node chunks.
-ByteWriter TypeChunk(Long type, Long level)
-{
-  return ByteWriter().Start(110064, level).Long(type).Long(0).String(u"S").End();
-}
-
-// A member of a list of children, which holds `chunks`.
-Bytes Member(const Bytes& chunks) { return ByteWriter().Start(5707, 0).Append(chunks).End().bytes; }
-
 } // namespace
-
-TEST(Shader, WritesItsChunksByteForByte)
-{
-  BaseShader shader;
-  shader.SetName("S");
-  shader.SetBitmapFilename(Filename("b"));
-  SetCountingMarker(shader);
-  const std::string node =
-      "01 0001ADE2 00000007  0F 00000000  0F 00000000  01 00000084 00000001 0F FFFFFFFF"
-      "0F 000003E8 0F 00000083 83 00000002 0062  02  0C 00  82 00000002 0053  0F 00000000  0F 00000001 0F 00000000"
-      "80 0000000E 616C69617332 0000000000000000  0C 01 80 00000010 000102030405060708090A0B0C0D0E0F  15 00  02"
-      "01 0001ADF5 00000002  0F 00000004  0F 00000000 0F 00000000 0F 00000000 0F 00000000  0C 00  02";
-  const std::string own = "01 0001ADF0 00000000 0F 000016C9 0F 00000000 82 00000002 0053 02";
-  EXPECT_EQ(ToHex(BytesOf(shader)), ToHex(FromHex(node + own)));
-
-  BaseShader* child = AddChild(shader, kUnknownType);
-  SetCountingMarker(*child);
-  const std::string children = "01 0001AE14 00000000  01 0000164B 00000000";
-  const Bytes behind = BytesOf(*child);
-  EXPECT_EQ(ToHex(BytesOf(shader)), ToHex(FromHex(node + own + children)) + " " + ToHex(behind) + " 02 02");
-}
 
 TEST(Shader, KeepsAFilenameOnlyAsABitmap)
 {
@@ -84,12 +55,9 @@ TEST(Shader, ReadsChildrenBehindThoseThatItHas)
 {
   BaseShader shader;
   AddChild(shader, 1);
-  ByteWriter inner;
-  inner.Append(TypeChunk(3, 0).bytes).Start(110100, 0).Append(Member(TypeChunk(4, 0).bytes)).End();
-  ByteWriter w;
-  w.Start(110100, 0).Append(Member(TypeChunk(2, 0).bytes)).Start(99, 1).Long(1).End().Append(Member(inner.bytes)).End();
-  w.Append(TypeChunk(kUnknownType, 0).bytes);
-  ASSERT_TRUE(ReadInto(shader, w.bytes));
+  const std::string members = "[110100,0 [5707,0 [110064,0 L2 L0 SS ] ] [99,1 L1 ] [5707,0 [110064,0 L3 L0 SS ] "
+                              "[110100,0 [5707,0 [110064,0 L4 L0 SS ] ] ] ] ] [110064,0 L1012345 L0 SS ]";
+  ASSERT_TRUE(ReadInto(shader, Record(members)));
   EXPECT_EQ(TypesBelow(shader), "(1 2 3(4))");
   EXPECT_EQ(shader.GetType(), kUnknownType); // what follows the children is in step
 
@@ -98,7 +66,7 @@ TEST(Shader, ReadsChildrenBehindThoseThatItHas)
   ASSERT_TRUE(ReadInto(again, BytesOf(shader)));
   EXPECT_EQ(TypesBelow(again), "(1 2 3(4))");
   BaseShader nested;
-  ASSERT_TRUE(ReadInto(nested, ByteWriter().Start(110100, 0).Append(w.bytes).End().bytes));
+  ASSERT_TRUE(ReadInto(nested, Record("[110100,0 " + members + " ]")));
   EXPECT_EQ(TypesBelow(nested), "(2 3(4))");
 }
 
@@ -106,10 +74,8 @@ TEST(Shader, TakesNoChildrenFromADamagedList)
 {
   const counting_memory::BalanceCheck balance;
   AssertionCounter silent;
-  ByteWriter w;
-  w.Start(110100, 0).Append(Member(TypeChunk(2, 0).bytes)).Start(5707, 0).Long(1).End().End();
   BaseShader shader;
-  EXPECT_FALSE(ReadInto(shader, w.bytes));
+  EXPECT_FALSE(ReadInto(shader, Record("[110100,0 [5707,0 [110064,0 L2 L0 SS ] ] [5707,0 L1 ] ]")));
   EXPECT_EQ(shader.GetDown(), nullptr);
 }
 

@@ -1,11 +1,11 @@
-// The texture tag: its defaults, its old chunk, what it computes, and its links through files, copies and merges.
+// The texture tag: its old chunk, what it computes, and its links through files, copies and merges.
 #include <cmath>
-#include <functional>
 #include <memory>
 
 #include <gtest/gtest.h>
 
 #include "q7r_file/tag_bytes.h"
+#include "support/record_samples.h"
 #include "support/scene_bytes.h"
 #include "support/temp_folder.h"
 #include "support/text.h"
@@ -41,104 +41,56 @@ Real RealOf(TextureTag& tag, Long id)
   return value.GetType() == kDataLong ? value.GetLong() : value.GetReal();
 }
 
-ByteWriter OldChunk(Long version, Long level, Long height, Real pixelHeight)
-{
-  const bool old = version < 11600;
-  ByteWriter chunk;
-  chunk.Start(110010, level).Vector(1, 2, 3).Vector(4, 5, 6).Vector(0.1, 0.2, 0.3);
-  if (old)
-    chunk.IdentityMatrix().IdentityMatrix();
-  chunk.Real(0.5).Real(0.25).Real(2.0).Real(4.0).Bool(false).Bool(true).Bool(true).Long(6).Long(7);
-  if (old)
-    chunk.Long(98).Long(99);
-  if (level >= 1)
-    chunk.String(u"skin");
-  if (level >= 2 && old)
-    chunk.Bool(true);
-  if (level >= 3)
-    chunk.Memory(Link(5));
-  if (level >= 4)
-    chunk.Memory(Link(6));
-  if (level >= 5)
-    chunk.Long(16).Long(height).Real(1.8).Real(pixelHeight);
-  if (level >= 6)
-    chunk.Bool(false);
-  return chunk.Long(77).End();
-}
-
-// A node header that says no more than the id of the node's goal.
-Bytes HeaderWithGoal(std::uint8_t id)
-{
-  ByteWriter header;
-  header.Start(110050, 0).Long(0).Long(0).Start(132, 1).Long(-1).End().UChar(1);
-  header.Memory(std::string("agoal1\0\0\0\0\0\0\0", 13) + static_cast<char>(id)).String(u"");
-  return header.End().End().bytes;
-}
-
 } // namespace
 
-TEST(TextureTag, HasItsDefaultsInFileOrderAndNoChunkOfItsOwn)
+TEST(TextureTag, TakesPlaceLinksAndAspectsFromItsOldChunk)
 {
-  TextureTag tag;
-  auto real = [](const char* id, const char* bits) { return std::string("0F") + id + "0F 00000013 13" + bits; };
-  auto integer = [](const char* id, const char* value) { return std::string("0F") + id + "0F 0000000F 0F" + value; };
-  const std::string link = "0F 00000085 80 0000000E 616C69617332 0000000000000000";
-  const std::string zero = "0000000000000000";
-  const std::string one = "3FF0000000000000";
-  const std::string hex =
-      "01 00000084 00000001 0F FFFFFFFF" + real("000003E8", zero.c_str()) + real("000003E9", zero.c_str()) +
-      real("000003EA", one.c_str()) + real("000003EB", one.c_str()) + integer("000003EC", "00000000") +
-      integer("000003ED", "00000000") + integer("000003EF", "00000001") + integer("000003F0", "00000000") +
-      integer("000003F1", "00000000") + "0F 000003F2" + link +
-      "0F 000003F4 0F 00000017 17 4059000000000000 4059000000000000 4059000000000000" + "0F 000003F9" + link +
-      real("000003FA", "3FF5555555530AED") + real("000003FC", one.c_str()) + integer("000004B0", "00000001") +
-      real("000004B1", zero.c_str()) + real("000004B2", zero.c_str()) + "02";
-  const Bytes bytes = WriteToMemory([&](HyperFile& file) { file.WriteContainer(tag.GetDataInstance()); });
-  EXPECT_EQ(ToHex(bytes), ToHex(FromHex(hex)));
-  EXPECT_EQ(ToHex(OwnChunks(tag)), "");
-}
-
-TEST(TextureTag, ReadsEveryLevelOfItsOldChunk)
-{
-  for (Long version : {7000, 11599, 11600, 13000}) {
-    for (Long level = 0; level <= 7; ++level) {
-      TextureTag tag;
-      tag.TextureMatrix();
-      BaseMaterial first(kMaterialStandard);
-      BaseMaterial second(kMaterialStandard);
-      if (level % 2 == 0)
-        tag.GetDataInstance().RemoveData(kTextureMaterial); // the entry is made anew
-      {
-        ByteWriter whole;
-        whole.Header("Q7R6", version).Append(OldChunk(version, level, 9, 2.0).bytes).End();
-        const std::int32_t node = version < 7500 ? 0 : 1;
-        if (node)
-          whole.Append(HeaderWithGoal(5)).Append(HeaderWithGoal(6));
-        MemoryReadFile memory(whole.bytes);
-        ASSERT_TRUE(tag.ReadChunkLoop(memory.file, true)) << version << '/' << level;
-        ASSERT_TRUE(!node || (first.ReadChunkLoop(memory.file, true) && second.ReadChunkLoop(memory.file, true)));
-      }
-      EXPECT_EQ(Entries(tag, {1000, 1001, 1002, 1003, 1004, 1005, 1007, 1008, 1009}),
-                "1000=0.5 1001=0.25 1002=2 1003=4 1004=6 1005=7 1007=0 1008=1 1009=1");
-      EXPECT_EQ(tag.Position(), Vector(1, 2, 3));
-      EXPECT_EQ(tag.Size(), Vector(4, 5, 6));
-      EXPECT_EQ(tag.Rotation(), Vector(0.1, 0.2, 0.3));
-      EXPECT_EQ(tag.TextureMatrix().off, Vector(1, 2, 3));
-      EXPECT_EQ(tag.GetDataInstance().GetString(1006), String(level >= 1 ? "skin" : ""));
-      EXPECT_EQ(tag.GetMaterial(), level >= 3 && version >= 7500 ? &first : nullptr) << version << '/' << level;
-      EXPECT_EQ(tag.GetDataInstance().GetLink(1017), level >= 4 && version >= 7500 ? &second : nullptr);
-      EXPECT_EQ(Entries(tag, {1018, 1020, 1200}),
-                std::string(level >= 5 ? "1018=1.777777778 1020=0.9" : "1018=1.333333333 1020=1") +
-                    (level >= 6 ? " 1200=0" : " 1200=1"));
+  struct Row
+  {
+    const char* sample;
+    Long version;
+    bool first, second; // links
+    const char* entries;
+  };
+  const Row rows[] = {{"old texture 6", 13000, true, true, "1018=1.5 1020=0.5 1200=0"},
+                      {"old texture 5", 11600, true, true, "1018=1.5 1020=0.5 1200=1"},
+                      {"old texture 4", 11600, true, true, "1018=1.333333333 1020=1 1200=1"},
+                      {"old texture 3", 13000, true, false, "1018=1.333333333 1020=1 1200=1"},
+                      {"old texture 2 before 11600", 7000, false, false, "1018=1.333333333 1020=1 1200=1"}};
+  for (const Row& row : rows) {
+    SCOPED_TRACE(row.sample);
+    const RecordSample& sample = FindRecordSample(row.sample);
+    TextureTag tag;
+    tag.TextureMatrix();
+    BaseMaterial first(kMaterialStandard), second(kMaterialStandard);
+    if (sample.level % 2 == 0)
+      tag.GetDataInstance().RemoveData(kTextureMaterial); // the entry is made anew
+    {
+      ByteWriter whole;
+      whole.Header("Q7R6", row.version).Start(110010, sample.level).Append(Record(sample.body)).End().End();
+      for (const char* goal : {"05", "06"}) // headers that say no more than the id of the node's goal
+        whole.Append(Record(std::string("[110050,0 L0 L0 K C1 M61676F616C3100000000000000") + goal + " S ] ]"));
+      MemoryReadFile memory(whole.bytes);
+      ASSERT_TRUE(tag.ReadChunkLoop(memory.file, true));
+      ASSERT_TRUE(row.version < 7500 ||
+                  (first.ReadChunkLoop(memory.file, true) && second.ReadChunkLoop(memory.file, true)));
     }
+    EXPECT_EQ(tag.Position(), Vector(1, 1.5, 0.75));
+    EXPECT_EQ(tag.Size(), Vector(2, 2.5, 1.75));
+    EXPECT_EQ(tag.Rotation(), Vector(3, 3.5, 2.75));
+    EXPECT_EQ(tag.TextureMatrix().off, Vector(1, 1.5, 0.75));
+    EXPECT_EQ(tag.GetMaterial(), row.first ? &first : nullptr);
+    EXPECT_EQ(tag.GetDataInstance().GetLink(1017), row.second ? &second : nullptr);
+    EXPECT_EQ(Entries(tag, {1018, 1020, 1200}), row.entries);
   }
   TextureTag tag;
-  ASSERT_TRUE(ReadInto(tag, OldChunk(13000, 5, 0, 0.0).bytes));
+  const std::string four = FindRecordSample("old texture 4").body;
+  ASSERT_TRUE(ReadInto(tag, Record("[110010,5 " + four + " L16 L0 R2 R0 ]"))); // no quotients
   EXPECT_EQ(Entries(tag, {1018, 1020}), "1018=1 1020=1");
   TextureTag untouched;
-  ASSERT_TRUE(ReadInto(untouched, OldChunk(13000, -1, 1, 1).bytes));
+  ASSERT_TRUE(ReadInto(untouched, Record("[110010,-1 " + four + " ]")));
   EXPECT_EQ(Entries(untouched, {1000, 1002, 1011}), "1000=0 1002=1 1011=-");
-  EXPECT_EQ(ReadError(untouched, ByteWriter().Start(110010, 3).Vector(1, 2, 3).Long(5).End().bytes), -100);
+  EXPECT_EQ(ReadError(untouched, Record("[110010,3 V1 L5 ]")), -100);
 }
 
 TEST(TextureTag, IsNamedWhenTheFileHasNoName)

@@ -5,6 +5,7 @@
 
 #include "q7r_file/tag_bytes.h"
 #include "support/counting_memory.h"
+#include "support/record_samples.h"
 #include "support/text.h"
 #include "torvane/tags/value_tags.h"
 
@@ -28,82 +29,44 @@ std::unique_ptr<BaseArrayTag> Make(Long type)
                                                                 : static_cast<BaseArrayTag*>(MakeTag(type)));
 }
 
-void Fill(PointTag& tag)
-{
-  tag.ResizeTagArray(3);
-  for (Long i = 0; i < 3; ++i)
-    tag.GetArray()[i] = Vector(1 + 3 * i, 2 + 3 * i, 3 + 3 * i);
-}
-
-void Fill(PolygonTag& tag)
-{
-  tag.ResizeTagArray(2);
-  tag.GetArray()[0] = {0, 1, 2, 2};
-  tag.GetArray()[1] = {3, 4, 5, 0x01020304};
-}
-
-void Fill(SegmentTag& tag)
-{
-  tag.ResizeTagArray(2);
-  tag.GetArray()[0] = {7, 1};
-  tag.GetArray()[1] = {-1, 0};
-}
-
-void Fill(TangentTag& tag)
-{
-  tag.ReplaceTagArray(1);
-  tag.GetArray()[0] = {Vector(1, 2, 0), Vector(0, 0, -2)};
-}
-
-void Fill(VertexMapTag& tag)
-{
-  tag.ResizeTagArray(2);
-  tag.GetArray()[0] = 1.0F;
-  tag.GetArray()[1] = 0.25F;
-}
-
-void Fill(NormalTag& tag)
-{
-  tag.ResizeTagArray(1);
-  const Vector quad[4] = {{1, -1, 0}, {0.00004, -0.00006, 0.5}, {1.02, 1.1, -1.1}, {0, 0, 0.9999999}};
-  tag.WritePolygonNormals(0, quad);
-}
-
+// What a tag of a type holds, in its packing, and as numbers in memory: `number` tells their kind.
 struct Layout
 {
   Long type;
-  void (*fill)(BaseArrayTag&);
-  const char* empty;
-  const char* filled;
-};
+  std::string chunk;
+  char number;
+  std::vector<double> entries;
 
-template <class Tag>
-void FillAs(BaseArrayTag& tag)
-{
-  Fill(static_cast<Tag&>(tag));
-}
+  Bytes Filled() const { return Record("[" + std::to_string(type) + ",0 " + chunk + " ]"); }
+  Bytes Empty() const { return Record("[" + std::to_string(type) + ",0 L0 ]"); }
+  std::unique_ptr<BaseArrayTag> Make() const
+  {
+    std::unique_ptr<BaseArrayTag> tag = ::Make(type);
+    EXPECT_TRUE(ReadInto(*tag, Filled()));
+    return tag;
+  }
+};
 
 const Layout kLayouts[] = {
-    {5600, FillAs<PointTag>, "01 000015E0 00000000 0F 00000000 02",
-     "01 000015E0 00000000 0F 00000003"
-     "8C 00000019 06 3FF0000000000000 4010000000000000 401C000000000000"
-     "8C 00000019 06 4000000000000000 4014000000000000 4020000000000000"
-     "8C 00000019 06 4008000000000000 4018000000000000 4022000000000000 02"},
-    {5604, FillAs<PolygonTag>, "01 000015E4 00000000 0F 00000000 02",
-     "01 000015E4 00000000 0F 00000002  8C 00000009 03 00000000 00000003  8C 00000009 03 00000001 00000004"
-     "8C 00000009 03 00000002 00000005  8C 00000009 03 00000002 01020304 02"},
-    {5617, FillAs<TangentTag>, "01 000015F1 00000000 0F 00000000 02",
-     "01 000015F1 00000000 0F 00000001  17 3FF0000000000000 4000000000000000 0000000000000000"
-     "17 0000000000000000 0000000000000000 C000000000000000 02"},
-    {5672, FillAs<SegmentTag>, "01 00001628 00000000 0F 00000000 02",
-     "01 00001628 00000000 0F 00000002  0F 00000007 15 01  0F FFFFFFFF 15 00 02"},
-    {5682, FillAs<VertexMapTag>, "01 00001632 00000000 0F 00000000 02",
-     "01 00001632 00000000 0F 00000002  8C 00000009 05 3F800000 3E800000 02"},
-    // 32000, -32000, 0; 1 and -1 for 1.28 and -1.92; 32640 and the limits of 16 bits; 31999 for 31999.9968
-    {5711, FillAs<NormalTag>, "01 0000164F 00000000 0F 00000000 02",
-     "01 0000164F 00000000 0F 00000001  8C 00000019 02 7D00 8300 0000  0001 FFFF 3E80  7F80 7FFF 8000  0000 0000 7CFF"
-     "02"},
+    {5600, "L3 A6:1,4,7 A6:2,5,8 A6:3,6,9", 'R', {1, 2, 3, 4, 5, 6, 7, 8, 9}},
+    {5604, "L2 A3:0,3 A3:1,4 A3:2,5 A3:2,16909060", 'L', {0, 1, 2, 2, 3, 4, 5, 16909060}},
+    {5617, "L1 V1,2,0 V0,0,-2", 'R', {1, 2, 0, 0, 0, -2}},
+    {5672, "L2 L7 B1 L-1 B0", 'L', {7, 1, -1, 0}},
+    {5682, "L2 A5:1,0.25", 'S', {1, 0.25}},
+    {5711,
+     "L1 A2:32000,-32000,0,1,-1,16000,32640,32767,-32768,0,0,31999",
+     'W',
+     {32000, -32000, 0, 1, -1, 16000, 32640, 32767, -32768, 0, 0, 31999}},
 };
+
+std::vector<double> EntriesOf(const BaseArrayTag& tag, char number)
+{
+  const auto doubles = [](const auto& numbers) { return std::vector<double>(numbers.begin(), numbers.end()); };
+  return number == 'R'   ? doubles(Numbers<Real>(tag))
+         : number == 'L' ? doubles(Numbers<Long>(tag))
+         : number == 'S' ? doubles(Numbers<SReal>(tag))
+                         : doubles(Numbers<Word>(tag));
+}
 
 // The count that stands first in a legacy value is in bytes.
 ByteWriter Legacy(std::uint8_t tag, std::uint32_t length)
@@ -118,29 +81,29 @@ ByteWriter Legacy(std::uint8_t tag, std::uint32_t length)
 TEST(ValueTags, WriteAndReadTheirEntriesInTheirOwnPacking)
 {
   for (const Layout& layout : kLayouts) {
-    auto tag = Make(layout.type);
-    EXPECT_EQ(ToHex(OwnChunks(*tag)), ToHex(FromHex(layout.empty)));
-    layout.fill(*tag);
-    EXPECT_EQ(ToHex(OwnChunks(*tag)), ToHex(FromHex(layout.filled)));
-    auto copy = Make(layout.type);
-    ASSERT_TRUE(ReadInto(*copy, FromHex(layout.filled)));
-    EXPECT_EQ(ToHex(OwnChunks(*copy)), ToHex(FromHex(layout.filled)));
-    EXPECT_EQ(Numbers<UChar>(*copy), Numbers<UChar>(*tag)) << layout.type;
+    EXPECT_EQ(ToHex(OwnChunks(*::Make(layout.type))), ToHex(layout.Empty()));
+    auto tag = layout.Make();
+    EXPECT_EQ(ToHex(OwnChunks(*tag)), ToHex(layout.Filled()));
+    EXPECT_EQ(EntriesOf(*tag, layout.number), layout.entries) << layout.type;
   }
+  // 32000 a unit; 1 and -1 for 1.28 and -1.92; 32640 and the limits of 16 bits; 31999 for 31999.9968.
+  NormalTag normals;
+  const Vector quad[4] = {{1, -1, 0}, {0.00004, -0.00006, 0.5}, {1.02, 1.1, -1.1}, {0, 0, 0.9999999}};
+  EXPECT_TRUE(normals.ResizeTagArray(1) && normals.WritePolygonNormals(0, quad));
+  EXPECT_EQ(EntriesOf(normals, 'W'), kLayouts[5].entries);
 }
 
 TEST(ValueTags, KeepOrDropTheirEntriesWhenAFileHasNone)
 {
   for (const Layout& layout : kLayouts) {
-    auto tag = Make(layout.type);
-    layout.fill(*tag);
+    auto tag = layout.Make();
     const Long count = tag->GetCount();
-    ASSERT_TRUE(ReadInto(*tag, ByteWriter().Start(layout.type, -1).Long(1).Long(2).End().bytes));
+    ASSERT_TRUE(ReadInto(*tag, Record("[" + std::to_string(layout.type) + ",-1 L1 L2 ]")));
     EXPECT_EQ(tag->GetCount(), count); // a level below 0: passed over
-    ASSERT_TRUE(ReadInto(*tag, FromHex(layout.empty)));
+    ASSERT_TRUE(ReadInto(*tag, layout.Empty()));
     const bool drops = layout.type == kTagTangent || layout.type == kTagSegment;
     EXPECT_EQ(tag->GetCount(), drops ? 0 : count) << layout.type;
-    const Bytes negative = ByteWriter().Start(layout.type, 0).Long(-3).End().bytes;
+    const Bytes negative = Record("[" + std::to_string(layout.type) + ",0 L-3 ]");
     EXPECT_EQ(ReadError(*tag, negative), drops ? -100 : 0) << layout.type;
   }
 }
@@ -148,8 +111,7 @@ TEST(ValueTags, KeepOrDropTheirEntriesWhenAFileHasNone)
 TEST(ValueTags, ReportMemoryThatIsShortAndKeepTheirEntries)
 {
   for (const Layout& layout : kLayouts) {
-    auto tag = Make(layout.type);
-    layout.fill(*tag);
+    auto tag = layout.Make();
     const auto entries = Numbers<UChar>(*tag);
     counting_memory::FailAfter(0);
     EXPECT_FALSE(tag->ResizeTagArray(100));
@@ -157,7 +119,7 @@ TEST(ValueTags, ReportMemoryThatIsShortAndKeepTheirEntries)
     EXPECT_EQ(Numbers<UChar>(*tag), entries);
 
     AssertionCounter silence;
-    MemoryReadFile memory(ByteWriter().Header().Append(FromHex(layout.filled)).bytes);
+    MemoryReadFile memory(ByteWriter().Header().Append(layout.Filled()).bytes);
     UChar header = 0;
     Long id = 0;
     Long level = 0;
@@ -173,7 +135,7 @@ TEST(ValueTags, ReportMemoryThatIsShortAndKeepTheirEntries)
 TEST(ValueTags, ResizeKeepingTheFirstEntriesAndClearingNewOnes)
 {
   VertexMapTag map;
-  Fill(map);
+  EXPECT_TRUE(ReadInto(map, kLayouts[4].Filled()));
   ASSERT_TRUE(map.ResizeTagArray(4));
   EXPECT_EQ(Numbers<SReal>(map), (std::vector<SReal>{1.0F, 0.25F, 0.0F, 0.0F}));
   ASSERT_TRUE(map.ResizeTagArray(1));
@@ -183,20 +145,20 @@ TEST(ValueTags, ResizeKeepingTheFirstEntriesAndClearingNewOnes)
   EXPECT_EQ(map.GetArray(), nullptr);
 
   PolygonTag polygons;
-  Fill(polygons);
+  EXPECT_TRUE(ReadInto(polygons, kLayouts[1].Filled()));
   EXPECT_TRUE(polygons.ResizeTagArray(0) && polygons.ResizeTagArray(-9));
   EXPECT_EQ(polygons.GetCount(), 2);
 
   SegmentTag segments;
   EXPECT_FALSE(segments.ResizeTagArray(0) || segments.ResizeTagArray(-1));
-  Fill(segments);
+  EXPECT_TRUE(ReadInto(segments, kLayouts[3].Filled()));
   EXPECT_TRUE(segments.ResizeTagArray(-1));
   EXPECT_EQ(segments.GetCount(), 2);
   EXPECT_TRUE(segments.ResizeTagArray(0));
   EXPECT_EQ(segments.GetCount(), 0);
 
   TangentTag tangents;
-  Fill(tangents);
+  EXPECT_TRUE(ReadInto(tangents, kLayouts[2].Filled()));
   EXPECT_TRUE(tangents.ReplaceTagArray(2));
   EXPECT_EQ(Numbers<Real>(tangents), std::vector<Real>(12, 0.0));
 }
@@ -206,7 +168,6 @@ TEST(ValueTags, ReadTheArraysOfOldFiles)
   PointTag points;
   ByteWriter pointArray = Legacy(133, 2 * 12);
   pointArray.F64(1).F64(2).F64(3).F64(4).F64(5).F64(6);
-  Fill(points);
   ASSERT_TRUE(ReadInto(points, ByteWriter().Start(5600, 0).Append(pointArray.bytes).Long(9).End().bytes, 11924));
   EXPECT_EQ(Numbers<Real>(points), (std::vector<Real>{1, 2, 3, 4, 5, 6}));
 
@@ -243,15 +204,11 @@ TEST(ValueTags, ReadOldVertexMapsByTypeAndVersion)
       {5682, 7499, "map", 1}, {5682, 7500, "mine", 1}, {5708, 7499, "mine", 2}, {5708, 11925, "mine", 2}};
   for (const Row& row : rows) {
     auto tag = Make(row.type);
-    FillAs<VertexMapTag>(*tag);
+    tag->ResizeTagArray(2);
+    static_cast<VertexMapTag&>(*tag).GetArray()[0] = 1.0F;
     tag->SetName("mine");
-    ByteWriter chunk;
-    chunk.Start(row.type, 0);
-    if (row.version < 11925)
-      chunk.String(u"map").U8(137).U32(4).F32(0.5F);
-    else
-      chunk.Long(2).ArrayHead(5, 8).F32(0.5F).F32(0.5F);
-    ASSERT_TRUE(ReadInto(*tag, chunk.End().bytes, row.version));
+    const char* body = row.version < 11925 ? " Smap X89000000043F000000 ]" : " L2 A5:0.5,0.5 ]";
+    ASSERT_TRUE(ReadInto(*tag, Record("[" + std::to_string(row.type) + ",0" + body), row.version));
     EXPECT_EQ(tag->GetName(), String(row.name));
     EXPECT_EQ(tag->GetCount(), row.count);
     const bool read = row.type == 5682 || row.version == 11925;
@@ -266,23 +223,22 @@ TEST(ValueTags, CopyOntoEmptyAndFilledTags)
 {
   for (const Layout& layout : kLayouts) {
     const bool empties = layout.type == kTagNormal || layout.type == kTagVertexMap;
-    auto source = Make(layout.type);
-    auto empty = Make(layout.type);
-    layout.fill(*source);
+    auto source = layout.Make();
+    auto empty = ::Make(layout.type);
     const auto entries = Numbers<UChar>(*source);
     ASSERT_TRUE(source->CopyWithTranslation(*empty, 0, nullptr));
     EXPECT_EQ(Numbers<UChar>(*empty), entries) << layout.type;
     EXPECT_TRUE(source->CopyWithTranslation(*source, 0, nullptr));
 
     // Onto a filled tag: those two are emptied themselves, and leave zeros there.
-    auto filled = Make(layout.type);
+    auto filled = ::Make(layout.type);
     filled->ResizeTagArray(7);
     EXPECT_EQ(source->CopyWithTranslation(*filled, 0, nullptr), !empties) << layout.type;
     EXPECT_EQ(Numbers<UChar>(*filled), empties ? Bytes(entries.size(), 0) : entries) << layout.type;
     EXPECT_EQ(source->GetCount() == 0, empties) << layout.type;
 
     // From an empty one: polygons stay where they are.
-    auto none = Make(layout.type);
+    auto none = ::Make(layout.type);
     EXPECT_EQ(none->CopyWithTranslation(*empty, 0, nullptr), !empties);
     EXPECT_EQ(empty->GetCount() != 0, layout.type == kTagPolygon) << layout.type;
   }

@@ -1,6 +1,5 @@
 // Views: panels with their draws, the settings of new ones, and the scene camera of a document.
 #include <algorithm>
-#include <sstream>
 #include <string>
 
 #include <gtest/gtest.h>
@@ -8,6 +7,7 @@
 #include "q7r_file/node_bytes.h"
 #include "support/assertion_counter.h"
 #include "support/counting_memory.h"
+#include "support/record_samples.h"
 #include "support/scene_bytes.h"
 #include "torvane/objects/base_object.h"
 #include "torvane/values/ge_data.h"
@@ -29,13 +29,6 @@ BaseDraw* DrawAt(ViewPanel& panel, Long index)
 ViewPanel* FirstPanel(BaseDocument& document)
 {
   return static_cast<ViewPanel*>(document.GetViewPanelRoot()->GetFirst());
-}
-
-// The last bytes of what a node writes.
-std::string LastBytes(PrivateChunk& node, std::size_t count)
-{
-  const Bytes all = BytesOf(node);
-  return ToHex({all.end() - static_cast<long>(std::min(count, all.size())), all.end()});
 }
 
 } // namespace
@@ -99,17 +92,15 @@ TEST(View, MakesFourDrawsWithThePerspectiveFirst)
 TEST(View, WritesAndReadsAPanel)
 {
   const counting_memory::BalanceCheck balance;
-  const std::string own = "01 0001AEE2 00000000  01 00000084 00000001 0F FFFFFFFF";
   ViewPanel panel;
-  const std::string empty = "0C 00  02" + own + "02 02"; // no list
-  EXPECT_EQ(LastBytes(panel, FromHex(empty).size()), ToHex(FromHex(empty)));
+  const std::string list = ToHex(Record("[110124,0"));
+  EXPECT_EQ(ToHex(BytesOf(panel)).find(list), std::string::npos); // no list
   panel.GetSettings().SetLong(5, 6);
   panel.GetBaseDraw(0);
   const std::string whole = ToHex(BytesOf(panel));
-  EXPECT_NE(whole.find(ToHex(FromHex("0C 00 02 01 0001AE2C 00000000 01 0001AE14 00000000 01 0001AEE1 00000000"))),
-            std::string::npos);
-  const std::string end = "02 02 02" + own + "0F 00000005 0F 0000000F 0F 00000006 02 02"; // draw, list, chunk
-  EXPECT_EQ(LastBytes(panel, FromHex(end).size()), ToHex(FromHex(end)));
+  EXPECT_NE(whole.find(ToHex(Record("C0 ] [110124,0 [110100,0 [110305,0"))), std::string::npos);
+  const std::string end = ToHex(Record("] ] ] [110306,0 [132,1 L-1 L5 L15 L6 ] ]")); // draw, list, chunk
+  EXPECT_EQ(whole.substr(whole.size() - end.size()), end);
 
   ViewPanel again;
   ASSERT_TRUE(ReadInto(again, BytesOf(panel)));
@@ -117,14 +108,12 @@ TEST(View, WritesAndReadsAPanel)
   ASSERT_EQ(again.GetDraws().GetCount(), 4);
   EXPECT_EQ(DrawAt(again, 1)->GetEditorCamera()->GetDataInstance().GetLong(1001), 6);
   // An empty chunk, one with more behind the list, and one with another value.
-  for (const auto& [body, draws, read] :
-       {std::tuple<ByteWriter, Long, bool>{ByteWriter(), 4, true},
-        {ByteWriter().Start(110100, 0).Start(110305, 0).End().Start(99, 0).End().End().Long(4), 1, true},
-        {ByteWriter().Start(98, 0).Long(1).End(), 1, true},
-        {ByteWriter().Long(1), 1, false}}) {
+  for (const auto& [body, draws, read] : {std::tuple<const char*, Long, bool>{"", 4, true},
+                                          {"[110100,0 [110305,0 ] [99,0 ] ] L4 ", 1, true},
+                                          {"[98,0 L1 ] ", 1, true},
+                                          {"L1 ", 1, false}}) {
     AssertionCounter quiet;
-    const Bytes chunk = ByteWriter().Start(110124, 0).Append(body.bytes).End().Start(7, 7).End().bytes;
-    EXPECT_EQ(ReadInto(again, chunk), read);
+    EXPECT_EQ(ReadInto(again, Record("[110124,0 " + std::string(body) + "] [7,7 ]")), read);
     EXPECT_EQ(again.GetDraws().GetCount(), draws);
   }
   AssertionCounter silent;

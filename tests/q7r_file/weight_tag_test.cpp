@@ -5,6 +5,7 @@
 
 #include "q7r_file/tag_bytes.h"
 #include "support/counting_memory.h"
+#include "support/record_samples.h"
 #include "support/text.h"
 #include "torvane/objects/base_object.h"
 #include "torvane/tags/joint_tree.h"
@@ -19,34 +20,23 @@ using namespace _torvane_;
 // A matrix with the offset (n, 0, 0) and axes of length `scale`.
 Matrix Frame(Real n, Real scale) { return {{n, 0, 0}, {scale, 0, 0}, {0, scale, 0}, {0, 0, scale}}; }
 
-void PutFrame(ByteWriter& writer, Real n, Real scale)
+// The same in a file.
+std::string FrameText(int n, const std::string& s)
 {
-  writer.Matrix({n, 0, 0, scale, 0, 0, 0, scale, 0, 0, 0, scale});
+  return "Y" + std::to_string(n) + ",0,0," + s + ",0,0,0," + s + ",0,0,0," + s + " ";
 }
 
-// The values of a joint up to its entries; 2.0 and 8.0 are the scales of bind and rest pose.
-void PutJoint(ByteWriter& writer, Long level, Real bind)
+// The values of a joint; 2 and 8 are the scales of bind and rest pose.
+std::string JointText(Long level, int bind)
 {
-  if (level >= 1)
-    writer.Long(99);
-  writer.Memory(Link(0));
-  PutFrame(writer, bind, 2.0);
-  writer.Real(2.5);
-  writer.Long(0).Long(0).Long(1).ArrayHead(3, 12).I32(3).I32(3).I32(0);
-  writer.ULong(0).ULong(0).ULong(0).ULong(0).Long(0).Long(1).ArrayHead(2, 2).U16(0xFFFF);
-  writer.Long(5).ULong(1).ULong(2).ULong(3).ULong(1).Long(4).Long(1).ArrayHead(3, 4).I32(-9);
-  writer.Long(1).ULong(21).Memory(Link(0)).Long(22);
-  if (level == 4)
-    PutFrame(writer, bind, 8.0);
+  return (level >= 1 ? "L99 k " : "k ") + FrameText(bind, "2") +
+         "R2.5 L0 L0 L1 A3:3,3,0 U0 U0 U0 U0 L0 L1 A2:-1 L5 U1 U2 U3 U1 L4 L1 A3:-9 L1 U21 k L22 " +
+         (level == 4 ? FrameText(bind, "8") : "");
 }
 
-void PutRest(ByteWriter& writer, Long level, Real n)
+std::string RestText(Long level, int n) // with a later writer's value
 {
-  writer.Start(1021281, 3);
-  PutFrame(writer, n, 8.0);
-  if (level >= 6)
-    writer.Memory(Link(0));
-  writer.Long(7).End(); // a later writer's value
+  return "[1021281,3 " + FrameText(n, "8") + (level >= 6 ? "k L7 ] " : "L7 ] ");
 }
 
 // An object that holds a weight tag, and its data.
@@ -76,10 +66,10 @@ std::string RowOf(int kind, BaseObject& object)
 }
 
 // Reads data of a level that lie in a chunk; true if they were taken and the chunk's end came next.
-bool ReadData(WeightTagData& data, Long level, const Bytes& body, bool expected = true)
+bool ReadData(WeightTagData& data, Long level, const std::string& body, bool expected = true)
 {
   AssertionCounter silence;
-  MemoryReadFile memory(ByteWriter().Header().Append(body).End().bytes);
+  MemoryReadFile memory(ByteWriter().Header().Append(Record(body)).End().bytes);
   EXPECT_EQ(data.ReadData(memory.file, kChunkNodeData, level), expected);
   return memory.file.SkipToEndChunk() && memory.file.GetFile().GetRemaining() == 0;
 }
@@ -100,17 +90,10 @@ TEST(WeightTag, ReadsTheDataOfEveryLevel)
 {
   for (Long level = 0; level <= 7; ++level) {
     Rig rig;
-    ByteWriter body;
-    body.Long(2);
-    if (level >= 1)
-      PutFrame(body, 4, 0.5);
-    PutJoint(body, level, 1);
-    PutJoint(body, level, 3);
-    if (level >= 5)
-      body.Long(1); // in place of the first joint's chunk, which then is as it was
-    if (level >= 5)
-      PutRest(body, level, 16);
-    ASSERT_TRUE(ReadData(*rig.data, level, body.Long(1).bytes)) << level;
+    std::string body = "L2 " + (level >= 1 ? FrameText(4, "0.5") : "") + JointText(level, 1) + JointText(level, 3);
+    if (level >= 5) // a value in place of the first joint's chunk, which then is as it was
+      body += "L1 " + RestText(level, 16);
+    ASSERT_TRUE(ReadData(*rig.data, level, body + "L1")) << level;
     EXPECT_EQ(rig.data->GetReadLevel(), level);
     EXPECT_EQ(rig.data->GetGlobalMatrix(), level >= 1 ? Frame(4, 0.5) : Matrix());
     EXPECT_EQ(rig.data->GetGlobalInverse(), level >= 1 ? Frame(-8, 2) : Matrix());
@@ -137,24 +120,13 @@ TEST(WeightTag, ReadsTheDataOfEveryLevel)
 TEST(WeightTag, StaysInStepWithDamagedData)
 {
   Rig rig;
-  ByteWriter none; // no chunk at all behind the joints
-  none.Long(1).IdentityMatrix();
-  PutJoint(none, 6, 1);
-  EXPECT_TRUE(ReadData(*rig.data, 6, none.bytes));
-  ByteWriter other = none;
-  EXPECT_TRUE(ReadData(*rig.data, 6, other.Start(1021282, 1).Long(1).End().bytes, false));
-  PutRest(none, 6, 1);
-  for (std::size_t cut = 0; cut < none.bytes.size(); ++cut) {
-    AssertionCounter silence;
-    ByteWriter whole;
-    whole.Header().Append({none.bytes.begin(), none.bytes.begin() + static_cast<std::ptrdiff_t>(cut)});
-    MemoryReadFile memory(whole.bytes);
-    EXPECT_FALSE(rig.data->ReadData(memory.file, kChunkNodeData, 6)) << cut;
-  }
+  const std::string none = "L1 " + FrameText(0, "1") + JointText(6, 1); // no chunk at all behind the joints
+  EXPECT_TRUE(ReadData(*rig.data, 6, none));
+  EXPECT_TRUE(ReadData(*rig.data, 6, none + "[1021282,1 L1 ]", false));
   for (Long count : {2147483647, -1, 40}) {
     counting_memory::ResetPeak();
     const LLong before = counting_memory::Get().bytes;
-    ReadData(*rig.data, 6, ByteWriter().Long(count).IdentityMatrix().Append(Bytes(500, 11)).bytes, false);
+    ReadData(*rig.data, 6, "L" + std::to_string(count) + " Y0 200( X0B0B )", false);
     EXPECT_LT(counting_memory::Get().peakBytes - before, 100000);
   }
 }

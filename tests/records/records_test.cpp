@@ -8,6 +8,7 @@
 #include "support/every_failed_allocation.h"
 #include "support/memory_file.h"
 #include "support/record_samples.h"
+#include "support/text.h"
 #include "torvane/memory/owned.h"
 #include "torvane/tags/compositing_tag.h"
 #include "torvane/values/ge_data.h"
@@ -67,21 +68,28 @@ GeListNode* CopyOf(GeListNode& node, const RecordSample& sample)
   return copy;
 }
 
-// The values that are marked by a parameter, against that parameter.
+// The values that are told to be a parameter or an entry, against it.
 void CheckParameters(GeListNode& node, const std::vector<RecordValue>& values)
 {
   int depth = 0;
   for (const RecordValue& value : values) {
     depth += value.kind == '[' ? 1 : value.kind == ']' ? -1 : 0;
-    const std::size_t at = value.text.find('@');
-    if (at == std::string::npos || depth > 0)
+    if (value.origin == ' ' || depth > 0)
       continue;
+    SCOPED_TRACE(value.id);
     GeData data;
-    ASSERT_TRUE(node.GetParameterById(std::stoi(value.text.substr(at + 1)), data)) << value.text;
+    if (value.origin == '%')
+      data = NodeCast<BaseList2D>(&node)->GetDataInstance().GetData(value.id);
+    else
+      ASSERT_TRUE(node.GetParameterById(value.id, data));
+    if (value.kind == 'S') {
+      EXPECT_EQ(Utf8(data.GetString()), value.text);
+      continue;
+    }
     const double number = value.kind == 'V'   ? data.GetVector().x
                           : value.kind == 'T' ? data.GetTime().Get()
                                               : data.GetReal();
-    EXPECT_TRUE(value.kind == 'S' || number == std::stod(value.text)) << value.text << " but " << number;
+    EXPECT_EQ(number, std::stod(value.text));
   }
 }
 
@@ -122,6 +130,7 @@ TEST(Records, KeepEachValueByItself)
       const Bytes chunk = Chunk(sample.chunk, sample.level, changed);
       const NodePtr node(sample.make());
       EXPECT_TRUE(Read(*node, sample, chunk)) << sample.name << ", value " << i;
+      CheckParameters(*node, changed);
       EXPECT_EQ(Difference(*node, chunk), "") << sample.name << ", value " << i;
     }
   }

@@ -78,12 +78,24 @@ void PutContainer(ByteWriter& w, const std::string& text)
   w.End();
 }
 
-void PutMatrix(ByteWriter& w, double first)
+void PutMatrix(ByteWriter& w, const std::string& text)
 {
+  const std::vector<double> told = Numbers(text);
   double numbers[12];
-  for (double& number : numbers)
-    number = first++;
+  for (std::size_t i = 0; i < 12; ++i)
+    numbers[i] = told.size() == 12 ? told[i] : told[0] + static_cast<double>(i);
   w.Matrix(numbers);
+}
+
+void PutVector(ByteWriter& w, const RecordValue& value)
+{
+  const std::vector<double> told = Numbers(value.text);
+  if (told.size() == 3)
+    w.Vector(told[0], told[1], told[2]);
+  else if (value.mark == '=')
+    w.Vector(told[0], told[0], told[0]);
+  else
+    w.Vector(told[0], told[0] + 0.5, told[0] - 0.25);
 }
 
 void PutValue(ByteWriter& w, const RecordValue& value, Long version)
@@ -112,13 +124,10 @@ void PutValue(ByteWriter& w, const RecordValue& value, Long version)
     w.Time(number(), 1);
     break;
   case 'V':
-    if (value.mark == '=')
-      w.Vector(number(), number(), number());
-    else
-      w.Vector(number(), number() + 0.5, number() - 0.25);
+    PutVector(w, value);
     break;
   case 'Y':
-    PutMatrix(w, number());
+    PutMatrix(w, text);
     break;
   case 'S':
     w.String(units);
@@ -130,7 +139,7 @@ void PutValue(ByteWriter& w, const RecordValue& value, Long version)
     w.Memory(Hex(text));
     break;
   case 'k':
-    w.Memory(std::string_view("alias2\0\0\0\0\0\0\0\0", 14));
+    w.Memory(std::string("alias2\0\0\0\0\0\0\0", 13) + static_cast<char>(number()));
     break;
   case 'K':
     PutContainer(w, text);
@@ -158,9 +167,13 @@ std::vector<RecordValue> ParseRecord(const std::string& body)
   std::istringstream words(Unfold(body));
   for (std::string word; words >> word;) {
     const bool marked = word.size() > 1 && std::string("=#").find(word[1]) != std::string::npos;
-    RecordValue value{word[0], marked ? word[1] : ' ', word.substr(marked ? 2 : 1)};
-    if (value.text.find('@') != std::string::npos)
-      value.mark = '@';
+    const std::size_t end = std::min(word.find_first_of("@%"), word.size());
+    const std::size_t start = marked ? 2 : 1;
+    RecordValue value{word[0], marked ? word[1] : ' ', word.substr(start, end - start), ' ', 0};
+    if (end < word.size()) {
+      value.origin = word[end];
+      value.id = std::stoi(word.substr(end + 1));
+    }
     values.push_back(value);
   }
   return values;
@@ -172,6 +185,11 @@ std::vector<std::uint8_t> RecordBytes(const std::vector<RecordValue>& values, Lo
   for (const RecordValue& value : values)
     PutValue(w, value, version);
   return w.bytes;
+}
+
+std::vector<std::uint8_t> Record(const std::string& body, Long version)
+{
+  return RecordBytes(ParseRecord(body), version);
 }
 
 bool ChangeValue(RecordValue& value)
