@@ -1,4 +1,5 @@
 #include <cmath>
+#include <tuple>
 
 #include <gtest/gtest.h>
 
@@ -39,21 +40,15 @@ TEST(Camera, HasProjectionViewFieldAndFocus)
 {
   const std::string film = R"("camera":{"type":"orthographic","filmSize":72,"focusDistance":{"k":720}},"pe":{"k":500})";
   Exported exported(Composition(Layer(13, "Plain", "", R"("pe":{"k":1000})") + "," + Layer(13, "Film", "", film)));
-  struct Case
-  {
-    const char* name;
-    Long projection;
-    Real aperture, field, focus, focalLength;
-  };
   // The zoom is as long as the composition is wide, or half of that; the focus distance follows it unless it is set.
-  const Case cases[] = {{"Plain", 0, 36, 2 * std::atan(0.5), 1000 * 25.4 / 72, 36},
-                        {"Film", 4, 25.4, kHalfPi, 254, 12.7}};
-  for (const Case& c : cases) {
-    EXPECT_EQ(exported.Parameter(c.name, 1001).GetLong(), c.projection) << c.name;
-    EXPECT_NEAR(exported.Parameter(c.name, 1006).GetReal(), c.aperture, 1e-9) << c.name;
-    EXPECT_NEAR(exported.Parameter(c.name, 1008).GetReal(), c.field, 1e-12) << c.name;
-    EXPECT_NEAR(exported.Parameter(c.name, 1010).GetReal(), c.focus, 1e-9) << c.name;
-    EXPECT_NEAR(exported.Object(c.name).GetDataInstance().GetReal(500), c.focalLength, 1e-9) << c.name;
+  const std::tuple<const char*, Long, Real, Real, Real, Real> cases[] = {
+      {"Plain", 0, 36, 2 * std::atan(0.5), 1000 * 25.4 / 72, 36}, {"Film", 4, 25.4, kHalfPi, 254, 12.7}};
+  for (const auto& [name, projection, aperture, field, focus, focalLength] : cases) {
+    EXPECT_EQ(exported.Parameter(name, 1001).GetLong(), projection) << name;
+    EXPECT_NEAR(exported.Parameter(name, 1006).GetReal(), aperture, 1e-9) << name;
+    EXPECT_NEAR(exported.Parameter(name, 1008).GetReal(), field, 1e-12) << name;
+    EXPECT_NEAR(exported.Parameter(name, 1010).GetReal(), focus, 1e-9) << name;
+    EXPECT_NEAR(exported.Object(name).GetDataInstance().GetReal(500), focalLength, 1e-9) << name;
   }
 }
 

@@ -1,3 +1,5 @@
+#include <tuple>
+
 #include <gtest/gtest.h>
 
 #include "export_fixture.h"
@@ -121,18 +123,12 @@ const std::string kCube = R"({"id":"cube","nm":"Cube","w":300,"h":200,"layers":[
 
 TEST(CompositionWalk, BuildsTheTreeThatTheHostShows)
 {
-  struct Case
-  {
-    const char* what;
-    std::string json;
-    const char* tree;
-  };
   const std::string flat = R"({"ty":1,"nm":"Flat","ind":1,"sw":9,"sh":9,"sc":"#fff","ks":{}})";
   const std::string cubeAsset = R"("assets":[)" + kCube + "]";
   const std::string outer =
       R"("assets":[)" + kCube + R"(,{"id":"outer","nm":"Outer","layers":[)" + Layer(0, "C1", "", R"("refId":"cube")") +
       "," + Layer(0, "C2", "", R"("refId":"cube","parent":8)") + "," + Layer(3, "N", "", R"("ind":8)") + "]}]";
-  const Case cases[] = {
+  const std::tuple<const char*, std::string, const char*> cases[] = {
       {"no layer", Composition(""), "Main"},
       {"layer order, parents, targets",
        Composition(Solid("A", "", R"("parent":3)") + "," + Solid("B") + "," + Layer(3, "N", "", R"("ind":3)") + "," +
@@ -153,12 +149,12 @@ TEST(CompositionWalk, BuildsTheTreeThatTheHostShows)
       {"a layer without a name has that of its source", Composition(Layer(0, "", "", R"("refId":"cube")"), cubeAsset),
        "Main(Cube(Front Pivot(Back)))"},
   };
-  for (const Case& c : cases) {
-    Exported exported(c.json);
-    EXPECT_TRUE(exported.succeeded) << c.what;
-    EXPECT_EQ(exported.Tree(), c.tree) << c.what;
-    EXPECT_EQ(exported.Root()->GetNext(), nullptr) << c.what;
-    EXPECT_TRUE(exported.host.Reports().empty()) << c.what;
+  for (const auto& [what, json, tree] : cases) {
+    Exported exported(json);
+    EXPECT_TRUE(exported.succeeded) << what;
+    EXPECT_EQ(exported.Tree(), tree) << what;
+    EXPECT_EQ(exported.Root()->GetNext(), nullptr) << what;
+    EXPECT_TRUE(exported.host.Reports().empty()) << what;
   }
 }
 

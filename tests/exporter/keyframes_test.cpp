@@ -1,4 +1,6 @@
 // Sampled animation: which frames are read, what their keys are, and which of them are left.
+#include <tuple>
+
 #include <gtest/gtest.h>
 
 #include "export_fixture.h"
@@ -41,14 +43,7 @@ TEST(Keyframes, AreAutomaticClampedSplineKeysOnThreeTracks)
 // and the single value at its start.
 TEST(Keyframes, CountFromCompositionTimeZero)
 {
-  struct Case
-  {
-    const char* what;
-    const char* timing;
-    const char* keys;
-    Real first;
-  };
-  const Case cases[] = {
+  const std::tuple<const char*, const char*, const char*, Real> cases[] = {
       {"from the start", R"("fr":25,"ip":0,"op":3)", "0:0 0.04:0.1 0.08:0.2 0.12:0.3", 0},
       {"a later work area", R"("fr":25,"ip":0,"op":20,"ae":{"workArea":[5,8]})", "0:0 0.04:0.1 0.08:0.2 0.12:0.3", 0.5},
       {"a work area before time 0", R"("fr":25,"ip":-5,"op":-3)", "0:0 0.04:0.1 0.08:0.2", -0.5},
@@ -61,10 +56,10 @@ TEST(Keyframes, CountFromCompositionTimeZero)
   };
   const std::string light = R"({"ty":14,"nm":"L","ks":{},"light":{"intensity":)" +
                             std::string(R"({"k":[{"t":-10,"s":[-100]},{"t":90,"s":[900]}]}}})");
-  for (const Case& c : cases) {
-    Exported exported("{" + std::string(c.timing) + R"(,"w":9,"h":9,"layers":[)" + light + "]}");
-    EXPECT_EQ(Keys(exported.Object("L"), kIntensity), c.keys) << c.what;
-    EXPECT_DOUBLE_EQ(exported.Parameter("L", kIntensity).GetReal(), c.first) << c.what;
+  for (const auto& [what, timing, keys, first] : cases) {
+    Exported exported("{" + std::string(timing) + R"(,"w":9,"h":9,"layers":[)" + light + "]}");
+    EXPECT_EQ(Keys(exported.Object("L"), kIntensity), keys) << what;
+    EXPECT_DOUBLE_EQ(exported.Parameter("L", kIntensity).GetReal(), first) << what;
   }
 }
 
@@ -97,13 +92,7 @@ TEST(Keyframes, AreThinnedByTheValuesBesideThem)
 
 TEST(Keyframes, AreMadeForWhatVaries)
 {
-  struct Case
-  {
-    const char* what;
-    const char* intensity;
-    const char* tracks;
-  };
-  const Case cases[] = {
+  const std::tuple<const char*, const char*, const char*> cases[] = {
       {"a constant", R"({"k":50})", ""},
       {"one key", R"({"k":[{"t":3,"s":[50]}]})", ""}, // sampled, but constant
       {"two keys", R"({"k":[{"t":3,"s":[50]},{"t":4,"s":[60]}]})", "Intensity:4"},
@@ -112,9 +101,9 @@ TEST(Keyframes, AreMadeForWhatVaries)
       {"an expression that doesn't", R"({"k":50,"x":"50"})", ""},
       {"an expression on keys", R"({"k":[{"t":3,"s":[50]},{"t":4,"s":[60]}],"x":"value"})", "Intensity:4"},
   };
-  for (const Case& c : cases) {
-    Exported exported(Composition(Layer(14, "L", "", std::string(R"("light":{"intensity":)") + c.intensity + "}")));
-    EXPECT_EQ(Tracks(exported.Object("L")), c.tracks) << c.what;
+  for (const auto& [what, intensity, tracks] : cases) {
+    Exported exported(Composition(Layer(14, "L", "", std::string(R"("light":{"intensity":)") + intensity + "}")));
+    EXPECT_EQ(Tracks(exported.Object("L")), tracks) << what;
   }
 }
 

@@ -1,5 +1,6 @@
 // The place of a layer's object: anchors, parents, rotation, targets, and what all kinds of layer share.
 #include <algorithm>
+#include <tuple>
 
 #include <gtest/gtest.h>
 
@@ -114,15 +115,8 @@ TEST(LayerRotation, BeginsWithItsKeys)
 
 TEST(Targets, AreMadeForUnturnedLayersThatLookAtTheirPointOfInterest)
 {
-  struct Case
-  {
-    const char* what;
-    std::string layer;
-    const char* tree;
-    Vector rotation;
-  };
   const std::string right = R"("p":{"k":[0,0,0]},"a":{"k":[100,0,0]})";
-  const Case cases[] = {
+  const std::tuple<const char*, std::string, const char*, Vector> cases[] = {
       {"camera", Layer(13, "L", right), "Main(L.Target L)", {}},
       {"spot", Layer(14, "L", right, R"("light":{"type":"spot"})"), "Main(L.Target L)", {}},
       {"parallel light", Layer(14, "L", right, R"("light":{"type":"parallel"})"), "Main(L)", {}},
@@ -132,22 +126,22 @@ TEST(Targets, AreMadeForUnturnedLayersThatLookAtTheirPointOfInterest)
       // Looking along +x, and then turned about z: the look comes first in the product.
       {"turned camera", Layer(13, "L", right + R"(,"rz":{"k":90})"), "Main(L)", {kHalfPi, -kHalfPi, 0}},
   };
-  for (const Case& c : cases) {
-    Exported exported(Composition(c.layer));
-    EXPECT_EQ(exported.Tree(), c.tree) << c.what;
+  for (const auto& [what, layer, tree, rotation] : cases) {
+    Exported exported(Composition(layer));
+    EXPECT_EQ(exported.Tree(), tree) << what;
     BaseObject& object = exported.Object("L");
     BaseTag* tag = object.GetTag(5676);
-    ASSERT_EQ(tag != nullptr, Find(exported.Root(), "L.Target") != nullptr) << c.what;
+    ASSERT_EQ(tag != nullptr, Find(exported.Root(), "L.Target") != nullptr) << what;
     if (tag) {
-      EXPECT_EQ(tag->GetDataInstance().GetLink(1001), &exported.Object("L.Target")) << c.what;
-      EXPECT_EQ(exported.Object("L.Target").GetType(), 5140) << c.what;
-      ExpectNear(exported.Object("L.Target").GetRelPos(), {100, 0, 0}, c.what);
+      EXPECT_EQ(tag->GetDataInstance().GetLink(1001), &exported.Object("L.Target")) << what;
+      EXPECT_EQ(exported.Object("L.Target").GetType(), 5140) << what;
+      ExpectNear(exported.Object("L.Target").GetRelPos(), {100, 0, 0}, what);
     }
-    const Matrix expected = AnglesToMatrix(c.rotation, 2);
+    const Matrix expected = AnglesToMatrix(rotation, 2);
     const Matrix actual = AnglesToMatrix(object.GetRelRot(), 2);
-    ExpectNear(actual.v1, expected.v1, c.what);
-    ExpectNear(actual.v2, expected.v2, c.what);
-    ExpectNear(actual.v3, expected.v3, c.what);
+    ExpectNear(actual.v1, expected.v1, what);
+    ExpectNear(actual.v2, expected.v2, what);
+    ExpectNear(actual.v3, expected.v3, what);
   }
 }
 

@@ -1,4 +1,5 @@
 #include <filesystem>
+#include <tuple>
 
 #include <gtest/gtest.h>
 
@@ -67,31 +68,25 @@ TEST(Planes, WearTheColourOfTheirSolid)
 
 TEST(Planes, ShowTheirFootageThroughABitmapShader)
 {
-  struct Case
-  {
-    const char* file;
-    Long files;
-    Long lastFrame;
-  };
   // The work area has seven frames.
-  const Case cases[] = {
+  const std::tuple<const char*, Long, Long> cases[] = {
       {"still.png", 1, 0}, {"frames_0000.jpg", 100, 99}, {"shot.mov", 1, 6},
       {"shot.AVI", 50, 6}, {"shot.mpg", 1, 6},           {"shot.mpeg", 1, 0},
       {"mov", 1, 0},       {"shot.mov.png", 4, 3},       {"shot.mp4", 1, 0},
   };
-  for (const Case& c : cases) {
+  for (const auto& [file, files, lastFrame] : cases) {
     Exported exported(Composition(Layer(2, "A", "", R"("refId":"a")"),
                                   R"("ae":{"workArea":[1,8]},"assets":[{"id":"a","u":"clips/","w":8,"h":6,"p":")" +
-                                      std::string(c.file) + R"(","ae":{"files":)" + std::to_string(c.files) + "}}]"));
+                                      std::string(file) + R"(","ae":{"files":)" + std::to_string(files) + "}}]"));
     Material* material = MaterialOf(exported.Object("A"));
-    ASSERT_NE(material, nullptr) << c.file;
+    ASSERT_NE(material, nullptr) << file;
     auto* shader = static_cast<BaseShader*>(material->GetDataInstance().GetLink(8000));
-    ASSERT_NE(shader, nullptr) << c.file;
-    EXPECT_EQ(shader, material->GetShaders()) << c.file;
-    EXPECT_EQ(shader->GetType(), 5833) << c.file;
+    ASSERT_NE(shader, nullptr) << file;
+    EXPECT_EQ(shader, material->GetShaders()) << file;
+    EXPECT_EQ(shader->GetType(), 5833) << file;
     EXPECT_EQ(Text(shader->BitmapFilename().GetString()),
-              std::filesystem::absolute("/footage/clips/").append(c.file).make_preferred().string());
-    EXPECT_EQ(shader->GetDataInstance().GetLong(2001, -1), c.lastFrame) << c.file;
+              std::filesystem::absolute("/footage/clips/").append(file).make_preferred().string());
+    EXPECT_EQ(shader->GetDataInstance().GetLong(2001, -1), lastFrame) << file;
   }
 }
 

@@ -1,3 +1,5 @@
+#include <tuple>
+
 #include <gtest/gtest.h>
 
 #include "exporter/walk/transform.h"
@@ -27,16 +29,7 @@ TEST(Transform, TurnsHostPixelsIntoSceneUnits)
   TransformRules shifted = plane;
   shifted.parentShift = ParentShift(200, 100);
   const TransformRules camera = {.lookAtTarget = true, .useRotation = true};
-  struct Case
-  {
-    const char* what;
-    LayerSample sample;
-    TransformRules rules;
-    Vector position;
-    Vector rotation;
-    Vector scale;
-  };
-  const Case cases[] = {
+  const std::tuple<const char*, LayerSample, TransformRules, Vector, Vector, Vector> cases[] = {
       {"anchor at the centre", {{10, 20, 30}, {50, 25, 0}, 0, 0, 0, none, full}, plane, {10, -20, 30}, none, {1, 1, 1}},
       {"anchor at the corner of a plane at half its size",
        {none, none, 0, 0, 0, none, {50, 50, 50}},
@@ -71,11 +64,11 @@ TEST(Transform, TurnsHostPixelsIntoSceneUnits)
        {1, 1, 1}},
       {"camera on its target", {{5, 6, 7}, {5, 6, 7}, 0, 0, 0, none, none}, camera, {5, -6, 7}, none, {1, 1, 1}},
   };
-  for (const Case& c : cases) {
-    const SceneTransform result = ConvertTransform(c.sample, c.rules, nullptr);
-    ExpectNear(result.position, c.position, c.what);
-    ExpectNear(result.rotation, c.rotation, c.what);
-    ExpectNear(result.scale, c.scale, c.what);
+  for (const auto& [what, sample, rules, position, rotation, scale] : cases) {
+    const SceneTransform result = ConvertTransform(sample, rules, nullptr);
+    ExpectNear(result.position, position, what);
+    ExpectNear(result.rotation, rotation, what);
+    ExpectNear(result.scale, scale, what);
   }
 }
 

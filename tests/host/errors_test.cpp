@@ -170,10 +170,7 @@ TEST(CompositionErrors, NameTheFileAndThePlace)
 
 TEST(CompositionErrors, NameThePlaceWithinWhatIsRead)
 {
-  const struct
-  {
-    std::string text, message;
-  } cases[] = {
+  const std::tuple<std::string, std::string> cases[] = {
       {Changed("/layers/0/ks/p", R"({"s": true, "x": 5})"), "/layers/0/ks/p/x: expected an object"},
       {Changed("/layers/0/ks/p", R"({"s": true, "z": {"k": [{"t": 0}]}})"), "/layers/0/ks/p/z/k/0/s: missing"},
       {Changed("/layers/1/pe", "{}"), "/layers/1/pe/k: missing"},
@@ -186,8 +183,8 @@ TEST(CompositionErrors, NameThePlaceWithinWhatIsRead)
       {"{\"w\": \"\xFF\"}", "byte 8 (line 1, column 8): not JSON"},
       {std::string(100000, '['), "nested deeper than 1000"},
   };
-  for (const auto& c : cases)
-    EXPECT_EQ("orbit.json: " + c.message, Refusal(c.text));
+  for (const auto& [text, message] : cases)
+    EXPECT_EQ("orbit.json: " + message, Refusal(text));
 }
 
 TEST(CompositionErrors, FindLoopsOfAnyLength)
@@ -262,11 +259,7 @@ TEST(CompositionWarnings, NameTheLayerAndGoOn)
 
 TEST(HostTexts, ConvertFromUtf8)
 {
-  const struct
-  {
-    const char* utf8;
-    std::u16string utf16;
-  } cases[] = {
+  const std::tuple<const char*, std::u16string> cases[] = {
       {"a\xC3\xA9\xE2\x82\xAC", u"a\u00e9\u20ac"},
       {"\xF0\x9F\x9A\x80", u"\U0001F680"},
       {"\xF4\x8F\xBF\xBF", u"\U0010FFFF"},
@@ -276,8 +269,8 @@ TEST(HostTexts, ConvertFromUtf8)
       {"\xE2\x82", u"\uFFFD\uFFFD"},                     // cut short
       {"\xF4\x90\x80\x80", u"\uFFFD\uFFFD\uFFFD\uFFFD"}, // beyond Unicode
   };
-  for (const auto& c : cases)
-    EXPECT_EQ(c.utf16, host::ToUtf16(c.utf8)) << c.utf8;
+  for (const auto& [utf8, utf16] : cases)
+    EXPECT_EQ(utf16, host::ToUtf16(utf8)) << utf8;
   EXPECT_EQ("\"a b\"", host::Quoted("a\nb"));
   // A cut falls between characters.
   EXPECT_EQ('"' + std::string(199, 'x') + "...\"", host::Quoted(std::string(199, 'x') + "\xE2\x82\xAC and more"));

@@ -4,6 +4,7 @@
 #include "host/model/timing.h"
 
 #include <cmath>
+#include <tuple>
 
 namespace
 {
@@ -26,12 +27,6 @@ Value PositionAt(const Stage& stage, double frame)
 
 TEST(PropertyValue, FollowsTheKindOfTheInterval)
 {
-  struct Case
-  {
-    const char* position;
-    double frame;
-    Value expected;
-  };
   const char* const linear = R"({"k": [{"t": 10, "s": [0, 10, 20]}, {"t": 20, "s": [100, 10, -20]}]})";
   const char* const hold = R"({"k": [{"t": 0, "s": [1, 2, 3], "h": 1}, {"t": 10, "s": [4, 5, 6]}]})";
   const char* const old = R"({"k": [{"t": 0, "s": [1, 2], "e": [5, 6]}, {"t": 8, "e": [7, 6]}, {"t": 16}]})";
@@ -44,7 +39,7 @@ TEST(PropertyValue, FollowsTheKindOfTheInterval)
   const char* const outOnly = R"({"k": [{"t": 0, "s": [0], "o": {"x": 0.9, "y": 0}}, {"t": 10, "s": [10]}]})";
   const char* const split = R"({"s": true, "x": {"k": [{"t": 0, "s": [0]}, {"t": 4, "s": [8]}]}, "y": {"k": 7},
                                 "z": {"k": [{"t": 0, "s": 1, "h": 1}, {"t": 2, "s": 9}]}})";
-  const Case cases[] = {
+  const std::tuple<const char*, double, Value> cases[] = {
       {R"({"k": [7, 8, 9]})", 3, {7, 8, 9}},
       {R"({"k": [7]})", 3, {7, 0, 0}},
       {R"({"k": 7})", 3, {7, 0, 0}},
@@ -67,9 +62,9 @@ TEST(PropertyValue, FollowsTheKindOfTheInterval)
       {split, 3, {6, 7, 9}},
       {R"({"s": true, "y": {"k": 5}})", 0, {0, 5, 0}},
   };
-  for (const Case& c : cases) {
-    SCOPED_TRACE(std::string(c.position) + " at " + std::to_string(c.frame));
-    ExpectNear(c.expected, PositionAt(WithPosition(c.position), c.frame), 1e-9);
+  for (const auto& [position, frame, expected] : cases) {
+    SCOPED_TRACE(std::string(position) + " at " + std::to_string(frame));
+    ExpectNear(expected, PositionAt(WithPosition(position), frame), 1e-9);
   }
 }
 

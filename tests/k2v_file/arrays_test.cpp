@@ -1,6 +1,7 @@
 #include <algorithm>
 #include <cstring>
 #include <random>
+#include <tuple>
 #include <vector>
 
 #include <gtest/gtest.h>
@@ -26,16 +27,15 @@ void Fill(LongArray& array, Long count)
 TEST(DynArray, GrowsByItsIncrementOrTwofold)
 {
   counting_memory::BalanceCheck balance;
-  struct Row
-  {
-    Long first, increment, count, capacity;
-  };
-  for (const Row& row : {Row{4, 0, 1, 4}, Row{4, 0, 5, 8}, Row{4, 0, 9, 16}, Row{4, 3, 5, 7}, Row{4, 3, 8, 10}}) {
-    LongArray array(row.first, row.increment);
-    Fill(array, row.count);
-    EXPECT_EQ(array.GetCapacity(), row.capacity);
+  for (const auto& [first, increment, count, capacity] :
+       {std::tuple<Long, Long, Long, Long>{4, 0, 1, 4}, std::tuple<Long, Long, Long, Long>{4, 0, 5, 8},
+        std::tuple<Long, Long, Long, Long>{4, 0, 9, 16}, std::tuple<Long, Long, Long, Long>{4, 3, 5, 7},
+        std::tuple<Long, Long, Long, Long>{4, 3, 8, 10}}) {
+    LongArray array(first, increment);
+    Fill(array, count);
+    EXPECT_EQ(array.GetCapacity(), capacity);
     array.Reset();
-    EXPECT_EQ(array.GetCapacity(), row.capacity);
+    EXPECT_EQ(array.GetCapacity(), capacity);
     array.Flush();
     EXPECT_EQ(array.GetCapacity(), 0);
   }
@@ -71,21 +71,16 @@ TEST(DynArray, EditsWithinItsBounds)
 
 TEST(DynArray, MovesInFrontOfTheElementAtTheTarget)
 {
-  struct Row
-  {
-    Long from, to;
-    std::vector<Long> values;
-  };
   const std::vector<Long> same = {0, 1, 2, 3};
-  const Row rows[] = {
+  const std::tuple<Long, Long, std::vector<Long>> rows[] = {
       {0, 3, {1, 2, 0, 3}}, {0, 4, {1, 2, 3, 0}}, {3, 0, {3, 0, 1, 2}}, {2, 1, {0, 2, 1, 3}}, {1, 1, same},
       {1, 2, same},         {0, 5, same},         {-1, 2, same},        {4, 1, same},         {2, -1, same},
   };
-  for (const Row& row : rows) {
+  for (const auto& [from, to, values] : rows) {
     LongArray array;
     Fill(array, 4);
-    array.Move(row.from, row.to);
-    EXPECT_EQ(Values(array), row.values) << row.from << " to " << row.to;
+    array.Move(from, to);
+    EXPECT_EQ(Values(array), values) << from << " to " << to;
   }
 }
 

@@ -1,6 +1,7 @@
 #include "torvane/pictures/bitmap.h"
 
 #include <array>
+#include <tuple>
 
 #include <gtest/gtest.h>
 
@@ -55,19 +56,15 @@ std::string DecodeRuns(Long bits, Long width, Long height, const char* hex)
 
 TEST(Pictures, HaveSizesUpToTheLimit)
 {
-  struct Case
-  {
-    Long width, height, depth, result, gotWidth, gotHeight;
-  };
-  const Case cases[] = {{0, 5, kDepthColor, 1, 1, 5},          {7, -1, kDepthGrey, 1, 7, 1},
-                        {128000, 1, kDepthGrey, 1, 128000, 1}, {128001, 1, kDepthGrey, -2, 4, 4},
-                        {1, 128001, kDepthGrey, -2, 4, 4},     {1, 1, 3, -2, 4, 4}};
-  for (const Case& c : cases) {
+  const std::tuple<Long, Long, Long, Long, Long, Long> cases[] = {
+      {0, 5, kDepthColor, 1, 1, 5},      {7, -1, kDepthGrey, 1, 7, 1},      {128000, 1, kDepthGrey, 1, 128000, 1},
+      {128001, 1, kDepthGrey, -2, 4, 4}, {1, 128001, kDepthGrey, -2, 4, 4}, {1, 1, 3, -2, 4, 4}};
+  for (const auto& [width, height, depth, result, gotWidth, gotHeight] : cases) {
     Bitmap bitmap;
     bitmap.Init(4, 4, kDepthGrey);
-    EXPECT_EQ(c.result, bitmap.Init(c.width, c.height, c.depth));
-    EXPECT_EQ(c.gotWidth, bitmap.GetBw());
-    EXPECT_EQ(c.gotHeight, bitmap.GetBh());
+    EXPECT_EQ(result, bitmap.Init(width, height, depth));
+    EXPECT_EQ(gotWidth, bitmap.GetBw());
+    EXPECT_EQ(gotHeight, bitmap.GetBh());
   }
 }
 

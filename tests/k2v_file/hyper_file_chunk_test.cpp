@@ -1,4 +1,6 @@
 // Skipping, raw chunks and containers.
+#include <tuple>
+
 #include <gtest/gtest.h>
 
 #include "k2v_file/hyper_file_bytes.h"
@@ -100,21 +102,18 @@ TEST(HyperFileSkip, PassesOverEveryValueInMemoryAndOnDisk)
 TEST(HyperFileSkip, CountsSomeOldArraysByAnotherElementSize)
 {
   AssertionCounter quiet;
-  struct Row
-  {
-    std::int32_t version;
-    std::uint8_t precision;
-    std::uint8_t tag;
-    std::uint32_t length;
-    std::size_t body;
-  };
-  for (const Row& row : {Row{11924, 0, 133, 25, 50}, Row{11925, 0, 133, 25, 25}, Row{11924, 1, 133, 25, 25},
-                         Row{11924, 0, 136, 100, 168}, Row{11925, 0, 136, 100, 100}, Row{11924, 1, 136, 100, 100},
-                         Row{11924, 0, 134, 100, 100}}) {
+  for (const auto& [version, precision, tag, length, body] :
+       {std::tuple<std::int32_t, std::uint8_t, std::uint8_t, std::uint32_t, std::size_t>{11924, 0, 133, 25, 50},
+        std::tuple<std::int32_t, std::uint8_t, std::uint8_t, std::uint32_t, std::size_t>{11925, 0, 133, 25, 25},
+        std::tuple<std::int32_t, std::uint8_t, std::uint8_t, std::uint32_t, std::size_t>{11924, 1, 133, 25, 25},
+        std::tuple<std::int32_t, std::uint8_t, std::uint8_t, std::uint32_t, std::size_t>{11924, 0, 136, 100, 168},
+        std::tuple<std::int32_t, std::uint8_t, std::uint8_t, std::uint32_t, std::size_t>{11925, 0, 136, 100, 100},
+        std::tuple<std::int32_t, std::uint8_t, std::uint8_t, std::uint32_t, std::size_t>{11924, 1, 136, 100, 100},
+        std::tuple<std::int32_t, std::uint8_t, std::uint8_t, std::uint32_t, std::size_t>{11924, 0, 134, 100, 100}}) {
     ByteWriter writer;
-    writer.Header("Q7R6", row.version, row.precision).U8(row.tag).U32(row.length);
-    MemoryReadFile read(Filler(writer, row.body).End().Long(77).bytes);
-    EXPECT_TRUE(SkipsTo77(read.file)) << row.version << " " << int{row.tag};
+    writer.Header("Q7R6", version, precision).U8(tag).U32(length);
+    MemoryReadFile read(Filler(writer, body).End().Long(77).bytes);
+    EXPECT_TRUE(SkipsTo77(read.file)) << version << " " << int{tag};
   }
   // Of a large memory block only the upper half of the length is read.
   MemoryReadFile large(ByteWriter().Header().U8(139).I64(3).Raw("abc").End().Long(77).bytes);
@@ -125,13 +124,7 @@ TEST(HyperFileSkip, CountsSomeOldArraysByAnotherElementSize)
 TEST(HyperFileSkip, TellsAChunkThatDoesNotEnd)
 {
   AssertionCounter quiet;
-  struct Row
-  {
-    Bytes rest;
-    Long error;
-    Long cause;
-  };
-  const Row rows[] = {
+  const std::tuple<Bytes, Long, Long> rows[] = {
       {ByteWriter().Long(1).bytes, FILEERROR_NONE, FILEERROR_NONE}, // ends between values: no error
       {ByteWriter().Start(1, 1).End().bytes, FILEERROR_NONE, FILEERROR_NONE},
       {{}, FILEERROR_PREMATURE_END, FILEERROR_READ},
@@ -143,16 +136,16 @@ TEST(HyperFileSkip, TellsAChunkThatDoesNotEnd)
   };
   TempFolder folder;
   Filename path((folder / "cut.q7r").c_str());
-  for (const Row& row : rows) {
-    SCOPED_TRACE(ToHex(row.rest));
-    MemoryReadFile read(WithHeader(row.rest));
-    WriteWholeFile(folder / "cut.q7r", WithHeader(row.rest));
+  for (const auto& [rest, error, cause] : rows) {
+    SCOPED_TRACE(ToHex(rest));
+    MemoryReadFile read(WithHeader(rest));
+    WriteWholeFile(folder / "cut.q7r", WithHeader(rest));
     HyperFile disk;
     ASSERT_TRUE(disk.Open(kSceneIdent, path, kHyperFileRead));
     for (HyperFile* file : {&read.file, &disk}) {
       EXPECT_FALSE(file->SkipToEndChunk());
-      EXPECT_EQ(file->GetError(), row.error);
-      EXPECT_EQ(file->GetProblem().code, row.cause);
+      EXPECT_EQ(file->GetError(), error);
+      EXPECT_EQ(file->GetProblem().code, cause);
     }
   }
 }
@@ -253,23 +246,18 @@ TEST(HyperFileContainer, ReplacesElementsUnlessItIsFlushed)
 TEST(HyperFileContainer, RefusesWhatIsNoContainer)
 {
   AssertionCounter quiet;
-  struct Row
-  {
-    Bytes bytes;
-    bool good;
-    Long error;
-  };
-  for (const Row& row : {Row{ByteWriter().Start(132, 0).Long(5).End().bytes, true, FILEERROR_NONE},
-                         Row{ByteWriter().Start(133, 1).Long(5).End().bytes, false, FILEERROR_WRONG_VALUE},
-                         Row{ByteWriter().Long(5).bytes, false, FILEERROR_WRONG_VALUE},
-                         Row{ByteWriter().Start(132, 1).Real(5).End().bytes, false, FILEERROR_WRONG_VALUE},
-                         Row{ByteWriter().Start(132, 1).Long(5).Real(1).End().bytes, false, FILEERROR_NONE}}) {
-    SCOPED_TRACE(ToHex(row.bytes));
-    MemoryReadFile read(WithHeader(row.bytes));
+  for (const auto& [bytes, good, error] :
+       {std::tuple<Bytes, bool, Long>{ByteWriter().Start(132, 0).Long(5).End().bytes, true, FILEERROR_NONE},
+        std::tuple<Bytes, bool, Long>{ByteWriter().Start(133, 1).Long(5).End().bytes, false, FILEERROR_WRONG_VALUE},
+        std::tuple<Bytes, bool, Long>{ByteWriter().Long(5).bytes, false, FILEERROR_WRONG_VALUE},
+        std::tuple<Bytes, bool, Long>{ByteWriter().Start(132, 1).Real(5).End().bytes, false, FILEERROR_WRONG_VALUE},
+        std::tuple<Bytes, bool, Long>{ByteWriter().Start(132, 1).Long(5).Real(1).End().bytes, false, FILEERROR_NONE}}) {
+    SCOPED_TRACE(ToHex(bytes));
+    MemoryReadFile read(WithHeader(bytes));
     BaseContainer container(3);
-    EXPECT_EQ(read.file.ReadContainer(container, true), row.good);
-    EXPECT_EQ(read.file.GetError(), row.error);
-    if (row.good) { // a level below 1 leaves the rest unread
+    EXPECT_EQ(read.file.ReadContainer(container, true), good);
+    EXPECT_EQ(read.file.GetError(), error);
+    if (good) { // a level below 1 leaves the rest unread
       Long unread = 0;
       EXPECT_TRUE(container.GetId() == 3 && read.file.ReadLong(unread) && unread == 5);
     }

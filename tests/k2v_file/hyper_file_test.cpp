@@ -4,6 +4,7 @@
 #include <cstring>
 #include <limits>
 #include <thread>
+#include <tuple>
 
 #include <gtest/gtest.h>
 
@@ -238,18 +239,14 @@ TEST(HyperFile, HoldsRealsAsFloatsInSinglePrecision)
 
 TEST(HyperFile, OpensEachMagicWithItsPrecision)
 {
-  struct Row
-  {
-    const char* magic;
-    bool single;
-  };
   EXPECT_EQ(ToHex(WriteToMemory([](HyperFile&) {}, true)), "51 51 37 52 51 37 52 36 00 00 32 C8 00");
-  for (const Row& row : {Row{"YQ7R", false}, {"XQ7R", true}, {"6Q7R", true}, {"AQ7R", true}, {"8Q7R", true}}) {
-    MemoryReadFile read(ByteWriter().Raw(row.magic).Raw("Q7R6").Long(5).bytes);
+  for (const auto& [magic, single] :
+       {std::tuple<const char*, bool>{"YQ7R", false}, {"XQ7R", true}, {"6Q7R", true}, {"AQ7R", true}, {"8Q7R", true}}) {
+    MemoryReadFile read(ByteWriter().Raw(magic).Raw("Q7R6").Long(5).bytes);
     Long value = 0;
-    EXPECT_TRUE(read.opened && read.file.ReadLong(value) && value == 5) << row.magic;
-    EXPECT_EQ(read.file.IsSinglePrecision(), row.single) << row.magic;
-    EXPECT_EQ(read.file.GetFileVersion(), 6000) << row.magic;
+    EXPECT_TRUE(read.opened && read.file.ReadLong(value) && value == 5) << magic;
+    EXPECT_EQ(read.file.IsSinglePrecision(), single) << magic;
+    EXPECT_EQ(read.file.GetFileVersion(), 6000) << magic;
   }
   for (std::uint8_t precision : FromHex("00 01 07")) {
     MemoryReadFile read(ByteWriter().Header("Vlek", 7499, precision).bytes, kPaintTextureIdent);

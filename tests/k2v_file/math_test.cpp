@@ -1,5 +1,6 @@
 #include <cmath>
 #include <random>
+#include <tuple>
 #include <vector>
 
 #include <gtest/gtest.h>
@@ -109,12 +110,7 @@ TEST(Rotation, AnglesComeBackFromAnyScaledMatrix)
 TEST(Rotation, AnglesSurviveGimbalLock)
 {
   constexpr Real q = kHalfPi;
-  struct Row
-  {
-    Long order;
-    Vector angles, result;
-  };
-  const Row rows[] = {
+  const std::tuple<Long, Vector, Vector> rows[] = {
       {0, {q, 0.3, 0}, {q, 0.3, 0}},
       {0, {-q, 0.3, 0}, {-q, kTwoPi + 0.3, 0}},
       {1, {0, 0.3, q}, {0, 0.3, q}},
@@ -135,9 +131,9 @@ TEST(Rotation, AnglesSurviveGimbalLock)
       {6, {-1, 0.5, -2}, {kTwoPi - 1, 0.5, kTwoPi - 2}},
       {6, {2, 0.5, 1}, {2, 0.5, 1}},
   };
-  for (const Row& row : rows) {
-    SCOPED_TRACE(testing::Message() << "order " << row.order << " angles " << row.angles.x << " " << row.angles.y);
-    ExpectNear(MatrixToAngles(AnglesToMatrix(row.angles, row.order), row.order), row.result, 1e-7);
+  for (const auto& [order, angles, result] : rows) {
+    SCOPED_TRACE(testing::Message() << "order " << order << " angles " << angles.x << " " << angles.y);
+    ExpectNear(MatrixToAngles(AnglesToMatrix(angles, order), order), result, 1e-7);
   }
   for (Long order : kOrders) {
     const Vector angles = MatrixToAngles(Matrix({}, {}, {}, {}), order);
@@ -219,11 +215,7 @@ TEST(SmallMath, StaysWithinItsRanges)
 
 TEST(Colours, ConvertBetweenRgbAndHsv)
 {
-  struct Row
-  {
-    Vector rgb, hsv;
-  };
-  const Row rows[] = {
+  const std::tuple<Vector, Vector> rows[] = {
       {{1, 0, 0}, {0, 1, 1}},
       {{1, 1, 0}, {1.0 / 6, 1, 1}},
       {{0, 0.5, 0}, {1.0 / 3, 1, 0.5}},
@@ -233,9 +225,9 @@ TEST(Colours, ConvertBetweenRgbAndHsv)
       {{0.25, 0.25, 0.25}, {0, 0, 0.25}},
       {{0, 0, 0}, {0, 0, 0}},
   };
-  for (const Row& row : rows) {
-    ExpectNear(RgbToHsv(row.rgb), row.hsv);
-    ExpectNear(HsvToRgb(row.hsv), row.rgb);
+  for (const auto& [rgb, hsv] : rows) {
+    ExpectNear(RgbToHsv(rgb), hsv);
+    ExpectNear(HsvToRgb(hsv), rgb);
   }
   EXPECT_EQ(HsvToRgb({1, 1, 1}), Vector(1, 0, 0));
   EXPECT_EQ(RgbToHsv({-1, 0, -2}), Vector());

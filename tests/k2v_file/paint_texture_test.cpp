@@ -1,6 +1,7 @@
 #include "torvane/pictures/paint_texture.h"
 
 #include <random>
+#include <tuple>
 
 #include <gtest/gtest.h>
 
@@ -138,12 +139,7 @@ const char* const kMade = "image 300x1 depth 4; alpha 0 300x1";
 
 TEST(RunCoding, PacksByHand)
 {
-  const struct
-  {
-    const char* name;
-    Bytes bytes;
-    std::string packed;
-  } cases[] = {
+  const std::tuple<const char*, Bytes, std::string> cases[] = {
       {"nothing", {}, ""},
       {"one", {7}, "00 07"},
       {"two alike are no run", {7, 7}, "01 07 07"},
@@ -153,14 +149,14 @@ TEST(RunCoding, PacksByHand)
       {"300 alike", Bytes(300, 9), "81 09 81 09 D5 09"},
       {"two behind a whole run", Bytes(130, 9), "81 09 01 09 09"},
   };
-  for (const auto& c : cases) {
-    SCOPED_TRACE(c.name);
-    EXPECT_EQ(c.packed, ToHex(Pack(c.bytes)));
-    if (!c.bytes.empty()) {
-      EXPECT_EQ(ToHex(c.bytes), Unpack(Pack(c.bytes), c.bytes.size()));
-      const auto size = static_cast<LLong>(Pack(c.bytes).size());
-      EXPECT_EQ(Pack(c.bytes), Pack(c.bytes, size));
-      EXPECT_EQ(Bytes(), Pack(c.bytes, size - 1)); // over the limit
+  for (const auto& [name, bytes, packed] : cases) {
+    SCOPED_TRACE(name);
+    EXPECT_EQ(packed, ToHex(Pack(bytes)));
+    if (!bytes.empty()) {
+      EXPECT_EQ(ToHex(bytes), Unpack(Pack(bytes), bytes.size()));
+      const auto size = static_cast<LLong>(Pack(bytes).size());
+      EXPECT_EQ(Pack(bytes), Pack(bytes, size));
+      EXPECT_EQ(Bytes(), Pack(bytes, size - 1)); // over the limit
     }
   }
   // Groups of plain bytes are full with 128.
@@ -260,11 +256,7 @@ TEST(PaintTextures, TurnRowsGreyByTheirType)
     }
     return w;
   };
-  const struct
-  {
-    Long type, width, components;
-    const char* row;
-  } cases[] = {
+  const std::tuple<Long, Long, Long, const char*> cases[] = {
       {2, 3, 1, "; row 0 at 7,5: 0A 14 1F"},
       {3, 2, 2, "; row 0 at 7,5: 14 64"},
       {4, 2, 3, "; row 0 at 7,5: 14 6E"}, // (10 + 20 + 31) / 3, (100 + 200 + 31) / 3
@@ -275,10 +267,9 @@ TEST(PaintTextures, TurnRowsGreyByTheirType)
       {2, 0, 1, ""},
       {2, 2, 0, ""},
   };
-  for (const auto& c : cases) {
-    SCOPED_TRACE(std::to_string(c.type) + ", " + std::to_string(c.components));
-    EXPECT_EQ(std::string(kMade) + c.row,
-              Load(AlphaFile(c.type, c.width, 1, c.components, rows(c.width, c.components))));
+  for (const auto& [type, width, components, row] : cases) {
+    SCOPED_TRACE(std::to_string(type) + ", " + std::to_string(components));
+    EXPECT_EQ(std::string(kMade) + row, Load(AlphaFile(type, width, 1, components, rows(width, components))));
   }
 }
 
@@ -304,12 +295,7 @@ TEST(PaintTextures, FailOnWhatCannotBe)
   lists.Append(start).Start(599, 0);
   for (int i = 0; i < 4000; ++i)
     lists.Start(110100, 0);
-  const struct
-  {
-    const char* name;
-    Bytes bytes;
-    std::string result;
-  } cases[] = {
+  const std::tuple<const char*, Bytes, std::string> cases[] = {
       {"a scene file", ByteWriter().Header("Q7R6").bytes, "error -100"},
       {"pixels of an older form", ByteWriter().Append(start).Start(kPixels, 1).End().End().bytes, "error -7"},
       {"a string for a size", ByteWriter().Append(start).Start(kTexture, 1).String(u"4").End().End().bytes,
@@ -322,9 +308,9 @@ TEST(PaintTextures, FailOnWhatCannotBe)
   };
   const counting_memory::BalanceCheck balance;
   AssertionCounter quiet;
-  for (const auto& c : cases) {
-    SCOPED_TRACE(c.name);
-    EXPECT_EQ(c.result, Load(c.bytes));
+  for (const auto& [name, bytes, result] : cases) {
+    SCOPED_TRACE(name);
+    EXPECT_EQ(result, Load(bytes));
   }
   Client refuses;
   refuses.refusesImage = true;
@@ -334,23 +320,20 @@ TEST(PaintTextures, FailOnWhatCannotBe)
 // Rows that are packed as well as can be: 64 times the size of the file.
 TEST(PaintTextures, TakeLittleMemoryForTheirRows)
 {
-  const struct
-  {
-    Long type, components;
-  } cases[] = {{2, 1}, {3, 2}, {4, 3}, {5, 4}};
-  for (const auto& c : cases) {
+  const std::tuple<Long, Long> cases[] = {{2, 1}, {3, 2}, {4, 3}, {5, 4}};
+  for (const auto& [type, components] : cases) {
     Bytes plane;
-    for (int i = 0; i < 100000 / c.components; ++i)
+    for (int i = 0; i < 100000 / components; ++i)
       plane.insert(plane.end(), {129, 7});
     ByteWriter row;
-    for (Long i = 0; i < c.components; ++i)
+    for (Long i = 0; i < components; ++i)
       row.UChar(1).Memory(plane);
     const auto width = static_cast<Long>(plane.size() / 2 * 128);
-    const Bytes file = AlphaFile(c.type, width, 1, c.components, row);
+    const Bytes file = AlphaFile(type, width, 1, components, row);
     const LLong before = counting_memory::Get().bytes;
     counting_memory::ResetPeak();
     EXPECT_EQ(kMade, Load(file));
-    EXPECT_LE(counting_memory::Get().peakBytes - before, 100 * static_cast<LLong>(file.size())) << c.type;
+    EXPECT_LE(counting_memory::Get().peakBytes - before, 100 * static_cast<LLong>(file.size())) << type;
   }
 }
 

@@ -1,6 +1,7 @@
 #include "torvane/stream/stream_walker.h"
 
 #include <string>
+#include <tuple>
 #include <vector>
 
 #include <gtest/gtest.h>
@@ -68,11 +69,7 @@ TEST(StreamWalker, TellsEachValueInEveryPrecisionAndVersion)
 TEST(StreamWalker, TellsWhereAndWhyAFileIsDamaged)
 {
   const auto file = [] { return ByteWriter().Header().Start(5, 1).Start(6, 0); };
-  const struct
-  {
-    ByteWriter bytes;
-    const char* problem;
-  } rows[] = {
+  const std::tuple<ByteWriter, const char*> rows[] = {
       {file().Long(1), "byte 36, in chunk 5/6: the file ends inside a chunk"},
       {file().U8(9), "byte 31, in chunk 5/6: no value begins with the byte 9"},
       {file().U8(15).U8(0), "byte 31, in chunk 5/6: the file ends inside a value"},
@@ -81,8 +78,8 @@ TEST(StreamWalker, TellsWhereAndWhyAFileIsDamaged)
       {file().End().U8(1).I32(7), "byte 37, in chunk 5: the file ends inside a chunk's start"},
       {file().End().End().End(), "byte 33: a chunk ends that never began"},
   };
-  for (const auto& row : rows)
-    EXPECT_EQ(Walk(row.bytes.bytes).back(), row.problem);
+  for (const auto& [bytes, problem] : rows)
+    EXPECT_EQ(Walk(bytes.bytes).back(), problem);
   AssertionCounter quiet;
   const std::vector<std::uint8_t> cut = ByteWriter().Raw("QQ7R").bytes;
   Filename name;

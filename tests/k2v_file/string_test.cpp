@@ -1,5 +1,6 @@
 #include <functional>
 #include <string>
+#include <tuple>
 #include <utility>
 #include <vector>
 
@@ -24,12 +25,7 @@ TEST(String, KeepsCapacityAtMultiplesOf16AndReusesTheBlock)
   String text;
   EXPECT_EQ(text.GetCapacity(), 0);
   EXPECT_EQ(text.Data(), nullptr);
-  struct Step
-  {
-    std::function<void()> act;
-    Long length, capacity;
-  };
-  const Step steps[] = {
+  const std::tuple<std::function<void()>, Long, Long> steps[] = {
       {[&] { text.FillChars(1, u'a'); }, 1, 16},
       {[&] { text.FillChars(16, u'b'); }, 16, 16},
       {[&] { text.InsertChar(16, u'c'); }, 17, 32},
@@ -55,10 +51,10 @@ TEST(String, KeepsCapacityAtMultiplesOf16AndReusesTheBlock)
       {[&] { text.FillChars(0, u'a'); }, 0, 16},
       {[&] { text.Trim(); }, 0, 0},
   };
-  for (const Step& step : steps) {
-    step.act();
-    EXPECT_EQ(text.GetLength(), step.length);
-    EXPECT_EQ(text.GetCapacity(), step.capacity);
+  for (const auto& [act, length, capacity] : steps) {
+    act();
+    EXPECT_EQ(text.GetLength(), length);
+    EXPECT_EQ(text.GetCapacity(), capacity);
   }
 }
 
@@ -120,27 +116,22 @@ TEST(String, ComparesByTheFirstDifferenceThenByTheNextCharacter)
 TEST(String, FindsTheFirstAndTheLastPlace)
 {
   const String text("abcAbcab");
-  struct Row
-  {
-    const char* pattern;
-    Long start, first, firstUpper, last, lastUpper;
-  };
-  const Row rows[] = {
+  const std::tuple<const char*, Long, Long, Long, Long, Long> rows[] = {
       {"ab", 0, 0, 0, 0, 0},      {"ab", 1, 6, 3, 0, 0},   {"ab", 7, -1, -1, 6, 6}, // no longer fits: from the end
       {"abc", 1, -1, 3, 0, 0},    {"AB", 0, -1, 0, -1, 0}, {"", 0, -1, -1, -1, -1},
       {"ab", -2, -1, -1, -1, -1}, {"b", 8, -1, -1, 7, 7},  {"abcabcabc", 0, -1, -1, -1, -1},
       {"bc", 5, -1, -1, 4, 4},    {"C", 3, -1, 5, -1, 2},
   };
-  for (const Row& row : rows) {
+  for (const auto& [pattern, start, first, firstUpper, last, lastUpper] : rows) {
     using Find = Bool (String::*)(const String&, Long&, Long) const;
-    const std::pair<Find, Long> finds[] = {{&String::FindFirst, row.first},
-                                           {&String::FindFirstUpper, row.firstUpper},
-                                           {&String::FindLast, row.last},
-                                           {&String::FindLastUpper, row.lastUpper}};
+    const std::pair<Find, Long> finds[] = {{&String::FindFirst, first},
+                                           {&String::FindFirstUpper, firstUpper},
+                                           {&String::FindLast, last},
+                                           {&String::FindLastUpper, lastUpper}};
     for (const auto& [find, expected] : finds) {
       Long at = 0;
-      EXPECT_EQ((text.*find)(row.pattern, at, row.start), expected >= 0);
-      EXPECT_EQ(at, expected) << row.pattern << " from " << row.start;
+      EXPECT_EQ((text.*find)(pattern, at, start), expected >= 0);
+      EXPECT_EQ(at, expected) << pattern << " from " << start;
     }
   }
   Long at = 0;
@@ -157,12 +148,7 @@ TEST(String, FindsTheFirstAndTheLastPlace)
 TEST(String, EditsWithinItsBounds)
 {
   counting_memory::BalanceCheck balance;
-  struct Row
-  {
-    std::function<void(String&)> act;
-    const char* result;
-  };
-  const Row rows[] = {
+  const std::tuple<std::function<void(String&)>, const char*> rows[] = {
       {[](String& s) { s.Delete(1, 2); }, "adef"},
       {[](String& s) { s.Delete(4, 9); }, "abcd"},
       {[](String& s) { s.Delete(-1, 2); }, "abcdef"},
@@ -185,10 +171,10 @@ TEST(String, EditsWithinItsBounds)
       {[](String& s) { s[-1] = u'x'; }, "abcdef"},
       {[](String& s) { s = s.ToUpper(); }, "ABCDEF"},
   };
-  for (const Row& row : rows) {
+  for (const auto& [act, result] : rows) {
     String text("abcdef");
-    row.act(text);
-    EXPECT_EQ(Utf8(text), row.result);
+    act(text);
+    EXPECT_EQ(Utf8(text), result);
   }
   const String text("ab");
   EXPECT_EQ(text[2], 0);
@@ -211,12 +197,7 @@ TEST(StringEncoding, WritesEachCharacterInTheFormOfItsEncoding)
 {
   counting_memory::BalanceCheck balance;
   const String text = FromUnits(u"A\u00E9\u20AC\u4E2D");
-  struct Row
-  {
-    StringEncoding encoding;
-    std::string bytes;
-  };
-  const Row rows[] = {
+  const std::tuple<StringEncoding, std::string> rows[] = {
       {STRINGENCODING_DEFAULT, "A\xE9\x80_"},
       {STRINGENCODING_TABLE, "A\xE9\x80_"},
       {STRINGENCODING_ASCII, "A___"},
@@ -224,11 +205,11 @@ TEST(StringEncoding, WritesEachCharacterInTheFormOfItsEncoding)
       {STRINGENCODING_UTF8, "A\xC3\xA9\xE2\x82\xAC\xE4\xB8\xAD"},
       {STRINGENCODING_XML, "A&#x00E9;&#x20AC;&#x4E2D;"},
   };
-  for (const Row& row : rows) {
-    EXPECT_EQ(text.GetCStringLen(row.encoding), static_cast<Long>(row.bytes.size()));
-    char* copy = text.GetCStringCopy(row.encoding);
+  for (const auto& [encoding, bytes] : rows) {
+    EXPECT_EQ(text.GetCStringLen(encoding), static_cast<Long>(bytes.size()));
+    char* copy = text.GetCStringCopy(encoding);
     ASSERT_NE(copy, nullptr);
-    EXPECT_EQ(std::string(copy), row.bytes);
+    EXPECT_EQ(std::string(copy), bytes);
     GeFree(copy);
   }
   EXPECT_EQ(String().GetCStringCopy(), nullptr);
@@ -240,25 +221,18 @@ TEST(StringEncoding, WritesEachCharacterInTheFormOfItsEncoding)
 
 TEST(StringEncoding, NeverWritesPastATinyBuffer)
 {
-  struct Row
-  {
-    StringEncoding encoding;
-    std::u16string text;
-    Long size;
-    std::string bytes;
-  };
-  const Row rows[] = {
+  const std::tuple<StringEncoding, std::u16string, Long, std::string> rows[] = {
       {STRINGENCODING_UTF8, u"\u00E9", 2, ""},       {STRINGENCODING_UTF8, u"\u00E9", 3, "\xC3\xA9"},
       {STRINGENCODING_UTF8, u"\u00E9x", 2, "x"},     {STRINGENCODING_UTF8, u"\u4E2Dab", 3, "ab"},
       {STRINGENCODING_ESCAPED, u"\u00E9b", 3, "_b"}, {STRINGENCODING_ESCAPED, u"\u00E9b", 7, "\\u00E9"},
       {STRINGENCODING_XML, u"\u00E9", 8, "_"},       {STRINGENCODING_XML, u"\u00E9", 9, "&#x00E9;"},
       {STRINGENCODING_DEFAULT, u"abcd", 3, "ab"},    {STRINGENCODING_DEFAULT, u"abcd", 1, ""},
   };
-  for (const Row& row : rows) {
-    std::vector<char> buffer(static_cast<std::size_t>(row.size)); // exact, so that an overrun is seen
-    Long written = FromUnits(row.text).GetCString(buffer.data(), row.size, row.encoding);
-    EXPECT_EQ(std::string(buffer.data()), row.bytes);
-    EXPECT_EQ(written, static_cast<Long>(row.bytes.size()));
+  for (const auto& [encoding, text, size, bytes] : rows) {
+    std::vector<char> buffer(static_cast<std::size_t>(size)); // exact, so that an overrun is seen
+    Long written = FromUnits(text).GetCString(buffer.data(), size, encoding);
+    EXPECT_EQ(std::string(buffer.data()), bytes);
+    EXPECT_EQ(written, static_cast<Long>(bytes.size()));
   }
   char untouched = 'u';
   EXPECT_EQ(String("a").GetCString(&untouched, 0), 0);
@@ -322,15 +296,7 @@ TEST(String, FormatsNumbers)
 {
   EXPECT_EQ(Utf8(String::FromLong(-2147483647 - 1)), "-2147483648");
   EXPECT_EQ(Utf8(String::FromLLong(-9223372036854775807 - 1)), "-9223372036854775808");
-  struct Row
-  {
-    Real value;
-    Long before, behind;
-    Bool exponent;
-    UniChar fill;
-    const char* text;
-  };
-  const Row rows[] = {
+  const std::tuple<Real, Long, Long, Bool, UniChar, const char*> rows[] = {
       {2.5, -1, -1, false, ' ', "2.5"},    {100.0, -1, -1, false, ' ', "1"}, // zeros before the point go too
       {0.25, -1, -1, false, ' ', "0.25"},  {-0.0, -1, -1, false, ' ', "0"},
       {0.0, -1, -1, false, ' ', "0"},      {-0.0, -1, 0, false, ' ', "0"},
@@ -340,8 +306,8 @@ TEST(String, FormatsNumbers)
       {2.5, -1, 2, true, ' ', "2.50E+00"}, {1000.0, -2, 2, true, ' ', "1E+03"},
       {0.0, -2, 2, true, ' ', "0E+00"},    {1e40, -1, 1, false, ' ', "10000000000000000303786028427003666890752.0"},
   };
-  for (const Row& row : rows)
-    EXPECT_EQ(Utf8(String::FromReal(row.value, row.before, row.behind, row.exponent, row.fill)), row.text);
+  for (const auto& [value, before, behind, exponent, fill, text] : rows)
+    EXPECT_EQ(Utf8(String::FromReal(value, before, behind, exponent, fill)), text);
   EXPECT_EQ(String::FromReal(1.0, 2000000000, 2000000000).GetLength(), 20001);
 }
 

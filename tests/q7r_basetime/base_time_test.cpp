@@ -1,5 +1,6 @@
 #include <limits>
 #include <string>
+#include <tuple>
 #include <vector>
 
 #include <gtest/gtest.h>
@@ -24,11 +25,7 @@ void ExpectFields(const BaseTime& time, Real numerator, Real denominator)
 TEST(BaseTime, RoundsSignsAndReducesFractions)
 {
   AssertionRecord log;
-  struct Row
-  {
-    Real n, d, numerator, denominator;
-  };
-  const Row rows[] = {
+  const std::tuple<Real, Real, Real, Real> rows[] = {
       {0, 25, 0, 1},
       {30, 25, 6, 5},
       {5, -2, -5, 2},
@@ -48,9 +45,9 @@ TEST(BaseTime, RoundsSignsAndReducesFractions)
       {kInfinity, 1, 0, 1},
       {1, kInfinity, 0, 1},
   };
-  for (const Row& row : rows) {
-    SCOPED_TRACE(testing::Message() << row.n << " / " << row.d);
-    ExpectFields(BaseTime(row.n, row.d), row.numerator, row.denominator);
+  for (const auto& [n, d, numerator, denominator] : rows) {
+    SCOPED_TRACE(testing::Message() << n << " / " << d);
+    ExpectFields(BaseTime(n, d), numerator, denominator);
   }
   EXPECT_TRUE(log.Reports().empty());
   ExpectFields(BaseTime(3, 0.4), 3, 1);

@@ -6,6 +6,7 @@
 #include <random>
 #include <set>
 #include <thread>
+#include <tuple>
 #include <vector>
 
 #include <gtest/gtest.h>
@@ -36,12 +37,7 @@ TEST(DateTime, ComparesByTheLargestUnitThatDiffers)
 
 TEST(DateTime, CountsJulianDays)
 {
-  struct Row
-  {
-    DateTime date;
-    Real day;
-  };
-  const Row rows[] = {
+  const std::tuple<DateTime, Real> rows[] = {
       {{2000, 1, 1, 12, 0, 0}, 2451545.5},  {{1999, 12, 31, 0, 0, 0}, 2451544.0},
       {{2000, 3, 1, 0, 0, 0}, 2451605.0},   {{1970, 1, 1, 6, 0, 0}, 2440588.25},
       {{1582, 10, 15, 0, 0, 0}, 2299161.0}, // the day after the next row
@@ -49,10 +45,10 @@ TEST(DateTime, CountsJulianDays)
       {{-1, 12, 31, 0, 0, 0}, 1721423.0}, // no year 0
       {{-4713, 1, 1, 0, 0, 0}, 0.0},
   };
-  for (const Row& row : rows) {
-    SCOPED_TRACE(row.day);
-    EXPECT_EQ(GetJulianDay(row.date), row.day);
-    EXPECT_EQ(FromJulianDay(row.day), row.date);
+  for (const auto& [date, day] : rows) {
+    SCOPED_TRACE(day);
+    EXPECT_EQ(GetJulianDay(date), day);
+    EXPECT_EQ(FromJulianDay(day), date);
   }
 }
 

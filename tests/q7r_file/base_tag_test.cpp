@@ -1,4 +1,6 @@
 // Plain tags and plug-in tags: their chunks, their copies, and which class the factory makes.
+#include <tuple>
+
 #include <gtest/gtest.h>
 
 #include "q7r_file/node_bytes.h"
@@ -70,21 +72,16 @@ TEST(BaseTag, CopiesOntoATagOfTheSameTypeOnly)
 
 TEST(BaseTag, MakesTheTypesOfItsTable)
 {
-  struct Row
-  {
-    Long asked;
-    Long type;
-    Long diskType;
-  };
-  const Row rows[] = {{5600, 5600, 5600},       {5616, 5616, 5616},          {5629, 5629, 5629}, {5673, 5673, 5673},
-                      {5676, 5676, 5676},       {5678, 5678, 5691},          {5691, -1, 5691},   {5701, 5701, 5701},
-                      {1019365, 1019365, 5691}, {465000404, 465000404, 5691}};
-  for (const Row& row : rows) {
-    BaseTag* tag = MakeTag(row.asked);
+  const std::tuple<Long, Long, Long> rows[] = {
+      {5600, 5600, 5600},       {5616, 5616, 5616},          {5629, 5629, 5629}, {5673, 5673, 5673},
+      {5676, 5676, 5676},       {5678, 5678, 5691},          {5691, -1, 5691},   {5701, 5701, 5701},
+      {1019365, 1019365, 5691}, {465000404, 465000404, 5691}};
+  for (const auto& [asked, type, diskType] : rows) {
+    BaseTag* tag = MakeTag(asked);
     ASSERT_NE(tag, nullptr);
-    EXPECT_EQ(tag->GetType(), row.type) << row.asked;
-    EXPECT_EQ(tag->GetDiskType(), row.diskType) << row.asked;
-    EXPECT_EQ(tag->GetNodeData() != nullptr, row.asked == kTagWeight) << row.asked;
+    EXPECT_EQ(tag->GetType(), type) << asked;
+    EXPECT_EQ(tag->GetDiskType(), diskType) << asked;
+    EXPECT_EQ(tag->GetNodeData() != nullptr, asked == kTagWeight) << asked;
     DeleteObj(tag);
   }
 }

@@ -1,6 +1,7 @@
 // Cameras: the entries of a new one, and the parameters that are computed from them.
 #include <cmath>
 #include <string>
+#include <tuple>
 #include <vector>
 
 #include <gtest/gtest.h>
@@ -138,18 +139,14 @@ TEST(Camera, RelatesFieldsOfViewToTheFocalLength)
 
 TEST(Camera, TellsItsFocalLengthOn36MillimetreFilm)
 {
-  struct Case
-  {
-    Real length, width;
-    const char* text;
-  };
-  constexpr Case kCases[] = {{50, 36, " 50 mm"},       {36, 36, " 36 mm"}, {100, 36, " 100 mm"}, {25, 24, " 37.5 mm"},
-                             {10, 32.4, " 11.111 mm"}, {0, 36, " 0 mm"},   {-10, 36, " -10 mm"}, {0.0001, 36, " 0 mm"}};
+  const std::tuple<Real, Real, const char*> kCases[] = {
+      {50, 36, " 50 mm"},       {36, 36, " 36 mm"}, {100, 36, " 100 mm"}, {25, 24, " 37.5 mm"},
+      {10, 32.4, " 11.111 mm"}, {0, 36, " 0 mm"},   {-10, 36, " -10 mm"}, {0.0001, 36, " 0 mm"}};
   const ObjectPtr camera = NewCamera();
-  for (const Case& c : kCases) {
-    Entries(camera).SetReal(500, c.length);
-    Entries(camera).SetReal(1006, c.width);
-    EXPECT_EQ(Get(*camera, 1133).GetString(), String(c.text));
+  for (const auto& [length, width, text] : kCases) {
+    Entries(camera).SetReal(500, length);
+    Entries(camera).SetReal(1006, width);
+    EXPECT_EQ(Get(*camera, 1133).GetString(), String(text));
   }
   Entries(camera).SetReal(1006, 0);
   Entries(camera).SetReal(500, 1);

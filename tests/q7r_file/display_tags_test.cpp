@@ -3,6 +3,7 @@
 #include <chrono>
 #include <string>
 #include <thread>
+#include <tuple>
 
 #include <gtest/gtest.h>
 
@@ -77,25 +78,19 @@ TEST(DisplayTag, AnswersElevenParametersFromItsOwnSettings)
 
 TEST(DisplayTag, TakesTheChunkOfOldFilesIntoItsContainer)
 {
-  struct Row
-  {
-    Long level;
-    Long version;
-    const char* entries;
-  };
-  const Row rows[] = {
+  const std::tuple<Long, Long, const char*> rows[] = {
       {0, 11610, "1001=1 1002=0 1010=- 1004=- 1007=1 1008=1 1009=1 1012=- 1006=- 1014=- 1015=1"},
       {1, 11610, "1001=1 1002=0 1010=1 1004=4 1007=1 1008=1 1009=1 1012=- 1006=- 1014=- 1015=1"},
       {2, 11610, "1001=1 1002=0 1010=1 1004=4 1007=0 1008=1 1009=0 1012=1 1006=5 1014=- 1015=1"},
       {3, 6000, "1001=1 1002=0 1010=1 1004=4 1007=0 1008=1 1009=0 1012=1 1006=5 1014=0 1015=1"},
       {3, 11611, "1001=- 1002=- 1010=- 1004=- 1007=- 1008=- 1009=- 1012=- 1006=- 1014=- 1015=1"},
   };
-  for (const Row& row : rows) {
-    const std::string& body = FindRecordSample("old display " + std::to_string(row.level)).body;
+  for (const auto& [level, version, entries] : rows) {
+    const std::string& body = FindRecordSample("old display " + std::to_string(level)).body;
     DisplayTag tag;
-    EXPECT_TRUE(ReadInto(tag, Record("[110009," + std::to_string(row.level) + " " + body + " L1 ]"), row.version));
+    EXPECT_TRUE(ReadInto(tag, Record("[110009," + std::to_string(level) + " " + body + " L1 ]"), version));
     EXPECT_EQ(Entries(tag.GetDataInstance(), {1001, 1002, 1010, 1004, 1007, 1008, 1009, 1012, 1006, 1014, 1015}),
-              row.entries)
-        << row.level << " in " << row.version;
+              entries)
+        << level << " in " << version;
   }
 }

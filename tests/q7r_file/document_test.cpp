@@ -1,5 +1,6 @@
 // Whole documents: the layout of the file, old modes and tools, partial loads, damage, merging and copying.
 #include <random>
+#include <tuple>
 
 #include <gtest/gtest.h>
 
@@ -138,15 +139,8 @@ TEST(DocumentFile, NoChangedByteCrashesTheReader)
 
 TEST(DocumentFile, RefusesWhatIsNoSceneFile)
 {
-  struct Case
-  {
-    const char* name;
-    Bytes bytes;
-    Long flags;
-    Long code;
-  };
   const Bytes header = ByteWriter().Header().bytes;
-  const Case cases[] = {
+  const std::tuple<const char*, Bytes, Long, Long> cases[] = {
       {"nothing", {}, 3, FILEERROR_WRONG_VALUE},
       {"another ident", ByteWriter().Header("Q7R5").Start(110059, 0).End().bytes, 3, FILEERROR_WRONG_VALUE},
       {"the header alone", header, 3, FILEERROR_READ},
@@ -157,11 +151,11 @@ TEST(DocumentFile, RefusesWhatIsNoSceneFile)
        FILEERROR_OLD_VERSION},
   };
   AssertionCounter quiet;
-  for (const Case& c : cases) {
-    SCOPED_TRACE(c.name);
+  for (const auto& [name, bytes, flags, code] : cases) {
+    SCOPED_TRACE(name);
     FileProblem problem;
-    EXPECT_EQ(LoadFromBytes(c.bytes, c.flags, &problem), nullptr);
-    EXPECT_EQ(problem.code, c.code);
+    EXPECT_EQ(LoadFromBytes(bytes, flags, &problem), nullptr);
+    EXPECT_EQ(problem.code, code);
   }
   EXPECT_NE(LoadFromBytes(ByteWriter().Header("Q7R6", 99000).Start(110059, 0).End().bytes), nullptr);
 }

@@ -1,6 +1,7 @@
 // Objects of points: their own chunks, the operations that resize their tags, splines, and copies.
 #include <algorithm>
 #include <string>
+#include <tuple>
 
 #include <gtest/gtest.h>
 
@@ -290,15 +291,12 @@ TEST(PointObject, ComesBackFromAFileUnderItsLabel)
 
 TEST(PolygonObject, RunsWhenItsPolygonsHavePoints)
 {
-  struct Row
-  {
-    Long points, polygons;
-    bool runs;
-  };
-  for (const Row& row : {Row{-1, -1, true}, Row{3, -1, true}, Row{3, 1, true}, Row{-1, 1, false}}) {
+  for (const auto& [points, polygons, runs] :
+       {std::tuple<Long, Long, bool>{-1, -1, true}, std::tuple<Long, Long, bool>{3, -1, true},
+        std::tuple<Long, Long, bool>{3, 1, true}, std::tuple<Long, Long, bool>{-1, 1, false}}) {
     BaseObject* object = AllocObject(kObjectPolygon);
-    ResizePolygons(*object, row.points, row.polygons, -1);
-    EXPECT_EQ(object->Execute(), row.runs) << row.points << ", " << row.polygons;
+    ResizePolygons(*object, points, polygons, -1);
+    EXPECT_EQ(object->Execute(), runs) << points << ", " << polygons;
     DeleteObj(object);
   }
 }

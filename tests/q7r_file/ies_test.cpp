@@ -3,6 +3,7 @@
 #include <cmath>
 #include <limits>
 #include <map>
+#include <tuple>
 
 #include <gtest/gtest.h>
 
@@ -208,23 +209,18 @@ TEST(IESFile, ReadsOrRefusesTheTiltOfTheLamp)
 
 TEST(IESFile, RefusesCountsOutOfRangeAndTablesThatEndEarly)
 {
-  struct Case
-  {
-    int vertical, horizontal;
-    Long result;
-  };
-  constexpr Case kCases[] = {{0, 0, 1},     {0, 1, 1},     {1, 0, 1},   {1, 1, 1},   {1024, 1, 1},  {1, 1024, 1},
-                             {1025, 1, -5}, {1, 1025, -5}, {-1, 1, -5}, {1, -1, -5}, {1025, 0, -5}, {0, 1025, -5}};
-  for (const Case& c : kCases) {
-    const int table = std::max(c.vertical, 0) * std::max(c.horizontal, 0);
-    const std::string counts = std::to_string(c.vertical) + " " + std::to_string(c.horizontal);
-    const std::string head =
-        kHead + "1 -1 1 " + counts + kOpening + Repeat("1 ", c.vertical) + Repeat("2\n", c.horizontal);
+  const std::tuple<int, int, Long> kCases[] = {{0, 0, 1},    {0, 1, 1},    {1, 0, 1},     {1, 1, 1},
+                                               {1024, 1, 1}, {1, 1024, 1}, {1025, 1, -5}, {1, 1025, -5},
+                                               {-1, 1, -5},  {1, -1, -5},  {1025, 0, -5}, {0, 1025, -5}};
+  for (const auto& [vertical, horizontal, result] : kCases) {
+    const int table = std::max(vertical, 0) * std::max(horizontal, 0);
+    const std::string counts = std::to_string(vertical) + " " + std::to_string(horizontal);
+    const std::string head = kHead + "1 -1 1 " + counts + kOpening + Repeat("1 ", vertical) + Repeat("2\n", horizontal);
     IESPtr light;
-    EXPECT_EQ(LoadText(head + Repeat("3 ", table), light), c.result) << counts;
-    if (c.result == 1) {
-      EXPECT_EQ(light->GetVerticalCount(), c.vertical);
-      EXPECT_EQ(light->GetHorizontalCount(), c.horizontal);
+    EXPECT_EQ(LoadText(head + Repeat("3 ", table), light), result) << counts;
+    if (result == 1) {
+      EXPECT_EQ(light->GetVerticalCount(), vertical);
+      EXPECT_EQ(light->GetHorizontalCount(), horizontal);
       EXPECT_EQ(light->candela.GetCount(), table);
       EXPECT_EQ(light->maxCandela, table > 0 ? 3 : 0);
     }

@@ -1,6 +1,7 @@
 // Weights of joints: 16-bit values, runs that grow and split, and the forms of files.
 #include <map>
 #include <random>
+#include <tuple>
 
 #include <gtest/gtest.h>
 
@@ -64,12 +65,7 @@ const std::string kEmptyList = "10 00000000 10 00000000 10 00000000 10 00000000 
 
 TEST(JointWeightTable, StoresWeightsInSixteenBits)
 {
-  struct Row
-  {
-    Real weight;
-    Real stored;
-  };
-  const Row rows[] = {
+  const std::tuple<Real, Real> rows[] = {
       {1.0, 65535},
       {0.5, 32768},
       {2.0, 65535},
@@ -85,10 +81,10 @@ TEST(JointWeightTable, StoresWeightsInSixteenBits)
       {std::nan(""), 0},
   };
   JointWeightTable table;
-  for (const Row& row : rows) {
-    ASSERT_TRUE(table.WritePointWeight(7, row.weight));
-    EXPECT_EQ(table.ReadPointWeight(7), row.stored / 65535.0) << row.weight;
-    EXPECT_EQ(table.GetRunCount(), row.stored == 0 ? 0 : 1) << row.weight;
+  for (const auto& [weight, stored] : rows) {
+    ASSERT_TRUE(table.WritePointWeight(7, weight));
+    EXPECT_EQ(table.ReadPointWeight(7), stored / 65535.0) << weight;
+    EXPECT_EQ(table.GetRunCount(), stored == 0 ? 0 : 1) << weight;
   }
   EXPECT_FALSE(table.WritePointWeight(-1, 1.0));
   EXPECT_EQ(table.ReadPointWeight(-1), 0.0);
@@ -96,13 +92,7 @@ TEST(JointWeightTable, StoresWeightsInSixteenBits)
 
 TEST(JointWeightTable, LengthensJoinsShortensAndSplitsItsRuns)
 {
-  struct Step
-  {
-    Long point;
-    Real weight;
-    const char* runs;
-  };
-  const Step steps[] = {
+  const std::tuple<Long, Real, const char*> steps[] = {
       {5, 1, "5-5@0 "},
       {7, 1, "5-5@0 7-7@1 "},
       {6, 1, "5-7@0 "},
@@ -119,9 +109,9 @@ TEST(JointWeightTable, LengthensJoinsShortensAndSplitsItsRuns)
       {7, 0.5, "0-0@0 7-7@1 "},
   };
   JointWeightTable table;
-  for (const Step& step : steps) {
-    ASSERT_TRUE(table.WritePointWeight(step.point, step.weight));
-    EXPECT_EQ(Runs(table), step.runs) << step.point;
+  for (const auto& [point, weight, runs] : steps) {
+    ASSERT_TRUE(table.WritePointWeight(point, weight));
+    EXPECT_EQ(Runs(table), runs) << point;
   }
 }
 

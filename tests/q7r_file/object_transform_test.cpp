@@ -1,5 +1,6 @@
 // The transform model: what each setter stores and derives, and how matrices come apart.
 #include <numbers>
+#include <tuple>
 
 #include <gtest/gtest.h>
 
@@ -146,15 +147,7 @@ TEST(ObjectTransform, MatricesPassThroughParentsAndFrozenParts)
 
 TEST(ObjectTransform, MirroredAxesComeBackThroughTheStoredScaleAndTheHandedness)
 {
-  struct Row
-  {
-    const char* name;
-    Vector stored;
-    Matrix matrix;
-    Vector scale;
-    Vector angles;
-  };
-  const Row rows[] = {
+  const std::tuple<const char*, Vector, Matrix, Vector, Vector> rows[] = {
       {"plain", {1, 1, 1}, {{1, 2, 3}, {2, 0, 0}, {0, 3, 0}, {0, 0, 4}}, {2, 3, 4}, {0, 0, 0}},
       {"mirrored x stays x", {-1, 1, 1}, {{}, {-2, 0, 0}, {0, 3, 0}, {0, 0, 4}}, {-2, 3, 4}, {0, 0, 0}},
       {"mirrored x becomes y", {1, 1, 1}, {{}, {-2, 0, 0}, {0, 3, 0}, {0, 0, 4}}, {2, -3, 4}, {0, 0, -kPiValue}},
@@ -163,18 +156,18 @@ TEST(ObjectTransform, MirroredAxesComeBackThroughTheStoredScaleAndTheHandedness)
       {"no scale, no angles", {0, 0, 0}, {{}, {0, 0, -2}, {0, 3, 0}, {4, 0, 0}}, {2, 3, 4}, {0, 0, 0}},
       {"collapsed", {1, 1, 1}, {{5, 6, 7}, {}, {}, {}}, {0, 0, 0}, {0, 0, 0}},
   };
-  for (const Row& row : rows) {
-    SCOPED_TRACE(row.name);
+  for (const auto& [name, stored, matrix, scale, angles] : rows) {
+    SCOPED_TRACE(name);
     BaseObject object(kObjectNull);
-    object.SetRelScale(row.stored);
-    object.SetRelativeMatrix(row.matrix);
-    ExpectNear(object.GetRelPos(), row.matrix.off, "position");
-    ExpectNear(object.GetRelScale(), row.scale, "scale");
-    if (row.scale != Vector())
-      ExpectNear(object.GetRelRot(), row.angles, "angles");
+    object.SetRelScale(stored);
+    object.SetRelativeMatrix(matrix);
+    ExpectNear(object.GetRelPos(), matrix.off, "position");
+    ExpectNear(object.GetRelScale(), scale, "scale");
+    if (scale != Vector())
+      ExpectNear(object.GetRelRot(), angles, "angles");
     EXPECT_EQ(object.GetAbsScale(), object.GetRelScale());
-    if (row.stored != Vector())
-      ExpectNear(object.GetLocalMatrix(), row.matrix);
+    if (stored != Vector())
+      ExpectNear(object.GetLocalMatrix(), matrix);
   }
 }
 

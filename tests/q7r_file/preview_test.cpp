@@ -1,4 +1,6 @@
 // The preview pictures of documents and materials.
+#include <tuple>
+
 #include <gtest/gtest.h>
 
 #include "q7r_file/node_bytes.h"
@@ -59,22 +61,18 @@ TEST(DocumentPreview, FailsTheLoadWhenItCannotBeDecoded)
   Bitmap bitmap;
   Fill(bitmap, SmoothPicture(20, 10, 3));
   const Bytes jpeg = SaveToMemory(bitmap, kImageFormatJpeg);
-  const struct
-  {
-    const char* name;
-    Bytes picture;
-  } cases[] = {{"no bytes", {}},
-               {"another format", SaveToMemory(bitmap, kImageFormatBmp)},
-               {"cut in the header", Bytes(jpeg.begin(), jpeg.begin() + 100)}};
-  for (const auto& c : cases) {
-    SCOPED_TRACE(c.name);
+  const std::tuple<const char*, Bytes> cases[] = {{"no bytes", {}},
+                                                  {"another format", SaveToMemory(bitmap, kImageFormatBmp)},
+                                                  {"cut in the header", Bytes(jpeg.begin(), jpeg.begin() + 100)}};
+  for (const auto& [name, picture] : cases) {
+    SCOPED_TRACE(name);
     for (Long flags : {LoadObjects | LoadMaterials, LoadPreviewOnly + 0}) {
       FileProblem problem;
-      EXPECT_EQ(LoadFromBytes(SceneWith(c.picture).End().bytes, flags, &problem), nullptr);
+      EXPECT_EQ(LoadFromBytes(SceneWith(picture).End().bytes, flags, &problem), nullptr);
       EXPECT_EQ(problem.code, FILEERROR_WRONG_VALUE);
     }
     // One that isn't announced is no concern.
-    EXPECT_NE(LoadFromBytes(SceneWith(c.picture, false).End().bytes), nullptr);
+    EXPECT_NE(LoadFromBytes(SceneWith(picture, false).End().bytes), nullptr);
   }
   // Only the first of a file is decoded.
   ByteWriter twice = SceneWith(jpeg);

@@ -1,6 +1,7 @@
 // The texture tag: its old chunk, what it computes, and its links through files, copies and merges.
 #include <cmath>
 #include <memory>
+#include <tuple>
 
 #include <gtest/gtest.h>
 
@@ -104,24 +105,19 @@ TEST(TextureTag, IsNamedWhenTheFileHasNoName)
 TEST(TextureTag, ComputesTilesFromLengthsAndBack)
 {
   TextureTag tag;
-  struct Row
-  {
-    Long tiles;
-    Long length;
-  };
-  for (const Row& row : {Row{1014, 1002}, Row{1015, 1003}}) {
-    ASSERT_TRUE(tag.SetParameterById(row.tiles, GeData(4.0)));
-    EXPECT_EQ(RealOf(tag, row.length), 0.25);
-    EXPECT_EQ(tag.GetDataInstance().GetReal(row.tiles), 4.0); // also an entry of its own
-    ASSERT_TRUE(tag.SetParameterById(row.tiles, GeData(0.0)));
-    EXPECT_EQ(RealOf(tag, row.length), 0.25);
-    EXPECT_EQ(RealOf(tag, row.tiles), 4.0);
+  for (const auto& [tiles, length] : {std::tuple<Long, Long>{1014, 1002}, std::tuple<Long, Long>{1015, 1003}}) {
+    ASSERT_TRUE(tag.SetParameterById(tiles, GeData(4.0)));
+    EXPECT_EQ(RealOf(tag, length), 0.25);
+    EXPECT_EQ(tag.GetDataInstance().GetReal(tiles), 4.0); // also an entry of its own
+    ASSERT_TRUE(tag.SetParameterById(tiles, GeData(0.0)));
+    EXPECT_EQ(RealOf(tag, length), 0.25);
+    EXPECT_EQ(RealOf(tag, tiles), 4.0);
     for (Real tiny : {0.0, 1e-7, -1e-7}) {
-      tag.SetParameterById(row.length, GeData(tiny));
-      EXPECT_EQ(RealOf(tag, row.tiles), 0.0);
+      tag.SetParameterById(length, GeData(tiny));
+      EXPECT_EQ(RealOf(tag, tiles), 0.0);
     }
-    tag.SetParameterById(row.length, GeData(-1.1e-7));
-    EXPECT_NEAR(RealOf(tag, row.tiles), -9090909.09, 0.01);
+    tag.SetParameterById(length, GeData(-1.1e-7));
+    EXPECT_NEAR(RealOf(tag, tiles), -9090909.09, 0.01);
   }
   TextureTag fresh;
   const BaseContainer before = fresh.GetDataInstance();

@@ -2,6 +2,7 @@
 #include <bit>
 #include <limits>
 #include <memory>
+#include <tuple>
 
 #include <gtest/gtest.h>
 
@@ -56,14 +57,7 @@ ByteWriter OldPoints()
 TEST(PackedUVW, HoldsTheseBits)
 {
   const Real nan = std::numeric_limits<Real>::quiet_NaN();
-  struct Row
-  {
-    Vector uvw;
-    ULong word0;
-    ULong word1;
-    Vector back;
-  };
-  const Row rows[] = {
+  const std::tuple<Vector, ULong, ULong, Vector> rows[] = {
       {{0.25, 0.75, 0.0}, 0x3E800000, 0x3F400000, {0.25, 0.75, 0.0}},
       // The lowest bit of v goes, that of u stays; a negative zero is a zero.
       {{0.1, 0.1, -0.0}, 0x3DCCCCCD, 0x3DCCCCCC, {0.1F, std::bit_cast<float>(0x3DCCCCCC), 0.0}},
@@ -76,11 +70,11 @@ TEST(PackedUVW, HoldsTheseBits)
       {{kSmallest, -kSmallest, 0.75 * kSmallest}, 0x00008000, 0x40000001, {kSmallest, -kSmallest, 1.5 * kSmallest}},
       {{nan, -0.0, 0.0}, 0, 0x80000000, {0.0, -0.0, 0.0}},
   };
-  for (const Row& row : rows) {
-    const PackedUVW packed = PackUVW(row.uvw);
-    EXPECT_EQ(packed.word0, row.word0) << row.uvw.x << ' ' << row.uvw.y << ' ' << row.uvw.z;
-    EXPECT_EQ(packed.word1, row.word1) << row.uvw.x << ' ' << row.uvw.y << ' ' << row.uvw.z;
-    EXPECT_EQ(UnpackUVW(packed), row.back) << row.uvw.x << ' ' << row.uvw.y << ' ' << row.uvw.z;
+  for (const auto& [uvw, word0, word1, back] : rows) {
+    const PackedUVW packed = PackUVW(uvw);
+    EXPECT_EQ(packed.word0, word0) << uvw.x << ' ' << uvw.y << ' ' << uvw.z;
+    EXPECT_EQ(packed.word1, word1) << uvw.x << ' ' << uvw.y << ' ' << uvw.z;
+    EXPECT_EQ(UnpackUVW(packed), back) << uvw.x << ' ' << uvw.y << ' ' << uvw.z;
   }
 }
 
@@ -93,14 +87,6 @@ TEST(UVWTag, ReadsTheLayoutsOfEveryVersionAndLevel)
                    quadBytes[i + 3]);
   const std::vector<ULong> ones = {0x3F800000, 0x3F800000, 0xBF800000, 0x3F800000, 0, 0, 0, 0x0000001F};
   const std::vector<ULong> raw = {0x7FFF7FFF, 0xFFFFFFFF, 1, 2, 3, 4, 5, 0x7FC00001}; // no floats at all
-  struct Row
-  {
-    Long version;
-    Long level;
-    Bytes body;
-    std::vector<ULong> words;
-    Long parameter;
-  };
   ByteWriter floats;
   floats.U8(137).U32(36);
   for (ULong word : raw)
@@ -110,7 +96,7 @@ TEST(UVWTag, ReadsTheLayoutsOfEveryVersionAndLevel)
   const Bytes newer = ByteWriter().Long(1).ArrayHead(3, 32).Append(quadBytes).Bool(true).bytes;
   const Bytes both = ByteWriter().Append(OldWords().bytes).Append(OldPoints().bytes).Bool(true).bytes;
   const Bytes noWords = ByteWriter().U8(135).U32(0).Append(OldPoints().bytes).Bool(true).bytes;
-  const Row rows[] = {
+  const std::tuple<Long, Long, Bytes, std::vector<ULong>, Long> rows[] = {
       {11599, 0, OldWords().Bool(true).bytes, ones, 0},
       {11599, 1, both, quad, 0},
       {11599, 2, noWords, quad, 1},
@@ -122,14 +108,14 @@ TEST(UVWTag, ReadsTheLayoutsOfEveryVersionAndLevel)
       {11904, 3, newer, quad, 1},
       {13000, 7, newer, quad, 1},
   };
-  for (const Row& row : rows) {
+  for (const auto& [version, level, body, words, parameter] : rows) {
     counting_memory::BalanceCheck balance;
     UVWTag tag;
     tag.ResizeTagArray(4);
-    const Bytes chunk = ByteWriter().Start(5671, row.level).Append(row.body).Long(77).End().bytes;
-    ASSERT_TRUE(ReadInto(tag, chunk, row.version)) << row.version << '/' << row.level;
-    EXPECT_EQ(Words(tag), row.words) << row.version << '/' << row.level;
-    EXPECT_EQ(ParameterOf(tag), row.parameter) << row.version << '/' << row.level;
+    const Bytes chunk = ByteWriter().Start(5671, level).Append(body).Long(77).End().bytes;
+    ASSERT_TRUE(ReadInto(tag, chunk, version)) << version << '/' << level;
+    EXPECT_EQ(Words(tag), words) << version << '/' << level;
+    EXPECT_EQ(ParameterOf(tag), parameter) << version << '/' << level;
   }
 }
 

@@ -1,5 +1,6 @@
 // Tags that hold arrays: their bytes, the layouts of older files, counts that lie, and their ways of copying.
 #include <memory>
+#include <tuple>
 
 #include <gtest/gtest.h>
 
@@ -193,25 +194,18 @@ TEST(ValueTags, ReadTheArraysOfOldFiles)
 
 TEST(ValueTags, ReadOldVertexMapsByTypeAndVersion)
 {
-  struct Row
-  {
-    Long type;
-    Long version;
-    const char* name;
-    Long count;
-  };
-  const Row rows[] = {
+  const std::tuple<Long, Long, const char*, Long> rows[] = {
       {5682, 7499, "map", 1}, {5682, 7500, "mine", 1}, {5708, 7499, "mine", 2}, {5708, 11925, "mine", 2}};
-  for (const Row& row : rows) {
-    auto tag = Make(row.type);
+  for (const auto& [type, version, name, count] : rows) {
+    auto tag = Make(type);
     tag->ResizeTagArray(2);
     static_cast<VertexMapTag&>(*tag).GetArray()[0] = 1.0F;
     tag->SetName("mine");
-    const char* body = row.version < 11925 ? " Smap X89000000043F000000 ]" : " L2 A5:0.5,0.5 ]";
-    ASSERT_TRUE(ReadInto(*tag, Record("[" + std::to_string(row.type) + ",0" + body), row.version));
-    EXPECT_EQ(tag->GetName(), String(row.name));
-    EXPECT_EQ(tag->GetCount(), row.count);
-    const bool read = row.type == 5682 || row.version == 11925;
+    const char* body = version < 11925 ? " Smap X89000000043F000000 ]" : " L2 A5:0.5,0.5 ]";
+    ASSERT_TRUE(ReadInto(*tag, Record("[" + std::to_string(type) + ",0" + body), version));
+    EXPECT_EQ(tag->GetName(), String(name));
+    EXPECT_EQ(tag->GetCount(), count);
+    const bool read = type == 5682 || version == 11925;
     EXPECT_EQ(Numbers<SReal>(*tag)[0], read ? 0.5F : 1.0F);
     std::unique_ptr<GeListNode> clone(tag->MakeClone(0, nullptr));
     ASSERT_NE(clone, nullptr);

@@ -123,6 +123,12 @@ TEST(WeightTag, StaysInStepWithDamagedData)
   const std::string none = "L1 " + FrameText(0, "1") + JointText(6, 1); // no chunk at all behind the joints
   EXPECT_TRUE(ReadData(*rig.data, 6, none));
   EXPECT_TRUE(ReadData(*rig.data, 6, none + "[1021282,1 L1 ]", false));
+  const Bytes whole = ByteWriter().Header().Append(Record(none + RestText(6, 1))).bytes;
+  for (std::size_t cut = 13; cut < whole.size(); ++cut) {
+    AssertionCounter silence;
+    MemoryReadFile memory({whole.begin(), whole.begin() + static_cast<std::ptrdiff_t>(cut)});
+    EXPECT_FALSE(rig.data->ReadData(memory.file, kChunkNodeData, 6)) << cut;
+  }
   for (Long count : {2147483647, -1, 40}) {
     counting_memory::ResetPeak();
     const LLong before = counting_memory::Get().bytes;

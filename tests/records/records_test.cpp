@@ -97,6 +97,7 @@ void CheckParameters(GeListNode& node, const std::vector<RecordValue>& values)
 
 TEST(Records, AreKeptCopiedAndWrittenInTheCurrentForm)
 {
+  ASSERT_GT(RecordSamples().size(), 150U);
   const counting_memory::BalanceCheck balance;
   for (const RecordSample& sample : RecordSamples()) {
     SCOPED_TRACE(sample.name);

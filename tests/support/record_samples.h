@@ -1,4 +1,5 @@
-// One sample of every record of a scene file, at every level and with every bound of a version, as text.
+// One sample of every record of a scene file, at every level and with every bound of a version, as text: the table is
+// records.txt.
 //
 // A text holds the values of a chunk in file order. A letter tells the kind, behind it stands the value:
 //   L Long  U ULong  C UChar  B Bool  R Real  T Time in whole seconds
@@ -19,7 +20,7 @@
 
 struct RecordSample
 {
-  const char* name;
+  std::string name;
   _torvane_::GeListNode* (*make)(); // a new node that takes the chunk
   _torvane_::Long chunk;
   _torvane_::Long level;
