@@ -185,23 +185,6 @@ TEST(HyperFile, RefusesAValueOfAnotherTagAndEverythingAfterIt)
   }
 }
 
-TEST(HyperFile, TellsWhenMemoryIsShort)
-{
-  AssertionCounter quiet;
-  for (const ValueCase& value : ValueCases()) {
-    if (value.hex.size() < 20 || value.hex[0] != '8')
-      continue; // only values from tag 128 on take memory
-    SCOPED_TRACE(value.name);
-    counting_memory::BalanceCheck balance;
-    MemoryReadFile read(WithHeader(FromHex(value.hex)));
-    counting_memory::FailAfter(0);
-    bool same = value.readsSame(read.file);
-    counting_memory::FailNever();
-    EXPECT_FALSE(same);
-    EXPECT_EQ(read.file.GetError(), FILEERROR_MEMORY);
-  }
-}
-
 TEST(HyperFile, HoldsRealsAsFloatsInSinglePrecision)
 {
   auto write = [](HyperFile& file) {

@@ -335,6 +335,7 @@ TEST(Document, WhatIsSavedCanBeLoadedAndWhatNestsTooDeepIsRefused)
     else
       document->InsertObject(object);
     last = object;
+    object->SetRelPos({1, 0, 0});
     if (depth < HyperFile::kMaxLoopDepth - 5 && depth != 2000)
       continue;
     Long error = FILEERROR_NONE;
@@ -354,6 +355,7 @@ TEST(Document, WhatIsSavedCanBeLoadedAndWhatNestsTooDeepIsRefused)
       EXPECT_EQ(error, FILEERROR_TOO_DEEP) << depth;
     }
   }
+  EXPECT_EQ(last->GetGlobalMatrix().off, Vector(HyperFile::kMaxLoopDepth + 1, 0, 0));
   EXPECT_GE(saved, HyperFile::kMaxLoopDepth - 3);
   EXPECT_LT(saved, HyperFile::kMaxLoopDepth);
 }

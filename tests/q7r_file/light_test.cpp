@@ -44,7 +44,7 @@ ObjectPtr ReadLight(const std::string& body, Long level, Long version = 13000)
 }
 
 // A light of level 5 whose body goes on.
-std::string WithMore(const std::string& more) { return FindRecordSample("light 5").body + more; }
+std::string WithMore(const std::string& more) { return FindRecordSample("light 5").body + " " + more; }
 
 template <class Visit>
 void ForEachParameter(const Visit& visit)
@@ -165,9 +165,9 @@ TEST(Light, TurnsTheOldSizeFactorIntoASizeOfAtLeast16)
                       {-3, 7000, 16},  {1e9, 9419, 2147483647}, {0.5, 9419, 50}, {0.5, 9420, -1}};
   for (const Row& row : rows) {
     const std::string body = FindRecordSample(row.version < 7500 ? "light 0 before 7500" : "light 0").body;
-    const std::string middle = "R=64@90032 ";
+    const std::string middle = "R=64@90032";
     const std::size_t place = body.find(middle) + middle.size();
-    const std::string factor = "B0 R" + std::to_string(row.factor) + " ";
+    const std::string factor = " B0 R" + std::to_string(row.factor);
     const ObjectPtr light = ReadLight(body.substr(0, place) + factor + body.substr(place), 1, row.version);
     ASSERT_NE(light, nullptr) << row.version;
     EXPECT_EQ(light->GetDataInstance().GetLong(100006, -1), row.size) << row.factor;

@@ -92,18 +92,6 @@ TEST(Material, PassesOverOldChannelChunks)
   EXPECT_FALSE(channel.ReadChunk(memory.file, 5708, 0));
 }
 
-TEST(Material, WithoutANameIsCalledMatOnceItsHeaderIsRead)
-{
-  for (Long version : {7499, 13000}) {
-    const Bytes header = Record("[110050,0 L0 L0 K C0 S ]");
-    Material standard;
-    BaseMaterial other(kMaterialPlugin);
-    EXPECT_TRUE(ReadInto(standard, header, version) && ReadInto(other, header, version));
-    EXPECT_EQ(Utf8(standard.GetName()), "Mat");
-    EXPECT_EQ(Utf8(other.GetName()), "");
-  }
-}
-
 TEST(Material, OfAnUnknownTypeComesBackByteForByte)
 {
   const counting_memory::BalanceCheck balance;

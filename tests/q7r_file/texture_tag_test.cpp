@@ -94,14 +94,6 @@ TEST(TextureTag, TakesPlaceLinksAndAspectsFromItsOldChunk)
   EXPECT_EQ(ReadError(untouched, Record("[110010,3 V1 L5 ]")), -100);
 }
 
-TEST(TextureTag, IsNamedWhenTheFileHasNoName)
-{
-  TextureTag tag;
-  const Bytes unnamed = BytesOf(tag);
-  ASSERT_TRUE(ReadInto(tag, unnamed));
-  EXPECT_EQ(tag.GetName(), String("Texture"));
-}
-
 TEST(TextureTag, ComputesTilesFromLengthsAndBack)
 {
   TextureTag tag;

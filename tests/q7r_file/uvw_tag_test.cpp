@@ -142,29 +142,3 @@ TEST(UVWTag, FailsOnBadArraysWithTheMemoryError)
   UVWTag tag;
   EXPECT_NE(ReadError(tag, ByteWriter().Start(5671, 2).U8(137).U32(0xFFFFFFFF).U32(1).End().bytes), 0);
 }
-
-TEST(UVWTag, IsNamedWhenTheFileHasNoName)
-{
-  UVWTag source;
-  source.SetName(String());
-  UVWTag unnamed;
-  ASSERT_TRUE(ReadInto(unnamed, BytesOf(source)));
-  EXPECT_EQ(unnamed.GetName(), String("UVW"));
-  source.SetName("map");
-  UVWTag named;
-  ASSERT_TRUE(ReadInto(named, BytesOf(source)));
-  EXPECT_EQ(named.GetName(), String("map"));
-}
-
-TEST(UVWTag, CopiesWithItsParameter)
-{
-  UVWTag source;
-  UVWTag target;
-  source.SetParameterById(1000, GeData(Long{3}));
-  source.ResizeTagArray(2);
-  source.GetArray()[1].corners[3] = {4, 5};
-  target.ResizeTagArray(9);
-  ASSERT_TRUE(source.CopyWithTranslation(target, 0, nullptr));
-  EXPECT_EQ(Words(target), Words(source));
-  EXPECT_EQ(ParameterOf(target), 3);
-}

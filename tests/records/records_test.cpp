@@ -9,7 +9,9 @@
 #include "support/memory_file.h"
 #include "support/record_samples.h"
 #include "support/text.h"
+#include "torvane/materials/base_material.h"
 #include "torvane/memory/owned.h"
+#include "torvane/objects/base_object.h"
 #include "torvane/tags/compositing_tag.h"
 #include "torvane/values/ge_data.h"
 
@@ -209,5 +211,23 @@ TEST(Records, AreReadAndCopiedWholeOrNotAtAllWhenAnAllocationFails)
     const bool hasClones = NodePtr(node->MakeClone(0, nullptr)) != nullptr;
     EveryFailedAllocation([&] { return NodePtr(hasClones ? node->MakeClone(0, nullptr) : CopyOf(*node, sample)); },
                           written);
+  }
+}
+
+TEST(Records, OfSomeClassesNameNodesThatHaveNoName)
+{
+  const std::pair<GeListNode*, const char*> rows[] = {
+      {MakeTag(kTagUVW), "UVW"},      {MakeTag(kTagTexture), "Texture"},        {AllocObject(kObjectSpline), "Spline"},
+      {AllocObject(kObjectNull), ""}, {MakeMaterial(kMaterialStandard), "Mat"}, {MakeMaterial(kMaterialPlugin), ""}};
+  for (const auto& [made, name] : rows) {
+    const NodePtr node(made);
+    auto& list = *NodeCast<BaseList2D>(node.get());
+    for (const std::string& own : {std::string(), std::string("own")}) {
+      list.SetName("before");
+      const Bytes chunk = Record("[110050,0 L0 L0 K C0 S" + own + " ] [110069,2 L0 C0 ]");
+      MemoryReadFile memory(ByteWriter().Header().Append(chunk).End().bytes);
+      EXPECT_TRUE(node->ReadChunkLoop(memory.file, true));
+      EXPECT_EQ(Utf8(list.GetName()), own.empty() ? name : own);
+    }
   }
 }
