@@ -3,8 +3,8 @@
 #include <cstdint>
 #include <cstdio>
 
-#include "gltf/checker.h"
 #include "gltf/converter.h"
+#include "gltf/file/checker.h"
 #include "torvane/document/base_document.h"
 #include "torvane/memory/assertion.h"
 #include "torvane/text/filename.h"

@@ -2,9 +2,9 @@
 #pragma once
 
 #include "gltf/converter.h"
-#include "gltf/output.h"
-#include "gltf/scene_tree.h"
-#include "gltf/timeline.h"
+#include "gltf/file/output.h"
+#include "gltf/motion/timeline.h"
+#include "gltf/scene/scene_tree.h"
 
 namespace gltf
 {

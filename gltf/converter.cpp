@@ -3,11 +3,11 @@
 #include <algorithm>
 #include <memory>
 
-#include "gltf/camera.h"
 #include "gltf/context.h"
-#include "gltf/nodes.h"
-#include "gltf/targets.h"
-#include "gltf/tracks.h"
+#include "gltf/motion/tracks.h"
+#include "gltf/scene/camera.h"
+#include "gltf/scene/nodes.h"
+#include "gltf/scene/targets.h"
 
 namespace gltf
 {

@@ -9,7 +9,7 @@
 #include <vector>
 
 #include "gltf/account.h"
-#include "gltf/byte_buffer.h"
+#include "gltf/file/byte_buffer.h"
 
 namespace _torvane_
 {
@@ -63,6 +63,7 @@ Model Convert(_torvane_::BaseDocument& document, const Options& options);
 
 // One file of JSON and bytes, handed on piece by piece or as a whole. Throws TooLarge above 4 GB.
 using Sink = std::function<void(const std::uint8_t* data, std::size_t size)>;
+std::size_t GlbSize(const Model& model);
 void WriteGlb(const Model& model, const Sink& sink);
 std::vector<std::uint8_t> ToGlb(const Model& model);
 

@@ -10,8 +10,8 @@
 #include <gtest/gtest.h>
 #include <nlohmann/json.hpp>
 
-#include "gltf/checker.h"
 #include "gltf/converter.h"
+#include "gltf/file/checker.h"
 #include "support/scene_bytes.h"
 #include "support/text.h"
 #include "torvane/animation/ctrack.h"

@@ -158,6 +158,8 @@ const Verb kVerbs[] = {
     {"preview {scene.q7r} --set {p.bmp} -o {out.q7r} --force", "out.q7r"},
     {"preview {scene.q7r} -o {out.bmp} --force", "out.bmp"},
     {"preview {scene.q7r} -o {out.jpg} --force", "out.jpg"},
+    {"convert {scene.q7r} {out.glb} --force", "out.glb"},
+    {"view {scene.q7r} -o {out.html} --force", "out.html"},
     {"info {scene.q7r}", ""},
     {"tree --json {scene.q7r}", ""},
     {"dump {scene.q7r}", ""},

@@ -4,6 +4,7 @@
 #include <cstdio>
 #include <filesystem>
 
+#include "gltf/page/page.h"
 #include "gltf/text.h"
 #include "output/output_file.h"
 #include "output/temporary_file.h"
@@ -27,20 +28,36 @@ std::vector<std::string> FilesOf(const std::string& output)
   return {output};
 }
 
-// Neither of two files takes its place before both are written.
-void WriteModel(const gltf::Model& model, const std::string& output)
+std::string TextOf(const fs::path& path)
 {
+  const std::u8string text = path.u8string();
+  return {text.begin(), text.end()};
+}
+
+// The main file, as a whole.
+void WriteMain(const gltf::Model& model, const std::string& title, GltfForm form, const gltf::Sink& write)
+{
+  if (form == GltfForm::kPage)
+    gltf::WritePage(model, title, write);
+  else if (form == GltfForm::kGlb)
+    gltf::WriteGlb(model, write);
+  else
+    write(reinterpret_cast<const std::uint8_t*>(model.json.data()), model.json.size());
+}
+
+// Neither of two files takes its place before both are written.
+void WriteModel(const gltf::Model& model, const std::string& title, const std::string& output)
+{
+  const GltfForm form = GltfFormOf(output);
   auto writeMain = [&](const std::string& partial) {
     RawOutput file{fs::path(partial)};
-    auto write = [&file](const void* data, std::size_t size) { file.Write(static_cast<const char*>(data), size); };
-    if (GltfFormOf(output) == GltfForm::kGlb)
-      gltf::WriteGlb(model, write);
-    else
-      write(model.json.data(), model.json.size());
+    WriteMain(model, title, form, [&file](const std::uint8_t* data, std::size_t size) {
+      file.Write(reinterpret_cast<const char*>(data), size);
+    });
     file.Close();
     return std::string();
   };
-  if (GltfFormOf(output) == GltfForm::kGlb || model.bytes.Size() == 0)
+  if (form != GltfForm::kGltf || model.bytes.Size() == 0)
     return WriteOutput(output, writeMain);
   WriteOutput(BytesPath(output), [&](const std::string& partial) {
     RawOutput file{fs::path(partial)};
@@ -59,13 +76,14 @@ GltfForm GltfFormOf(const std::string& path)
   std::string suffix = fs::path(path).extension().string();
   std::transform(suffix.begin(), suffix.end(), suffix.begin(),
                  [](char c) { return c >= 'A' && c <= 'Z' ? static_cast<char>(c + ('a' - 'A')) : c; });
-  return suffix == ".glb" ? GltfForm::kGlb : suffix == ".gltf" ? GltfForm::kGltf : GltfForm::kNone;
+  return suffix == ".glb"    ? GltfForm::kGlb
+         : suffix == ".gltf" ? GltfForm::kGltf
+         : suffix == ".html" ? GltfForm::kPage
+                             : GltfForm::kNone;
 }
 
 void RequireGltfOutput(const std::string& output, const std::string& scene, bool force)
 {
-  if (GltfFormOf(output) == GltfForm::kNone)
-    throw Failure(output + ": the name must end with .glb or .gltf");
   for (const std::string& file : FilesOf(output)) {
     std::error_code error;
     if (!scene.empty() && fs::equivalent(file, scene, error))
@@ -79,13 +97,12 @@ int WriteGltf(_torvane_::BaseDocument& document, const std::string& scene, const
 {
   options.sceneFolder = fs::absolute(scene).parent_path();
   options.outputFolder = fs::absolute(output).parent_path();
-  if (GltfFormOf(output) == GltfForm::kGltf) {
-    const std::u8string name = fs::path(BytesPath(output)).filename().u8string();
-    options.bufferName = gltf::PercentEncoded({name.begin(), name.end()});
-  }
+  if (GltfFormOf(output) == GltfForm::kGltf)
+    options.bufferName = gltf::PercentEncoded(TextOf(fs::path(BytesPath(output)).filename()));
+  options.embed = options.embed || GltfFormOf(output) == GltfForm::kPage;
   try {
     const gltf::Model model = gltf::Convert(document, options);
-    WriteModel(model, output);
+    WriteModel(model, TextOf(fs::path(scene).stem()), output);
     for (const std::string& line : model.account.Lines())
       std::fprintf(stderr, "%s\n", line.c_str());
     return model.account.HasProblems() ? kProblems : kDone;

@@ -1,4 +1,4 @@
-// Scenes written as glTF files.
+// Scenes written as glTF files and as pages.
 #pragma once
 
 #include <string>
@@ -15,6 +15,7 @@ enum class GltfForm
   kNone,
   kGlb,  // one file
   kGltf, // JSON, with the bytes in NAME.bin beside it
+  kPage, // one web page (.html)
 };
 
 GltfForm GltfFormOf(const std::string& path);
@@ -25,7 +26,7 @@ void RequireGltfOutput(const std::string& output, const std::string& scene, bool
 
 // Writes a document to a path of one of the forms, as whole files, tells what they can't hold on standard error and
 // their sizes on standard output. `scene` is where the document came from: its pictures may lie beside it. Gives the
-// exit status. Throws Failure.
+// exit status. A page always has its pictures packed in. Throws Failure.
 int WriteGltf(_torvane_::BaseDocument& document, const std::string& scene, const std::string& output,
               gltf::Options options);
 

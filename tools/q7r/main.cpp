@@ -26,8 +26,9 @@ int Run(int argc, char** argv)
   program.set_version_flag("--version", "q7r 1.0.0 (scene file version 13000)");
   program.require_subcommand(1);
   int status = q7r::kDone;
-  for (auto add : {q7r::AddExport, q7r::AddInfo, q7r::AddTree, q7r::AddDump, q7r::AddCheck, q7r::AddResave,
-                   q7r::AddMerge, q7r::AddPreview, q7r::AddIES, q7r::AddCompositions, q7r::AddExtract, q7r::AddConvert})
+  for (auto add :
+       {q7r::AddExport, q7r::AddInfo, q7r::AddTree, q7r::AddDump, q7r::AddCheck, q7r::AddResave, q7r::AddMerge,
+        q7r::AddPreview, q7r::AddIES, q7r::AddCompositions, q7r::AddExtract, q7r::AddConvert, q7r::AddView})
     add(program, status);
   try {
     program.parse(argc, argv);

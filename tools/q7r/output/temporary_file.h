@@ -65,6 +65,9 @@ bool IsStandardOutput(const std::filesystem::path& path);
 // Folders for temporary files, the one that the user has set first.
 std::vector<std::filesystem::path> TemporaryFolders();
 
+// Makes a folder in one of them that nobody else can look into; it stays. Throws std::system_error.
+std::filesystem::path MakePrivateFolder();
+
 // To be called once, first of all: a standard stream that is closed doesn't become the next file that is opened, and a
 // file that grows too long is an error like others.
 void PrepareProcess();

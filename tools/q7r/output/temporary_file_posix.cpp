@@ -6,6 +6,7 @@
 #include <cerrno>
 #include <charconv>
 #include <csignal>
+#include <cstdlib>
 #include <fcntl.h>
 #include <mutex>
 #include <random>
@@ -231,6 +232,16 @@ std::vector<fs::path> TemporaryFolders()
 {
   std::error_code error;
   return {fs::temp_directory_path(error), "/tmp", "/var/tmp", "/dev/shm"};
+}
+
+fs::path MakePrivateFolder()
+{
+  for (const fs::path& folder : TemporaryFolders()) {
+    std::string path = (folder / "q7r-XXXXXX").string();
+    if (!folder.empty() && ::mkdtemp(path.data()))
+      return path;
+  }
+  Throw(errno);
 }
 
 void PrepareProcess()

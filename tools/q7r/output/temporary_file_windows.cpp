@@ -168,6 +168,17 @@ std::vector<fs::path> TemporaryFolders()
   return {fs::temp_directory_path(error), L"C:\\Windows\\Temp", L"C:\\ProgramData"};
 }
 
+fs::path MakePrivateFolder()
+{
+  // Below a folder that is the user's own, as the first one is.
+  for (const fs::path& folder : TemporaryFolders()) {
+    const fs::path path = folder / fs::path(RandomName()).stem();
+    if (!folder.empty() && ::CreateDirectoryW(path.c_str(), nullptr))
+      return path;
+  }
+  ThrowLast();
+}
+
 void PrepareProcess() {}
 
 } // namespace q7r

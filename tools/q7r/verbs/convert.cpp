@@ -32,6 +32,9 @@ struct Options
 
 int Convert(Options& options)
 {
+  const GltfForm form = GltfFormOf(options.output);
+  if (form != GltfForm::kGlb && form != GltfForm::kGltf)
+    throw Failure(options.output + ": the name must end with .glb or .gltf");
   RequireGltfOutput(options.output, options.scene, options.force);
   options.conversion.pointers = !options.noPointers;
   if (options.lit || options.unlit)

@@ -141,7 +141,7 @@ void AddExport(CLI::App& program, int& status)
   verb->add_option("PROJECT", options->project.file, "an After Effects project (.aep, .aepx) or a composition file")
       ->required();
   verb->add_option("OUTPUT", options->output,
-                   "the scene file to write; its suffix becomes .q7r (.glb and .gltf: as convert)")
+                   "the scene file to write; its suffix becomes .q7r (.glb, .gltf: as convert; .html: as view)")
       ->required();
   AddProjectOptions(*verb, options->project);
   verb->add_flag("--force", options->force, "replace an existing file without asking");

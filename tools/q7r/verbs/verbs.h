@@ -33,5 +33,6 @@ void AddIES(CLI::App& program, int& status);
 void AddCompositions(CLI::App& program, int& status);
 void AddExtract(CLI::App& program, int& status);
 void AddConvert(CLI::App& program, int& status);
+void AddView(CLI::App& program, int& status);
 
 } // namespace q7r

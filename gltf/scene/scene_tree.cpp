@@ -1,0 +1,145 @@
+#include "gltf/scene/scene_tree.h"
+
+#include <algorithm>
+#include <cmath>
+
+#include "torvane/ids.h"
+#include "torvane/objects/unit_factors.h"
+#include "torvane/render/render_data.h"
+#include "torvane/views/base_draw.h"
+
+namespace gltf
+{
+
+using namespace _torvane_;
+
+namespace
+{
+
+constexpr Long kKeyLayerId = 1027565; // of an object's container: the host's number of the layer
+constexpr Long kFlagLocked = 4;       // of a scene layer
+constexpr Real kDefaultUnit = 0.01;
+
+const LayerObject* LayerOf(const BaseObject& object)
+{
+  return NodeCast<LayerObject>(object.GetLayer()); // a file may point the link at anything
+}
+
+// In reach of single precision, and above 0.
+bool IsUsable(Real number) { return number >= 1e-12 && number <= 1e12; }
+
+Real UnitOf(const BaseDocument& document)
+{
+  const auto* unit =
+      NodeCast<UnitScaleData>(document.GetDataInstance().GetCustomDataType(kKeyDocumentUnit, kCustomUnitScale));
+  const Real factor = unit ? GetUnitFactor(unit) : 0.0;
+  return IsUsable(factor) ? factor : kDefaultUnit;
+}
+
+void TakeIfUsable(const BaseContainer& settings, Long id, Real& value)
+{
+  const Real number = settings.GetReal(id, value);
+  if (IsUsable(number))
+    value = number;
+}
+
+} // namespace
+
+bool StandsForLayer(const BaseObject& object) { return object.GetDataInstance().FindData(kKeyLayerId) != nullptr; }
+
+SceneTree::SceneTree(BaseDocument& document)
+{
+  AddAll(document.GetFirstObject());
+  places_.reserve(objects_.size());
+  for (std::size_t i = 0; i < objects_.size(); ++i)
+    places_.emplace(objects_[i].object, i);
+  sceneCamera_ = FindSceneCamera(document);
+}
+
+// Without a recursion: chains of parents are as long as their makers like.
+void SceneTree::AddAll(BaseObject* first)
+{
+  std::size_t parent = kNone;
+  std::size_t before = kNone; // the sibling before
+  for (BaseObject* object = first; object;) {
+    const std::size_t index = Add(*object, parent);
+    if (before != kNone)
+      objects_[before].nextSibling = index;
+    else if (parent != kNone)
+      objects_[parent].firstChild = index;
+    before = index;
+    if (BaseObject* child = object->GetDown()) {
+      parent = index;
+      before = kNone;
+      object = child;
+      continue;
+    }
+    while (!object->GetNext() && parent != kNone) {
+      before = parent;
+      object = objects_[parent].object;
+      parent = objects_[parent].parent;
+    }
+    object = object->GetNext();
+  }
+}
+
+std::size_t SceneTree::Add(BaseObject& object, std::size_t parent)
+{
+  SceneObject entry = {&object, parent, kNone, kNone, kNone, false};
+  if (parent != kNone)
+    entry.offLayer = LayerOf(*objects_[parent].object) == LayerOf(object) ? objects_[parent].offLayer : parent;
+  entry.hidden = IsHidden(entry);
+  objects_.push_back(entry);
+  return objects_.size() - 1;
+}
+
+bool SceneTree::IsHidden(const SceneObject& entry) const
+{
+  const Long mode = entry.object->GetRenderMode();
+  if (mode == kObjectModeOff || mode == kObjectModeOn)
+    return mode == kObjectModeOff;
+  if (!StandsForLayer(*entry.object))
+    return entry.parent != kNone && objects_[entry.parent].hidden;
+  const LayerObject* layer = LayerOf(*entry.object);
+  const bool isNested = layer && !layer->GetFlag(kFlagLocked) && entry.offLayer != kNone;
+  return isNested && objects_[entry.offLayer].hidden;
+}
+
+std::size_t SceneTree::Find(const GeListNode* node) const
+{
+  const auto found = places_.find(node);
+  return found == places_.end() ? kNone : found->second;
+}
+
+std::size_t SceneTree::FindSceneCamera(BaseDocument& document) const
+{
+  const auto* panels = document.GetViewPanelRoot();
+  auto* panel = panels ? NodeCast<ViewPanel>(panels->GetFirst()) : nullptr;
+  auto* draw = panel ? NodeCast<BaseDraw>(panel->GetDraws().GetFirst()) : nullptr;
+  const std::size_t linked = draw ? Find(draw->GetSceneCamera().GetLink()) : kNone;
+  if (linked != kNone && objects_[linked].object->GetType() == kObjectCamera)
+    return linked;
+  for (std::size_t i = 0; i < objects_.size(); ++i) {
+    if (objects_[i].object->GetType() == kObjectCamera)
+      return i;
+  }
+  return kNone;
+}
+
+SceneSettings::SceneSettings(BaseDocument& document)
+    : unit(UnitOf(document)),
+      fps(std::max(document.GetPref().GetFps(), Long{1})),
+      start(document.GetPref().GetMinTime().Get()),
+      end(document.GetPref().GetMaxTime().Get())
+{
+  const RenderData* render = document.GetActiveRenderData();
+  if (!render)
+    return;
+  const BaseContainer& settings = render->GetDataInstance();
+  TakeIfUsable(settings, kRenderWidth, width);
+  TakeIfUsable(settings, kRenderHeight, height);
+  aspect = width / height;
+  TakeIfUsable(settings, kRenderFilmAspect, aspect);
+}
+
+} // namespace gltf

@@ -1,0 +1,68 @@
+// The objects of a document as a list, in the order of the tree, with what each one's place in it means; and the
+// settings that the whole conversion goes by.
+#pragma once
+
+#include <cstddef>
+#include <unordered_map>
+#include <vector>
+
+#include "gltf/scene/frames.h"
+#include "torvane/document/base_document.h"
+
+namespace gltf
+{
+
+inline constexpr std::size_t kNone = static_cast<std::size_t>(-1);
+
+struct SceneObject
+{
+  _torvane_::BaseObject* object;
+  std::size_t parent;      // kNone for a root
+  std::size_t offLayer;    // the nearest ancestor that isn't on the object's own scene layer, or kNone
+  std::size_t firstChild;  // kNone for none
+  std::size_t nextSibling; // likewise
+  bool hidden;             // not rendered
+};
+
+// Parents before their children. The index of an object is that of its node.
+class SceneTree
+{
+ public:
+  explicit SceneTree(_torvane_::BaseDocument& document);
+
+  std::size_t Count() const { return objects_.size(); }
+  const SceneObject& operator[](std::size_t index) const { return objects_[index]; }
+  // The index of an object of this document, kNone for anything else.
+  std::size_t Find(const _torvane_::GeListNode* node) const;
+  // What the first view looks through, else the first camera; kNone without cameras.
+  std::size_t SceneCamera() const { return sceneCamera_; }
+
+ private:
+  void AddAll(_torvane_::BaseObject* first);
+  std::size_t Add(_torvane_::BaseObject& object, std::size_t parent);
+  bool IsHidden(const SceneObject& entry) const;
+  std::size_t FindSceneCamera(_torvane_::BaseDocument& document) const;
+
+  std::vector<SceneObject> objects_;
+  std::unordered_map<const _torvane_::GeListNode*, std::size_t> places_;
+  std::size_t sceneCamera_ = kNone;
+};
+
+// True for an object that stands for a layer of the host that made the scene.
+bool StandsForLayer(const _torvane_::BaseObject& object);
+
+// Settings of a document, each brought to something usable.
+struct SceneSettings
+{
+  explicit SceneSettings(_torvane_::BaseDocument& document);
+
+  Real unit = 0.01; // metres of one scene unit
+  int fps = 30;
+  Real start = 0.0; // seconds
+  Real end = 0.0;
+  Real width = 800.0; // of the picture, pixels
+  Real height = 600.0;
+  Real aspect = 4.0 / 3.0; // width by height, as seen
+};
+
+} // namespace gltf
