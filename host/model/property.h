@@ -81,6 +81,11 @@ class Property
   void SetConstant(const Value& value) { constant_ = value; }
   void SetKeyframes(std::vector<Keyframe> keyframes) { keyframes_ = std::move(keyframes); }
   void SetSamples(std::vector<Value> samples) { samples_ = std::move(samples); }
+  // The same for one of the three of a split position.
+  void SetSplitSamples(std::size_t component, std::vector<Value> samples)
+  {
+    split_.at(component).SetSamples(std::move(samples));
+  }
   // A keyframe that only shapes the way between its neighbours may be left out of the list and is counted here.
   void CountKeyframes(std::size_t leftOut) { leftOut_ = leftOut; }
   void SetExpression(std::string text) { expression_ = std::move(text); }

@@ -36,6 +36,7 @@ class SamplesReader
 
  private:
   void TakeLayer(const Composition& composition, std::size_t index, const Composition& target);
+  bool TakeProperty(const Property& baked, Property* own) const;
   std::vector<Value> Resample(const std::vector<Value>& samples) const;
   void Warn(const std::string& text) { project_.warnings.push_back(name_ + ": " + text); }
 
@@ -71,18 +72,35 @@ std::vector<Value> SamplesReader::Resample(const std::vector<Value>& samples) co
   return resampled;
 }
 
+// False when there are samples and nothing to take them. Of a separated position each dimension takes its own.
+bool SamplesReader::TakeProperty(const Property& baked, Property* own) const
+{
+  bool isTaken = true;
+  if (!baked.Samples().empty()) {
+    if (own)
+      own->SetSamples(Resample(baked.Samples()));
+    isTaken = own != nullptr;
+  }
+  for (std::size_t c = 0; c < baked.Split().size(); ++c) {
+    if (baked.Split()[c].Samples().empty())
+      continue;
+    if (own && !own->Split().empty())
+      own->SetSplitSamples(c, Resample(baked.Split()[c].Samples()));
+    else
+      isTaken = false;
+  }
+  return isTaken;
+}
+
 void SamplesReader::TakeLayer(const Composition& composition, std::size_t index, const Composition& target)
 {
   const Layer& layer = *composition.layers[index];
   Layer* const taker = FindLayer(target, index, layer);
   for (const auto& property : layer.streams) {
-    if (!property || property->Samples().empty())
+    if (!property)
       continue;
     const StreamInfo& info = property->Info();
-    Property* const own = taker ? taker->streams[StreamIndex(info)].get() : nullptr;
-    if (own)
-      own->SetSamples(Resample(property->Samples()));
-    else
+    if (!TakeProperty(*property, taker ? taker->streams[StreamIndex(info)].get() : nullptr))
       Warn(LayerLabel(layer) + ": its samples of " + info.name + " find no such property in composition " +
            Quoted(target.item->name));
   }

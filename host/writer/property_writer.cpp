@@ -49,8 +49,7 @@ bool IsSayable(const Property& property)
 {
   const std::vector<Keyframe>& keys = property.Keyframes();
   return (!property.IsTurning() || keys.size() < 2) &&
-         std::all_of(keys.begin(), keys.end(), [](const Keyframe& key) { return IsSayable(key); }) &&
-         std::all_of(property.Split().begin(), property.Split().end(), [](const Property& c) { return IsSayable(c); });
+         std::all_of(keys.begin(), keys.end(), [](const Keyframe& key) { return IsSayable(key); });
 }
 
 OrderedJson WriteEasing(const std::vector<Easing>& easing, double Easing::*x, double Easing::*y)
@@ -122,9 +121,7 @@ OrderedJson WriteProperty(const Property& property, std::size_t lastFrame)
     json["s"] = true;
     for (std::size_t c = 0; c < property.Split().size(); ++c) {
       constexpr const char* kKeys[] = {"x", "y", "z"};
-      OrderedJson& component = json[kKeys[c]] = WriteKeys(property.Split()[c]);
-      if (!property.Split()[c].Expression().empty())
-        component["x"] = property.Split()[c].Expression();
+      json[kKeys[c]] = WriteProperty(property.Split()[c], lastFrame);
     }
   }
   if (!property.Expression().empty())

@@ -81,7 +81,13 @@ std::string Shot(unsigned active = 1)
                                           {{0, 0, 1, 0.5}, {0, 0, 0, 0.5}, {0, 0, 2, 0.5}}),
                              pb::PlainKey(25600, pb::kLinear, pb::kHold, {2, 1, 1}, {{}, {}, {}}),
                              pb::PlainKey(51200, pb::kLinear, pb::kHold, {3, 1, 1}, {{}, {}, {}})}}));
-  pb::Layer camera{.id = 11, .kind = 2, .switches = 0x44};
+  pb::Layer camera{.id = 11, .name = "Lens", .kind = 2, .switches = 0x44};
+  pb::Add(camera.transform, "ADBE Position", pb::Body({.components = 3, .value = {0, 0, 0}, .switches = 3}));
+  pb::Add(camera.transform, "ADBE Position_0", pb::Body({.value = {7}, .after = {pb::Utf8("wiggle(1, 5)")}}));
+  pb::Add(camera.transform, "ADBE Position_1",
+          pb::Body({.keys = {pb::PlainKey(0, pb::kLinear, pb::kBezier, {5}, {{0, 0, 40, 0.5}}),
+                             pb::PlainKey(51200, pb::kBezier, pb::kLinear, {5}, {{40, 0.5, 0, 0}})}}));
+  pb::Add(camera.transform, "ADBE Position_2", pb::Body({.value = {-900}}));
   pb::Comp inner{.id = 2,
                  .name = "Inner",
                  .layers = {pb::MakeLayer({.id = 30, .source = 60})},
@@ -190,7 +196,9 @@ TEST_F(ProjectVerbs, FindMovedFootageAndTakeSamples)
   const std::string baked =
       Write("baked.json", R"({"nm": "Main", "w": 9, "h": 9, "fr": 12.5, "ip": 0, "op": 3, "layers":
     [{"ty": 1, "nm": "Wall", "ddd": 1, "ks": {"rx": {"k": 0, "samples": [10, 20, 40]}}},
-     {"ty": 13, "nm": "Eye", "pe": {"k": 1, "samples": [1]}}]})");
+     {"ty": 13, "nm": "Eye", "pe": {"k": 1, "samples": [1]}},
+     {"ty": 13, "nm": "Lens", "pe": {"k": 1}, "ks": {"p": {"s": true, "x": {"k": 0, "samples": [1, 2]}}}},
+     {"ty": 3, "nm": "Null 1", "ks": {"p": {"s": true, "y": {"k": 0, "samples": [1]}}}}]})");
   const RunResult run =
       RunQ7r("extract " + Quoted(shot) + " --force -o " + Quoted(folder_ / "a.json") + " --samples " + Quoted(baked));
   EXPECT_EQ(0, run.status);
@@ -198,8 +206,14 @@ TEST_F(ProjectVerbs, FindMovedFootageAndTakeSamples)
   EXPECT_NE(run.err.find("baked.json: layer \"Eye\": its samples of zoom find no such property"), std::string::npos)
       << run.err;
   const ProjectBytes text = ReadWholeFile(folder_ / "a.json");
-  const nlohmann::json wall = nlohmann::json::parse(text.begin(), text.end())["layers"][0];
-  EXPECT_EQ(nlohmann::json::parse("[[10.0], [20.0], [20.0], [40.0], [40.0]]"), wall["ks"]["rx"]["samples"]);
+  const nlohmann::json layers = nlohmann::json::parse(text.begin(), text.end())["layers"];
+  EXPECT_EQ(nlohmann::json::parse("[[10.0], [20.0], [20.0], [40.0], [40.0]]"), layers[0]["ks"]["rx"]["samples"]);
+  // Of a separated position one dimension alone; what turns back in another is sampled there.
+  const nlohmann::json& position = layers[1]["ks"]["p"];
+  EXPECT_EQ(nlohmann::json::parse("[[1.0], [2.0], [2.0]]"), position["x"]["samples"]);
+  EXPECT_EQ(76U, position["y"]["samples"].size());
+  EXPECT_FALSE(position["z"].contains("samples") || position.contains("samples"));
+  EXPECT_NE(run.err.find("layer \"Null 1\": its samples of position find no such property"), std::string::npos);
 }
 
 } // namespace
