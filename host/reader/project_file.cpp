@@ -78,6 +78,12 @@ std::vector<CompositionSummary> CompositionFile::Compositions()
   return summaries;
 }
 
+bool BeginsAsJson(std::string_view bytes)
+{
+  const std::size_t first = bytes.find_first_not_of(" \t\r\n");
+  return first != std::string_view::npos && bytes[first] == '{';
+}
+
 bool HasSuffix(const std::filesystem::path& file, std::string_view suffix)
 {
   std::string own = PathToUtf8(file.extension());
@@ -92,9 +98,11 @@ std::unique_ptr<ProjectFile> OpenProjectFile(const std::filesystem::path& file)
 {
   const std::string name = PathToUtf8(file.filename());
   FileBytes bytes(file);
-  const bool isXml = projects::IsXmlProject(bytes.View()) || HasSuffix(file, ".aepx");
-  if (isXml || projects::IsBinaryProject(bytes.View()) || HasSuffix(file, ".aep"))
-    return projects::OpenProject(name, std::move(bytes), isXml);
+  const bool isBinary = projects::IsBinaryProject(bytes.View()), isXml = projects::IsXmlProject(bytes.View());
+  // The suffix only tells what is missed in a file that is none of them.
+  const bool isToBeXml = HasSuffix(file, ".aepx"), isToBeProject = isToBeXml || HasSuffix(file, ".aep");
+  if (isBinary || isXml || (isToBeProject && !BeginsAsJson(bytes.View())))
+    return projects::OpenProject(name, std::move(bytes), isXml || (isToBeXml && !isBinary));
   return std::make_unique<CompositionFile>(name, bytes, std::filesystem::absolute(file).parent_path());
 }
 

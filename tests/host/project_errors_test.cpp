@@ -151,7 +151,9 @@ TEST(ProjectErrors, TellFilesThatAreNone)
       {"<AfterEffectsProject><head bdata=\"012\"/></AfterEffectsProject>",
        "line 1: bdata of head: an odd number of digits"},
       {deep + "</Fold>", "not XML"},
-      {"<AfterEffectsProject/>", "expected a list Fold"},
+      {"<AfterEffectsProject/>", "line 1: expected a list Fold"},
+      {"<?xml version=\"1.0\"?>\n<AfterEffectsProject>\n<Fold2/></AfterEffectsProject>",
+       "line 2: expected a list Fold"},
   };
   for (const auto& [bytes, reason] : cases) {
     const std::string refusal = Refusal(bytes);

@@ -147,6 +147,10 @@ void ProjectBuilder::ReadLayer(const Build& build, const Chunk& chunk, const Lay
   const PropertyGroup properties = list ? PropertyGroup(*list) : PropertyGroup();
   const LayerClock clock(record.start, record.stretch, builds_.front().settings.framesPerSecond);
   SetSpan(record, properties, clock, layer);
+  const Chunk* overrides = properties.Find("ADBE Layer Overrides");
+  const std::optional<Chunk> count = overrides ? overrides->Find("CprC"_tag) : std::nullopt;
+  if (count && count->Get(Field<std::uint32_t>{0}) > 0)
+    doubts_.insert("values of Essential Graphics are passed over: nested compositions have their own");
   ReadStreams(properties, {build.settings, record, clock, doubts_}, layer);
 }
 
@@ -196,6 +200,8 @@ void ProjectBuilder::SetLight(const LayerRecord& record, Layer& layer)
   layer.type = AEGP_ObjectType_LIGHT;
   layer.is3D = true;
   layer.lightType = static_cast<AEGP_LightType>(std::min(record.lightKind, ldta::kAmbient));
+  if (record.lightKind == ldta::kParallel || record.lightKind == ldta::kAmbient)
+    doubts_.insert("parallel and ambient lights were never seen: which is which is told by others");
   if (record.lightKind > ldta::kAmbient)
     doubts_.insert("environment lights were never seen: taken as ambient");
 }

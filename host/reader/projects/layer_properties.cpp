@@ -83,6 +83,7 @@ class StreamReader
  private:
   std::unique_ptr<Property> ReadProperty(const PropertySource& source, const PropertyGroup& group);
   std::unique_ptr<Property> Make(const StreamInfo& info, PropertyRecord record, Unit unit, const Value& defaults);
+  std::unique_ptr<Property> NoteKeyedOption(const PropertySource& source, std::unique_ptr<Property> property) const;
   Property ReadSeparated(const PropertyGroup& group, std::size_t component);
   bool IsSeparated(const PropertyGroup& group) const;
   void Convert(PropertyRecord& record, Unit unit, std::size_t dimensions, const Value& defaults) const;
@@ -127,11 +128,19 @@ std::unique_ptr<Property> StreamReader::ReadProperty(const PropertySource& sourc
   const Value defaults = DefaultOf(info);
   const Chunk* chunk = group.Find(source.matchName);
   if (chunk && (chunk->IsList("tdbs"_tag) || chunk->IsList("otst"_tag)))
-    return Make(info, ReadPropertyRecord(*chunk), source.unit, defaults);
+    return NoteKeyedOption(source, Make(info, ReadPropertyRecord(*chunk), source.unit, defaults));
   if (source.id == AEGP_LayerStream_POSITION)
     DoubtDefaultPosition();
   auto property = std::make_unique<Property>(info);
   property->SetConstant(defaults);
+  return property;
+}
+
+std::unique_ptr<Property> StreamReader::NoteKeyedOption(const PropertySource& source,
+                                                        std::unique_ptr<Property> property) const
+{
+  if (source.group == kLight && property->KeyframeCount() > 1)
+    Doubt("options of lights that have keyframes were never seen: read as other properties are");
   return property;
 }
 

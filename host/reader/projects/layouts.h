@@ -78,6 +78,7 @@ inline constexpr u8 kText = 3;
 inline constexpr u8 kShape = 4;
 inline constexpr u8 kModel = 5;
 
+inline constexpr u32 kParallel = 0;
 inline constexpr u32 kAmbient = 3;
 inline constexpr u32 kEnvironment = 4;
 } // namespace ldta

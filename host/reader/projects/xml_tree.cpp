@@ -183,6 +183,7 @@ std::unique_ptr<ChunkDocument> TreeBuilder::Build()
   PutWord("RIFX"_tag);
   PutWord(0);
   PutWord("Egg!"_tag);
+  places_.emplace_back(0, static_cast<std::size_t>(root.offset_debug()));
   open_.push_back({4, root.first_child()});
   while (!open_.empty()) {
     const pugi::xml_node element = open_.back().next;
