@@ -39,7 +39,7 @@ constexpr ArrayCase kArrayCases[] = {
      "8C 00 00 00 11 06 3F F0 00 00 00 00 00 00 C0 04 00 00 00 00 00 00"},
 };
 
-void Record(Long number, void* numbers) { static_cast<std::vector<Long>*>(numbers)->push_back(number); }
+void Collect(Long number, void* numbers) { static_cast<std::vector<Long>*>(numbers)->push_back(number); }
 
 } // namespace
 
@@ -204,7 +204,7 @@ TEST(HyperFileArray, CountsEveryElementForTheProgressHooks)
   Bytes bytes = WriteToMemory(
       [&](HyperFile& file) {
         file.WriteArray(elements.data(), kArrayByte, 1, 120000); // counted, though nobody listens yet
-        file.SetWriteProgress(Record, &positions);
+        file.SetWriteProgress(Collect, &positions);
         file.WriteChar(1);
         file.WriteArray(elements.data(), kArrayByte, 1, 120000);
       },
@@ -234,7 +234,7 @@ TEST(HyperFileArray, CountsEveryElementForTheProgressHooks)
   std::vector<Long> percents;
   Char one = 0;
   ASSERT_TRUE(read.file.ReadArray(elements.data(), kArrayByte, 1, 120000));
-  read.file.SetReadProgress(Record, &percents);
+  read.file.SetReadProgress(Collect, &percents);
   ASSERT_TRUE(read.file.ReadChar(one) && read.file.ReadArray(elements.data(), kArrayByte, 1, 120000));
   EXPECT_EQ(percents, expected);
 }
