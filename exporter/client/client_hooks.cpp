@@ -1,4 +1,6 @@
 // What the library asks of its client, memory aside.
+#include <atomic>
+
 #include "exporter/client/alien_nodes.h"
 #include "torvane/hooks.h"
 #include "torvane/objects/point_object.h"
@@ -16,7 +18,7 @@ namespace
 constexpr Long kWriterId = 1027408;
 constexpr const char* kWriterName = "Krokior";
 
-Long MaterialCounter = 0; // the number of the next material that runs
+std::atomic<Long> MaterialCounter = 0; // the number of the next material that runs
 
 } // namespace
 

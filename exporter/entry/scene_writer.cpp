@@ -17,7 +17,7 @@ using namespace _torvane_;
 namespace
 {
 
-FileProblem lastProblem;
+thread_local FileProblem lastProblem; // a host that isn't After Effects may export several at a time
 
 // The document, built from the active composition, in the open file. False when memory ran out: the file is then of no
 // use.

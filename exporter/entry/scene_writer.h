@@ -13,7 +13,8 @@ inline constexpr const char* kSceneSuffix = "q7r";
 // path gives true and writes nothing. A write that fails later is not seen here: the result is still true.
 bool WriteSceneFile(const char* path);
 
-// What went wrong with the file of the last WriteSceneFile, for a host in the same program. After Effects isn't told.
+// What went wrong with the file of the last WriteSceneFile of this thread, for a host in the same program. After
+// Effects isn't told.
 const _torvane_::FileProblem& GetSceneFileProblem();
 
 } // namespace exporter

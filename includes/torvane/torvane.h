@@ -66,6 +66,7 @@
 #include "torvane/text/ge_string.h"
 #include "torvane/time/base_time.h"
 #include "torvane/time/date_time.h"
+#include "torvane/time/reproducible_run.h"
 #include "torvane/time/uuid.h"
 #include "torvane/types.h"
 #include "torvane/values/base_container.h"

@@ -3,6 +3,7 @@
 #include <cmath>
 
 #include "q7r_basetime/basetime_log.h"
+#include "torvane/time/reproducible_run.h"
 
 namespace _torvane_
 {
@@ -145,6 +146,12 @@ Bool DateTimeFromTime(std::time_t seconds, DateTime& date) noexcept
   return true;
 }
 
-void GetDateTimeNow(DateTime& date) noexcept { DateTimeFromTime(std::time(nullptr), date); }
+void GetDateTimeNow(DateTime& date) noexcept
+{
+  if (const ReproducibleRun* run = ReproducibleRun::GetCurrent())
+    date = run->GetNow();
+  else
+    DateTimeFromTime(std::time(nullptr), date);
+}
 
 } // namespace _torvane_

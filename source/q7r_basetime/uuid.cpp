@@ -3,6 +3,7 @@
 #include <cstring>
 
 #include "q7r_basetime/basetime_log.h"
+#include "torvane/time/reproducible_run.h"
 
 #ifdef _WIN32
 #include <windows.h>
@@ -72,7 +73,9 @@ Bool TakeRandom(UChar* bytes)
 
 void CreateUuid(UChar* bytes) noexcept
 {
-  if (!TakeRandom(bytes))
+  if (ReproducibleRun* run = ReproducibleRun::GetCurrent())
+    run->TakeUuid(bytes);
+  else if (!TakeRandom(bytes))
     ReportBaseTime(__LINE__, "the system gives no random identifier");
 }
 

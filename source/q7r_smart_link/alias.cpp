@@ -6,6 +6,7 @@
 #include "torvane/memory/owned.h"
 #include "torvane/nodes/private_chunk.h"
 #include "torvane/stream/hyper_file.h"
+#include "torvane/time/reproducible_run.h"
 
 namespace _torvane_
 {
@@ -21,6 +22,13 @@ constexpr LLong kRecordSize = kMarkSize + static_cast<LLong>(sizeof(GeAliasID));
 constexpr LLong kNameLengthSize = 4;
 
 std::atomic<GeAliasID> gNextTrunkId{1};
+
+GeAliasID TakeTrunkId()
+{
+  if (ReproducibleRun* run = ReproducibleRun::GetCurrent())
+    return run->TakeLinkId();
+  return gNextTrunkId.fetch_add(1, std::memory_order_relaxed);
+}
 
 // What FirstLinkOfGoal gives for a link without an owner.
 constexpr struct EmptyOwner
@@ -101,9 +109,7 @@ void GeAliasXLink::Detach()
 
 GeAliasGoal* GeAliasXLink::GetGoal() const { return trunk ? trunk->goal : nullptr; }
 
-AliasTrunk::AliasTrunk(GeAliasGoal& trunkGoal)
-    : goal(&trunkGoal), id(gNextTrunkId.fetch_add(1, std::memory_order_relaxed))
-{}
+AliasTrunk::AliasTrunk(GeAliasGoal& trunkGoal) : goal(&trunkGoal), id(TakeTrunkId()) {}
 
 AliasTrunk::~AliasTrunk()
 {

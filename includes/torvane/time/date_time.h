@@ -22,7 +22,7 @@ struct DateTime
   friend constexpr Bool operator==(const DateTime& a, const DateTime& b) = default;
 };
 
-// The machine's local time. A failure is reported and leaves `date` as it is.
+// The machine's local time, or the date of a ReproducibleRun. A failure is reported and leaves `date` as it is.
 void GetDateTimeNow(DateTime& date) noexcept;
 
 // Local time to and from the C library's count of seconds. False, and a report, when it has no such date.

@@ -1,8 +1,7 @@
 #include "torvane/tags/compositing_tag.h"
 
-#include <chrono>
-
 #include "k2v_file/values/container_defaults.h"
+#include "q7r_basetime/clock.h"
 #include "q7r_file/tags/tag_entries.h"
 
 namespace _torvane_
@@ -27,14 +26,6 @@ constexpr ContainerDefault kCompositingDefaults[] = {
     {1151, DefaultForm::kReal, 1.0},         {1152, DefaultForm::kReal, 1.0}, {1159, DefaultForm::kReal, 1.0},
     {kCompositingClock, DefaultForm::kLong},
 };
-
-// A running number of milliseconds, cut to 32 bits.
-Long ReadMilliseconds()
-{
-  using namespace std::chrono;
-  const auto now = duration_cast<milliseconds>(steady_clock::now().time_since_epoch()).count();
-  return static_cast<Long>(static_cast<ULong>(now));
-}
 
 // Six times a switch and a number that belong together.
 void ReadPairs(EntryReader& entries, Long switchId, Long numberId)
