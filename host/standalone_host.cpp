@@ -127,6 +127,8 @@ A_Err StandaloneHost::Start(AEGP_EntryPoint entry)
                     [&] { return entry(Basic(), kHostMajorVersion, kHostMinorVersion, kFirstPluginId, &refcon); });
 }
 
+void StandaloneHost::TakePlugin(const StandaloneHost& started) { static_cast<PluginState&>(*state_) = *started.state_; }
+
 A_Err StandaloneHost::CallMenuHook()
 {
   for (const MenuHook& hook : state_->menuHooks) {

@@ -84,6 +84,9 @@ class StandaloneHost
   // Calls the plug-in's entry point. An int that a plug-in throws out of this or out of a hook is taken as its error.
   // All three throw std::bad_alloc when the host itself ran out of memory meanwhile, whatever the plug-in made of it.
   A_Err Start(AEGP_EntryPoint entry);
+  // In place of Start, for a plug-in that was started by another host, of any thread: an application starts a plug-in
+  // once. The plug-in finds here what it registered there.
+  void TakePlugin(const StandaloneHost& started);
   // Calls the update-menu hooks, as before the menus are shown; the first error ends the round.
   A_Err CallMenuHook();
   // Calls the command hooks that are registered for the command or for all, whether it is enabled or not.

@@ -137,7 +137,9 @@ JsonDocument::JsonDocument(std::string_view name, std::string_view text) : name_
   const std::string start = name_ + ": ";
   if (builder.IsTooDeep())
     throw CompositionError(start + "nested deeper than " + std::to_string(kMaxDepth));
-  const char* reason = builder.IsOutOfRange() ? ": number out of range" : ": not JSON";
+  const char* reason = builder.IsOutOfRange()              ? ": number out of range"
+                       : builder.ErrorByte() > text.size() ? ": the file ends before its JSON does"
+                                                           : ": not JSON";
   throw CompositionError(start + BytePlace(text, builder.ErrorByte()) + reason);
 }
 

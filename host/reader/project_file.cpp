@@ -92,24 +92,44 @@ bool HasSuffix(const std::filesystem::path& file, std::string_view suffix)
   return own == suffix;
 }
 
+// What is neither a project nor JSON is told at once, in words of the one who gave it.
+void RefuseOthers(std::string_view bytes, const std::string& name)
+{
+  const std::size_t first = bytes.find_first_not_of("\xEF\xBB\xBF \t\r\n");
+  const std::string start = OneLine(name) + ": ";
+  if (first == std::string_view::npos)
+    throw CompositionError(start + "is empty");
+  if (bytes.starts_with("QQ7R"))
+    throw CompositionError(start + "is a scene file, no project or composition");
+  constexpr std::string_view kFirstOfJson = "{[\"-0123456789tfn";
+  if (kFirstOfJson.find(bytes[first]) == std::string_view::npos)
+    throw CompositionError(start + "neither an After Effects project nor a composition (JSON)");
+}
+
 } // namespace
 
 std::unique_ptr<ProjectFile> OpenProjectFile(const std::filesystem::path& file)
 {
-  const std::string name = PathToUtf8(file.filename());
-  FileBytes bytes(file);
+  return OpenProjectFile(FileBytes(file), PathToUtf8(file), std::filesystem::absolute(file).parent_path());
+}
+
+std::unique_ptr<ProjectFile> OpenProjectFile(FileBytes bytes, const std::string& name,
+                                             const std::filesystem::path& folder)
+{
   const bool isBinary = projects::IsBinaryProject(bytes.View()), isXml = projects::IsXmlProject(bytes.View());
   // The suffix only tells what is missed in a file that is none of them.
-  const bool isToBeXml = HasSuffix(file, ".aepx"), isToBeProject = isToBeXml || HasSuffix(file, ".aep");
+  const std::filesystem::path path = PathFromUtf8(name);
+  const bool isToBeXml = HasSuffix(path, ".aepx"), isToBeProject = isToBeXml || HasSuffix(path, ".aep");
   if (isBinary || isXml || (isToBeProject && !BeginsAsJson(bytes.View())))
     return projects::OpenProject(name, std::move(bytes), isXml || (isToBeXml && !isBinary));
-  return std::make_unique<CompositionFile>(name, bytes, std::filesystem::absolute(file).parent_path());
+  RefuseOthers(bytes.View(), name);
+  return std::make_unique<CompositionFile>(name, bytes, folder);
 }
 
 Project LoadComposition(const std::filesystem::path& file)
 {
   const FileBytes bytes(file);
-  return LoadCompositionText(bytes.View(), PathToUtf8(file.filename()), std::filesystem::absolute(file).parent_path());
+  return LoadCompositionText(bytes.View(), PathToUtf8(file), std::filesystem::absolute(file).parent_path());
 }
 
 Project ReadProject(ProjectFile& file, std::size_t composition, const std::string& name, const ReadOptions& options)

@@ -2,6 +2,7 @@
 // and XML. The first bytes tell which it is.
 #pragma once
 
+#include "host/file_bytes.h"
 #include "host/model/composition.h"
 
 #include <memory>
@@ -37,7 +38,12 @@ class ProjectFile
   virtual Project Read(std::size_t composition) = 0;
 };
 
+// Messages name the file by its path, as it is given here.
 std::unique_ptr<ProjectFile> OpenProjectFile(const std::filesystem::path& file);
+// The same for bytes of no file. `name` stands in messages, and names a composition without a name of its own; footage
+// is looked for relative to `folder`.
+std::unique_ptr<ProjectFile> OpenProjectFile(FileBytes bytes, const std::string& name,
+                                             const std::filesystem::path& folder);
 
 struct ReadOptions
 {

@@ -124,7 +124,7 @@ void SamplesReader::Run()
 void AddSamples(Project& project, const std::filesystem::path& file)
 {
   const FileBytes bytes(file);
-  const std::string name = OneLine(PathToUtf8(file.filename()));
+  const std::string name = OneLine(PathToUtf8(file));
   SamplesReader(ReadComposition(JsonDocument(name, bytes.View()), std::filesystem::absolute(file).parent_path()), name,
                 project)
       .Run();

@@ -41,7 +41,18 @@ using Outcome = const char*;
 inline constexpr Outcome kDone = nullptr;
 inline constexpr Outcome kNoPlace = "no place for the result";
 
-struct HostState
+// What a plug-in has registered.
+struct PluginState
+{
+  AEGP_PluginID plugin = 0;
+  std::string pluginName;
+  std::vector<char> isEnabled; // by command less 1
+  std::vector<MenuEntry> menu;
+  std::vector<Hook> hooks;
+  std::vector<MenuHook> menuHooks;
+};
+
+struct HostState : PluginState
 {
   Project project;
   const Item* active = nullptr;
@@ -50,12 +61,6 @@ struct HostState
   std::function<void(const std::string&)> report;
   Progress progress;
 
-  AEGP_PluginID plugin = 0;
-  std::string pluginName;
-  std::vector<char> isEnabled; // by command less 1
-  std::vector<MenuEntry> menu;
-  std::vector<Hook> hooks;
-  std::vector<MenuHook> menuHooks;
   bool withholdsCommand = false;
   bool outOfMemory = false; // an operation failed by it since the plug-in was called
 
