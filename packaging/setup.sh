@@ -5,7 +5,8 @@
 
 top=$(cd "$(dirname "${BASH_SOURCE[0]}")/.." && pwd -P)
 program=$(basename "$0")
-log=$top/build/setup.log
+builds=$top/build
+log=$builds/setup.log
 
 say() { printf '%s: %s\n' "$program" "$*" >&2; }
 
@@ -14,9 +15,27 @@ fail() {
   exit 2
 }
 
+# A tree that this user can't write to is built in a folder of the user's own, below the home folder or that for
+# temporary files.
+choose_builds() {
+  if [[ -w $builds ]] || { [[ ! -e $builds && -w $top ]]; }; then
+    return
+  fi
+  local own=${XDG_CACHE_HOME:-${HOME:-/nonexistent}/.cache} place
+  place=q7r-$(printf '%s' "$top" | cksum | cut -d' ' -f1)
+  if ! mkdir -p "$own/$place" 2>/dev/null; then
+    own=${TMPDIR:-/tmp}
+    place+=-$EUID
+    mkdir -m 700 "$own/$place" 2>/dev/null || [[ -d $own/$place && ! -L $own/$place && -O $own/$place ]] ||
+      fail "cannot write to $top, nor make $own/$place to build in"
+  fi
+  builds=$own/$place
+  log=$builds/setup.log
+}
+
 # Only one process at a time installs and builds in this tree, or in a folder of it; the others wait here.
 lock_tree() {
-  local folder=${1-$top/build}
+  local folder=${1-$builds}
   mkdir -p "$folder" || fail "cannot make $folder"
   exec 9>"$folder/.lock"
   if ! flock --nonblock 9; then
@@ -74,11 +93,11 @@ install_packages() {
 # copied or moved) starts afresh.
 configure() {
   local preset=$1 fresh=()
-  local cache=$top/build/$preset/CMakeCache.txt
+  local cache=$builds/$preset/CMakeCache.txt
   if [[ -e $cache ]] && ! grep -qxF "CMAKE_HOME_DIRECTORY:INTERNAL=$top" "$cache"; then
     fresh=(--fresh)
   fi
-  (cd "$top" && logged cmake --preset "$preset" "${fresh[@]}" "${@:2}")
+  (cd "$top" && logged cmake --preset "$preset" -B "$builds/$preset" "${fresh[@]}" "${@:2}")
 }
 
 # Passes a build's output on to the log and shows, on a terminal, how far it has come.
@@ -103,7 +122,7 @@ show_progress() {
 # Builds the targets of a configured preset; silent when there is nothing to do.
 build() {
   : >"$log"
-  if ! NINJA_STATUS='[%f/%t] ' ninja -C "$top/build/$1" "${@:2}" 2>&1 9>&- | show_progress; then
+  if ! NINJA_STATUS='[%f/%t] ' ninja -C "$builds/$1" "${@:2}" 2>&1 9>&- | show_progress; then
     grep -v '^\[' "$log" | tail -n 40 >&2
     return 1
   fi
