@@ -87,7 +87,13 @@ TEST_F(CommandLine, RefusesCompositionsAndPathsWithOneLine)
   const Case cases[] = {
       {"no file", Quoted(folder_ / "none.json") + " " + Quoted(out), {"none.json"}},
       {"an empty file", Quoted(Write("empty.json", "")) + " " + Quoted(out), {"empty.json"}},
-      {"no JSON", Quoted(Write("text.json", "Once upon a time")) + " " + Quoted(out), {"text.json", "line 1"}},
+      {"no JSON",
+       Quoted(Write("text.json", "Once upon a time")) + " " + Quoted(out),
+       {"text.json", "neither an After Effects project nor"}},
+      {"JSON that ends early",
+       Quoted(Write("cut.json", "{\n \"w\": 1,")) + " " + Quoted(out),
+       {"cut.json", "line 2, column", "ends before"}},
+      {"a scene", Quoted(Write("s.q7r", "QQ7RQ7R6")) + " " + Quoted(out), {"s.q7r: is a scene file"}},
       {"JSON of something else", Quoted(Write("list.json", "[1, 2]")) + " " + Quoted(out), {"list.json"}},
       {"an unknown composition", Quoted(good) + " " + Quoted(out) + " --composition Moon", {"good.json", "Moon"}},
       {"a missing folder", Quoted(good) + " " + Quoted(folder_ / "missing/out.q7r"), {"missing/out.q7r"}},
@@ -133,12 +139,16 @@ TEST_F(CommandLine, SaysWhatIsWrongWithASceneFileAndDestroysNothing)
     const char* name;
     Bytes bytes;
     int checkStatus;
+    const char* says = "byte ";
   };
-  const Case cases[] = {{"empty.q7r", {}, 2},
+  const Case cases[] = {{"empty.q7r", {}, 2, "not a scene file: it is empty"},
                         {"header.q7r", Bytes(whole.begin(), whole.begin() + 13), 1},
                         {"cut.q7r", Bytes(whole.begin(), whole.begin() + static_cast<long>(whole.size() / 2)), 1},
                         {"ident.q7r", ByteWriter().Header("Q7R5").Start(110059, 0).End().bytes, 2},
-                        {"noise.q7r", noise, 2},
+                        {"noise.q7r", noise, 2, "not a scene file"},
+                        {"photo.q7r", {0xFF, 0xD8, 0xFF, 0xE0}, 2, "not a scene file but a JPEG picture"},
+                        {"c.json", Bytes(kComposition, kComposition + 9), 2, "not a scene file but JSON"},
+                        {"notes.txt", {'h', 'e', 'y'}, 2, "not a scene file but a text"},
                         {"inside.q7r", inside, 1}};
   for (const Case& c : cases) {
     SCOPED_TRACE(c.name);
@@ -148,31 +158,61 @@ TEST_F(CommandLine, SaysWhatIsWrongWithASceneFileAndDestroysNothing)
           "resave " + Quoted(file) + " " + Quoted(folder_ / "new.q7r"),
           "resave --force " + Quoted(file) + " " + Quoted(file),
           "merge " + Quoted(folder_ / "scene.q7r") + " " + Quoted(file) + " -o " + Quoted(folder_ / "new.q7r")})
-      ExpectRefusal(RunQ7r(arguments), {c.name, "byte "});
+      ExpectRefusal(RunQ7r(arguments), {"q7r: " + file + ": ", c.says});
     const RunResult check = RunQ7r("check " + Quoted(file));
     EXPECT_EQ(check.status, c.checkStatus) << check.out << check.err;
-    EXPECT_NE((check.out + check.err).find("byte "), std::string::npos);
+    EXPECT_NE((check.out + check.err).find(c.says), std::string::npos);
     EXPECT_EQ(ReadWholeFile(file), c.bytes) << "the damaged file was touched";
     EXPECT_FALSE(std::filesystem::exists(folder_ / "new.q7r"));
   }
-  ExpectRefusal(RunQ7r("info " + Quoted(folder_ / "none.q7r")), {"none.q7r"});
+  ExpectRefusal(RunQ7r("info " + Quoted(folder_ / "none.q7r")),
+                {(folder_ / "none.q7r") + ": No such file or directory"});
 }
 
 TEST_F(CommandLine, TellsArgumentsThatItCannotTake)
 {
-  for (const char* arguments :
-       {"", "dance", "info", "export only-one.json", "tree a.q7r --loud", "merge a.q7r b.q7r"}) {
-    const RunResult run = RunQ7r(arguments);
-    EXPECT_EQ(run.status, 2) << arguments;
-    EXPECT_EQ(run.out, "") << arguments;
-    EXPECT_NE(run.err, "") << arguments;
-  }
+  const struct
+  {
+    const char* arguments;
+    const char* says;
+  } cases[] = {
+      {"", "which verb? (q7r --help"},
+      {"dance", "there is no verb \"dance\" (q7r --help"},
+      {"exprot a b", "there is no verb \"exprot\"; did you mean export?"},
+      {"--verison", "there is no option --verison; did you mean --version?"},
+      {"info", "info: FILE is required (q7r info --help"},
+      {"export only-one.json", "only-one.json: where to?"},
+      {"export a b c", "many files need a folder"},
+      {"export a b --compositon=Main", "export: there is no option --compositon; did you mean --composition?"},
+      {"tree a.q7r --loud", "tree: there is no option --loud (q7r tree --help"},
+      {"merge a.q7r b.q7r", "merge: --output is required"},
+      {"resave a b --jobs 0", "resave: --jobs: "},
+      {"export a b --quiet --verbose", "--verbose excludes --quiet"},
+      {"extract a -o b c", "extract: \"c\" is one argument too many"},
+  };
+  for (const auto& c : cases)
+    ExpectRefusal(RunQ7r(c.arguments), {c.says});
   for (const char* verb : {"", "export", "info", "tree", "dump", "check", "resave", "merge"}) {
     const RunResult run = RunQ7r(std::string(verb) + " --help");
     EXPECT_EQ(run.status, 0) << verb;
     EXPECT_NE(run.out.find("Usage: q7r"), std::string::npos) << run.out;
+    EXPECT_EQ(RunQ7r(std::string("help ") + verb).out, run.out);
   }
   EXPECT_EQ(RunQ7r("--version").status, 0);
+}
+
+// What every status means stands in two places.
+TEST_F(CommandLine, TellsItsStatusInHelpAsInTheReadme)
+{
+  const std::string help = RunQ7r("--help").out;
+  const Bytes bytes = ReadWholeFile(TEST_SOURCE_DIR "/README.md");
+  const std::string readme(bytes.begin(), bytes.end());
+  for (const std::string status : {"0", "1", "2"}) {
+    const std::size_t row = readme.find("| " + status + " | ");
+    ASSERT_NE(row, std::string::npos) << status;
+    const std::string meaning = readme.substr(row + 6, readme.find(" |", row + 6) - row - 6);
+    EXPECT_NE(help.find("  " + status + "  " + meaning + "\n"), std::string::npos) << meaning;
+  }
 }
 
 // What other programs put into a scene: an object, a tag, a value and chunks of kinds that nobody here knows.

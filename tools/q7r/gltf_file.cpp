@@ -1,14 +1,14 @@
 #include "gltf_file.h"
 
 #include <algorithm>
-#include <cstdio>
 #include <filesystem>
 
 #include "gltf/page/page.h"
 #include "gltf/text.h"
 #include "output/output_file.h"
 #include "output/temporary_file.h"
-#include "verbs/verbs.h"
+#include "report.h"
+#include "standard_input.h"
 
 namespace q7r
 {
@@ -73,6 +73,8 @@ void WriteModel(const gltf::Model& model, const std::string& title, const std::s
 
 GltfForm GltfFormOf(const std::string& path)
 {
+  if (IsStandard(path))
+    return GltfForm::kGlb;
   std::string suffix = fs::path(path).extension().string();
   std::transform(suffix.begin(), suffix.end(), suffix.begin(),
                  [](char c) { return c >= 'A' && c <= 'Z' ? static_cast<char>(c + ('a' - 'A')) : c; });
@@ -104,7 +106,7 @@ int WriteGltf(_torvane_::BaseDocument& document, const std::string& scene, const
     const gltf::Model model = gltf::Convert(document, options);
     WriteModel(model, TextOf(fs::path(scene).stem()), output);
     for (const std::string& line : model.account.Lines())
-      std::fprintf(stderr, "%s\n", line.c_str());
+      TellNote(line);
     return model.account.HasProblems() ? kProblems : kDone;
   } catch (const gltf::TooLarge& error) {
     throw Failure(output + ": " + error.what());

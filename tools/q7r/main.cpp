@@ -1,7 +1,6 @@
 // q7r: scene files from compositions, and tools for scene files.
-#include <cstdio>
+#include <algorithm>
 #include <exception>
-#include <iostream>
 #include <new>
 #include <sstream>
 
@@ -9,6 +8,7 @@
 #include "output/temporary_file.h"
 #include "torvane/memory/assertion.h"
 #include "torvane/memory/memory.h"
+#include "usage.h"
 #include "verbs/verbs.h"
 
 namespace
@@ -16,10 +16,25 @@ namespace
 
 constexpr const char* kDescription = R"(Exports compositions into .q7r scene files and works on such files.
 
-Results go to standard output, messages to standard error. Exit status: 0 done;
-1 done, but problems were reported; 2 not done.)";
+Results go to standard output, messages to standard error; - stands for standard
+input or output wherever a file does. Exit status:
 
-int Run(int argc, char** argv)
+  0  done
+  1  done, but something was warned of, or check or diff found something
+  2  not done, or not with each of several files)";
+
+// "q7r help export" is "q7r export --help".
+std::vector<std::string> ArgumentsOf(int argc, char** argv)
+{
+  std::vector<std::string> arguments(argv + std::min(argc, 1), argv + argc);
+  if (!arguments.empty() && arguments.front() == "help") {
+    arguments.erase(arguments.begin());
+    arguments.emplace_back("--help");
+  }
+  return arguments;
+}
+
+int Run(const std::vector<std::string>& arguments)
 {
   CLI::App program(kDescription, "q7r");
   program.allow_windows_style_options(false); // "/..." is a path everywhere
@@ -31,12 +46,13 @@ int Run(int argc, char** argv)
         q7r::AddPreview, q7r::AddIES, q7r::AddCompositions, q7r::AddExtract, q7r::AddConvert, q7r::AddView})
     add(program, status);
   try {
-    program.parse(argc, argv);
+    program.parse(std::vector<std::string>(arguments.rbegin(), arguments.rend())); // taken from the end
   } catch (const CLI::ParseError& error) {
+    if (error.get_exit_code() != static_cast<int>(CLI::ExitCodes::Success))
+      throw q7r::Failure(q7r::UsageText(program, error, arguments));
     std::ostringstream help;
-    const int result = program.exit(error, help, std::cerr);
+    program.exit(error, help, help);
     q7r::Print(help.str());
-    return result == 0 ? q7r::kDone : q7r::kNotDone;
   }
   return status;
 }
@@ -51,16 +67,12 @@ int main(int argc, char** argv)
   try {
     // What any part of the library could not allocate may be missing from what was printed.
     const _torvane_::AllocationWatch watch;
-    const int status = Run(argc, argv);
+    const int status = Run(ArgumentsOf(argc, argv));
     q7r::FlushStandardOutput();
     if (watch.Failed() && status != q7r::kNotDone)
       throw std::bad_alloc();
     return status;
-  } catch (const std::bad_alloc&) {
-    std::fputs("q7r: not enough memory\n", stderr);
-    return q7r::kNotDone;
-  } catch (const std::exception& error) {
-    std::fprintf(stderr, "q7r: %s\n", error.what());
-    return q7r::kNotDone;
+  } catch (const std::exception&) {
+    return q7r::TellFailure();
   }
 }

@@ -2,11 +2,8 @@
 
 #include <cstdio>
 
-#ifdef _WIN32
-#include <io.h>
-#else
-#include <unistd.h>
-#endif
+#include "output/terminal.h"
+#include "report.h"
 
 namespace q7r
 {
@@ -17,18 +14,12 @@ namespace
 constexpr int kWidth = 40;
 constexpr std::chrono::milliseconds kPatience(500);
 
-bool IsErrorTerminal()
-{
-#ifdef _WIN32
-  return _isatty(2) != 0;
-#else
-  return isatty(2) != 0;
-#endif
-}
-
 } // namespace
 
-ProgressBar::ProgressBar(std::string what) : what_(std::move(what)), isTerminal_(IsErrorTerminal()) {}
+ProgressBar::ProgressBar(std::string what)
+    : what_(std::move(what)),
+      isTerminal_(IsTerminal(StandardStream::kError) && !TheTalk().quiet && !ToldTogether::IsInForce())
+{}
 
 void ProgressBar::Draw(int percent)
 {

@@ -1,5 +1,5 @@
-// A bar on standard error for work that takes long. It is drawn on a terminal only, and only once the work has taken
-// half a second; it is wiped out at the end.
+// A bar on standard error for work that takes long. It is drawn on a terminal only, by a thread that isn't one of
+// many, and only once the work has taken half a second; it is wiped out at the end.
 #pragma once
 
 #include <chrono>

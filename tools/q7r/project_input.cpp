@@ -4,8 +4,11 @@
 #include <cstdio>
 
 #include "export_account.h"
+#include "footage.h"
 #include "host/text.h"
-#include "verbs/verbs.h"
+#include "report.h"
+#include "standard_input.h"
+#include "usage.h"
 
 namespace q7r
 {
@@ -18,6 +21,12 @@ using Summaries = std::vector<host::CompositionSummary>;
 constexpr std::size_t kMostNamed = 20; // in a message
 
 std::filesystem::path ToPath(const std::string& path) { return std::filesystem::path(path); }
+
+// In messages.
+std::string NameOf(const std::string& file)
+{
+  return IsStandard(file) ? InputName(file) : host::OneLine(host::PathToUtf8(ToPath(file)));
+}
 
 std::string NamesOf(const Summaries& compositions)
 {
@@ -38,26 +47,26 @@ std::size_t FindNamed(const Summaries& compositions, const ProjectOptions& optio
         return c.id == options.composition;
       });
   if (wanted == compositions.end())
-    throw Failure(options.file + ": there is no composition " + host::Quoted(options.composition) + "; it has " +
-                  NamesOf(compositions));
+    throw Failure(NameOf(options.file),
+                  "there is no composition " + host::Quoted(options.composition) + "; it has " + NamesOf(compositions));
   if (named != compositions.end() && std::count_if(compositions.begin(), compositions.end(), isNamed) > 1)
-    std::fprintf(stderr, "warning: %s: several compositions are named %s; the one with the id %s is taken\n",
-                 options.file.c_str(), host::Quoted(named->name).c_str(), named->id.c_str());
+    TellWarning(NameOf(options.file) + ": several compositions are named " + host::Quoted(named->name) +
+                "; the one with the id " + named->id + " is taken");
   return static_cast<std::size_t>(wanted - compositions.begin());
 }
 
 std::size_t Choose(const Summaries& compositions, const ProjectOptions& options)
 {
   if (compositions.empty())
-    throw Failure(options.file + ": has no composition");
+    throw Failure(NameOf(options.file), "has no composition");
   if (!options.composition.empty())
     return FindNamed(compositions, options);
   const auto active = std::find_if(compositions.begin(), compositions.end(), [](const auto& c) { return c.isActive; });
   if (active != compositions.end())
     return static_cast<std::size_t>(active - compositions.begin());
   if (compositions.size() > 1)
-    throw Failure(options.file + ": please choose one of its compositions with --composition\n" +
-                  CompositionTable(compositions));
+    throw Failure(NameOf(options.file),
+                  "please choose one of its compositions with --composition\n" + CompositionTable(compositions));
   return 0;
 }
 
@@ -78,18 +87,44 @@ void AddProjectOptions(CLI::App& verb, ProjectOptions& options)
   verb.add_option("--images", options.images, "look here, and in all folders below, for footage that was moved");
   verb.add_option("--samples", options.samples,
                   "take the samples of this composition file, in place of expressions that aren't run");
-  verb.add_flag("--verbose", options.verbose, "list every warning, not one for each kind");
+  AddTalkOptions(verb, "list every warning, not one for each kind");
+}
+
+std::unique_ptr<host::ProjectFile> OpenProject(const std::string& file)
+{
+  if (!IsStandard(file))
+    return host::OpenProjectFile(ToPath(file));
+  const std::string& bytes = StandardInput();
+  return host::OpenProjectFile(host::FileBytes(std::vector<char>(bytes.begin(), bytes.end())), NameOf(file),
+                               std::filesystem::current_path());
 }
 
 host::Project ReadProject(const ProjectOptions& options)
 {
-  const std::filesystem::path path = ToPath(options.file);
-  const std::unique_ptr<host::ProjectFile> file = host::OpenProjectFile(path);
+  const std::unique_ptr<host::ProjectFile> file = OpenProject(options.file);
   const std::size_t chosen = Choose(file->Compositions(), options);
   const host::ReadOptions more{ToPath(options.images), ToPath(options.samples)};
-  host::Project project = host::ReadProject(*file, chosen, host::OneLine(host::PathToUtf8(path.filename())), more);
-  for (const std::string& warning : options.verbose ? project.warnings : MergedWarnings(project.warnings))
-    std::fprintf(stderr, "warning: %s\n", warning.c_str());
+  host::Project project = host::ReadProject(*file, chosen, NameOf(options.file), more);
+  for (const std::string& warning : TheTalk().verbose ? project.warnings : MergedWarnings(project.warnings))
+    TellWarning(warning);
+  return project;
+}
+
+host::Project ReadProjectToExport(const ProjectOptions& options)
+{
+  host::Project project = ReadProject(options);
+  if (!options.images.empty()) // what isn't there was told when it was looked for
+    return project;
+  const std::vector<std::string> missing = MissingPictures(project);
+  const std::size_t told = TheTalk().verbose ? missing.size() : std::min(missing.size(), kMostNamed);
+  for (std::size_t i = 0; i < missing.size(); ++i) {
+    project.warnings.push_back(NameOf(options.file) + ": the picture " + host::Quoted(missing[i]) + " is not there");
+    if (i < told)
+      TellWarning(project.warnings.back());
+  }
+  if (told < missing.size())
+    TellWarning(NameOf(options.file) + ": " + std::to_string(missing.size() - told) +
+                " more pictures are not there; --verbose lists them");
   return project;
 }
 

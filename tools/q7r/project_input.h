@@ -16,15 +16,20 @@ struct ProjectOptions
   std::string composition; // name or id; empty: the one that is in front
   std::string images;
   std::string samples;
-  bool verbose = false; // every warning, not one for each kind
 };
 
-// Adds --composition, --images, --samples and --verbose.
+// Adds --composition, --images and --samples, and --quiet and --verbose.
 void AddProjectOptions(CLI::App& verb, ProjectOptions& options);
 
-// Reads the composition that is meant and prints what it warns of. Throws Failure where there is none, or where several
+// Opens a file, or standard input. Throws host::CompositionError and Failure.
+std::unique_ptr<host::ProjectFile> OpenProject(const std::string& file);
+
+// Reads the composition that is meant and tells what it warns of. Throws Failure where there is none, or where several
 // are there to choose from.
 host::Project ReadProject(const ProjectOptions& options);
+
+// The same for an export: also tells, once each, the pictures of its layers that aren't there.
+host::Project ReadProjectToExport(const ProjectOptions& options);
 
 // The compositions as a table for people.
 std::string CompositionTable(const std::vector<host::CompositionSummary>& compositions);

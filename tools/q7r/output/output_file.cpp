@@ -7,15 +7,10 @@
 #include <memory>
 #include <system_error>
 
-#ifdef _WIN32
-#include <io.h>
-#else
-#include <unistd.h>
-#endif
-
+#include "standard_input.h"
 #include "standard_output.h"
 #include "temporary_file.h"
-#include "verbs/verbs.h"
+#include "terminal.h"
 
 namespace q7r
 {
@@ -29,18 +24,11 @@ namespace fs = std::filesystem;
 
 constexpr int kMaxLinks = 40; // as the system follows
 
-bool IsTerminal()
-{
-#ifdef _WIN32
-  return _isatty(0) != 0;
-#else
-  return isatty(0) != 0 && isatty(2) != 0;
-#endif
-}
+std::string OutputName(const std::string& path) { return IsStandard(path) ? "standard output" : path; }
 
 [[noreturn]] void Fail(const std::string& path, const std::error_code& error)
 {
-  throw Failure(path + ": " + error.message());
+  throw Failure(OutputName(path), error.message());
 }
 
 // Where an output belongs.
@@ -118,6 +106,8 @@ void Copy(const fs::path& source, RawOutput& output)
 // "shot.q7r: 640 x 480 pixels, 12.3 KB".
 void TellWritten(const std::string& path, const fs::path& partial, const std::string& words)
 {
+  if (TheTalk().quiet)
+    return;
   PrintLine(path + ": " + (words.empty() ? "" : words + ", ") + SizeText(fs::file_size(partial)));
   FlushStandardOutput();
 }
@@ -157,7 +147,7 @@ void ReplaceFile(const Place& place, const std::string& path, const FileWriter& 
 
 bool AskReplace(const std::string& path)
 {
-  if (!IsTerminal())
+  if (!IsTerminal(StandardStream::kInput) || !IsTerminal(StandardStream::kError))
     return false;
   std::cerr << path << " exists already. Replace it? [y/N] " << std::flush;
   std::string answer;
@@ -197,16 +187,16 @@ bool IsDevice(const std::string& path)
 void RequireWritable(const std::string& path, bool force)
 {
   if (!HasFileName(path))
-    throw Failure(path + ": is no file name");
+    throw Failure(path, "is no file name");
   const Place place = FindPlace(path);
   if (fs::is_directory(place.status))
-    throw Failure(path + ": is a folder");
+    throw Failure(path, "is a folder");
   if (place.IsDevice())
     return;
   if (!place.Exists() && !fs::is_directory(StatusOf(path, place.Folder(), true)))
-    throw Failure(path + ": there is no folder " + place.Folder().string());
+    throw Failure(path, "there is no folder " + place.Folder().string());
   if (place.Exists() && !force && !AskReplace(path))
-    throw Failure(path + ": exists already; --force replaces it");
+    throw Failure(path, "exists already; --force replaces it");
 }
 
 void WriteOutput(const std::string& path, const FileWriter& write)

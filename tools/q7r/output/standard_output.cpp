@@ -1,11 +1,13 @@
 #include "standard_output.h"
 
+#include <atomic>
 #include <cerrno>
 #include <cstdarg>
 #include <cstdio>
+#include <string>
 #include <system_error>
 
-#include "verbs/verbs.h"
+#include "report.h"
 
 namespace q7r
 {
@@ -14,14 +16,13 @@ namespace
 {
 
 // Further attempts would tell another cause, or none.
-bool isBroken = false;
+std::atomic<bool> isBroken = false;
 
 void Require(bool good)
 {
   const int error = errno;
-  if (good || isBroken)
+  if (good || isBroken.exchange(true))
     return;
-  isBroken = true;
   throw Failure("standard output: " + (error ? std::generic_category().message(error) : "can't be written"));
 }
 
@@ -35,8 +36,7 @@ void Print(std::string_view text)
 
 void PrintLine(std::string_view text)
 {
-  Print(text);
-  Print("\n");
+  Print(std::string(text) + '\n'); // in one piece, since several threads may tell something
 }
 
 void PrintFormatted(const char* format, ...)

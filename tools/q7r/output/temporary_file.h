@@ -56,7 +56,7 @@ class RawOutput
   int descriptor_;
 };
 
-// The number of the open file that a path like "/dev/stdout" or "/dev/fd/3" stands for; -1 for all others.
+// The number of the open file that a path like "-", "/dev/stdout" or "/dev/fd/3" stands for; -1 for all others.
 int DescriptorOf(const std::string& path);
 
 // Both are open on one and the same file.

@@ -207,7 +207,7 @@ void RawOutput::Close()
 
 int DescriptorOf(const std::string& path)
 {
-  if (path == "/dev/stdout")
+  if (path == "-" || path == "/dev/stdout")
     return STDOUT_FILENO;
   if (path == "/dev/stderr")
     return STDERR_FILENO;

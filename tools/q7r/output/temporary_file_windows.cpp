@@ -158,7 +158,7 @@ void RawOutput::Close()
     ThrowErrno();
 }
 
-int DescriptorOf(const std::string&) { return -1; }
+int DescriptorOf(const std::string& path) { return path == "-" ? 1 : -1; }
 
 bool IsStandardOutput(const fs::path&) { return false; }
 

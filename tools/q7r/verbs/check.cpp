@@ -2,9 +2,11 @@
 #include <cstdio>
 #include <memory>
 
+#include "file_list.h"
 #include "listing/json_text.h"
 #include "output/standard_output.h"
 #include "scene_file.h"
+#include "standard_input.h"
 #include "torvane/stream/stream_walker.h"
 #include "verbs.h"
 
@@ -22,49 +24,46 @@ no scene file or can't be read at all.
 
 Example: q7r check shot.q7r)";
 
-struct Options
-{
-  std::string file;
-  bool json = false;
-};
+struct Options : FileList
+{};
 
 // Walks the values; the message of the first fault, or nothing.
 std::string WalkProblem(const std::string& file, long long& values)
 {
   StreamWalker walker;
   if (!walker.Open(ToFilename(file)))
-    throw Failure(ProblemText(file, walker));
+    throw SceneFailure(file, walker);
   StreamValue value;
   while (walker.Next(value)) {
     if (value.tag != kTagChunkStart && value.tag != kTagChunkEnd && walker.GetDepth() == 0)
-      return file + ": byte " + std::to_string(value.offset) + ": a value outside all chunks";
+      return InputName(file) + ": byte " + std::to_string(value.offset) + ": a value outside all chunks";
     ++values;
   }
   if (walker.GetProblem().systemError != 0) // nothing that the file could be blamed for
-    throw Failure(ProblemText(file, walker));
+    throw SceneFailure(file, walker);
   return walker.GetProblem().code == FILEERROR_NONE ? "" : ProblemText(file, walker);
 }
 
-int Check(const Options& options)
+int Check(const std::string& file, const Options& options)
 {
   std::vector<std::string> problems;
   long long values = 0;
-  std::string walk = WalkProblem(options.file, values);
+  std::string walk = WalkProblem(file, values);
   if (!walk.empty())
     problems.push_back(walk);
   FileProblem problem;
-  DocumentPtr document(LoadDocument(ToFilename(options.file), LoadObjects | LoadMaterials, &problem));
+  DocumentPtr document(LoadDocument(ToFilename(file), LoadObjects | LoadMaterials, &problem));
   if (problem.systemError != 0)
-    throw Failure(ProblemText(options.file, problem));
+    throw SceneFailure(file, problem);
   if (!document)
-    problems.push_back(ProblemText(options.file, problem) + " (the scene can't be loaded)");
+    problems.push_back(ProblemText(file, problem) + " (the scene can't be loaded)");
   if (options.json) {
     PrintLine(Json{{"values", values}, {"problems", problems}}.dump(1, ' ', false, Json::error_handler_t::replace));
   } else {
     for (const std::string& line : problems)
       PrintLine(line);
     if (problems.empty())
-      PrintFormatted("%s: good, %lld values\n", options.file.c_str(), values);
+      PrintFormatted("%s: good, %lld values\n", InputName(file).c_str(), values);
   }
   return problems.empty() ? kDone : kProblems;
 }
@@ -74,10 +73,12 @@ int Check(const Options& options)
 void AddCheck(CLI::App& program, int& status)
 {
   auto options = std::make_shared<Options>();
+  options->headed = false; // each line begins with its file
   CLI::App* verb = program.add_subcommand("check", kHelp);
-  verb->add_option("FILE", options->file, "the scene file")->required();
-  verb->add_flag("--json", options->json, "as one JSON object");
-  verb->callback([options, &status] { status = Check(*options); });
+  AddFileList(*verb, *options, "a scene file", "as one JSON object");
+  verb->callback([options, &status] {
+    status = ShowEach(*options, [&](const std::string& file) { return Check(file, *options); });
+  });
 }
 
 } // namespace q7r

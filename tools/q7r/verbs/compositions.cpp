@@ -47,8 +47,7 @@ void PrintJson(const std::vector<host::CompositionSummary>& compositions)
 
 int Compositions(const Options& options)
 {
-  const std::vector<host::CompositionSummary> compositions =
-      host::OpenProjectFile(std::filesystem::path(options.file))->Compositions();
+  const std::vector<host::CompositionSummary> compositions = OpenProject(options.file)->Compositions();
   if (options.json)
     PrintJson(compositions);
   else
@@ -62,7 +61,8 @@ void AddCompositions(CLI::App& program, int& status)
 {
   auto options = std::make_shared<Options>();
   CLI::App* verb = program.add_subcommand("compositions", kHelp);
-  verb->add_option("PROJECT", options->file, "an After Effects project (.aep, .aepx) or a composition file")
+  verb->add_option("PROJECT", options->file,
+                   "an After Effects project (.aep, .aepx) or a composition file; - is standard input")
       ->required();
   verb->add_flag("--json", options->json, "print JSON");
   verb->callback([options, &status] { status = Compositions(*options); });

@@ -3,7 +3,9 @@
 
 #include "gltf_file.h"
 #include "scene_file.h"
+#include "usage.h"
 #include "verbs.h"
+#include "work_list.h"
 
 namespace q7r
 {
@@ -14,33 +16,37 @@ namespace
 constexpr const char* kHelp = R"(Writes what a scene shows as glTF 2.0, which viewers, engines and 3D applications open:
 nodes, cameras, lights, planes with their pictures, meshes and everything that moves.
 
-OUTPUT ends with .glb (one file) or with .gltf (JSON, with NAME.bin beside it). What
+The output ends with .glb (one file) or with .gltf (JSON, with NAME.bin beside it). What
 glTF can't hold is told once a kind; docs/gltf.md tells what goes over and how.
 
-Example: q7r convert shot.q7r shot.glb --embed)";
+Examples: q7r convert shot.q7r shot.glb --embed
+          q7r convert scenes/*.q7r -o models)";
 
-struct Options
+struct Options : WorkOptions
 {
-  std::string scene;
-  std::string output;
   bool lit = false;
   bool unlit = false;
   bool noPointers = false;
-  bool force = false;
   gltf::Options conversion;
 };
 
 int Convert(Options& options)
 {
-  const GltfForm form = GltfFormOf(options.output);
-  if (form != GltfForm::kGlb && form != GltfForm::kGltf)
-    throw Failure(options.output + ": the name must end with .glb or .gltf");
-  RequireGltfOutput(options.output, options.scene, options.force);
   options.conversion.pointers = !options.noPointers;
   if (options.lit || options.unlit)
     options.conversion.shading = options.lit ? gltf::Shading::kLit : gltf::Shading::kUnlit;
-  const DocumentPtr document = LoadScene(options.scene);
-  return WriteGltf(*document, options.scene, options.output, options.conversion);
+  return DoWork(
+      PlanWork(options, ".glb"), options.jobs,
+      [&](const Work& work) {
+        const GltfForm form = GltfFormOf(work.output);
+        if (form != GltfForm::kGlb && form != GltfForm::kGltf)
+          throw Failure(work.output, "the name must end with .glb or .gltf");
+        RequireGltfOutput(work.output, work.input, options.force);
+      },
+      [&](const Work& work) {
+        const DocumentPtr document = LoadScene(work.input);
+        return WriteGltf(*document, work.input, work.output, options.conversion);
+      });
 }
 
 } // namespace
@@ -49,8 +55,10 @@ void AddConvert(CLI::App& program, int& status)
 {
   auto options = std::make_shared<Options>();
   CLI::App* verb = program.add_subcommand("convert", kHelp);
-  verb->add_option("SCENE", options->scene, "the scene file")->required();
-  verb->add_option("OUTPUT", options->output, "the file to write, .glb or .gltf")->required();
+  AddWorkOptions(
+      *verb, *options, "SCENE",
+      "the scene file, then the file to write, .glb or .gltf. With -o, as many scene files as you like, each "
+      "into a .glb");
   verb->add_flag("--embed", options->conversion.embed, "pack the pictures into the file");
   verb->add_flag("--hidden", options->conversion.keepHidden,
                  "keep what isn't rendered, switched off by KHR_node_visibility, which few viewers know");
@@ -61,7 +69,7 @@ void AddConvert(CLI::App& program, int& status)
       ->check(CLI::Range(1e-9, 1e9));
   verb->add_flag("--no-pointers", options->noPointers,
                  "leave out what moves in cameras and lights, for old readers (KHR_animation_pointer)");
-  verb->add_flag("--force", options->force, "replace existing files without asking");
+  AddTalkOptions(*verb);
   verb->callback([options, &status] { status = Convert(*options); });
 }
 

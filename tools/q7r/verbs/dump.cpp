@@ -4,6 +4,7 @@
 
 #include <nlohmann/json.hpp>
 
+#include "file_list.h"
 #include "listing/json_text.h"
 #include "output/standard_output.h"
 #include "scene_file.h"
@@ -30,11 +31,8 @@ Use it to see what a file really holds, or to compare two files value by value.
 
 Example: q7r dump shot.q7r | less)";
 
-struct Options
-{
-  std::string file;
-  bool json = false;
-};
+struct Options : FileList
+{};
 
 const char* const kArrayNames[] = {"?", "byte", "16-bit", "32-bit", "64-bit", "float", "double"};
 
@@ -129,10 +127,10 @@ void PrintJson(const Nesting& nesting, const StreamValue& value)
   PrintLine(line.dump(-1, ' ', false, nlohmann::json::error_handler_t::replace));
 }
 
-int Dump(const Options& options)
+int Dump(const std::string& file, const Options& options)
 {
   StreamWalker walker;
-  const Bool good = walker.Open(ToFilename(options.file));
+  const Bool good = walker.Open(ToFilename(file));
   StreamValue value;
   Nesting nesting;
   while (good && walker.Next(value)) {
@@ -145,7 +143,7 @@ int Dump(const Options& options)
     nesting.Enter(value);
   }
   if (walker.GetProblem().code != FILEERROR_NONE)
-    throw Failure(ProblemText(options.file, walker));
+    throw SceneFailure(file, walker);
   return kDone;
 }
 
@@ -155,9 +153,10 @@ void AddDump(CLI::App& program, int& status)
 {
   auto options = std::make_shared<Options>();
   CLI::App* verb = program.add_subcommand("dump", kHelp);
-  verb->add_option("FILE", options->file, "the scene file")->required();
-  verb->add_flag("--json", options->json, "one JSON object a line");
-  verb->callback([options, &status] { status = Dump(*options); });
+  AddFileList(*verb, *options, "a scene file", "one JSON object a line");
+  verb->callback([options, &status] {
+    status = ShowEach(*options, [&](const std::string& file) { return Dump(file, *options); });
+  });
 }
 
 } // namespace q7r

@@ -1,7 +1,6 @@
 // q7r export: plays the host for the exporter.
 #include <algorithm>
 #include <cctype>
-#include <cstdio>
 #include <filesystem>
 #include <memory>
 #include <new>
@@ -10,13 +9,17 @@
 #include "exporter/entry/message_table.h"
 #include "exporter/entry/scene_writer.h"
 #include "exporter/host_api/aegp_entry.h"
+#include "footage.h"
 #include "gltf_file.h"
 #include "host/standalone_host.h"
 #include "output/output_file.h"
 #include "output/temporary_file.h"
 #include "progress_bar.h"
 #include "project_input.h"
+#include "reproducible.h"
+#include "standard_input.h"
 #include "verbs.h"
+#include "work_list.h"
 
 namespace q7r
 {
@@ -31,13 +34,19 @@ a scene of cameras, lights and image planes. docs/projects.md and docs/compositi
 tell what is read. At the end it tells on standard error which layers the scene has and
 which were left out, and why.
 
-Example: q7r export shot.aep shot.q7r --composition "Main")";
+Pictures that aren't there are told once each; exit status 1 then, as for every
+warning. Of a sequence of projects each becomes a scene of its name with -o FOLDER.
+
+Examples: q7r export shot.aep shot.q7r --composition "Main"
+          q7r export shots/*.aep -o scenes
+          q7r export - - <shot.json >shot.q7r)";
 
 struct Options
 {
   ProjectOptions project;
-  std::string output;
-  bool force = false;
+  WorkOptions work;
+  bool relative = false;
+  bool reproducible = false;
 };
 
 // The exporter forces the suffix of the path that the save dialog gives. Here the path is given beforehand, so it is
@@ -58,6 +67,18 @@ std::string WithSuffix(const std::string& path)
   return suffix == exporter::kSceneSuffix ? path : path.substr(0, dot + 1) + exporter::kSceneSuffix;
 }
 
+// The plug-in, started once as an application does, whatever number of projects it then exports.
+const host::StandaloneHost& Application()
+{
+  static const std::unique_ptr<host::StandaloneHost> application = [] {
+    auto host = std::make_unique<host::StandaloneHost>(host::Project());
+    if (const A_Err error = host->Start(EntryPointFunc))
+      throw Failure("the exporter didn't start (error " + std::to_string(error) + ")");
+    return host;
+  }();
+  return *application;
+}
+
 // Plays one export into the file `partial`. True if the exporter showed no message.
 bool PlayExport(host::StandaloneHost& player, const std::string& output, const std::string& partial)
 {
@@ -68,11 +89,9 @@ bool PlayExport(host::StandaloneHost& player, const std::string& output, const s
   player.OnReport([&](const std::string& message) {
     quiet = false;
     bar.Clear();
-    std::fprintf(stderr, "%s\n", message.c_str());
+    TellWarning(message);
   });
   player.OnProgress([&](double share) { bar.Show(share); });
-  if (A_Err error = player.Start(EntryPointFunc))
-    throw Failure(output + ": the exporter didn't start (error " + std::to_string(error) + ")");
   AEGP_Command command = player.FindCommand(exporter::GetMessage(exporter::Message::kMenuEntry));
   player.CallMenuHook();
   if (!command || !player.IsCommandEnabled(command))
@@ -89,47 +108,74 @@ bool PlayExport(host::StandaloneHost& player, const std::string& output, const s
   return quiet;
 }
 
-void TellAccount(const host::Composition& composition, _torvane_::BaseDocument& document)
+// Of several exports each account says whose it is.
+void TellAccount(const host::Composition& composition, _torvane_::BaseDocument& document, const std::string& output)
 {
-  std::fprintf(stderr, "%s\n", AccountText(composition, CountScene(document)).c_str());
+  const std::string whose = ToldTogether::IsInForce() ? output + ": " : "";
+  TellNote(whose + AccountText(composition, CountScene(document)));
 }
 
 // Goes through the scene, which is kept in a temporary file meanwhile.
-int ExportAsGltf(host::StandaloneHost& player, const host::Composition& composition, const std::string& source,
-                 const std::string& output)
+int ExportAsGltf(host::StandaloneHost& player, const host::Composition& composition, const Work& work)
 {
   const std::unique_ptr<TemporaryFile> scene = MakePlainFile();
-  const bool quiet = PlayExport(player, output, scene->Path().string());
+  const bool quiet = PlayExport(player, work.output, scene->Path().string());
   const DocumentPtr document = LoadScene(scene->Path().string());
-  TellAccount(composition, *document);
-  const int status = WriteGltf(*document, source, output, {});
+  TellAccount(composition, *document, work.output);
+  const int status = WriteGltf(*document, work.input, work.output, {});
   return quiet ? status : kProblems;
+}
+
+bool IsGltf(const Work& work) { return !IsStandard(work.output) && GltfFormOf(work.output) != GltfForm::kNone; }
+
+void RequireOutput(const Work& work, bool force)
+{
+  if (IsGltf(work))
+    RequireGltfOutput(work.output, work.input, force);
+  else
+    RequireWritable(work.output, force);
+}
+
+int ExportOne(const Work& work, const Options& options)
+{
+  ProjectOptions input = options.project;
+  input.file = work.input;
+  Reproduction reproduction(options.reproducible);
+  if (options.reproducible) {
+    reproduction.Take(ReadInput(work.input));
+    reproduction.Take(input.composition);
+    reproduction.Begin();
+  }
+  host::Project project = ReadProjectToExport(input);
+  if (options.relative && !IsGltf(work)) // a glTF file's are always
+    MakeRelative(project, std::filesystem::absolute(work.output).parent_path());
+  const host::Composition& chosen = *project.root; // stays where it is when the project moves
+  const bool isWarned = !project.warnings.empty();
+  host::StandaloneHost player(std::move(project));
+  player.TakePlugin(Application());
+  if (IsGltf(work)) {
+    const int status = ExportAsGltf(player, chosen, work);
+    return isWarned ? kProblems : status;
+  }
+  bool quiet = true;
+  WriteOutput(work.output, [&](const std::string& partial) {
+    quiet = PlayExport(player, work.output, partial);
+    const DocumentPtr document = ReadBack(partial, work.output);
+    TellAccount(chosen, *document, work.output);
+    return std::string();
+  });
+  return quiet && !isWarned ? kDone : kProblems;
 }
 
 int Export(const Options& options)
 {
-  const std::string output = WithSuffix(options.output);
-  const bool asGltf = GltfFormOf(output) != GltfForm::kNone;
-  if (asGltf)
-    RequireGltfOutput(output, options.project.file, options.force);
-  else
-    RequireWritable(output, options.force);
-  host::Project project = ReadProject(options.project);
-  const host::Composition& chosen = *project.root; // stays where it is when the project moves
-  const bool isWarned = !project.warnings.empty();
-  host::StandaloneHost player(std::move(project));
-  if (asGltf) {
-    const int status = ExportAsGltf(player, chosen, options.project.file, output);
-    return isWarned ? kProblems : status;
-  }
-  bool quiet = true;
-  WriteOutput(output, [&](const std::string& partial) {
-    quiet = PlayExport(player, output, partial);
-    const DocumentPtr document = ReadBack(partial, output);
-    TellAccount(chosen, *document);
-    return std::string();
-  });
-  return quiet && !isWarned ? kDone : kProblems;
+  std::vector<Work> list = PlanWork(options.work, ".q7r");
+  for (Work& work : list)
+    work.output = WithSuffix(work.output);
+  Application(); // before there are threads
+  return DoWork(
+      list, options.work.jobs, [&](const Work& work) { RequireOutput(work, options.work.force); },
+      [&](const Work& work) { return ExportOne(work, options); });
 }
 
 } // namespace
@@ -138,13 +184,13 @@ void AddExport(CLI::App& program, int& status)
 {
   auto options = std::make_shared<Options>();
   CLI::App* verb = program.add_subcommand("export", kHelp);
-  verb->add_option("PROJECT", options->project.file, "an After Effects project (.aep, .aepx) or a composition file")
-      ->required();
-  verb->add_option("OUTPUT", options->output,
-                   "the scene file to write; its suffix becomes .q7r (.glb, .gltf: as convert; .html: as view)")
-      ->required();
+  AddWorkOptions(
+      *verb, options->work, "PROJECT",
+      "an After Effects project (.aep, .aepx) or a composition file, then the scene file to write; its "
+      "suffix becomes .q7r (.glb, .gltf: as convert; .html: as view). With -o, as many projects as you like");
   AddProjectOptions(*verb, options->project);
-  verb->add_flag("--force", options->force, "replace an existing file without asking");
+  AddReproducibleOption(*verb, options->reproducible);
+  verb->add_flag("--relative", options->relative, "write the paths of pictures relative to the scene file");
   verb->callback([options, &status] { status = Export(*options); });
 }
 

@@ -1,5 +1,4 @@
 // q7r extract: one composition of a project as a composition file.
-#include <cstdio>
 #include <memory>
 
 #include "host/text.h"
@@ -32,11 +31,12 @@ struct Options
 int Extract(const Options& options)
 {
   RequireWritable(options.output, options.force);
-  const host::CompositionText composition = host::WriteComposition(ReadProject(options.project));
+  const host::Project project = ReadProject(options.project);
+  const host::CompositionText composition = host::WriteComposition(project);
   for (const std::string& warning : composition.warnings)
-    std::fprintf(stderr, "warning: %s: %s\n", options.output.c_str(), warning.c_str());
+    TellWarning(options.output + ": " + warning);
   WriteOutput(options.output, composition.text);
-  return kDone;
+  return project.warnings.empty() && composition.warnings.empty() ? kDone : kProblems;
 }
 
 } // namespace

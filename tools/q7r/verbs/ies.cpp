@@ -2,9 +2,11 @@
 #include <cstdio>
 #include <memory>
 
+#include "file_list.h"
 #include "listing/ies_text.h"
 #include "output/standard_output.h"
 #include "scene_file.h"
+#include "standard_input.h"
 #include "verbs.h"
 
 namespace q7r
@@ -26,11 +28,8 @@ as well; here they are without it. With --json the table of intensities is there
 
 Example: q7r ies downlight.ies)";
 
-struct Options
-{
-  std::string file;
-  bool json = false;
-};
+struct Options : FileList
+{};
 
 using IESPtr = Owned<IESLight>;
 
@@ -42,7 +41,7 @@ IESPtr LoadIES(const std::string& path)
   IESLight* loaded = nullptr;
   const Long result = LoadIESFile(loaded, name, IESFactors::kLightOnly);
   if (result != kIESLoaded)
-    throw Failure(path + ": " + GetIESResultText(result));
+    throw Failure(InputName(path), GetIESResultText(result));
   return IESPtr(loaded);
 }
 
@@ -126,9 +125,9 @@ Json LightJson(const IESLight& light)
   return json;
 }
 
-int ShowIES(const Options& options)
+int ShowIES(const std::string& file, const Options& options)
 {
-  const IESPtr light = LoadIES(options.file);
+  const IESPtr light = LoadIES(file);
   if (options.json)
     PrintLine(LightJson(*light).dump(1, ' ', false, Json::error_handler_t::replace));
   else
@@ -162,9 +161,10 @@ void AddIES(CLI::App& program, int& status)
 {
   auto options = std::make_shared<Options>();
   CLI::App* verb = program.add_subcommand("ies", kHelp);
-  verb->add_option("FILE", options->file, "the photometric file")->required();
-  verb->add_flag("--json", options->json, "as one JSON object, with the table");
-  verb->callback([options, &status] { status = ShowIES(*options); });
+  AddFileList(*verb, *options, "a photometric file", "as one JSON object, with the table");
+  verb->callback([options, &status] {
+    status = ShowEach(*options, [&](const std::string& file) { return ShowIES(file, *options); });
+  });
 }
 
 } // namespace q7r

@@ -1,9 +1,9 @@
 // q7r info: what a scene file is and how much it holds.
 #include <cstdio>
-#include <filesystem>
 #include <map>
 #include <memory>
 
+#include "file_list.h"
 #include "listing/json_text.h"
 #include "listing/scene_counts.h"
 #include "listing/type_names.h"
@@ -24,11 +24,8 @@ objects, tags, materials, tracks and keys it holds.
 
 Example: q7r info shot.q7r)";
 
-struct Options
-{
-  std::string file;
-  bool json = false;
-};
+struct Options : FileList
+{};
 
 long long Sum(const std::map<Long, long long>& counts)
 {
@@ -114,11 +111,11 @@ void PrintInfo(const Json& info, const SceneCounts& counts)
   Row("keys", number("keys"));
 }
 
-int Info(const Options& options)
+int Info(const std::string& file, const Options& options)
 {
-  DocumentPtr document = LoadScene(options.file);
+  DocumentPtr document = LoadScene(file);
   const SceneCounts counts = CountScene(*document);
-  Json info = InfoJson(*document, counts, std::filesystem::file_size(options.file));
+  Json info = InfoJson(*document, counts, InputSize(file));
   if (options.json)
     PrintLine(info.dump(1, ' ', false, Json::error_handler_t::replace));
   else
@@ -132,9 +129,10 @@ void AddInfo(CLI::App& program, int& status)
 {
   auto options = std::make_shared<Options>();
   CLI::App* verb = program.add_subcommand("info", kHelp);
-  verb->add_option("FILE", options->file, "the scene file")->required();
-  verb->add_flag("--json", options->json, "as one JSON object");
-  verb->callback([options, &status] { status = Info(*options); });
+  AddFileList(*verb, *options, "a scene file", "as one JSON object");
+  verb->callback([options, &status] {
+    status = ShowEach(*options, [&](const std::string& file) { return Info(file, *options); });
+  });
 }
 
 } // namespace q7r

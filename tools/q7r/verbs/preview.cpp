@@ -5,8 +5,11 @@
 #include <memory>
 
 #include "output/output_file.h"
+#include "standard_input.h"
 #include "torvane/pictures/bitmap_filters.h"
+#include "usage.h"
 #include "verbs.h"
+#include "work_list.h"
 
 namespace q7r
 {
@@ -23,14 +26,12 @@ The suffix of the picture's name tells its format, .jpg, .jpeg or .bmp. A JPEG c
 byte for byte as the scene holds it. BMP (24 bits a pixel) and JPEG files can be put in.
 
 Examples: q7r preview shot.q7r -o shot.jpg
+          q7r preview scenes/*.q7r -o stills
           q7r preview shot.q7r --set still.bmp -o new.q7r)";
 
-struct Options
+struct Options : WorkOptions
 {
-  std::string scene;
   std::string picture; // to put in; empty to take out
-  std::string output;
-  bool force = false;
 };
 
 const char* PictureProblem(Long result)
@@ -52,19 +53,21 @@ const char* PictureProblem(Long result)
 void RequireGood(const std::string& path, Long result)
 {
   if (result != IMAGERESULT_OK)
-    throw Failure(path + ": " + PictureProblem(result));
+    throw Failure(InputName(path), PictureProblem(result));
 }
 
 // The format that a picture's name asks for.
 Long FormatOf(const std::string& path)
 {
+  if (IsStandard(path))
+    return kImageFormatJpeg;
   std::string suffix = std::filesystem::path(path).extension().string();
   std::transform(suffix.begin(), suffix.end(), suffix.begin(), [](unsigned char c) { return std::tolower(c); });
   if (suffix == ".bmp")
     return kImageFormatBmp;
   if (suffix == ".jpg" || suffix == ".jpeg")
     return kImageFormatJpeg;
-  throw Failure(path + ": the name of a picture ends with .jpg, .jpeg or .bmp");
+  throw Failure(path, "the name of a picture ends with .jpg, .jpeg or .bmp");
 }
 
 // The picture as a file of a format.
@@ -81,19 +84,18 @@ std::string PictureBytes(BaseDocument& document, Long format)
   return {static_cast<const char*>(written.data), static_cast<std::size_t>(written.size)};
 }
 
-int TakeOut(const Options& options)
+int TakeOut(const Work& work)
 {
-  Long format = FormatOf(options.output);
-  RequireWritable(options.output, options.force);
+  const Long format = FormatOf(work.output);
   FileProblem problem;
-  DocumentPtr document(LoadDocument(ToFilename(options.scene), LoadPreviewOnly, &problem));
+  DocumentPtr document(LoadDocument(ToFilename(work.input), LoadPreviewOnly, &problem));
   if (!document)
-    throw Failure(ProblemText(options.scene, problem));
+    throw SceneFailure(work.input, problem);
   Bitmap& preview = document->GetPreview();
   if (preview.GetBw() < 1)
-    throw Failure(options.scene + ": holds no preview picture");
+    throw Failure(InputName(work.input), "holds no preview picture");
   const std::string words = std::to_string(preview.GetBw()) + " x " + std::to_string(preview.GetBh()) + " pixels";
-  WriteOutput(options.output, PictureBytes(*document, format), words);
+  WriteOutput(work.output, PictureBytes(*document, format), words);
   return kDone;
 }
 
@@ -102,7 +104,7 @@ void LoadPicture(const std::string& path, Bitmap& bitmap)
   const std::string bytes = ReadInput(path);
   const auto size = static_cast<LLong>(bytes.size());
   if (size < 1)
-    throw Failure(path + ": is empty");
+    throw Failure(InputName(path), "is empty");
   Filename name;
   name.SetMemoryRead(bytes.data(), size);
   const BmpLoader bmp;
@@ -112,21 +114,32 @@ void LoadPicture(const std::string& path, Bitmap& bitmap)
     if (loader->Identify(name, bytes.data(), size))
       return RequireGood(path, loader->Load(name, bitmap, kFirstFrame));
   }
-  throw Failure(path + ": is neither a JPEG file nor a BMP file of the common kind");
+  throw Failure(InputName(path), "is neither a JPEG file nor a BMP file of the common kind");
 }
 
-int PutIn(const Options& options)
+int PutIn(const Work& work, const std::string& picture)
 {
-  RequireWritable(options.output, options.force);
-  DocumentPtr document = LoadScene(options.scene);
+  DocumentPtr document = LoadScene(work.input);
   Bitmap& preview = document->GetPreview();
-  LoadPicture(options.picture, preview);
+  LoadPicture(picture, preview);
   // A scene file holds its preview as JPEG.
   Long most = JpgSaver().GetMaxResolution();
   if (preview.GetBw() > most || preview.GetBh() > most)
-    RequireGood(options.picture, IMAGERESULT_LARGE);
-  WriteScene(*document, options.output);
+    RequireGood(picture, IMAGERESULT_LARGE);
+  WriteScene(*document, work.output);
   return kDone;
+}
+
+int Preview(const Options& options)
+{
+  const bool takesOut = options.picture.empty();
+  const auto prepare = [&](const Work& work) {
+    if (takesOut)
+      FormatOf(work.output);
+    RequireWritable(work.output, options.force);
+  };
+  return DoWork(PlanWork(options, takesOut ? ".jpg" : nullptr), options.jobs, prepare,
+                [&](const Work& work) { return takesOut ? TakeOut(work) : PutIn(work, options.picture); });
 }
 
 } // namespace
@@ -135,12 +148,12 @@ void AddPreview(CLI::App& program, int& status)
 {
   auto options = std::make_shared<Options>();
   CLI::App* verb = program.add_subcommand("preview", kHelp);
-  verb->add_option("FILE", options->scene, "the scene file")->required();
+  AddWorkOptions(*verb, *options, "FILE",
+                 "the scene file, then the picture to write, or with --set the scene file to write. With -o, as many "
+                 "scene files as you like, each picture a .jpg");
   verb->add_option("--set", options->picture, "put this picture in")->option_text("IMAGE");
-  verb->add_option("-o,--output", options->output, "the picture to write; with --set the scene file to write")
-      ->required();
-  verb->add_flag("--force", options->force, "replace an existing file without asking");
-  verb->callback([options, &status] { status = options->picture.empty() ? TakeOut(*options) : PutIn(*options); });
+  AddTalkOptions(*verb);
+  verb->callback([options, &status] { status = Preview(*options); });
 }
 
 } // namespace q7r

@@ -3,7 +3,10 @@
 #include <vector>
 
 #include "output/output_file.h"
+#include "reproducible.h"
+#include "usage.h"
 #include "verbs.h"
+#include "work_list.h"
 
 namespace q7r
 {
@@ -19,7 +22,8 @@ know (objects, tags, values of other programs) is written back byte for byte.
 
 Use it to bring files of old versions up to date.
 
-Example: q7r resave old.q7r new.q7r)";
+Examples: q7r resave old.q7r new.q7r
+          q7r resave old/*.q7r -o new)";
 
 constexpr const char* kMergeHelp =
     R"(Adds the materials, objects, render settings and layers of other scene files to one
@@ -27,30 +31,55 @@ and writes the result.
 
 Example: q7r merge shot.q7r set.q7r props.q7r -o all.q7r)";
 
-struct Options
+struct ResaveOptions : WorkOptions
 {
+  bool reproducible = false;
+};
+
+struct MergeOptions
+{
+  bool reproducible = false;
   std::string input;
   std::vector<std::string> others;
   std::string output;
   bool force = false;
 };
 
-int Resave(const Options& options)
+int ResaveOne(const Work& work, bool reproducible)
 {
-  RequireWritable(options.output, options.force);
-  DocumentPtr document = LoadScene(options.input);
-  WriteScene(*document, options.output);
+  Reproduction reproduction(reproducible);
+  if (reproducible)
+    reproduction.Take(ReadInput(work.input));
+  reproduction.Begin();
+  const DocumentPtr document = LoadScene(work.input);
+  reproduction.TakeDate(*document);
+  WriteScene(*document, work.output);
   return kDone;
 }
 
-int Merge(const Options& options)
+int Resave(const ResaveOptions& options)
+{
+  return DoWork(
+      PlanWork(options, nullptr), options.jobs, [&](const Work& work) { RequireWritable(work.output, options.force); },
+      [&](const Work& work) { return ResaveOne(work, options.reproducible); });
+}
+
+int Merge(const MergeOptions& options)
 {
   RequireWritable(options.output, options.force);
-  DocumentPtr document = LoadScene(options.input);
+  Reproduction reproduction(options.reproducible);
+  if (options.reproducible) {
+    reproduction.Take(ReadInput(options.input));
+    for (const std::string& other : options.others)
+      reproduction.Take(ReadInput(other));
+  }
+  reproduction.Begin();
+  const DocumentPtr document = LoadScene(options.input);
+  reproduction.TakeDate(*document);
   for (const std::string& other : options.others) {
     FileProblem problem;
     if (!MergeDocument(document.get(), ToFilename(other), LoadObjects | LoadMaterials, &problem))
-      throw Failure(ProblemText(other, problem));
+      throw SceneFailure(other, problem);
   }
   WriteScene(*document, options.output);
   return kDone;
@@ -60,22 +89,25 @@ int Merge(const Options& options)
 
 void AddResave(CLI::App& program, int& status)
 {
-  auto options = std::make_shared<Options>();
+  auto options = std::make_shared<ResaveOptions>();
   CLI::App* verb = program.add_subcommand("resave", kResaveHelp);
-  verb->add_option("IN", options->input, "the scene file to read")->required();
-  verb->add_option("OUT", options->output, "the scene file to write")->required();
-  verb->add_flag("--force", options->force, "replace an existing file without asking");
+  AddWorkOptions(*verb, *options, "SCENE",
+                 "the scene file to read, then the one to write. With -o, as many scene files as you like");
+  AddReproducibleOption(*verb, options->reproducible);
+  AddTalkOptions(*verb);
   verb->callback([options, &status] { status = Resave(*options); });
 }
 
 void AddMerge(CLI::App& program, int& status)
 {
-  auto options = std::make_shared<Options>();
+  auto options = std::make_shared<MergeOptions>();
   CLI::App* verb = program.add_subcommand("merge", kMergeHelp);
   verb->add_option("INTO", options->input, "the scene file to begin with")->required();
   verb->add_option("FILE", options->others, "scene files to add")->required();
   verb->add_option("-o,--output", options->output, "the scene file to write")->required();
   verb->add_flag("--force", options->force, "replace an existing file without asking");
+  AddReproducibleOption(*verb, options->reproducible);
+  AddTalkOptions(*verb);
   verb->callback([options, &status] { status = Merge(*options); });
 }
 

@@ -2,6 +2,7 @@
 #include <cstdio>
 #include <memory>
 
+#include "file_list.h"
 #include "listing/node_details.h"
 #include "listing/scene_json.h"
 #include "listing/type_names.h"
@@ -28,11 +29,8 @@ to the last key, for programs.
 
 Example: q7r tree shot.q7r)";
 
-struct Options
-{
-  std::string file;
-  bool json = false;
-};
+struct Options : FileList
+{};
 
 std::string Quoted(const String& text) { return "\"" + ToUtf8(text) + "\""; }
 
@@ -130,9 +128,9 @@ void PrintScene(BaseDocument& document)
     PrintIndented(1, line);
 }
 
-int Tree(const Options& options)
+int Tree(const std::string& file, const Options& options)
 {
-  DocumentPtr document = LoadScene(options.file);
+  DocumentPtr document = LoadScene(file);
   if (options.json)
     PrintLine(SceneJson(*document).dump(1, ' ', false, Json::error_handler_t::replace));
   else
@@ -146,9 +144,10 @@ void AddTree(CLI::App& program, int& status)
 {
   auto options = std::make_shared<Options>();
   CLI::App* verb = program.add_subcommand("tree", kHelp);
-  verb->add_option("FILE", options->file, "the scene file")->required();
-  verb->add_flag("--json", options->json, "everything, as one JSON object");
-  verb->callback([options, &status] { status = Tree(*options); });
+  AddFileList(*verb, *options, "a scene file", "everything, as one JSON object");
+  verb->callback([options, &status] {
+    status = ShowEach(*options, [&](const std::string& file) { return Tree(file, *options); });
+  });
 }
 
 } // namespace q7r

@@ -3,23 +3,10 @@
 
 #include <CLI/CLI.hpp>
 
+#include "report.h"
+
 namespace q7r
 {
-
-// What the program ends with.
-enum ExitStatus : int
-{
-  kDone = 0,
-  kProblems = 1, // done, but with problems that were told
-  kNotDone = 2,
-};
-
-// A verb that can't do its work throws this; main prints the message as one line and ends with kNotDone.
-class Failure : public std::runtime_error
-{
- public:
-  using std::runtime_error::runtime_error;
-};
 
 void AddExport(CLI::App& program, int& status);
 void AddInfo(CLI::App& program, int& status);

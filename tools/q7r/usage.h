@@ -1,0 +1,22 @@
+// What is told of a command line that can't be taken.
+#pragma once
+
+#include <CLI/CLI.hpp>
+#include <string>
+#include <vector>
+
+namespace q7r
+{
+
+// One line: what is wrong, the verb or option that was probably meant, and where help is. `arguments` are those behind
+// the program's name.
+std::string UsageText(const CLI::App& program, const CLI::ParseError& error, const std::vector<std::string>& arguments);
+
+// The candidate that differs least from a word: by letters that are missing, too many, other or swapped. Empty when all
+// differ too much to have been meant.
+std::string Nearest(const std::string& word, const std::vector<std::string>& candidates);
+
+// Adds --quiet, and --verbose unless `verbose`, which tells what it does, is null.
+void AddTalkOptions(CLI::App& verb, const char* verbose = nullptr);
+
+} // namespace q7r
