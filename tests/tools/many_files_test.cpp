@@ -87,6 +87,11 @@ TEST_F(ManyFiles, GoIntoAFolderWithTheirNames)
   EXPECT_EQ(RunQ7r("convert " + scenes + " -o " + Place("models/")).status, 0);
   for (const std::string name : {"again/a.q7r", "again/b.lottie.q7r", "models/a.glb", "models/b.lottie.glb"})
     EXPECT_GT(ReadWholeFile(folder_ / name).size(), 0U) << name;
+  EXPECT_EQ(RunQ7r("export " + a + " -o " + Place("one")).status, 0);
+  EXPECT_EQ(RunQ7r("export " + a + " -o " + Place("two.q7r")).status, 0);
+  EXPECT_GT(ReadWholeFile(folder_ / "one/a.q7r").size() * ReadWholeFile(folder_ / "two.q7r").size(), 0U);
+  EXPECT_NE(RunQ7r("export " + a + " " + b + " -o " + Place("two.q7r")).err.find("two.q7r: is no folder"),
+            std::string::npos);
   // What is there stays, and two files of one name don't overwrite each other.
   const RunResult second = RunQ7r("resave " + scenes + " -o " + Place("again"));
   EXPECT_EQ(second.status, 2);
@@ -156,7 +161,7 @@ TEST_F(ManyFiles, TellMissingPicturesOnceAndHoldPathsFromTheScene)
   const std::string shot = Write("shot/shot.json", kShot);
   Write("shot/pictures/a.png", "");
   fs::create_directories(folder_ / "scenes");
-  const RunResult run = RunQ7r("export --relative " + shot + " " + Place("scenes/s.q7r"));
+  const RunResult run = RunQ7r("export --relative " + shot + " " + Place("scenes/../scenes/s.q7r"));
   EXPECT_EQ(run.status, 1);
   EXPECT_EQ(Count(run.err, "warning: " + (folder_ / "shot/shot.json") + ": the picture "), 2U) << run.err;
   EXPECT_EQ(Count(run.err, "gone.png\" is not there"), 1U) << run.err;

@@ -61,11 +61,18 @@ std::vector<std::string> MissingPictures(const host::Project& project)
 
 void MakeRelative(host::Project& project, const fs::path& folder)
 {
+  // By the folders that the links on the way lead to: "..", behind a link, isn't the folder before it.
+  std::error_code error;
+  const fs::path root = fs::weakly_canonical(folder, error);
+  if (error)
+    return;
   for (host::Item& item : project.items) {
     const fs::path path = host::PathFromUtf8(item.path);
     if (!HasPath(item) || !path.is_absolute() || (fs::path::preferred_separator == '/' && IsWindowsPath(item.path)))
       continue;
-    const fs::path relative = path.lexically_relative(folder);
+    std::error_code ignored;
+    const fs::path real = fs::weakly_canonical(path.parent_path(), ignored) / path.filename();
+    const fs::path relative = real.lexically_relative(root);
     if (!relative.empty())
       item.path = host::PathToUtf8(relative);
   }

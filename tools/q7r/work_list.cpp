@@ -7,6 +7,7 @@
 #include <mutex>
 #include <thread>
 
+#include "output/output_file.h"
 #include "progress_bar.h"
 #include "report.h"
 #include "standard_input.h"
@@ -20,10 +21,15 @@ namespace
 
 namespace fs = std::filesystem;
 
+// A folder, or what is to be one: a new name without a suffix. So the one file that a pattern of the shell gave goes
+// where several would have gone.
 bool IsFolder(const std::string& path)
 {
   std::error_code ignored;
-  return path.ends_with('/') || fs::is_directory(path, ignored);
+  const fs::file_status status = fs::status(path, ignored);
+  if (fs::exists(status) || IsDevice(path))
+    return fs::is_directory(status);
+  return path.ends_with('/') || !fs::path(path).has_extension();
 }
 
 std::string PlaceIn(const std::string& folder, const std::string& file, const char* suffix)
@@ -138,6 +144,8 @@ std::vector<Work> PlanWork(const WorkOptions& options, const char* suffix)
   }
   if (files.size() == 1 && !IsFolder(options.output))
     return {{files.front(), options.output}};
+  if (!IsFolder(options.output))
+    throw Failure(options.output, "is no folder, which many files need; a new one whose name has a dot ends with /");
   return PlanFolder(options, suffix);
 }
 

@@ -27,8 +27,9 @@ struct Work
 // Adds the files under the name `name`, --output, --jobs and --force.
 void AddWorkOptions(CLI::App& verb, WorkOptions& options, const std::string& name, const std::string& what);
 
-// IN OUT, several with -o FOLDER, or one with -o FILE. In a folder a file keeps its name, with `suffix` (".q7r") in the
-// place of its own unless that is null; the folder is made. Throws Failure.
+// IN OUT, several with -o FOLDER, or one with -o FILE; a new name without a suffix is a folder. In a folder a file
+// keeps its name, with `suffix` (".q7r") in the place of its own unless that is null; the folder is made. Throws
+// Failure.
 std::vector<Work> PlanWork(const WorkOptions& options, const char* suffix);
 
 // Does all of the work, several pieces at a time on threads of their own, with a line of progress on a terminal, and

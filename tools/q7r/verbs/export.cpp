@@ -136,6 +136,12 @@ void RequireOutput(const Work& work, bool force)
     RequireWritable(work.output, force);
 }
 
+// Where a scene that goes into a pipe will be isn't known: then the folder of the shell.
+std::filesystem::path FolderOf(const std::string& output)
+{
+  return IsDevice(output) ? std::filesystem::current_path() : std::filesystem::absolute(output).parent_path();
+}
+
 int ExportOne(const Work& work, const Options& options)
 {
   ProjectOptions input = options.project;
@@ -148,7 +154,7 @@ int ExportOne(const Work& work, const Options& options)
   }
   host::Project project = ReadProjectToExport(input);
   if (options.relative && !IsGltf(work)) // a glTF file's are always
-    MakeRelative(project, std::filesystem::absolute(work.output).parent_path());
+    MakeRelative(project, FolderOf(work.output));
   const host::Composition& chosen = *project.root; // stays where it is when the project moves
   const bool isWarned = !project.warnings.empty();
   host::StandaloneHost player(std::move(project));
