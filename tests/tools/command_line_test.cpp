@@ -187,7 +187,7 @@ TEST_F(CommandLine, TellsArgumentsThatItCannotTake)
       {"tree a.q7r --loud", "tree: there is no option --loud (q7r tree --help"},
       {"merge a.q7r b.q7r", "merge: --output is required"},
       {"resave a b --jobs 0", "resave: --jobs: "},
-      {"export a b --quiet --verbose", "--verbose excludes --quiet"},
+      {"export a b --quiet --verbose", "--quiet excludes --verbose"},
       {"extract a -o b c", "extract: \"c\" is one argument too many"},
   };
   for (const auto& c : cases)
