@@ -176,7 +176,7 @@ TEST(CompositionErrors, NameThePlaceWithinWhatIsRead)
       {Changed("/layers/1/pe", "{}"), "/layers/1/pe/k: missing"},
       {Changed("/layers/0/parent", "2"), "/layers/0/parent: the chain of parents loops"},
       {"[]", "expected an object"},
-      {"", "byte 1 (line 1, column 0): not JSON"},
+      {"", "byte 1 (line 1, column 0): the file ends before its JSON does"},
       {"{\n  \"w\": 1,\n  oops", "byte 15 (line 3, column 3): not JSON"},
       {"{\"w\": 1} x", "byte 10 (line 1, column 10): not JSON"},
       {"{\"w\": 1e999}", "byte 11 (line 1, column 11): number out of range"},

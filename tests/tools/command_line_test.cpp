@@ -177,6 +177,11 @@ TEST_F(CommandLine, TellsArgumentsThatItCannotTake)
     const char* says;
   } cases[] = {
       {"", "which verb? (q7r --help"},
+      {"help exprot", "there is no verb \"exprot\"; did you mean export?"},
+      {"version", "there is no verb \"version\"; did you mean --version?"},
+      {"info \"\"", "\"\": is no file name"},
+      {"export \"\" a.q7r", "\"\": is no file name"},
+      {"export a.json b --samples", "export: --samples needs a value"},
       {"dance", "there is no verb \"dance\" (q7r --help"},
       {"exprot a b", "there is no verb \"exprot\"; did you mean export?"},
       {"--verison", "there is no option --verison; did you mean --version?"},

@@ -25,7 +25,7 @@ std::filesystem::path ToPath(const std::string& path) { return std::filesystem::
 // In messages.
 std::string NameOf(const std::string& file)
 {
-  return IsStandard(file) ? InputName(file) : host::OneLine(host::PathToUtf8(ToPath(file)));
+  return IsStandard(file) || file.empty() ? InputName(file) : host::OneLine(host::PathToUtf8(ToPath(file)));
 }
 
 std::string NamesOf(const Summaries& compositions)
@@ -92,6 +92,8 @@ void AddProjectOptions(CLI::App& verb, ProjectOptions& options)
 
 std::unique_ptr<host::ProjectFile> OpenProject(const std::string& file)
 {
+  if (file.empty())
+    throw Failure(NameOf(file), "is no file name");
   if (!IsStandard(file))
     return host::OpenProjectFile(ToPath(file));
   const std::string& bytes = StandardInput();

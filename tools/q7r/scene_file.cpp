@@ -38,6 +38,8 @@ std::string OpenedName(const std::filesystem::path& path)
 
 Filename ToFilename(const std::string& path)
 {
+  if (path.empty())
+    throw Failure(InputName(path), "is no file name");
   Filename name;
   if (IsStandard(path)) {
     const std::string& bytes = StandardInput();
@@ -69,7 +71,7 @@ std::string ReadInput(const std::string& path)
     bytes.append(block, 0, static_cast<std::size_t>(file.gcount()));
   }
   if (!file.is_open() || file.bad())
-    throw Failure(path + ": " + std::generic_category().message(errno));
+    throw Failure(InputName(path), std::generic_category().message(errno));
   return bytes;
 }
 

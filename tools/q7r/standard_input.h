@@ -16,6 +16,9 @@ inline constexpr std::size_t kMostInput = std::size_t{4} << 30;
 const std::string& StandardInput();
 
 // How messages name an input: as it was given, or "standard input".
-inline std::string InputName(const std::string& path) { return IsStandard(path) ? "standard input" : path; }
+inline std::string InputName(const std::string& path)
+{
+  return IsStandard(path) ? "standard input" : path.empty() ? "\"\"" : path;
+}
 
 } // namespace q7r

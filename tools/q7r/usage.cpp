@@ -39,7 +39,7 @@ std::string Guess(const std::string& word, const std::vector<std::string>& candi
 
 std::vector<std::string> VerbsOf(const CLI::App& program)
 {
-  std::vector<std::string> names;
+  std::vector<std::string> names = {"help", "--version"}; // what people try as verbs
   for (const CLI::App* verb : program.get_subcommands([](const CLI::App*) { return true; }))
     names.push_back(verb->get_name());
   return names;
@@ -53,6 +53,11 @@ std::vector<std::string> OptionsOf(const CLI::App& verb)
       names.push_back("--" + name);
   }
   return names;
+}
+
+bool IsError(const CLI::ParseError& error, CLI::ExitCodes code)
+{
+  return error.get_exit_code() == static_cast<int>(code);
 }
 
 bool IsOption(const std::string& argument) { return argument.size() > 1 && argument[0] == '-'; }
@@ -73,6 +78,8 @@ std::string ExtraText(const CLI::App& verb)
   return extra.empty() ? "too many arguments" : "\"" + extra.front() + "\" is one argument too many";
 }
 
+constexpr const char* kVerbsAreIn = " (q7r --help lists the verbs)";
+
 std::string NoVerbText(const CLI::App& program, const std::vector<std::string>& arguments)
 {
   if (arguments.empty())
@@ -88,11 +95,23 @@ std::string UsageText(const CLI::App& program, const CLI::ParseError& error, con
 {
   const std::vector<CLI::App*> verbs = program.get_subcommands();
   if (verbs.empty())
-    return NoVerbText(program, arguments) + " (q7r --help lists the verbs)";
+    return NoVerbText(program, arguments) + kVerbsAreIn;
   const CLI::App& verb = *verbs.front();
-  const bool isExtra = error.get_exit_code() == static_cast<int>(CLI::ExitCodes::ExtrasError);
-  const std::string text = isExtra ? ExtraText(verb) : error.what();
+  const std::string words = error.what();
+  const std::string option = words.substr(0, words.find(':'));
+  const std::string text = IsError(error, CLI::ExitCodes::ExtrasError)        ? ExtraText(verb)
+                           : IsError(error, CLI::ExitCodes::ArgumentMismatch) ? option + " needs a value"
+                                                                              : words;
   return verb.get_name() + ": " + text + " (q7r " + verb.get_name() + " --help tells more)";
+}
+
+void RequireVerb(const CLI::App& program, const std::vector<std::string>& arguments)
+{
+  if (arguments.empty() || IsOption(arguments.front()))
+    return;
+  const auto isMeant = [&](const CLI::App* verb) { return verb->check_name(arguments.front()); };
+  if (program.get_subcommands(isMeant).empty())
+    throw Failure(NoVerbText(program, arguments) + kVerbsAreIn);
 }
 
 std::string Nearest(const std::string& word, const std::vector<std::string>& candidates)

@@ -12,6 +12,9 @@ namespace q7r
 // the program's name.
 std::string UsageText(const CLI::App& program, const CLI::ParseError& error, const std::vector<std::string>& arguments);
 
+// Throws Failure for a first argument that is neither an option nor a verb.
+void RequireVerb(const CLI::App& program, const std::vector<std::string>& arguments);
+
 // The candidate that differs least from a word: by letters that are missing, too many, other or swapped. Empty when all
 // differ too much to have been meant.
 std::string Nearest(const std::string& word, const std::vector<std::string>& candidates);

@@ -24,7 +24,7 @@ namespace fs = std::filesystem;
 
 constexpr int kMaxLinks = 40; // as the system follows
 
-std::string OutputName(const std::string& path) { return IsStandard(path) ? "standard output" : path; }
+std::string OutputName(const std::string& path) { return IsStandard(path) ? "standard output" : InputName(path); }
 
 [[noreturn]] void Fail(const std::string& path, const std::error_code& error)
 {
@@ -187,7 +187,7 @@ bool IsDevice(const std::string& path)
 void RequireWritable(const std::string& path, bool force)
 {
   if (!HasFileName(path))
-    throw Failure(path, "is no file name");
+    throw Failure(OutputName(path), "is no file name");
   const Place place = FindPlace(path);
   if (fs::is_directory(place.status))
     throw Failure(path, "is a folder");
