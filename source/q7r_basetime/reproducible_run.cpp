@@ -10,10 +10,10 @@ namespace _torvane_
 namespace
 {
 
-thread_local ReproducibleRun* current = nullptr;
+thread_local ReproducibleRun* gCurrentRun = nullptr;
 
 // The generator splitmix64: neighbours give numbers that have nothing in common.
-ULLong Mix(ULLong number)
+ULLong MixBits(ULLong number)
 {
   number += 0x9E3779B97F4A7C15;
   number = (number ^ (number >> 30)) * 0xBF58476D1CE4E5B9;
@@ -23,18 +23,18 @@ ULLong Mix(ULLong number)
 
 } // namespace
 
-ReproducibleRun::ReproducibleRun(ULLong seed, const DateTime& now) noexcept : seed_(seed), now_(now), before_(current)
+ReproducibleRun::ReproducibleRun(ULLong seed, const DateTime& now) noexcept : seed_(seed), now_(now), before_(gCurrentRun)
 {
-  current = this;
+  gCurrentRun = this;
 }
 
-ReproducibleRun::~ReproducibleRun() { current = before_; }
+ReproducibleRun::~ReproducibleRun() { gCurrentRun = before_; }
 
-ReproducibleRun* ReproducibleRun::GetCurrent() noexcept { return current; }
+ReproducibleRun* ReproducibleRun::GetCurrent() noexcept { return gCurrentRun; }
 
 void ReproducibleRun::TakeUuid(UChar* bytes) noexcept
 {
-  const ULLong halves[] = {Mix(seed_ ^ Mix(drawn_)), Mix(~seed_ + Mix(drawn_))};
+  const ULLong halves[] = {MixBits(seed_ ^ MixBits(drawn_)), MixBits(~seed_ + MixBits(drawn_))};
   ++drawn_;
   for (Long i = 0; i < 16; ++i)
     bytes[i] = static_cast<UChar>(halves[i / 8] >> (8 * (7 - i % 8)));
