@@ -23,7 +23,8 @@ ULLong MixBits(ULLong number)
 
 } // namespace
 
-ReproducibleRun::ReproducibleRun(ULLong seed, const DateTime& now) noexcept : seed_(seed), now_(now), before_(gCurrentRun)
+ReproducibleRun::ReproducibleRun(ULLong seed, const DateTime& now) noexcept
+    : seed_(seed), now_(now), before_(gCurrentRun)
 {
   gCurrentRun = this;
 }
