@@ -83,54 +83,49 @@ void ReadAllSamples(host::StandaloneHost& host, A_long layers, A_long frames)
   }
 }
 
-// "host ns": the host's reads for one sample of one layer. "exporter ns": what the exporter takes on top of them, for
-// the conversion, nine keys, and the scene around them; "exporter/host" is the ratio of the two.
+void Export(BaseDocument& document)
+{
+  if (!exporter::ExportComposition(&document))
+    throw std::runtime_error("the export failed");
+}
+
+// "host ns": the host's reads for one sample of one layer. "exporter/host" is what the exporter takes on top of them,
+// for the conversion, nine keys, and the scene around them, as a part of that.
 void ExportAnimatedLayers(benchmark::State& state)
 {
   const std::int64_t layers = state.range(0);
   const std::int64_t frames = state.range(1);
   host::StandaloneHost host(host::LoadCompositionText(Composition(layers, frames), "benchmark.json", "/"));
   host.Start(EntryPointFunc);
-  const Seconds reads = BestOfThree(
-      [&] { return TimeOf([&] { ReadAllSamples(host, static_cast<A_long>(layers), static_cast<A_long>(frames)); }); });
-  ResetPeakMemory();
-  const std::int64_t before = PresentMemory();
-  Seconds best(1e9);
-  RunBest(state, [&] {
-    const _torvane_::Owned<BaseDocument> document(BaseDocument::Alloc());
-    const Seconds time = TimeOf([&] {
-      if (!exporter::ExportComposition(document.get()))
-        state.SkipWithError("the export failed");
+  const Run reads = BestOfThree([&] {
+    return InFreshProcess([&] {
+      return Measure([&] { ReadAllSamples(host, static_cast<A_long>(layers), static_cast<A_long>(frames)); });
     });
-    best = std::min(best, time);
-    return time;
   });
-  const auto samples = static_cast<double>(layers * (frames + 1));
-  state.counters["host ns"] = reads.count() / samples * 1e9;
-  state.counters["exporter ns"] = (best - reads).count() / samples * 1e9;
-  state.counters["exporter/host"] = (best - reads) / reads;
-  state.counters["peak MB"] = static_cast<double>(PeakMemory() - before) * 1e-6;
+  const Run run = RunFresh(state, [&] {
+    const _torvane_::Owned<BaseDocument> document(BaseDocument::Alloc());
+    return Measure([&] { Export(*document); });
+  });
+  state.counters["host ns"] = reads.time.count() / static_cast<double>(layers * (frames + 1)) * 1e9;
+  state.counters["exporter/host"] = (run.time - reads.time) / reads.time;
 }
 
 // From the composition to the closed file, a layer, its material and its tag at a time.
 void ExportStaticLayers(benchmark::State& state)
 {
-  const std::int64_t layers = state.range(0);
   const ScratchFile scratch;
-  host::StandaloneHost host(host::LoadCompositionText(StaticComposition(layers), "benchmark.json", "/"));
+  host::StandaloneHost host(host::LoadCompositionText(StaticComposition(state.range(0)), "benchmark.json", "/"));
   host.Start(EntryPointFunc);
-  ResetPeakMemory();
-  const std::int64_t before = PresentMemory();
-  RunBest(state, [&] {
+  RunFresh(state, [&] {
+    scratch.Remove();
     const _torvane_::Owned<BaseDocument> document(BaseDocument::Alloc());
-    return TimeOf([&] {
-      if (!exporter::ExportComposition(document.get()) ||
-          !SaveDocument(document.get(), _torvane_::Filename(scratch.Path().c_str()), 0))
-        state.SkipWithError("the export failed");
+    return Measure([&] {
+      Export(*document);
+      if (!SaveDocument(document.get(), _torvane_::Filename(scratch.Path().c_str()), 0))
+        throw std::runtime_error("the scene can't be saved");
     });
   });
-  SetRate(state, static_cast<double>(layers));
-  state.counters["peak MB"] = static_cast<double>(PeakMemory() - before) * 1e-6;
+  SetRate(state, static_cast<double>(state.range(0)));
 }
 
 BENCHMARK(ExportStaticLayers)->Arg(10'000)->Arg(20'000)->Apply(OneBest);

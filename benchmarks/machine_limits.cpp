@@ -45,12 +45,16 @@ std::uint64_t Swapped(double value) { return __builtin_bswap64(std::bit_cast<std
 template <typename Work>
 double Rate(std::size_t things, Work&& work)
 {
-  work();
-  return static_cast<double>(things) / BestOfThree([&] { return TimeOf(work); }).count();
+  const Run best = InFreshProcess([&] {
+    work();
+    return BestOfThree([&] { return Measure(work); });
+  });
+  return static_cast<double>(things) / best.time.count();
 }
 
 void WriteDoubles(const ScratchFile& scratch, const std::vector<double>& values)
 {
+  scratch.Remove();
   File file = Open(scratch, "wb");
   std::vector<std::uint64_t> buffer(kPiece / sizeof(double));
   for (std::size_t done = 0; done < values.size(); done += buffer.size()) {
@@ -78,6 +82,7 @@ void ReadDoubles(const ScratchFile& scratch)
 
 void WriteValues(const ScratchFile& scratch)
 {
+  scratch.Remove();
   File file = Open(scratch, "wb");
   std::vector<unsigned char> buffer(kValueBuffer);
   std::size_t fill = 0;
@@ -125,19 +130,16 @@ struct Node
 };
 static_assert(sizeof(Node) == 64);
 
-Seconds AllocateNodes()
+// The process ends with the nodes in place.
+void AllocateNodes()
 {
   Node* first = nullptr;
-  const Seconds time = TimeOf([&] {
-    for (std::size_t i = 0; i < kNodes; ++i) {
-      auto* node = static_cast<Node*>(std::malloc(sizeof(Node)));
-      *node = {first, {i, i, i, i, i, i, i}};
-      first = node;
-    }
-  });
-  while (first)
-    std::free(std::exchange(first, first->next));
-  return time;
+  for (std::size_t i = 0; i < kNodes; ++i) {
+    auto* node = static_cast<Node*>(std::malloc(sizeof(Node)));
+    *node = {first, {i, i, i, i, i, i, i}};
+    first = node;
+  }
+  benchmark::DoNotOptimize(first);
 }
 
 } // namespace
@@ -184,8 +186,8 @@ double ValueReadLimit()
 double NodeLimit()
 {
   static const double rate = [] {
-    AllocateNodes();
-    return static_cast<double>(kNodes) / BestOfThree(AllocateNodes).count();
+    const Run best = BestOfThree([] { return InFreshProcess([] { return Measure(AllocateNodes); }); });
+    return static_cast<double>(kNodes) / best.time.count();
   }();
   return rate;
 }

@@ -13,7 +13,7 @@ double DoubleReadLimit();
 double ValueWriteLimit();
 // The same, read (L4).
 double ValueReadLimit();
-// Nodes of 64 bytes a second, allocated and filled (L5).
+// Nodes of 64 bytes a second, allocated in memory fresh from the system and filled (L5).
 double NodeLimit();
 
 } // namespace benchmarks

@@ -72,49 +72,49 @@ bool IsWhole(const BaseDocument& document, Long rings)
          corners[0].x == static_cast<double>(static_cast<float>(double(rings - 1) / rings));
 }
 
-// Bytes of geometry beside doubles of the limit; and the most memory that `work` took at once, as a part of the
-// geometry.
-template <typename Work>
-void Measure(benchmark::State& state, double limit, Work&& work)
+// Doubles of geometry beside those of the limit; "memory" is the most that a run took, as a part of the geometry.
+void SetMeshRate(benchmark::State& state, const Run& run, double limit)
 {
   const double bytes = static_cast<double>(state.range(0)) * kAround * kGeometryPerPoint;
-  RunBest(state, work);
   SetRate(state, bytes / sizeof(double), limit);
-  const std::int64_t before = PresentMemory();
-  ResetPeakMemory();
-  work();
-  state.counters["memory"] = static_cast<double>(PeakMemory() - before) / bytes;
+  state.counters["memory"] = static_cast<double>(run.memory) / bytes;
 }
 
-Seconds Save(benchmark::State& state, BaseDocument& document, const ScratchFile& scratch)
+Run Save(BaseDocument& document, const ScratchFile& scratch)
 {
-  return TimeOf([&] {
+  scratch.Remove();
+  return Measure([&] {
     FileProblem problem;
     if (!SaveDocument(&document, Filename(scratch.Path().c_str()), 0, &problem) || problem.code != FILEERROR_NONE)
-      state.SkipWithError("the document can't be saved");
+      throw std::runtime_error("the document can't be saved");
   });
 }
 
 void SaveMesh(benchmark::State& state)
 {
   const ScratchFile scratch;
-  const DocumentPtr document = MakeTorus(static_cast<Long>(state.range(0)));
-  Measure(state, DoubleWriteLimit(), [&] { return Save(state, *document, scratch); });
+  const Run run = RunTogether(state, [&] {
+    const DocumentPtr document = MakeTorus(static_cast<Long>(state.range(0)));
+    Save(*document, scratch);
+    return BestOfThree([&] { return Save(*document, scratch); });
+  });
+  SetMeshRate(state, run, DoubleWriteLimit());
 }
 
 void LoadMesh(benchmark::State& state)
 {
   const ScratchFile scratch;
   const Long rings = static_cast<Long>(state.range(0));
-  Save(state, *MakeTorus(rings), scratch);
-  Measure(state, DoubleReadLimit(), [&] {
+  Prepare([&] { Save(*MakeTorus(rings), scratch); });
+  const Run run = RunFresh(state, [&] {
     DocumentPtr document;
-    const Seconds time =
-        TimeOf([&] { document.reset(LoadDocument(Filename(scratch.Path().c_str()), LoadObjects | LoadMaterials)); });
+    const Run load =
+        Measure([&] { document.reset(LoadDocument(Filename(scratch.Path().c_str()), LoadObjects | LoadMaterials)); });
     if (!document || !IsWhole(*document, rings))
-      state.SkipWithError("the document came back otherwise");
-    return time;
+      throw std::runtime_error("the document came back otherwise");
+    return load;
   });
+  SetMeshRate(state, run, DoubleReadLimit());
 }
 
 BENCHMARK(SaveMesh)->Arg(1000)->Arg(2000)->Apply(OneBest);

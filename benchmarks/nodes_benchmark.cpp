@@ -80,12 +80,13 @@ DocumentPtr MakeScene(int groups)
   return document;
 }
 
-Seconds Write(benchmark::State& state, BaseDocument& document, const ScratchFile& scratch)
+Run Write(BaseDocument& document, const ScratchFile& scratch)
 {
-  return TimeOf([&] {
+  scratch.Remove();
+  return Measure([&] {
     FileProblem problem;
     if (!SaveDocument(&document, Filename(scratch.Path().c_str()), 0, &problem) || problem.code != FILEERROR_NONE)
-      state.SkipWithError("the scene can't be written");
+      throw std::runtime_error("the scene can't be written");
   });
 }
 
@@ -108,17 +109,14 @@ void SetNodeRate(benchmark::State& state)
   SetRate(state, static_cast<double>(state.range(0)) * kNodesOfGroup, NodeLimit());
 }
 
-// The most memory that the process had, the scene that is written or read included.
-void SetPeak(benchmark::State& state) { state.counters["peak MB"] = static_cast<double>(PeakMemory()) * 1e-6; }
-
 void WriteNodes(benchmark::State& state)
 {
   const ScratchFile scratch;
-  const DocumentPtr document = MakeScene(static_cast<int>(state.range(0)));
-  Write(state, *document, scratch);
-  ResetPeakMemory();
-  RunBest(state, [&] { return Write(state, *document, scratch); });
-  SetPeak(state);
+  RunTogether(state, [&] {
+    const DocumentPtr document = MakeScene(static_cast<int>(state.range(0)));
+    Write(*document, scratch); // draws the markers of the nodes
+    return BestOfThree([&] { return Write(*document, scratch); });
+  });
   SetNodeRate(state);
 }
 
@@ -126,18 +124,17 @@ void ReadNodes(benchmark::State& state)
 {
   const ScratchFile scratch;
   const int groups = static_cast<int>(state.range(0));
-  Write(state, *MakeScene(groups), scratch);
-  ResetPeakMemory();
-  RunBest(state, [&] {
+  Prepare([&] { Write(*MakeScene(groups), scratch); });
+  const Run run = RunFresh(state, [&] {
     DocumentPtr document;
-    const Seconds time =
-        TimeOf([&] { document.reset(LoadDocument(Filename(scratch.Path().c_str()), LoadObjects | LoadMaterials)); });
+    const Run load =
+        Measure([&] { document.reset(LoadDocument(Filename(scratch.Path().c_str()), LoadObjects | LoadMaterials)); });
     if (!document || !IsWhole(*document, groups))
-      state.SkipWithError("the scene doesn't come back whole");
-    return time;
+      throw std::runtime_error("the scene doesn't come back whole");
+    return load;
   });
-  SetPeak(state);
   SetNodeRate(state);
+  state.counters["bytes/node"] = static_cast<double>(run.memory) / (static_cast<double>(groups) * kNodesOfGroup);
 }
 
 BENCHMARK(WriteNodes)->Arg(100)->Arg(200)->Apply(OneBest);

@@ -12,74 +12,75 @@ namespace
 using namespace _torvane_;
 using namespace benchmarks;
 
-// Opens `file`, or says on the benchmark that it can't.
-bool Open(benchmark::State& state, HyperFile& file, const ScratchFile& scratch, Long mode)
+void Open(HyperFile& file, const ScratchFile& scratch, Long mode)
 {
-  if (file.Open(kSceneIdent, Filename(scratch.Path().c_str()), mode))
-    return true;
-  state.SkipWithError("the file can't be opened");
-  return false;
+  if (mode == kHyperFileWrite)
+    scratch.Remove();
+  if (!file.Open(kSceneIdent, Filename(scratch.Path().c_str()), mode))
+    throw std::runtime_error("the file can't be opened");
 }
 
-Seconds WriteReals(benchmark::State& state, const ScratchFile& scratch)
+void WriteReals(const ScratchFile& scratch, LLong count)
 {
-  return TimeOf([&] {
-    HyperFile file;
-    if (!Open(state, file, scratch, kHyperFileWrite))
-      return;
-    for (LLong i = 0; i < state.range(0); ++i)
-      file.WriteReal(static_cast<Real>(i));
-    file.Close();
-  });
+  HyperFile file;
+  Open(file, scratch, kHyperFileWrite);
+  for (LLong i = 0; i < count; ++i)
+    file.WriteReal(static_cast<Real>(i));
+  file.Close();
 }
 
-Seconds ReadReals(benchmark::State& state, const ScratchFile& scratch)
+void ReadReals(const ScratchFile& scratch, LLong count)
 {
-  return TimeOf([&] {
-    HyperFile file;
-    if (!Open(state, file, scratch, kHyperFileRead))
-      return;
-    Real sum = 0;
-    for (LLong i = 0; i < state.range(0); ++i) {
-      Real value = 0;
-      file.ReadReal(value);
-      sum += value;
-    }
-    benchmark::DoNotOptimize(sum);
-  });
+  HyperFile file;
+  Open(file, scratch, kHyperFileRead);
+  Real sum = 0;
+  for (LLong i = 0; i < count; ++i) {
+    Real value = 0;
+    file.ReadReal(value);
+    sum += value;
+  }
+  benchmark::DoNotOptimize(sum);
+}
+
+void WriteArray(const ScratchFile& scratch, const std::vector<double>& values)
+{
+  HyperFile file;
+  Open(file, scratch, kHyperFileWrite);
+  file.WriteArray(values.data(), kArrayReal, sizeof(double), static_cast<LLong>(values.size()));
+  file.Close();
+}
+
+void ReadArray(const ScratchFile& scratch, std::size_t count)
+{
+  HyperFile file;
+  Open(file, scratch, kHyperFileRead);
+  const std::unique_ptr<double[]> values(new double[count]); // fresh memory, as the limit's
+  if (!file.ReadArray(values.get(), kArrayReal, sizeof(double), static_cast<LLong>(count)))
+    throw std::runtime_error("the array can't be read");
 }
 
 void WriteTaggedReals(benchmark::State& state)
 {
   const ScratchFile scratch;
-  RunBest(state, [&] { return WriteReals(state, scratch); });
+  RunFresh(state, [&] { return Measure([&] { WriteReals(scratch, state.range(0)); }); });
   SetRate(state, static_cast<double>(state.range(0)), ValueWriteLimit());
 }
 
 void ReadTaggedReals(benchmark::State& state)
 {
   const ScratchFile scratch;
-  WriteReals(state, scratch);
-  RunBest(state, [&] { return ReadReals(state, scratch); });
+  Prepare([&] { WriteReals(scratch, state.range(0)); });
+  RunFresh(state, [&] { return Measure([&] { ReadReals(scratch, state.range(0)); }); });
   SetRate(state, static_cast<double>(state.range(0)), ValueReadLimit());
-}
-
-Seconds WriteArray(benchmark::State& state, const ScratchFile& scratch, const std::vector<double>& values)
-{
-  return TimeOf([&] {
-    HyperFile file;
-    if (!Open(state, file, scratch, kHyperFileWrite))
-      return;
-    file.WriteArray(values.data(), kArrayReal, sizeof(double), static_cast<LLong>(values.size()));
-    file.Close();
-  });
 }
 
 void WriteDoubleArray(benchmark::State& state)
 {
   const ScratchFile scratch;
-  const std::vector<double> values(static_cast<std::size_t>(state.range(0)), 1.0 / 3);
-  RunBest(state, [&] { return WriteArray(state, scratch, values); });
+  RunTogether(state, [&] {
+    const std::vector<double> values(static_cast<std::size_t>(state.range(0)), 1.0 / 3);
+    return BestOfThree([&] { return Measure([&] { WriteArray(scratch, values); }); });
+  });
   SetRate(state, static_cast<double>(state.range(0)), DoubleWriteLimit());
 }
 
@@ -87,17 +88,8 @@ void ReadDoubleArray(benchmark::State& state)
 {
   const ScratchFile scratch;
   const auto count = static_cast<std::size_t>(state.range(0));
-  WriteArray(state, scratch, std::vector<double>(count, 1.0 / 3));
-  RunBest(state, [&] {
-    return TimeOf([&] {
-      HyperFile file;
-      if (!Open(state, file, scratch, kHyperFileRead))
-        return;
-      const std::unique_ptr<double[]> values(new double[count]); // fresh memory, as the limit's
-      if (!file.ReadArray(values.get(), kArrayReal, sizeof(double), static_cast<LLong>(count)))
-        state.SkipWithError("the array can't be read");
-    });
-  });
+  Prepare([&] { WriteArray(scratch, std::vector<double>(count, 1.0 / 3)); });
+  RunFresh(state, [&] { return Measure([&] { ReadArray(scratch, count); }); });
   SetRate(state, static_cast<double>(count), DoubleReadLimit());
 }
 
