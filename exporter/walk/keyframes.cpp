@@ -105,16 +105,16 @@ void SampledTrack::Add(const BaseTime& time, Real value)
 void SampledTrack::AddSampledKey(const BaseTime& time, Real value)
 {
   CCurve* curve = track_->GetCurve(1, 1);
-  CKey* key = curve ? curve->AddKey(time) : nullptr;
-  if (!key)
+  if (!curve)
     return;
-  constexpr Long kSet = 1;
-  key->ChangeNBit(kKeyBitAutomatic, kSet);
-  key->ChangeNBit(kKeyBitClamp, kSet);
-  if (content_ == Content::kData)
-    key->SetGeData(curve, static_cast<Long>(value));
-  else
-    key->SetValue(curve, value);
+  KeyValues key;
+  key.time = time;
+  key.switches = kKeyMaskAutomatic | kKeyMaskClamp;
+  if (content_ == Content::kValue)
+    key.value = value;
+  Long place = 0;
+  if (curve->SetKeyValues(key, &place) && content_ == Content::kData)
+    curve->GetKey(place)->SetGeData(curve, static_cast<Long>(value));
 }
 
 bool SampledTrack::IsConstant()
@@ -122,9 +122,13 @@ bool SampledTrack::IsConstant()
   CCurve* curve = track_->GetCurve(1, 1);
   if (!curve || curve->GetKeyCount() != 2)
     return !curve || curve->GetKeyCount() < 2;
-  const CKey& first = *curve->GetKey(0);
-  const CKey& last = *curve->GetKey(1);
-  return comparesData_ ? first.GetGeData().IsEqual(last.GetGeData()) : first.GetValue() == last.GetValue();
+  if (comparesData_)
+    return curve->GetKey(0)->GetGeData().IsEqual(curve->GetKey(1)->GetGeData());
+  KeyValues first;
+  KeyValues last;
+  curve->GetKeyValues(0, first);
+  curve->GetKeyValues(1, last);
+  return first.value == last.value;
 }
 
 void SampledTrack::Finish()

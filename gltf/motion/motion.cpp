@@ -53,8 +53,11 @@ Motion::Motion(const BaseObject& object, TrackSet& tracks)
     for (const Input& input : vector) {
       if (!input.curve)
         continue;
-      first_ = std::min(first_, input.curve->GetKey(0)->GetTime().Get());
-      last_ = std::max(last_, input.curve->GetKey(input.curve->GetKeyCount() - 1)->GetTime().Get());
+      KeyValues key;
+      input.curve->GetKeyValues(0, key);
+      first_ = std::min(first_, key.time.Get());
+      input.curve->GetKeyValues(input.curve->GetKeyCount() - 1, key);
+      last_ = std::max(last_, key.time.Get());
     }
   }
 }

@@ -54,14 +54,22 @@ InputReader::InputReader(const Input& input) : input_(input)
   times_.reserve(static_cast<std::size_t>(count));
   keys_.reserve(static_cast<std::size_t>(count));
   for (Long i = 0; i < count; ++i) {
-    const CKey* key = input.curve->GetKey(i);
-    const Real time = key->GetTime().Get();
+    KeyValues key;
+    input.curve->GetKeyValues(i, key);
+    const Real time = key.time.Get();
     const bool rises = times_.empty() || time > times_.back();
     if (!rises || !(std::fabs(time) <= kTimeLimit)) // only a damaged file has such
       continue;
     times_.push_back(time);
-    keys_.push_back(key);
+    keys_.push_back(i);
   }
+}
+
+KeyValues InputReader::KeyAt(std::size_t key) const
+{
+  KeyValues values;
+  input_.curve->GetKeyValues(keys_[key], values);
+  return values;
 }
 
 Real InputReader::At(Real time)
@@ -71,10 +79,9 @@ Real InputReader::At(Real time)
   while (next_ < times_.size() && times_[next_] <= time)
     ++next_;
   if (next_ == 0)
-    return keys_[0]->GetValue();
-  const CKey& before = *keys_[next_ - 1];
+    return KeyAt(0).value;
   if (next_ == times_.size() || times_[next_ - 1] == time)
-    return before.GetValue();
+    return KeyAt(next_ - 1).value;
   return input_.curve->GetValue(time);
 }
 
@@ -85,7 +92,7 @@ Piece InputReader::PieceOf(std::size_t key) const
 {
   if (key + 1 >= keys_.size() || IsLevel(key))
     return Piece::kFlat;
-  switch (keys_[key]->GetInterpolation()) {
+  switch (KeyAt(key).interpolation) {
   case kInterpolationSpline:
     return Piece::kSpline;
   case kInterpolationLinear:
@@ -97,19 +104,19 @@ Piece InputReader::PieceOf(std::size_t key) const
 
 bool InputReader::IsLevel(std::size_t key) const
 {
-  if (keys_[key]->GetValue() != keys_[key + 1]->GetValue())
+  const KeyValues here = KeyAt(key);
+  if (here.value != KeyAt(key + 1).value)
     return false;
-  if (keys_[key]->GetInterpolation() != kInterpolationSpline)
+  if (here.interpolation != kInterpolationSpline)
     return true;
-  Long place = 0;
-  input_.curve->FindKey(keys_[key]->GetTime(), &place);
+  const Long place = keys_[key];
   return input_.curve->GetTangents(place).rightValue == 0.0 && input_.curve->GetTangents(place + 1).leftValue == 0.0;
 }
 
 bool InputReader::HasSteps() const
 {
   for (std::size_t i = 0; i + 1 < keys_.size(); ++i) {
-    const Long type = keys_[i]->GetInterpolation();
+    const Long type = KeyAt(i).interpolation;
     if (type != kInterpolationSpline && type != kInterpolationLinear)
       return true;
   }

@@ -77,11 +77,12 @@ class InputReader
  private:
   Piece PieceOf(std::size_t key) const;
   bool IsLevel(std::size_t key) const;
+  _torvane_::KeyValues KeyAt(std::size_t key) const;
 
   Input input_;
   std::vector<Real> times_;
-  std::vector<const _torvane_::CKey*> keys_;
-  std::size_t next_ = 0; // the first key behind the time of the last call
+  std::vector<_torvane_::Long> keys_; // their places in the curve
+  std::size_t next_ = 0;              // the first key behind the time of the last call
 };
 
 } // namespace gltf

@@ -121,8 +121,9 @@ Real TrackSet::Earliest() const
 {
   Real earliest = 0.0;
   for (const Track& track : tracks_) {
-    if (HasCounterpart(track.id))
-      earliest = std::min(earliest, track.curve->GetKey(0)->GetTime().Get());
+    KeyValues first;
+    if (HasCounterpart(track.id) && track.curve->GetKeyValues(0, first))
+      earliest = std::min(earliest, first.time.Get());
   }
   return std::max(earliest, -kTimeLimit);
 }

@@ -1,23 +1,12 @@
 #include "torvane/animation/ccurve.h"
 
 #include "k2v_file/stream/chunk_visitor.h"
+#include "q7r_ccurve/key_times.h"
 #include "q7r_file/nodes/node_tools.h"
 #include "torvane/animation/animation_ids.h"
 
 namespace _torvane_
 {
-
-namespace
-{
-
-constexpr Real kKeyTimeLimit = 10000.0; // seconds, either way
-
-Bool IsKeyTime(const BaseTime& time)
-{
-  return time.Compare(BaseTime::Raw(-kKeyTimeLimit, 1.0)) >= 0 && time.Compare(BaseTime::Raw(kKeyTimeLimit, 1.0)) <= 0;
-}
-
-} // namespace
 
 void CCurve::WriteChunks(HyperFile& file)
 {
@@ -51,7 +40,7 @@ Bool CCurve::CopyTo(PrivateChunk& destination, ULong flags, TransArray* translat
 }
 
 // Keys beyond the range of times stay in the list, but not in the index.
-Bool CCurve::RebuildIndex()
+Bool CCurve::RebuildIndex() const
 {
   keys_.Reset();
   for (auto* key = NodeCast<CKey>(keyRoot_.GetFirst()); key; key = key->GetNext()) {
@@ -59,6 +48,91 @@ Bool CCurve::RebuildIndex()
       return false;
   }
   return true;
+}
+
+// Makes the keys nodes. False, with nothing changed, when memory is short.
+Bool CCurve::NeedNodes() const
+{
+  return !HasRows() || (keys_.Reserve(keyRoot_.GetRowCount()) && keyRoot_.MakeNodes() && RebuildIndex());
+}
+
+const BaseTime& CCurve::TimeOf(Long index) const
+{
+  return HasRows() ? keyRoot_.GetRows()[index].time : NodeAt(index)->GetTime();
+}
+
+Real CCurve::ValueOf(Long index) const
+{
+  return HasRows() ? keyRoot_.GetRows()[index].value : NodeAt(index)->GetValue();
+}
+
+Bool CCurve::GetKeyValues(Long index, KeyValues& values) const
+{
+  if (index < 0 || index >= GetKeyCount())
+    return false;
+  if (HasRows()) {
+    const KeyRow& row = keyRoot_.GetRows()[index];
+    const KeyRowTangents tangents = keyRoot_.GetRows().GetTangents(index);
+    values = {row.time,           tangents.leftTime,   tangents.rightTime, row.value,
+              tangents.leftValue, tangents.rightValue, row.interpolation,  row.nbits[1]};
+  } else {
+    const CKey& key = *NodeAt(index);
+    values = {key.GetTime(),      key.GetLeftTime(),   key.GetRightTime(),     key.GetValue(),
+              key.GetLeftValue(), key.GetRightValue(), key.GetInterpolation(), key.GetNBit(-2)};
+  }
+  return true;
+}
+
+Bool CCurve::SetKeyValues(const KeyValues& values, Long* index)
+{
+  if (index)
+    *index = -1;
+  if (!IsKeyTime(values.time))
+    return false;
+  const Long place = PlaceOf(values.time);
+  const Bool isNew = place == GetKeyCount() || !(TimeOf(place) == values.time);
+  if (!(keyRoot_.IsEmpty() ? SetRowValues(place, values, isNew) : SetNodeValues(place, values, isNew)))
+    return false;
+  if (index)
+    *index = place;
+  return true;
+}
+
+Bool CCurve::SetRowValues(Long place, const KeyValues& values, Bool isNew)
+{
+  KeyRows& rows = keyRoot_.GetRows();
+  KeyRow row;
+  if (!isNew)
+    row = rows[place];
+  row.time = values.time;
+  row.value = values.value;
+  row.interpolation = values.interpolation;
+  row.nbits[1] = values.switches;
+  const KeyRowTangents tangents = {values.leftTime, values.rightTime, values.leftValue, values.rightValue};
+  if (isNew)
+    return rows.Insert(place, row, tangents);
+  if (!rows.SetTangents(place, tangents))
+    return false;
+  rows[place] = row;
+  return true;
+}
+
+Bool CCurve::SetNodeValues(Long place, const KeyValues& values, Bool isNew)
+{
+  CKey* key = isNew ? NewObj<CKey>() : NodeAt(place);
+  if (!key)
+    return false;
+  key->Reset();
+  key->value_ = values.value;
+  key->interpolation_ = values.interpolation;
+  key->nbits_[1] = values.switches;
+  key->SetLeft(values.leftTime, values.leftValue);
+  key->SetRight(values.rightTime, values.rightValue);
+  key->time_ = values.time;
+  if (!isNew || InsertKey(key) == key)
+    return true;
+  DeleteObj(key);
+  return false;
 }
 
 CKey* CCurve::AddKey(const BaseTime& time, Long* index)
@@ -79,6 +153,10 @@ CKey* CCurve::AddKey(const BaseTime& time, Long* index)
 
 CKey* CCurve::InsertKey(CKey* key, Long* index)
 {
+  if (index)
+    *index = -1;
+  if (!NeedNodes())
+    return nullptr;
   Long place = PlaceOf(key->GetTime());
   CKey* present = GetKey(place);
   if (present && present->GetTime() == key->GetTime()) {
@@ -87,11 +165,8 @@ CKey* CCurve::InsertKey(CKey* key, Long* index)
       *index = place;
     return present;
   }
-  if (!keys_.Insert(place, key)) {
-    if (index)
-      *index = -1;
+  if (!keys_.Insert(place, key))
     return nullptr;
-  }
   keyRoot_.InsertAfter(key, GetKey(place - 1));
   if (index)
     *index = place;
@@ -102,14 +177,14 @@ CKey* CCurve::InsertKey(CKey* key, Long* index)
 Long CCurve::PlaceOf(const BaseTime& time) const
 {
   Long low = 0;
-  Long high = keys_.GetCount();
-  if (high == 0 || GetKey(high - 1)->GetTime() < time)
+  Long high = GetKeyCount();
+  if (high == 0 || TimeOf(high - 1) < time)
     return high;
-  if (GetKey(0)->GetTime() >= time)
+  if (TimeOf(0) >= time)
     return 0;
   while (low < high) {
     Long middle = low + (high - low) / 2;
-    if (GetKey(middle)->GetTime() < time)
+    if (TimeOf(middle) < time)
       low = middle + 1;
     else
       high = middle;
@@ -134,15 +209,19 @@ CKey* CCurve::FindKey(const BaseTime& time, Long* index, Long mode) const
 
 CKey* CCurve::GetKey(Long index) const
 {
-  return index >= 0 && index < keys_.GetCount() ? static_cast<CKey*>(keys_[index]) : nullptr;
+  return index >= 0 && index < GetKeyCount() && NeedNodes() ? NodeAt(index) : nullptr;
 }
 
 Bool CCurve::DelKey(Long index)
 {
-  CKey* key = GetKey(index);
-  if (!key)
+  if (index < 0 || index >= GetKeyCount())
     return false;
-  DeleteObj(key); // leaves the index
+  if (HasRows()) {
+    keyRoot_.GetRows().Remove(index);
+  } else {
+    CKey* key = NodeAt(index);
+    DeleteObj(key); // leaves the index
+  }
   return true;
 }
 

@@ -1,6 +1,7 @@
 #include "torvane/animation/ckey.h"
 
 #include "k2v_file/stream/chunk_visitor.h"
+#include "q7r_ccurve/key_times.h"
 #include "q7r_file/nodes/node_tools.h"
 #include "torvane/animation/animation_ids.h"
 #include "torvane/animation/ccurve.h"
@@ -221,6 +222,36 @@ Bool CKey::IsEqual(const CKey& other) const
   return time_ == other.time_ && value_ == other.value_ && leftValue_ == other.leftValue_ &&
          rightValue_ == other.rightValue_ && leftTime_ == other.leftTime_ && rightTime_ == other.rightTime_ &&
          interpolation_ == other.interpolation_ && keyData_.IsEqual(other.keyData_);
+}
+
+Bool CKey::ToRow(KeyRow& row, KeyRowTangents& tangents) const
+{
+  if (!IsBare() || keyData_.GetRawType() != kDataNil || nbits_[3] != 0 || !IsKeyTime(time_))
+    return false;
+  row.time = time_;
+  row.value = value_;
+  row.marker = marker_;
+  row.markerDrawn = markerDrawn_;
+  row.info = info_;
+  for (Long i = 0; i < 3; ++i)
+    row.nbits[i] = nbits_[i];
+  row.interpolation = interpolation_;
+  tangents = {leftTime_, rightTime_, leftValue_, rightValue_};
+  return true;
+}
+
+void CKey::FromRow(const KeyRow& row, const KeyRowTangents& tangents)
+{
+  time_ = row.time;
+  value_ = row.value;
+  marker_ = row.marker;
+  markerDrawn_ = row.markerDrawn;
+  info_ = row.info;
+  for (Long i = 0; i < 3; ++i)
+    nbits_[i] = row.nbits[i];
+  interpolation_ = row.interpolation;
+  SetLeft(tangents.leftTime, tangents.leftValue);
+  SetRight(tangents.rightTime, tangents.rightValue);
 }
 
 } // namespace _torvane_

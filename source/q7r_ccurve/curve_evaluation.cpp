@@ -46,14 +46,14 @@ Real SolveBezier(Real b, Real c, Real x)
 }
 
 // A cubic Bezier whose inner control points are the key plus its right tangent and the next key plus its left one.
-Real SplineValue(const CKey& a, const CKey& b, KeyTangents right, KeyTangents left, Real u)
+Real SplineValue(const KeyValues& a, const KeyValues& b, KeyTangents right, KeyTangents left, Real u)
 {
-  Real span = b.GetTime().Get() - a.GetTime().Get();
+  Real span = b.time.Get() - a.time.Get();
   Real leftTime = -left.leftTime;
   Shorten(right.rightTime, right.rightValue, span);
   Shorten(leftTime, left.leftValue, span);
   Real s = SolveBezier(right.rightTime / span, 1.0 - leftTime / span, u);
-  return Bezier(a.GetValue(), a.GetValue() + right.rightValue, b.GetValue() + left.leftValue, b.GetValue(), s);
+  return Bezier(a.value, a.value + right.rightValue, b.value + left.leftValue, b.value, s);
 }
 
 // Automatic tangents are kept in steps of a thousandth of a second.
@@ -65,24 +65,21 @@ struct Step
   Real value;
 };
 
-Step StepBetween(const CKey& from, const CKey& to)
-{
-  return {to.GetTime().Get() - from.GetTime().Get(), to.GetValue() - from.GetValue()};
-}
-
 } // namespace
 
 KeyTangents CCurve::AutomaticTangents(Long index) const
 {
-  const CKey* key = GetKey(index);
-  const CKey* before = GetKey(index - 1);
-  const CKey* behind = GetKey(index + 1);
-  if (!key || (!before && !behind))
+  const Bool before = index > 0;
+  const Bool behind = index + 1 < GetKeyCount();
+  if (!before && !behind)
     return {};
-  Step step = behind ? StepBetween(*key, *behind) : StepBetween(*before, *key);
+  auto stepTo = [this](Long to) {
+    return Step{TimeOf(to).Get() - TimeOf(to - 1).Get(), ValueOf(to) - ValueOf(to - 1)};
+  };
+  Step step = stepTo(behind ? index + 1 : index);
   if (before && behind) {
-    Step back = StepBetween(*before, *key);
-    Real span = behind->GetTime().Get() - before->GetTime().Get(); // not the sum of the two, which is rounded twice
+    Step back = stepTo(index);
+    Real span = TimeOf(index + 1).Get() - TimeOf(index - 1).Get(); // not the sum of the two, which is rounded twice
     Real weight = span == 0.0 ? 0.0 : back.time / span;
     step.time = step.time * weight + back.time * (1.0 - weight);
     step.value = step.value * weight + back.value * (1.0 - weight);
@@ -94,24 +91,21 @@ KeyTangents CCurve::AutomaticTangents(Long index) const
 // A key at an end, at a turning point, or beside an equal value.
 Bool CCurve::IsClamped(Long index) const
 {
-  const CKey* before = GetKey(index - 1);
-  const CKey* behind = GetKey(index + 1);
-  if (!before || !behind)
+  if (index == 0 || index + 1 == GetKeyCount())
     return true;
-  Real down = before->GetValue() - GetKey(index)->GetValue();
-  Real up = behind->GetValue() - GetKey(index)->GetValue();
+  Real down = ValueOf(index - 1) - ValueOf(index);
+  Real up = ValueOf(index + 1) - ValueOf(index);
   return (down > 0.0 && up > 0.0) || (down < 0.0 && up < 0.0) || std::fabs(down) < kClampTolerance ||
          std::fabs(up) < kClampTolerance;
 }
 
 KeyTangents CCurve::GetTangents(Long index) const
 {
-  const CKey* key = GetKey(index);
-  if (!key)
+  KeyValues key;
+  if (!GetKeyValues(index, key))
     return {};
-  KeyTangents tangents = {key->GetLeftTime().Get(), key->GetLeftValue(), key->GetRightTime().Get(),
-                          key->GetRightValue()};
-  ULong mask = key->GetNBit(-2);
+  KeyTangents tangents = {key.leftTime.Get(), key.leftValue, key.rightTime.Get(), key.rightValue};
+  ULong mask = key.switches;
   Bool flat = false;
   if (mask & kKeyMaskAutomatic) {
     tangents = AutomaticTangents(index);
@@ -137,28 +131,29 @@ Real CCurve::GetValue(Real time) const
   Long high = GetKeyCount();
   while (low < high) {
     Long middle = low + (high - low) / 2;
-    if (GetKey(middle)->GetTime().Get() <= time)
+    if (TimeOf(middle).Get() <= time)
       low = middle + 1;
     else
       high = middle;
   }
   Long index = low - 1;
   if (index < 0)
-    return GetKey(0)->GetValue();
-  const CKey& a = *GetKey(index);
-  const CKey* b = GetKey(index + 1);
-  Real start = a.GetTime().Get();
-  if (!b || time <= start)
-    return a.GetValue();
-  Real span = b->GetTime().Get() - start;
+    return ValueOf(0);
+  KeyValues a;
+  KeyValues b;
+  GetKeyValues(index, a);
+  Real start = a.time.Get();
+  if (!GetKeyValues(index + 1, b) || time <= start)
+    return a.value;
+  Real span = b.time.Get() - start;
   Real u = (time - start) / span;
-  switch (a.GetInterpolation()) {
+  switch (a.interpolation) {
   case kInterpolationSpline:
-    return SplineValue(a, *b, GetTangents(index), GetTangents(index + 1), u);
+    return SplineValue(a, b, GetTangents(index), GetTangents(index + 1), u);
   case kInterpolationLinear:
-    return a.GetValue() + (b->GetValue() - a.GetValue()) * u;
+    return a.value + (b.value - a.value) * u;
   default:
-    return a.GetValue();
+    return a.value;
   }
 }
 

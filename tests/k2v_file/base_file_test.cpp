@@ -211,7 +211,7 @@ void ReadPiece(BaseFile& file, const Bytes& bytes, LLong& position, std::mt19937
 TEST_F(BaseFileTest, RandomPiecesAreThoseOfAPlainBuffer)
 {
   std::mt19937 random(20031);
-  for (std::size_t size : {0U, 1U, 100U, 16382U, 16383U, 16384U, 16385U, 100000U}) {
+  for (std::size_t size : {0U, 1U, 100U, 262142U, 262143U, 262144U, 262145U, 600000U}) {
     const Bytes bytes = RandomBytes(size, static_cast<unsigned>(size));
     for (const char* target : {"disk", "memory", "stream"}) {
       for (Long mode : {kFileRead, kFileReadWrite, kFileReadShared}) {
@@ -520,24 +520,24 @@ TEST_F(BaseFileTest, AMemoryTargetGrowsByDoubledBlocksAndLosesThemWithAnError)
 #ifndef _WIN32 // nobody else may write to an open file
 TEST_F(BaseFileTest, AFileThatChangesWhileItIsReadKeepsItsLength)
 {
-  const Bytes bytes = RandomBytes(40000, 5);
+  const Bytes bytes = RandomBytes(400000, 5);
   const Filename name = NameOf("disk", bytes);
-  Bytes got(40000);
+  Bytes got(400000);
   BaseFile file;
   UChar first = 0;
   ASSERT_TRUE(file.Open(name, kFileRead) && file.ReadUChar(first));
   ASSERT_EQ(truncate((folder / "file").c_str(), 100), 0);
-  EXPECT_TRUE(file.Seek(16000));
-  EXPECT_EQ(file.ReadBytes(got.data(), 384), 384) << "the buffer has it, the disk no longer";
-  EXPECT_TRUE(std::equal(got.begin(), got.begin() + 384, bytes.begin() + 16000));
-  EXPECT_EQ(file.GetRemaining(), 40000 - 16384);
+  EXPECT_TRUE(file.Seek(262000));
+  EXPECT_EQ(file.ReadBytes(got.data(), 144), 144) << "the buffer has it, the disk no longer";
+  EXPECT_TRUE(std::equal(got.begin(), got.begin() + 144, bytes.begin() + 262000));
+  EXPECT_EQ(file.GetRemaining(), 400000 - 262144);
   EXPECT_EQ(file.ReadBytes(got.data(), 10, true), 0);
-  EXPECT_EQ(file.ReadBytes(got.data(), 20000), 0);
+  EXPECT_EQ(file.ReadBytes(got.data(), 120000), 0);
   EXPECT_EQ(file.GetError(), FILEERROR_READ);
 
   ASSERT_TRUE(file.Open(name, kFileReadShared));
   WriteWholeFile(folder / "file", bytes);
-  EXPECT_EQ(file.ReadBytes(got.data(), 40000, true), 100);
+  EXPECT_EQ(file.ReadBytes(got.data(), 400000, true), 100);
   EXPECT_EQ(file.GetLength(), 100);
 }
 #endif

@@ -1,7 +1,7 @@
 // A curve: keys in ascending time, with their evaluation.
 #pragma once
 
-#include "torvane/animation/ckey.h"
+#include "torvane/animation/key_list.h"
 
 namespace _torvane_
 {
@@ -20,6 +20,9 @@ struct KeyTangents
   Real rightValue = 0.0;
 };
 
+// A curve holds its keys as rows of about 64 bytes until somebody asks for one as a CKey; then all of them become
+// nodes, of some hundred bytes each, and stay nodes. A pointer to a CKey is good until that key is deleted. Whoever has
+// many keys to make or to look at takes SetKeyValues and GetKeyValues, which need no nodes.
 class CCurve : public BaseList2D
 {
  public:
@@ -41,8 +44,13 @@ class CCurve : public BaseList2D
   CKey* InsertKey(CKey* key, Long* index = nullptr);
   // Binary search. `index` gets the key's place, or -1.
   CKey* FindKey(const BaseTime& time, Long* index = nullptr, Long mode = kFindExact) const;
-  Long GetKeyCount() const { return keys_.GetCount(); }
-  CKey* GetKey(Long index) const; // null out of range
+  Long GetKeyCount() const { return keyRoot_.GetRowCount() + keys_.GetCount(); }
+  CKey* GetKey(Long index) const; // null out of range and when memory is short
+  // A key's values; false out of range.
+  Bool GetKeyValues(Long index, KeyValues& values) const;
+  // Puts a key with these values at its time, in place of one that stands there. False, with nothing changed, for a
+  // time beyond 10000 seconds either way and when memory is short. `index`, if given, is the key's place, or -1.
+  Bool SetKeyValues(const KeyValues& values, Long* index = nullptr);
   // Removes and frees a key; false out of range.
   Bool DelKey(Long index);
 
@@ -58,17 +66,25 @@ class CCurve : public BaseList2D
  private:
   friend class CKey; // tells when it goes or changes its time
 
-  Bool RebuildIndex();
+  Bool HasRows() const { return keyRoot_.GetRowCount() > 0; }
+  Bool NeedNodes() const;
+  Bool RebuildIndex() const;
+  const BaseTime& TimeOf(Long index) const;
+  Real ValueOf(Long index) const;
+  CKey* NodeAt(Long index) const { return static_cast<CKey*>(keys_[index]); }
+  Bool SetNodeValues(Long place, const KeyValues& values, Bool isNew);
+  Bool SetRowValues(Long place, const KeyValues& values, Bool isNew);
   void ForgetKey(const CKey& key);
   Bool MoveKey(CKey& key, const BaseTime& time);
   Long PlaceOf(const BaseTime& time) const;
   KeyTangents AutomaticTangents(Long index) const;
   Bool IsClamped(Long index) const;
 
-  // The keys in order, and the list that owns the same keys in the same order. Keys beyond the range of times that a
-  // file held are in the list alone.
-  GeToolDynArray keys_;
-  RootCKey keyRoot_;
+  // The nodes in order, none while the keys are rows, and the list that owns the same keys in the same order. Nodes
+  // beyond the range of times that a file held are in the list alone. Who asks for a node changes the form of what the
+  // curve holds, but not what it holds.
+  mutable GeToolDynArray keys_;
+  mutable KeyList keyRoot_;
 };
 
 } // namespace _torvane_

@@ -8,6 +8,8 @@ namespace _torvane_
 {
 
 class CCurve;
+struct KeyRow;
+struct KeyRowTangents;
 
 // How a curve runs from one key to the next.
 inline constexpr Long kInterpolationSpline = 1;
@@ -77,6 +79,12 @@ class CKey : public BaseList2D
   void Reset();
   // All fields and the data are equal.
   Bool IsEqual(const CKey& other) const;
+
+  // The key as a row of its curve; false for a key that has more than a row holds, or a time at which a curve takes no
+  // keys.
+  Bool ToRow(KeyRow& row, KeyRowTangents& tangents) const;
+  // Takes all that a row holds. For a key that stands in no curve.
+  void FromRow(const KeyRow& row, const KeyRowTangents& tangents);
 
  private:
   friend class CCurve; // sets the time of a key that it moves

@@ -211,6 +211,8 @@ class BaseFile : public GeMemory
   // error: the caller then takes ReadBytes or WriteBytes. What was used is told by the Commit operation.
   const UChar* ReadWindow(LLong count) const { return readLeft_ >= count ? cursor_ : nullptr; }
   UChar* WriteWindow(LLong count) { return writeLeft_ >= count ? cursor_ : nullptr; }
+  // The most that ReadWindow gives now.
+  LLong GetReadLeft() const { return readLeft_; }
   void CommitRead(LLong count)
   {
     cursor_ += count;

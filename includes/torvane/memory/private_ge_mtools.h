@@ -225,6 +225,12 @@ class GeTempDynArray : public GeMemory
   {
     return capacity <= capacity_ || detail::SetArrayCapacity(block_, capacity_, count_, capacity, kElementSize);
   }
+  // Gives back most of the room that no element takes. What there is stays when memory is short.
+  void Trim() noexcept
+  {
+    if (count_ > 0 && capacity_ - count_ > count_ / 16)
+      static_cast<void>(detail::SetArrayCapacity(block_, capacity_, count_, count_, kElementSize));
+  }
   // Cuts the array, or lengthens it with elements of zero bytes.
   Bool SetCount(Long count) noexcept;
   // Empties the array and frees the block.

@@ -136,6 +136,9 @@ class BaseList2D : public GeListNode
  protected:
   void SetType(Long type) { type_ = type; }
   static void SetDocumentOfMembers(RootList2D* root, BaseDocument* document); // null: does nothing
+  // True for a node with neither a name, parameters, a layer, shaders, tracks, identifiers besides the marker, chunks
+  // of others, nor links that lead to it.
+  Bool IsBare() const;
 
   String name_;
   GeAliasLink link_;

@@ -37,7 +37,7 @@ class RootList2D : public PrivateChunk
   BaseList2D* GetLast() const;
   Bool IsEmpty() const { return GetFirst() == nullptr; }
   // True if there is anything to write: members, or chunks that were kept.
-  Bool HasContent() const { return !IsEmpty() || !keptChunks_.IsEmpty(); }
+  virtual Bool HasContent() const { return !IsEmpty() || !keptChunks_.IsEmpty(); }
 
   // The class of the members; a node of another one is refused.
   virtual const NodeKind& GetMemberKind() const;
@@ -66,6 +66,7 @@ class RootList2D : public PrivateChunk
  protected:
   // Called when a node has become a member.
   virtual void OnEnter(BaseList2D&) {}
+  virtual void WriteMembers(HyperFile& file);
   // The label of a member's chunk.
   virtual Long GetMemberLabel(BaseList2D& member) const;
   // False: an empty list writes nothing at all, not even its outer chunk.

@@ -19,6 +19,7 @@ class BaseDocument;
 class Bitmap;
 class ContainerIndex;
 class GeData;
+class PreparedRecord;
 class TransArray;
 struct ValueForm;
 
@@ -269,6 +270,19 @@ class HyperFile : public GeMemory
   // Writes such a block back; `withoutEnd` as in reading. A null block writes an end tag unless `withoutEnd` is set.
   Bool WriteRawChunk(const void* data, LLong size, Bool withoutEnd);
 
+  // The quick way for records that are alike (prepared_record.h). BeginRecord gives a place with a copy of the record,
+  // whose fields are then to be set, and EndRecord writes it; `spare` has room for the record and may be the place.
+  // NextRecord gives what comes next if it is a record, of which `begun` bytes were read before, and PassRecord moves
+  // over it. Null: the general way is to be taken.
+  UChar* BeginRecord(const PreparedRecord& record, UChar* spare);
+  Bool EndRecord(const PreparedRecord& record, const UChar* place, const UChar* spare);
+  const UChar* NextRecord(const PreparedRecord& record, LLong begun) const;
+  void PassRecord(const PreparedRecord& record, LLong begun);
+  // How many such records may stand in a row, as far as the buffer goes; the first of them has begun so far.
+  LLong CountRecords(const PreparedRecord& record, LLong begun) const;
+  // Values since progress was last told.
+  LLong GetTicks() const { return ticks_; }
+
   // Opens and leaves one level of nested reading (chunk loops, containers). Entering deeper than kMaxLoopDepth sets
   // FILEERROR_CHUNK_STRUCTURE and gives false; every successful Enter needs its Leave.
   static constexpr Long kMaxLoopDepth = 4000;
@@ -348,6 +362,7 @@ class HyperFile : public GeMemory
   LLong LimitToTick(LLong limit) const;
   LLong GetTicksToDue() const;
   LLong GetTickThreshold() const { return mode_ == kHyperFileWrite ? kWriteTicks : readTicks_; }
+  Bool TakesRecords(LLong ticks) const;
   Bool HasHook() const { return mode_ == kHyperFileWrite ? writeHook_ != nullptr : readHook_ != nullptr; }
   Bool WriteHeader(ULong ident);
   Bool ReadHeader(ULong ident);

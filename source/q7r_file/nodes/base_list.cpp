@@ -231,6 +231,17 @@ void BaseList2D::RemoveFromList()
   SetDocument(nullptr);
 }
 
+Bool BaseList2D::IsBare() const
+{
+  BaseContainer::Iterator first;
+  Long id = 0;
+  const GeData* value = nullptr;
+  const Bool hasParameters = data_.GetId() != -1 || data_.BrowseFirst(first, id, value) || dynamicParameters_;
+  const Bool hasLinks = link_.GetLinkGoal() || link_.GetName() || goal_.trunk;
+  return name_.GetLength() == 0 && !hasParameters && !hasLinks && !shaders_ && !tracks_ && !uniqueIds_ &&
+         keptChunks_.IsEmpty();
+}
+
 BaseList2D* BaseList2D::GetLayer() const { return NodeCast<LayerObject>(link_.GetLink()); }
 
 void BaseList2D::SetDocument(BaseDocument* document)

@@ -113,10 +113,15 @@ void RootList2D::WriteChunks(HyperFile& file)
   if (!HasContent() && !IsWrittenWhenEmpty())
     return;
   file.WriteChunkStart(kChunkList, 0);
-  for (BaseList2D* member = GetFirst(); member; member = member->GetNext())
-    member->WriteAsChunk(file, GetMemberLabel(*member));
+  WriteMembers(file);
   keptChunks_.Write(file);
   file.WriteChunkEnd();
+}
+
+void RootList2D::WriteMembers(HyperFile& file)
+{
+  for (BaseList2D* member = GetFirst(); member; member = member->GetNext())
+    member->WriteAsChunk(file, GetMemberLabel(*member));
 }
 
 Bool RootList2D::EntersChunk(Long id)

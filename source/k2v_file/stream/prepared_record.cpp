@@ -1,0 +1,157 @@
+#include "torvane/stream/prepared_record.h"
+
+#include <atomic>
+#include <cstring>
+
+#include "torvane/nodes/private_chunk.h"
+#include "torvane/stream/hyper_file.h"
+
+namespace _torvane_
+{
+
+namespace
+{
+
+std::atomic<Bool> gEnabled{true};
+
+// A file's ticks since the last call.
+class TickCount
+{
+ public:
+  explicit TickCount(const HyperFile& file) : file_(file), start_(file.GetTicks()) {}
+  LLong Get() const { return file_.GetTicks() - start_; }
+
+ private:
+  const HyperFile& file_;
+  LLong start_;
+};
+
+} // namespace
+
+void PreparedRecord::SetEnabled(Bool enabled) { gEnabled.store(enabled, std::memory_order_relaxed); }
+
+Bool PreparedRecord::IsEnabled() { return gEnabled.load(std::memory_order_relaxed); }
+
+Bool PreparedRecord::Learn(PrivateChunk& sample, PrivateChunk& copy, Long label)
+{
+  MemoryDescription description;
+  Filename target;
+  target.SetMemoryWrite(&description);
+  HyperFile writer;
+  if (!writer.Open(kSceneIdent, target, kHyperFileWrite))
+    return false;
+  const LLong header = writer.GetPosition();
+  const TickCount written(writer);
+  sample.WriteAsChunk(writer, label);
+  writeTicks_ = written.Get();
+  const void* data = nullptr;
+  LLong size = 0;
+  if (!writer.Close() || !target.GetMemoryContinuous(data, size) || size - header > kLargest)
+    return false;
+
+  Filename source;
+  source.SetMemoryRead(data, size);
+  HyperFile reader;
+  UChar tag = 0;
+  Long id = 0;
+  Long level = 0;
+  if (!reader.Open(kSceneIdent, source, kHyperFileRead))
+    return false;
+  const TickCount read(reader);
+  if (!reader.ReadValueHeader(tag) || !reader.ReadChunkStart(id, level) || !copy.ReadChunkLoop(reader, true))
+    return false;
+  readTicks_ = read.Get();
+
+  size_ = size - header;
+  std::memcpy(bytes_, static_cast<const UChar*>(data) + header, static_cast<std::size_t>(size_));
+  std::memset(fixed_, 255, static_cast<std::size_t>(size_));
+  return true;
+}
+
+LLong PreparedRecord::TakeField(const void* mark, LLong size)
+{
+  LLong place = -1;
+  for (LLong i = 0; i + size <= size_; ++i) {
+    if (std::memcmp(bytes_ + i, mark, static_cast<std::size_t>(size)) != 0)
+      continue;
+    if (place >= 0)
+      return -1;
+    place = i;
+  }
+  if (place >= 0)
+    std::memset(fixed_ + place, 0, static_cast<std::size_t>(size));
+  return place;
+}
+
+Bool PreparedRecord::Matches(const UChar* place, LLong begun) const
+{
+  UChar different = 0;
+  const UChar* bytes = bytes_ + begun;
+  const UChar* fixed = fixed_ + begun;
+  const LLong count = size_ - begun;
+  for (LLong i = 0; i < count; ++i)
+    different = static_cast<UChar>(different | ((place[i] ^ bytes[i]) & fixed[i]));
+  return different == 0;
+}
+
+LLong PreparedRecord::CountHeads(const UChar* place, LLong size) const
+{
+  LLong count = 0;
+  while (size >= size_ && std::memcmp(place, bytes_, kHeadSize) == 0) {
+    ++count;
+    place += size_;
+    size -= size_;
+  }
+  return count;
+}
+
+// ---------------------------------------------------------------------------------------------------------------
+
+// Near the bound of nesting the general way is taken, which tells where it is passed.
+Bool HyperFile::TakesRecords(LLong ticks) const
+{
+  constexpr Long kLevels = 8;
+  return error_ == FILEERROR_NONE && PreparedRecord::IsEnabled() && !singlePrecision_ &&
+         loopDepth_ + kLevels <= kMaxLoopDepth && (!HasHook() || ticks < GetTicksToDue());
+}
+
+UChar* HyperFile::BeginRecord(const PreparedRecord& record, UChar* spare)
+{
+  if (!TakesRecords(record.GetWriteTicks()))
+    return nullptr;
+  UChar* place = TakeRoom(spare, record.GetSize());
+  std::memcpy(place, record.GetBytes(), static_cast<std::size_t>(record.GetSize()));
+  return place;
+}
+
+Bool HyperFile::EndRecord(const PreparedRecord& record, const UChar* place, const UChar* spare)
+{
+  const LLong start = file_.GetPosition();
+  if (!FinishRoom(place, spare, record.GetSize()))
+    return FailFromFile(start);
+  TickMany(record.GetWriteTicks());
+  return true;
+}
+
+const UChar* HyperFile::NextRecord(const PreparedRecord& record, LLong begun) const
+{
+  if (version_ < kVersionCurrent || !TakesRecords(record.GetReadTicks()))
+    return nullptr;
+  const UChar* place = file_.ReadWindow(record.GetSize() - begun);
+  return place && record.Matches(place, begun) ? place : nullptr;
+}
+
+void HyperFile::PassRecord(const PreparedRecord& record, LLong begun)
+{
+  file_.CommitRead(record.GetSize() - begun);
+  TickMany(record.GetReadTicks() - (begun > 0 ? 1 : 0)); // the chunk start's
+}
+
+LLong HyperFile::CountRecords(const PreparedRecord& record, LLong begun) const
+{
+  const LLong held = file_.GetReadLeft();
+  const LLong first = record.GetSize() - begun;
+  return held < first ? 0 : 1 + record.CountHeads(file_.ReadWindow(held) + first, held - first);
+}
+
+} // namespace _torvane_

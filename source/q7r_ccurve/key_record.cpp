@@ -1,0 +1,122 @@
+#include "q7r_ccurve/key_record.h"
+
+#include <atomic>
+#include <bit>
+#include <cstring>
+
+#include "torvane/bytes/base_file.h"
+#include "torvane/memory/spin_lock.h"
+
+namespace _torvane_
+{
+
+namespace
+{
+
+// Numbers like no other in a record, with the number of the field in the low byte.
+constexpr ULLong kRealMark = 0x4012345678ABCD00;
+constexpr ULong kLongMark = 0x5AC3E100;
+constexpr UChar kMarkerMark = 0xA0;
+
+} // namespace
+
+void KeyRecord::Put(UChar* place, const KeyRow& row, const KeyRowTangents& tangents) const
+{
+  const Real reals[kReals] = {row.time.GetNumerator(),
+                              row.time.GetDenominator(),
+                              tangents.leftTime.GetNumerator(),
+                              tangents.leftTime.GetDenominator(),
+                              tangents.rightTime.GetNumerator(),
+                              tangents.rightTime.GetDenominator(),
+                              row.value,
+                              tangents.leftValue,
+                              tangents.rightValue};
+  const ULong longs[kLongs] = {static_cast<ULong>(row.interpolation), row.info, row.nbits[0], row.nbits[1],
+                               row.nbits[2]};
+  for (Long i = 0; i < kReals; ++i)
+    bytes::PutBig(place + reals_[i], bytes::CleanBits(reals[i]));
+  for (Long i = 0; i < kLongs; ++i)
+    bytes::PutBig(place + longs_[i], longs[i]);
+  std::memcpy(place + marker_, row.marker.bytes, sizeof row.marker.bytes);
+}
+
+void KeyRecord::Take(const UChar* place, LLong begun, KeyRow& row, KeyRowTangents& tangents) const
+{
+  Real reals[kReals];
+  ULong longs[kLongs];
+  for (Long i = 0; i < kReals; ++i)
+    reals[i] = bytes::CleanReal(bytes::GetBig<ULLong>(place + (reals_[i] - begun)));
+  for (Long i = 0; i < kLongs; ++i)
+    longs[i] = bytes::GetBig<ULong>(place + (longs_[i] - begun));
+  row.time = BaseTime::Raw(reals[0], reals[1]);
+  tangents.leftTime = BaseTime::Raw(reals[2], reals[3]);
+  tangents.rightTime = BaseTime::Raw(reals[4], reals[5]);
+  row.value = reals[6];
+  tangents.leftValue = reals[7];
+  tangents.rightValue = reals[8];
+  row.interpolation = static_cast<Long>(longs[0]);
+  row.info = longs[1];
+  for (Long i = 0; i < 3; ++i)
+    row.nbits[i] = longs[2 + i];
+  std::memcpy(row.marker.bytes, place + (marker_ - begun), sizeof row.marker.bytes);
+  row.markerDrawn = true;
+}
+
+// A key with a mark in each field, written in the general way.
+Bool KeyRecord::Learn()
+{
+  UChar bytes[PreparedRecord::kLargest] = {};
+  NodeMarker marker;
+  for (Long i = 0; i < kReals; ++i) {
+    reals_[i] = i * static_cast<LLong>(sizeof(ULLong));
+    bytes::PutBig(bytes + reals_[i], kRealMark + static_cast<ULLong>(i));
+  }
+  for (Long i = 0; i < kLongs; ++i) {
+    longs_[i] = (kReals + i) * static_cast<LLong>(sizeof(ULLong));
+    bytes::PutBig(bytes + longs_[i], kLongMark + static_cast<ULong>(i));
+  }
+  marker_ = (kReals + kLongs) * static_cast<LLong>(sizeof(ULLong));
+  for (UChar& byte : marker.bytes)
+    byte = static_cast<UChar>(kMarkerMark + (&byte - marker.bytes));
+  std::memcpy(bytes + marker_, marker.bytes, sizeof marker.bytes);
+
+  KeyRow row;
+  KeyRowTangents tangents;
+  Take(bytes, 0, row, tangents);
+  CKey sample;
+  CKey copy;
+  sample.FromRow(row, tangents);
+  if (!record_.Learn(sample, copy, kLabelKey))
+    return false;
+  Bool found = true;
+  auto find = [&](LLong& place, LLong size) {
+    place = record_.TakeField(bytes + place, size);
+    found = found && place >= 0;
+  };
+  for (LLong& place : reals_)
+    find(place, sizeof(ULLong));
+  for (LLong& place : longs_)
+    find(place, sizeof(ULong));
+  find(marker_, sizeof marker.bytes);
+  return found;
+}
+
+const KeyRecord* KeyRecord::Get()
+{
+  static KeyRecord record;
+  static std::atomic<Bool> ready{false};
+  static ReadWriteSpinLock lock;
+  if (ready.load(std::memory_order_acquire))
+    return &record;
+  const WriteGuard guard(lock);
+  if (!ready.load(std::memory_order_relaxed)) {
+    KeyRecord made;
+    if (!made.Learn())
+      return nullptr;
+    record = made;
+    ready.store(true, std::memory_order_release);
+  }
+  return &record;
+}
+
+} // namespace _torvane_

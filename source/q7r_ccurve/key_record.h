@@ -1,0 +1,33 @@
+// The record of a plain key in a file: prepared once, see prepared_record.h.
+#pragma once
+
+#include "torvane/animation/key_list.h"
+#include "torvane/stream/prepared_record.h"
+
+namespace _torvane_
+{
+
+class KeyRecord
+{
+ public:
+  // The one of this process, made when it is first asked for; null when memory is short. Any thread may ask.
+  static const KeyRecord* Get();
+
+  const PreparedRecord& GetRecord() const { return record_; }
+  // The fields into the bytes of a record, and out of those behind its first `begun` ones, which hold none.
+  void Put(UChar* place, const KeyRow& row, const KeyRowTangents& tangents) const;
+  void Take(const UChar* place, LLong begun, KeyRow& row, KeyRowTangents& tangents) const;
+
+ private:
+  static constexpr Long kReals = 9;
+  static constexpr Long kLongs = 5;
+
+  Bool Learn();
+
+  PreparedRecord record_;
+  LLong reals_[kReals] = {}; // where the fields are, in the order of the functions in the source file
+  LLong longs_[kLongs] = {};
+  LLong marker_ = 0;
+};
+
+} // namespace _torvane_
