@@ -7,8 +7,8 @@
 #include <gtest/gtest.h>
 
 #include "support/counting_memory.h"
+#include "support/full_scene.h"
 #include "support/record_samples.h"
-#include "support/scene_bytes.h"
 #include "torvane/animation/ctrack.h"
 #include "torvane/objects/base_object.h"
 #include "torvane/stream/prepared_record.h"
@@ -93,8 +93,8 @@ FileBytes SceneOfCurves()
 
 std::vector<FileBytes> SceneFiles()
 {
-  std::vector<FileBytes> files = {SceneOfCurves()};
-  for (const auto& entry : std::filesystem::recursive_directory_iterator(TEST_SOURCE_DIR "/fuzz/corpus/scene")) {
+  std::vector<FileBytes> files = {SceneOfCurves(), SaveToBytes(*full_scene::MakeFullScene())};
+  for (const auto& entry : std::filesystem::recursive_directory_iterator(TEST_SOURCE_DIR "/fuzz/corpus")) {
     std::ifstream file(entry.path(), std::ios::binary);
     if (entry.is_regular_file())
       files.emplace_back(std::istreambuf_iterator<char>(file), std::istreambuf_iterator<char>());
@@ -114,7 +114,7 @@ FileBytes Resaved(const FileBytes& bytes, bool asNodes)
     const char* broken = DocumentInvariants::FindBroken(*document); // looks at every key
     EXPECT_EQ(broken, nullptr) << broken;
   }
-  return WithoutMarkers(SaveToBytes(*document));
+  return full_scene::SavedScene(*document);
 }
 
 TEST(KeyRows, AllWaysOfReadingAndWritingGiveTheSameBytes)
@@ -127,17 +127,7 @@ TEST(KeyRows, AllWaysOfReadingAndWritingGiveTheSameBytes)
     const GeneralWay general(true);
     EXPECT_TRUE(quick == Resaved(file, false)) << &file - files.data();
   }
-  EXPECT_TRUE(Resaved(files[0], false) == WithoutMarkers(files[0]));
-}
-
-TEST(KeyRows, KeepTheMarkersOfAFile)
-{
-  const FileBytes file = SceneOfCurves();
-  Filename name;
-  name.SetMemoryRead(file.data(), static_cast<LLong>(file.size()));
-  const DocumentPtr document(LoadDocument(name, LoadObjects | LoadMaterials));
-  ASSERT_TRUE(document);
-  EXPECT_TRUE(SaveToBytes(*document) == file);
+  EXPECT_TRUE(Resaved(files[0], false) == full_scene::Comparable(files[0]));
 }
 
 // Each byte of a record in turn is another one: both ways read the same, or fail alike.
@@ -147,6 +137,7 @@ TEST(KeyRows, ARecordThatIsDamagedIsReadAsInTheGeneralWay)
   for (Long frame = 0; frame < 3; ++frame)
     curve.SetKeyValues(Value(frame, frame));
   const FileBytes bytes = WriteToMemory([&](HyperFile& file) { curve.WriteAsChunk(file, 110415); }, true);
+  EXPECT_TRUE(bytes == WriteToMemory([&](HyperFile& file) { curve.WriteAsChunk(file, 110415); }, true)); // markers stay
   auto read = [](const FileBytes& damaged) {
     MemoryReadFile memory(damaged);
     UChar tag = 0;
@@ -156,11 +147,12 @@ TEST(KeyRows, ARecordThatIsDamagedIsReadAsInTheGeneralWay)
     memory.file.ReadValueHeader(tag);
     memory.file.ReadChunkStart(id, level);
     copy.ReadChunkLoop(memory.file, true);
+    memory.file.Close(); // links that lead nowhere become empty
     const FileBytes again = WriteToMemory([&](HyperFile& file) { copy.WriteChunks(file); });
     return std::tuple(memory.file.GetError(), memory.file.GetProblem().position, WithoutMarkers(again));
   };
   for (std::size_t place = 22; place < bytes.size(); ++place) {
-    for (const std::uint8_t change : {0x01, 0x80}) {
+    for (const int change : {0x01, 0x80}) {
       FileBytes damaged = bytes;
       damaged[place] = static_cast<std::uint8_t>(damaged[place] ^ change);
       const auto quick = read(damaged);
@@ -191,7 +183,7 @@ TEST(KeyRows, ProgressIsToldAtTheSamePlaces)
     copy.ReadChunkLoop(memory.file, true);
     EXPECT_EQ(copy.GetKeyCount(), 9000);
   }
-  EXPECT_GT(told[0].size(), 400U);
+  EXPECT_GT(told[0].size(), 50U);
   EXPECT_EQ(told[0], told[1]);
 }
 

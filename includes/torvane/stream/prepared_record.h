@@ -14,7 +14,7 @@ class PrivateChunk;
 class PreparedRecord
 {
  public:
-  static constexpr LLong kLargest = 512; // bytes
+  static constexpr LLong kLargest = 480; // bytes: files below 500 tell their progress at every value, which is counted
   static constexpr LLong kHeadSize = 9;  // of the chunk start that opens a record
 
   // Writes `sample`, a node, as a chunk of that label, and reads it back into `copy` to learn what reading takes.

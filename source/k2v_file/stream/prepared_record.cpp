@@ -14,18 +14,6 @@ namespace
 
 std::atomic<Bool> gEnabled{true};
 
-// A file's ticks since the last call.
-class TickCount
-{
- public:
-  explicit TickCount(const HyperFile& file) : file_(file), start_(file.GetTicks()) {}
-  LLong Get() const { return file_.GetTicks() - start_; }
-
- private:
-  const HyperFile& file_;
-  LLong start_;
-};
-
 } // namespace
 
 void PreparedRecord::SetEnabled(Bool enabled) { gEnabled.store(enabled, std::memory_order_relaxed); }
@@ -41,9 +29,8 @@ Bool PreparedRecord::Learn(PrivateChunk& sample, PrivateChunk& copy, Long label)
   if (!writer.Open(kSceneIdent, target, kHyperFileWrite))
     return false;
   const LLong header = writer.GetPosition();
-  const TickCount written(writer);
   sample.WriteAsChunk(writer, label);
-  writeTicks_ = written.Get();
+  writeTicks_ = writer.GetTicks();
   const void* data = nullptr;
   LLong size = 0;
   if (!writer.Close() || !target.GetMemoryContinuous(data, size) || size - header > kLargest)
@@ -57,10 +44,10 @@ Bool PreparedRecord::Learn(PrivateChunk& sample, PrivateChunk& copy, Long label)
   Long level = 0;
   if (!reader.Open(kSceneIdent, source, kHyperFileRead))
     return false;
-  const TickCount read(reader);
+  readTicks_ = 0;
+  reader.SetReadProgress([](Long, void* ticks) { ++*static_cast<LLong*>(ticks); }, &readTicks_); // at every value
   if (!reader.ReadValueHeader(tag) || !reader.ReadChunkStart(id, level) || !copy.ReadChunkLoop(reader, true))
     return false;
-  readTicks_ = read.Get();
 
   size_ = size - header;
   std::memcpy(bytes_, static_cast<const UChar*>(data) + header, static_cast<std::size_t>(size_));
