@@ -11,7 +11,7 @@ namespace _torvane_
 namespace
 {
 
-constexpr LLong kBufferSize = 262144; // fewer calls of the system; more brings nothing
+constexpr LLong kBufferSize = 262144;            // fewer calls of the system; more brings nothing
 constexpr std::size_t kStreamBufferSize = 32768; // of the C library, in kFileReadWrite
 constexpr LLong kSpare = 2;                      // a shorter file's buffer is longer than the file by this
 
