@@ -139,6 +139,8 @@ void SampledTrack::Finish()
     AddSampledKey(pendingTime_, pending_);
   if (IsConstant())
     track_.reset();
+  else
+    track_->GetCurve(1, 1)->Trim();
   Insert();
 }
 
@@ -206,14 +208,13 @@ bool SampleTransform(ExportContext& context, HostCalls& host, const HostStream& 
       !context.orientationStream)
     return false;
   LayerSample sample;
-  Vector previousRotation;
+  TransformConverter converter(rules);
   const Long lastFrame = LastFrame(context);
   for (Long frame = 0; frame <= lastFrame; ++frame) {
     if (!ReadLayerSample(host, context, anchorStream, scaleStream, FrameTime(context, frame), rules, sample))
       break;
-    const SceneTransform transform = ConvertTransform(sample, rules, frame > 0 ? &previousRotation : nullptr);
+    const SceneTransform& transform = converter.Convert(sample);
     const BaseTime keyTime = KeyTime(context, frame);
-    previousRotation = transform.rotation;
     tracks.position.Add(keyTime, transform.position);
     tracks.rotation.Add(keyTime, transform.rotation);
     tracks.scale.Add(keyTime, transform.scale);

@@ -1,6 +1,7 @@
 #include "exporter/walk/transform.h"
 
 #include <cmath>
+#include <cstring>
 
 namespace exporter
 {
@@ -34,9 +35,23 @@ Matrix SampleFrame(const LayerSample& sample, const TransformRules& rules, const
   return Multiply(frame, RotationMatrix(sample.rotateX, sample.rotateY, sample.rotateZ));
 }
 
-} // namespace
+// By the bits: -0.0 is not 0.0.
+template <class T>
+bool IsSame(const T& a, const T& b)
+{
+  return std::memcmp(&a, &b, sizeof a) == 0;
+}
 
-SceneTransform ConvertTransform(const LayerSample& sample, const TransformRules& rules, const Vector* previousRotation)
+// True if SampleFrame gives the same for both.
+bool HasSameFrame(const LayerSample& a, const LayerSample& b, const TransformRules& rules)
+{
+  const bool sameLook = !rules.lookAtTarget || (IsSame(a.position, b.position) && IsSame(a.anchor, b.anchor));
+  return sameLook && IsSame(a.orientation, b.orientation) && IsSame(a.rotateX, b.rotateX) &&
+         IsSame(a.rotateY, b.rotateY) && IsSame(a.rotateZ, b.rotateZ);
+}
+
+// Position and scale of a sample with these axes.
+SceneTransform Place(const LayerSample& sample, const TransformRules& rules, const Matrix& frame)
 {
   SceneTransform result;
   const Vector plain = FlipY(sample.position);
@@ -44,15 +59,37 @@ SceneTransform ConvertTransform(const LayerSample& sample, const TransformRules&
     result.scale = sample.scale * 0.01;
   const Vector offset = rules.useAnchor ? AnchorOffset(sample.anchor, rules, result.scale) : Vector();
   result.position = plain + offset;
-  if (rules.useRotation) {
-    Matrix frame = SampleFrame(sample, rules, plain);
+  if (rules.useRotation)
     result.position =
         plain + Normalize(frame.v1) * offset.x + Normalize(frame.v2) * offset.y + Normalize(frame.v3) * offset.z;
-    result.rotation = MatrixToAngles(frame, kExportRotationOrder);
-    if (previousRotation)
-      result.rotation = ClosestAngles(*previousRotation, result.rotation, kExportRotationOrder);
-  }
   result.position += rules.parentShift;
+  return result;
+}
+
+} // namespace
+
+const SceneTransform& TransformConverter::Convert(const LayerSample& sample)
+{
+  if (!isFirst_ && IsSame(sample, last_))
+    return result_;
+  if (rules_.useRotation && (isFirst_ || !HasSameFrame(sample, last_, rules_))) {
+    frame_ = SampleFrame(sample, rules_, FlipY(sample.position));
+    angles_ = MatrixToAngles(frame_, kExportRotationOrder);
+  }
+  const Vector previous = result_.rotation;
+  result_ = Place(sample, rules_, frame_);
+  if (rules_.useRotation)
+    result_.rotation = isFirst_ ? angles_ : ClosestAngles(previous, angles_, kExportRotationOrder);
+  last_ = sample;
+  isFirst_ = false;
+  return result_;
+}
+
+SceneTransform ConvertTransform(const LayerSample& sample, const TransformRules& rules, const Vector* previousRotation)
+{
+  SceneTransform result = TransformConverter(rules).Convert(sample);
+  if (rules.useRotation && previousRotation)
+    result.rotation = ClosestAngles(*previousRotation, result.rotation, kExportRotationOrder);
   return result;
 }
 

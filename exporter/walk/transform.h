@@ -67,6 +67,24 @@ struct SceneTransform
 // rotation that lie closest to it, so that keys don't jump by whole turns.
 SceneTransform ConvertTransform(const LayerSample& sample, const TransformRules& rules, const Vector* previousRotation);
 
+// Converts the samples of one object one after the other, each with the rotation before it. What stands still isn't
+// converted again.
+class TransformConverter
+{
+ public:
+  // `rules` outlives the converter.
+  explicit TransformConverter(const TransformRules& rules) : rules_(rules) {}
+  const SceneTransform& Convert(const LayerSample& sample);
+
+ private:
+  const TransformRules& rules_;
+  bool isFirst_ = true;
+  LayerSample last_;
+  Matrix frame_; // the axes of the last sample and their angles
+  Vector angles_ = Vector();
+  SceneTransform result_;
+};
+
 // Where a child of a layer of `width` by `height` pixels has to be moved: the host counts from the layer's corner, the
 // scene from its centre.
 constexpr Vector ParentShift(Real width, Real height) { return {-(width * 0.5), height * 0.5, 0.0}; }

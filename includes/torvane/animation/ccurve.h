@@ -53,6 +53,8 @@ class CCurve : public BaseList2D
   Bool SetKeyValues(const KeyValues& values, Long* index = nullptr);
   // Removes and frees a key; false out of range.
   Bool DelKey(Long index);
+  // Gives back the room that was taken for keys to come.
+  void Trim() { keyRoot_.GetRows().Trim(); }
 
   // The tangents that the key's bits ask for: stored, automatic, clamped or zero.
   KeyTangents GetTangents(Long index) const;

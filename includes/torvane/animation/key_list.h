@@ -61,7 +61,11 @@ class KeyRows
   Bool CopyTo(KeyRows& destination, ULong flags) const; // with the markers still to be drawn
   void Remove(Long index);
   void Flush();
-  void Trim() { rows_.Trim(); }
+  void Trim()
+  {
+    rows_.Trim();
+    tangents_.Trim();
+  }
 
  private:
   GeTempDynArray<KeyRow> rows_;

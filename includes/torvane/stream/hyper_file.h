@@ -386,7 +386,7 @@ class HyperFile : public GeMemory
   void NotePath();
   Bool ReadBodySize(const ValueForm& form, LLong& left);
   Bool ReadContainer(ContainerIndex& target, Bool flush);
-  Bool ReadContainerChunk(ContainerIndex& target, Bool flush);
+  Bool ReadContainerChunk(ContainerIndex& target, Bool flush, Long expected);
   Bool ReadContainerLegacy(ContainerIndex& target, Bool flush);
   GeData* PlaceElement(ContainerIndex& target, Bool flush, Long id);
   Bool ReadLegacyEntry(ContainerIndex& target, Bool flush, Long id, UChar type);

@@ -35,6 +35,8 @@ class BaseContainer
   // Removes all elements; the id stays.
   void Flush();
 
+  // Makes room for so many elements in one block, if there is no room for any. False when memory is short.
+  Bool Reserve(Long count) { return free_ || blocks_ || count < 1 || AddBlock(count); }
   // Appends without searching, so that a second element of the same id can arise. A negative id is stored as -1. The
   // element's value, or null when memory is short.
   GeData* InsertData(Long id, const GeData& value);

@@ -1,4 +1,6 @@
 // Walking by tags: skipping values and chunks, raw chunks, containers.
+#include <algorithm>
+
 #include "k2v_file/stream/value_forms.h"
 #include "k2v_file/values/container_index.h"
 #include "torvane/stream/hyper_file.h"
@@ -12,6 +14,7 @@ namespace
 
 constexpr Long kContainerChunk = 132;
 constexpr Long kContainerLevel = 1;
+constexpr Long kMostExpected = 64; // elements that get room before they are read
 
 // Where the type and the value of a container's element stand, with their tags, behind its id, and the sizes of whole
 // elements.
@@ -256,6 +259,8 @@ Bool HyperFile::ReadContainer(ContainerIndex& target, Bool flush)
 {
   if (!EnterLoop())
     return false;
+  // What a file holds mostly has as many elements as the defaults that it takes the place of.
+  const Long expected = flush ? std::min(target.GetContainer().GetCount(), kMostExpected) : 0;
   if (flush)
     target.GetContainer().Flush();
   LLong start = file_.GetPosition();
@@ -263,7 +268,7 @@ Bool HyperFile::ReadContainer(ContainerIndex& target, Bool flush)
   Bool read = false;
   if (ReadValueHeader(tag)) {
     if (tag == kTagChunkStart)
-      read = ReadContainerChunk(target, flush);
+      read = ReadContainerChunk(target, flush, expected);
     else if (tag == kTagLegacyContainer)
       read = ReadContainerLegacy(target, flush);
     else
@@ -273,7 +278,7 @@ Bool HyperFile::ReadContainer(ContainerIndex& target, Bool flush)
   return read && HasMemory();
 }
 
-Bool HyperFile::ReadContainerChunk(ContainerIndex& target, Bool flush)
+Bool HyperFile::ReadContainerChunk(ContainerIndex& target, Bool flush, Long expected)
 {
   BaseContainer& container = target.GetContainer();
   LLong start = file_.GetPosition() - 1;
@@ -290,6 +295,9 @@ Bool HyperFile::ReadContainerChunk(ContainerIndex& target, Bool flush)
   container.SetId(id);
   // Most elements are numbers: these are taken straight out of the buffer, as long as it holds the longest of them.
   const Bool numbersInBuffer = flush && !singlePrecision_;
+  const UChar* first = file_.ReadWindow(1);
+  if (expected > 0 && first && first[0] == kTagLong && !container.Reserve(expected))
+    return Fail(FILEERROR_MEMORY, start);
   while (error_ == FILEERROR_NONE) {
     GeData number;
     const LLong size = numbersInBuffer ? GetNumberElement(file_.ReadWindow(kRealElementSize), id, number) : 0;
