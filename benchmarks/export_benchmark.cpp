@@ -1,6 +1,9 @@
 // The export: what the exporter adds to the host's own reads.
+#include <latch>
 #include <memory>
 #include <string>
+#include <thread>
+#include <vector>
 
 #include "exporter/entry/host_calls.h"
 #include "exporter/host_api/aegp_entry.h"
@@ -110,6 +113,37 @@ void ExportAnimatedLayers(benchmark::State& state)
   state.counters["exporter/host"] = (run.time - reads.time) / reads.time;
 }
 
+// As many exports at once as the argument says, each in a thread of its own; "work" is how many exports' time goes by
+// in the time of one.
+void ExportInThreads(benchmark::State& state)
+{
+  constexpr std::int64_t kFrames = 2000;
+  static double alone = 0; // the time of the first argument, one thread
+  const std::string composition = Composition(50, kFrames);
+  host::StandaloneHost first(host::LoadCompositionText(composition, "benchmark.json", "/"));
+  first.Start(EntryPointFunc);
+  const Run run = RunFresh(state, [&] {
+    std::latch ready(state.range(0) + 1);
+    std::vector<std::thread> threads;
+    for (std::int64_t i = 0; i < state.range(0); ++i) {
+      threads.emplace_back([&] {
+        host::StandaloneHost host(host::LoadCompositionText(composition, "benchmark.json", "/"));
+        const _torvane_::Owned<BaseDocument> document(BaseDocument::Alloc());
+        ready.arrive_and_wait();
+        Export(*document);
+      });
+    }
+    ready.arrive_and_wait();
+    return Measure([&] {
+      for (std::thread& thread : threads)
+        thread.join();
+    });
+  });
+  if (state.range(0) == 1)
+    alone = run.time.count();
+  state.counters["work"] = static_cast<double>(state.range(0)) * alone / run.time.count();
+}
+
 // From the composition to the closed file, a layer, its material and its tag at a time.
 void ExportStaticLayers(benchmark::State& state)
 {
@@ -128,6 +162,7 @@ void ExportStaticLayers(benchmark::State& state)
   SetRate(state, static_cast<double>(state.range(0)));
 }
 
+BENCHMARK(ExportInThreads)->Arg(1)->Arg(2)->Apply(OneBest);
 BENCHMARK(ExportStaticLayers)->Arg(10'000)->Arg(20'000)->Apply(OneBest);
 BENCHMARK(ExportAnimatedLayers)
     ->Args({100, 1000})
