@@ -14,6 +14,7 @@ namespace
 {
 
 constexpr Real kThinTolerance = 1e-6;
+constexpr Long kMostReserved = 16384;          // keys that get room before it is known whether they stay
 constexpr std::int64_t kLastKeySecond = 10000; // curves take no keys beyond
 
 // The frames from 0 to this one are sampled, unless keys end before.
@@ -80,6 +81,12 @@ bool SampledTrack::IsSame(Real a, Real b) const
   if (comparesData_ != (content_ == Content::kData))
     return true;
   return comparesData_ ? a == b : std::abs(a - b) < kThinTolerance;
+}
+
+void SampledTrack::Reserve(Long count)
+{
+  if (CCurve* curve = track_ ? track_->GetCurve(1, 1) : nullptr)
+    curve->Reserve(std::min(count, kMostReserved));
 }
 
 void SampledTrack::Add(const BaseTime& time, Real value)
@@ -156,6 +163,12 @@ VectorTracks::VectorTracks(BaseObject* object, Long parameter, const char* const
               {object, ComponentPath(parameter, 2), names[2]}}
 {}
 
+void VectorTracks::Reserve(Long count)
+{
+  for (SampledTrack& track : tracks_)
+    track.Reserve(count);
+}
+
 void VectorTracks::Add(const BaseTime& time, const Vector& value)
 {
   tracks_[0].Add(time, value.x);
@@ -210,6 +223,8 @@ bool SampleTransform(ExportContext& context, HostCalls& host, const HostStream& 
   LayerSample sample;
   TransformConverter converter(rules);
   const Long lastFrame = LastFrame(context);
+  for (VectorTracks* vector : {&tracks.position, &tracks.rotation, &tracks.scale})
+    vector->Reserve(lastFrame + 1);
   for (Long frame = 0; frame <= lastFrame; ++frame) {
     if (!ReadLayerSample(host, context, anchorStream, scaleStream, FrameTime(context, frame), rules, sample))
       break;

@@ -31,6 +31,8 @@ class SampledTrack
                Content content = Content::kValue);
 
   explicit operator bool() const { return track_ != nullptr; }
+  // Makes room for the keys of so many values.
+  void Reserve(_torvane_::Long count);
   // Times come in ascending order.
   void Add(const _torvane_::BaseTime& time, Real value);
   // Puts the track last among those of the object. One that holds a single value throughout vanishes instead: it has
@@ -65,6 +67,7 @@ class VectorTracks
   // True if all three are there.
   explicit operator bool() const { return tracks_[0] && tracks_[1] && tracks_[2]; }
   std::span<SampledTrack, 3> All() { return tracks_; }
+  void Reserve(_torvane_::Long count);
   void Add(const _torvane_::BaseTime& time, const Vector& value);
   void Finish();
   void Insert();

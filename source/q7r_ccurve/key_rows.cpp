@@ -33,7 +33,7 @@ Bool KeyRows::SetTangents(Long index, const KeyRowTangents& tangents)
 
 Bool KeyRows::Insert(Long index, const KeyRow& row, const KeyRowTangents& tangents)
 {
-  if (!rows_.Insert(index, row))
+  if (!(index == rows_.GetCount() ? rows_.Append(row) : rows_.Insert(index, row)))
     return false;
   if (tangents_.GetCount() > 0 ? tangents_.Insert(index, tangents) : SetTangents(index, tangents))
     return true;

@@ -53,7 +53,9 @@ class CCurve : public BaseList2D
   Bool SetKeyValues(const KeyValues& values, Long* index = nullptr);
   // Removes and frees a key; false out of range.
   Bool DelKey(Long index);
-  // Gives back the room that was taken for keys to come.
+  // Makes room for `count` more keys, so that they aren't moved as they come; a curve whose keys are nodes needs none.
+  // Trim gives back what room was not used.
+  Bool Reserve(Long count) { return !keyRoot_.IsEmpty() || keyRoot_.GetRows().ReserveMore(count); }
   void Trim() { keyRoot_.GetRows().Trim(); }
 
   // The tangents that the key's bits ask for: stored, automatic, clamped or zero.

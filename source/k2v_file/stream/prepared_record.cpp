@@ -70,14 +70,22 @@ LLong PreparedRecord::TakeField(const void* mark, LLong size)
   return place;
 }
 
+// Eight bytes at a time; the last eight may overlap those before them.
 Bool PreparedRecord::Matches(const UChar* place, LLong begun) const
 {
-  UChar different = 0;
-  const UChar* bytes = bytes_ + begun;
-  const UChar* fixed = fixed_ + begun;
+  constexpr LLong kWord = sizeof(ULLong);
+  const auto word = [](const UChar* from) {
+    ULLong bytes = 0;
+    std::memcpy(&bytes, from, sizeof bytes);
+    return bytes;
+  };
   const LLong count = size_ - begun;
-  for (LLong i = 0; i < count; ++i)
-    different = static_cast<UChar>(different | ((place[i] ^ bytes[i]) & fixed[i]));
+  if (count < kWord)
+    return false;
+  const auto differs = [&](LLong i) { return (word(place + i) ^ word(bytes_ + begun + i)) & word(fixed_ + begun + i); };
+  ULLong different = differs(count - kWord);
+  for (LLong i = 0; i + kWord <= count; i += kWord)
+    different |= differs(i);
   return different == 0;
 }
 
