@@ -433,7 +433,7 @@ TEST_F(BaseFileTest, MisuseIsInvalidAndSomeOfItIsReported)
 #ifndef _WIN32 // no such device
 TEST_F(BaseFileTest, AFullDeviceFailsTheWriteThatMeetsIt)
 {
-  const Bytes large(20000);
+  const Bytes large(300000);
   BaseFile file;
   ASSERT_TRUE(file.Open("/dev/full", kFileWrite) && file.WriteLong(1));
   EXPECT_FALSE(file.Close());

@@ -113,7 +113,7 @@ class DocumentInvariants
       CCurve* curve = track.GetCurve(number, 0);
       for (Long i = 0; curve && i < curve->GetKeyCount(); ++i) {
         const CKey* key = curve->GetKey(i);
-        Require(key->GetCurve() == curve, "a key names another curve");
+        Require(!key || key->GetCurve() == curve, "a key names another curve"); // null without memory for nodes
       }
     }
   }
