@@ -117,13 +117,21 @@ std::size_t Output::AddBytes(const std::vector<std::uint8_t>& bytes)
 std::string Output::Finish(const std::string& generator, const Json& scene, const Json& animation,
                            const std::string& bufferUri)
 {
-  std::string text = "{\"asset\":" + Dump({{"version", "2.0"}, {"generator", generator}});
+  constexpr std::size_t kRest = 4096; // more than what isn't in a section takes
+  const std::string sceneText = Dump(scene);
+  std::size_t size = kRest + sceneText.size();
+  for (const Section* section : {&nodes, &cameras, &lights, &meshes, &materials, &textures, &images, &samplers,
+                                 &animationSamplers, &animationChannels, &accessors_, &views_})
+    size += section->Text().size();
+  std::string text;
+  text.reserve(size); // a text that grows is there twice, now and then
+  text += "{\"asset\":" + Dump({{"version", "2.0"}, {"generator", generator}});
   if (!extensions_.empty())
     text += ",\"extensionsUsed\":" + Dump(extensions_);
-  text += ",\"scene\":0,\"scenes\":[" + Dump(scene) + "]";
+  text += ",\"scene\":0,\"scenes\":[" + sceneText + "]";
   auto add = [&text](const char* name, Section& section) {
     if (section.Count() > 0)
-      text += std::string(",\"") + name + "\":[" + section.Text() + "]";
+      text.append(",\"").append(name).append("\":[").append(section.Text()).append("]");
     section.Release();
   };
   add("nodes", nodes);
@@ -135,8 +143,8 @@ std::string Output::Finish(const std::string& generator, const Json& scene, cons
   add("samplers", samplers);
   if (animationChannels.Count() > 0) {
     const std::string rest = animation.empty() ? "" : Dump(animation).substr(1); // with the brace that closes it
-    text += ",\"animations\":[{\"channels\":[" + animationChannels.Text() + "],\"samplers\":[" +
-            animationSamplers.Text() + "]" + (rest.empty() ? "}" : "," + rest) + "]";
+    text.append(",\"animations\":[{\"channels\":[").append(animationChannels.Text()).append("],\"samplers\":[");
+    text.append(animationSamplers.Text()).append("]").append(rest.empty() ? "}" : "," + rest).append("]");
     animationChannels.Release();
     animationSamplers.Release();
   }
@@ -149,8 +157,9 @@ std::string Output::Finish(const std::string& generator, const Json& scene, cons
     text += ",\"buffers\":[" + Dump(buffer) + "]";
   }
   if (lights.Count() > 0)
-    text += ",\"extensions\":{\"KHR_lights_punctual\":{\"lights\":[" + lights.Text() + "]}}";
-  return text + "}";
+    text.append(",\"extensions\":{\"KHR_lights_punctual\":{\"lights\":[").append(lights.Text()).append("]}}");
+  text += '}';
+  return text;
 }
 
 } // namespace gltf

@@ -48,7 +48,12 @@ std::string UniqueNames::Take(const std::string& name)
 
 Nodes::Nodes(Context& context, Targets& targets, const std::vector<const Motion*>& motions,
              std::vector<TrackSet*>& tracks)
-    : context_(context), targets_(targets), motions_(motions), tracks_(tracks), meshes_(context)
+    : context_(context),
+      targets_(targets),
+      motions_(motions),
+      tracks_(tracks),
+      meshes_(context),
+      names_(context.tree.Count())
 {}
 
 void Nodes::Write()

@@ -16,6 +16,7 @@ namespace gltf
 class UniqueNames
 {
  public:
+  explicit UniqueNames(std::size_t count) { taken_.reserve(count); }
   std::string Take(const std::string& name); // an empty one stays so
 
  private:
