@@ -64,8 +64,45 @@ class GeDataPrinter:
         return "%s %s" % (name, payload.format_string(max_elements=20))
 
 
+class FilenamePrinter:
+    """A Filename as its text."""
+
+    def __init__(self, value):
+        self.value = value
+
+    def to_string(self):
+        return text_of(self.value["text_"])
+
+    def display_hint(self):
+        return "string"
+
+
+class ContainerPrinter:
+    """A BaseContainer as its entries, each under its id."""
+
+    def __init__(self, value):
+        self.value = value
+
+    def to_string(self):
+        return "container %d" % int(self.value["id_"])
+
+    def children(self):
+        element = self.value["head_"]
+        while int(element) != 0:
+            yield str(int(element["id"])), element["value"]
+            element = element["next"]
+
+
+def is_node(kind):
+    """True for BaseList2D and what derives from it."""
+    if kind.code != gdb.TYPE_CODE_STRUCT:
+        return False
+    return kind.name == "_torvane_::BaseList2D" or any(
+        field.is_base_class and is_node(field.type.strip_typedefs()) for field in kind.fields())
+
+
 class NodePrinter:
-    """A node as its class, type and name; its fields as children."""
+    """A node as its class, type and name; its container as a child."""
 
     def __init__(self, value):
         self.value = value
@@ -74,17 +111,28 @@ class NodePrinter:
         name = text_of(self.value["name_"])
         return '%s %d "%s"' % (self.value.dynamic_type, int(self.value["type_"]), name)
 
+    def children(self):
+        yield "data", self.value["data_"]
+
+
+class NodePrinters(gdb.printing.PrettyPrinter):
+    """The printer of every class of nodes, those of clients too."""
+
+    def __init__(self):
+        super().__init__("torvane nodes")
+
+    def __call__(self, value):
+        return NodePrinter(value) if is_node(value.type.strip_typedefs()) else None
+
 
 def printers():
-    """The printers of this file, under the names of their types."""
+    """The printers of single types, under their names."""
     collection = gdb.printing.RegexpCollectionPrettyPrinter("torvane")
-    collection.add_printer("String", "^_torvane_::String$", StringPrinter)
-    collection.add_printer("Vector", "^_torvane_::Vector$", VectorPrinter)
-    collection.add_printer("GeData", "^_torvane_::GeData$", GeDataPrinter)
-    collection.add_printer(
-        "Node", "^_torvane_::(BaseList2D|BaseList4D|BaseObject|BaseTag|BaseMaterial|Material|BaseShader|LayerObject|CTrack|CCurve|CKey)$",
-        NodePrinter)
+    for name, printer in (("String", StringPrinter), ("Filename", FilenamePrinter), ("Vector", VectorPrinter),
+                          ("GeData", GeDataPrinter), ("BaseContainer", ContainerPrinter)):
+        collection.add_printer(name, "^_torvane_::%s$" % name, printer)
     return collection
 
 
 gdb.printing.register_pretty_printer(None, printers(), replace=True)
+gdb.printing.register_pretty_printer(None, NodePrinters(), replace=True)

@@ -180,6 +180,8 @@ class BaseDocument : public BaseList2D
   GeListNode* MakeEmpty() const override { return Alloc(); }
 
  private:
+  struct Parameter; // a row of the table of parameters
+
   template <class Visitor>
   Bool VisitFileInfo(Visitor& visitor, Bool& hasPreview);
   template <class Visitor>

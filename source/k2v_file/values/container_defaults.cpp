@@ -22,42 +22,34 @@ T* Empty()
 // Payloads lie behind their element or are shared by all: nothing here is ever freed or changed.
 void BaseContainer::BuildDefault(GeData& value, const ContainerDefault& row, void* payload)
 {
+  using Payload = GeData::Payload;
+  const auto hold = [&value](Long type, auto member, auto* object) {
+    value.payload_.*member = object;
+    value.type_ = type;
+  };
   switch (row.form) {
   case DefaultForm::kBool:
   case DefaultForm::kLong:
     value = GeData(static_cast<Long>(row.number));
-    break;
+    return;
   case DefaultForm::kReal:
     value = GeData(row.number);
-    break;
+    return;
   case DefaultForm::kTime:
-    value.payload_.time = ::new (payload) BaseTime(row.number, 1.0);
-    value.type_ = kDataTime;
-    break;
+    return hold(kDataTime, &Payload::time, ::new (payload) BaseTime(row.number, 1.0));
   case DefaultForm::kGrey:
-    value.payload_.vector = ::new (payload) Vector(row.number, row.number, row.number);
-    value.type_ = kDataVector;
-    break;
+    return hold(kDataVector, &Payload::vector, ::new (payload) Vector(row.number, row.number, row.number));
   case DefaultForm::kVector:
-    value.payload_.vector = ::new (payload) Vector(row.vector);
-    value.type_ = kDataVector;
-    break;
+    return hold(kDataVector, &Payload::vector, ::new (payload) Vector(row.vector));
   case DefaultForm::kString:
-    value.payload_.string = Empty<String>();
-    value.type_ = kDataString;
-    break;
+    return hold(kDataString, &Payload::string, Empty<String>());
   case DefaultForm::kFilename:
-    value.payload_.filename = Empty<Filename>();
-    value.type_ = kDataFilename;
-    break;
+    return hold(kDataFilename, &Payload::filename, Empty<Filename>());
   case DefaultForm::kLink:
-    value.payload_.link = Empty<GeAliasLink>();
-    value.type_ = kDataLink;
-    break;
+    return hold(kDataLink, &Payload::link, Empty<GeAliasLink>());
   case DefaultForm::kContainer:
-    value.payload_.container = row.container ? const_cast<BaseContainer*>(&row.container()) : Empty<BaseContainer>();
-    value.type_ = kDataContainer;
-    break;
+    return hold(kDataContainer, &Payload::container,
+                row.container ? const_cast<BaseContainer*>(&row.container()) : Empty<BaseContainer>());
   }
 }
 

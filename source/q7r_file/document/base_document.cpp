@@ -177,6 +177,74 @@ Long BaseDocument::AxisLockRow() const
   return row;
 }
 
+// ---------------------------------------------------------------------------------------------------------------
+// Parameters
+
+namespace
+{
+
+void Take(const GeData& value, Long& place) { place = value.GetLong(); }
+void Take(const GeData& value, BaseTime& place) { place = value.GetTime(); }
+void Take(const GeData& value, Filename& place) { place = value.GetFilename(); }
+
+void Call(DocumentPref& pref, void (DocumentPref::*set)(Long), const GeData& value) { (pref.*set)(value.GetLong()); }
+void Call(DocumentPref& pref, void (DocumentPref::*set)(Bool), const GeData& value) { (pref.*set)(value.GetBool()); }
+void Call(DocumentPref& pref, void (DocumentPref::*set)(Real), const GeData& value) { (pref.*set)(value.GetReal()); }
+void Call(DocumentPref& pref, void (DocumentPref::*set)(const BaseTime&), const GeData& value)
+{
+  (pref.*set)(value.GetTime());
+}
+
+} // namespace
+
+// A parameter that is a value of the document or of its preferences.
+struct BaseDocument::Parameter
+{
+  Long id;
+  GeData (*get)(const BaseDocument& document);
+  void (*set)(BaseDocument& document, const GeData& value);
+
+  template <auto member>
+  static constexpr Parameter Own(Long id)
+  {
+    return {id, [](const BaseDocument& document) { return GeData(document.*member); },
+            [](BaseDocument& document, const GeData& value) { Take(value, document.*member); }};
+  }
+  template <auto get, auto set>
+  static constexpr Parameter OfPref(Long id)
+  {
+    return {id, [](const BaseDocument& document) { return GeData((document.pref_.*get)()); },
+            [](BaseDocument& document, const GeData& value) { Call(document.pref_, set, value); }};
+  }
+  static const Parameter* Find(Long id);
+};
+
+const BaseDocument::Parameter* BaseDocument::Parameter::Find(Long id)
+{
+  static constexpr Parameter kTable[] = {
+      Own<&BaseDocument::time_>(kDocumentTime),
+      Own<&BaseDocument::directory_>(kDocumentPath),
+      Own<&BaseDocument::fileName_>(kDocumentFile),
+      Own<&BaseDocument::mode_>(kDocumentMode),
+      Own<&BaseDocument::tool_>(kDocumentTool),
+      OfPref<&DocumentPref::GetFps, &DocumentPref::SetFps>(kDocumentFps),
+      OfPref<&DocumentPref::GetMinTime, &DocumentPref::SetMinTime>(kDocumentMinTime),
+      OfPref<&DocumentPref::GetMaxTime, &DocumentPref::SetMaxTime>(kDocumentMaxTime),
+      OfPref<&DocumentPref::GetLoopMin, &DocumentPref::SetLoopMin>(kDocumentLoopMin),
+      OfPref<&DocumentPref::GetLoopMax, &DocumentPref::SetLoopMax>(kDocumentLoopMax),
+      OfPref<&DocumentPref::GetReal, &DocumentPref::SetReal>(kDocumentPrefReal),
+      OfPref<&DocumentPref::GetLastBool, &DocumentPref::SetLastBool>(kDocumentPrefLastBool),
+      {kDocumentInverseSwitch,
+       [](const BaseDocument& document) { return GeData(!document.data_.GetBool(kSwitchedOff)); },
+       [](BaseDocument& document, const GeData& value) { document.data_.SetBool(kSwitchedOff, !value.GetBool()); }},
+  };
+  for (const Parameter& row : kTable) {
+    if (row.id == id)
+      return &row;
+  }
+  return nullptr;
+}
+
 Bool BaseDocument::GetParameter(const ParameterPath& path, GeData& value)
 {
   Long id = path[0].id;
@@ -207,53 +275,16 @@ Bool BaseDocument::GetOwnParameter(Long id, GeData& value) const
     value = GeData(axisLocks_[AxisLockRow()][id - kDocumentFirstAxisLock]);
     return true;
   }
-  switch (id) {
-  case kDocumentTime:
-    value = GeData(time_);
+  if (const Parameter* row = Parameter::Find(id)) {
+    value = row->get(*this);
     return true;
-  case kDocumentFps:
-    value = GeData(pref_.GetFps());
-    return true;
-  case kDocumentMinTime:
-    value = GeData(pref_.GetMinTime());
-    return true;
-  case kDocumentMaxTime:
-    value = GeData(pref_.GetMaxTime());
-    return true;
-  case kDocumentLoopMin:
-    value = GeData(pref_.GetLoopMin());
-    return true;
-  case kDocumentLoopMax:
-    value = GeData(pref_.GetLoopMax());
-    return true;
-  case kDocumentPrefReal:
-    value = GeData(pref_.GetReal());
-    return true;
-  case kDocumentPrefLastBool:
-    value = GeData(pref_.GetLastBool());
-    return true;
-  case kDocumentPath:
-    value = GeData(directory_);
-    return true;
-  case kDocumentFile:
-    value = GeData(fileName_);
-    return true;
-  case kDocumentMode:
-    value = GeData(mode_);
-    return true;
-  case kDocumentTool:
-    value = GeData(tool_);
-    return true;
-  case kDocumentInverseSwitch:
-    value = GeData(!data_.GetBool(kSwitchedOff));
-    return true;
-  default:
-    return GetInfoText(data_, id, value);
   }
+  return GetInfoText(data_, id, value);
 }
 
 Bool BaseDocument::SetParameter(const ParameterPath& path, const GeData& value)
 {
+  const AllocationWatch watch;
   Long id = path[0].id;
   if (id >= kDocumentPrefFirstBool && id < kDocumentPrefFirstBool + 4) {
     pref_.SetBool(id - kDocumentPrefFirstBool, value.GetBool());
@@ -263,49 +294,11 @@ Bool BaseDocument::SetParameter(const ParameterPath& path, const GeData& value)
     axisLocks_[AxisLockRow()][id - kDocumentFirstAxisLock] = value.GetBool();
     return true;
   }
-  switch (id) {
-  case kDocumentTime:
-    time_ = value.GetTime();
-    return true;
-  case kDocumentFps:
-    pref_.SetFps(value.GetLong());
-    return true;
-  case kDocumentMinTime:
-    pref_.SetMinTime(value.GetTime());
-    return true;
-  case kDocumentMaxTime:
-    pref_.SetMaxTime(value.GetTime());
-    return true;
-  case kDocumentLoopMin:
-    pref_.SetLoopMin(value.GetTime());
-    return true;
-  case kDocumentLoopMax:
-    pref_.SetLoopMax(value.GetTime());
-    return true;
-  case kDocumentPrefReal:
-    pref_.SetReal(value.GetReal());
-    return true;
-  case kDocumentPrefLastBool:
-    pref_.SetLastBool(value.GetBool());
-    return true;
-  case kDocumentPath:
-    directory_ = value.GetFilename();
-    return true;
-  case kDocumentFile:
-    fileName_ = value.GetFilename();
-    return true;
-  case kDocumentMode:
-    mode_ = value.GetLong();
-    return true;
-  case kDocumentTool:
-    tool_ = value.GetLong();
-    return true;
-  case kDocumentInverseSwitch:
-    data_.SetBool(kSwitchedOff, !value.GetBool());
-    return true;
-  default:
-    return !IsInfoText(id) && BaseList2D::SetParameter(path, value);
+  if (const Parameter* row = Parameter::Find(id)) {
+    row->set(*this, value);
+    return !watch.Failed();
   }
+  return !IsInfoText(id) && BaseList2D::SetParameter(path, value);
 }
 
 // A copy that fails leaves no nodes behind.
