@@ -1,6 +1,7 @@
 #include "torvane/tags/weight_tag_data.h"
 
 #include "k2v_file/stream/chunk_visitor.h"
+#include "k2v_file/stream/value_forms.h"
 #include "torvane/math/ge_math.h"
 #include "torvane/objects/base_object.h"
 #include "torvane/tags/base_tag.h"
@@ -12,10 +13,15 @@ namespace _torvane_
 namespace
 {
 
-// The least that a file holds for one of them, with Reals in 4 bytes and empty links and lists.
-constexpr LLong kLeastEntrySize = 5 + 5 + 5;
-constexpr LLong kLeastListSize = 5 * 5;
-constexpr LLong kLeastJointSize = 5 + 49 + 5 + (3 * 5 + kLeastListSize) + 5 + kLeastListSize + 5;
+// The least that a file holds for one of them: Reals in 4 bytes, lists empty, and so links, which are memory blocks: a
+// tag and a length, as many bytes as a ULong.
+constexpr LLong kLeastLinkSize = LeastStoredSize(kTagULong);
+constexpr LLong kLeastEntrySize = LeastStoredSize(kTagULong) + kLeastLinkSize + LeastStoredSize(kTagLong);
+constexpr LLong kLeastListSize = LeastStoredSize(kTagLong, kTagLong, kTagLong, kTagLong, kTagLong);
+constexpr LLong kLeastJointSize =
+    kLeastLinkSize + LeastStoredSize(kTagMatrix, kTagReal, kTagLong, kTagLong, kTagLong) + kLeastListSize + // weights
+    LeastStoredSize(kTagLong) + kLeastListSize + LeastStoredSize(kTagLong); // flags, pairs, the count of entries
+static_assert(kLeastEntrySize == 15 && kLeastListSize == 25 && kLeastJointSize == 134);
 
 // The levels of the data from which files hold more, or hold it elsewhere.
 constexpr Long kLevelGlobalMatrix = 1; // and a number in front of each joint
