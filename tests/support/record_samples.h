@@ -12,6 +12,7 @@
 // parameter, or % and that of the entry, that it is.
 #pragma once
 
+#include <functional>
 #include <string>
 #include <vector>
 
@@ -21,7 +22,7 @@
 struct RecordSample
 {
   std::string name;
-  _torvane_::GeListNode* (*make)(); // a new node that takes the chunk
+  std::function<_torvane_::GeListNode*()> make; // a new node that takes the chunk
   _torvane_::Long chunk;
   _torvane_::Long level;
   std::string body;

@@ -65,7 +65,6 @@ const std::map<std::string, Maker> kMakers = {
     {"PointSelectionTag", Tag<kTagPointSelection>},
     {"PointTag", Tag<kTagPoint>},
     {"PolygonTag", Tag<kTagPolygon>},
-    {"SegmentTag", Tag<kTagSegment>},
     {"TangentTag", Tag<kTagTangent>},
     {"TextureTag", Tag<kTagTexture>},
     {"UVWTag", Tag<kTagUVW>},
@@ -117,7 +116,10 @@ std::vector<RecordSample> ReadTable()
     std::string maker;
     char comma = 0;
     words >> maker >> sample.chunk >> comma >> sample.level;
-    sample.make = kMakers.at(maker);
+    if (maker.starts_with("tag:"))
+      sample.make = [type = std::stoi(maker.substr(4))] { return MakeTag(type); };
+    else
+      sample.make = kMakers.at(maker);
     for (std::string option; words >> option;) {
       if (option == "of")
         words >> sample.version;
