@@ -12,9 +12,8 @@ set(CMAKE_CXX_FLAGS_RELWITHDEBINFO "-O2 -g1 -DNDEBUG")
 add_library(torvane_options INTERFACE)
 target_compile_options(torvane_options INTERFACE
   -Wall -Wextra -Wpedantic -Wconversion -Wshadow -Werror)
-# The check of virtual tables needs the type information that the library doesn't have.
 if(TORVANE_SANITIZE)
   target_compile_options(torvane_options INTERFACE
-    -fsanitize=${TORVANE_SANITIZE} -fno-sanitize=vptr -fno-sanitize-recover=all -fno-omit-frame-pointer)
+    -fsanitize=${TORVANE_SANITIZE} -fno-sanitize-recover=all -fno-omit-frame-pointer)
   target_link_options(torvane_options INTERFACE -fsanitize=${TORVANE_SANITIZE})
 endif()

@@ -1,5 +1,19 @@
 # find_package(torvane) gives the target torvane::torvane. The library leaves its client hooks (torvane/hooks.h)
-# undefined: the program that links it supplies them.
+# undefined: the program that links it supplies them. COMPONENTS client adds torvane::client, the library with hooks that
+# are ready to link (torvane/client.h); a program links one of the two.
 include(CMakeFindDependencyMacro)
 find_dependency(JPEG)
 include(${CMAKE_CURRENT_LIST_DIR}/torvane-targets.cmake)
+foreach(torvane_component IN LISTS torvane_FIND_COMPONENTS)
+  if(torvane_component STREQUAL "client")
+    include(${CMAKE_CURRENT_LIST_DIR}/torvane-client-targets.cmake)
+    set(torvane_client_FOUND TRUE)
+  else()
+    set(torvane_${torvane_component}_FOUND FALSE)
+    if(torvane_FIND_REQUIRED_${torvane_component})
+      set(torvane_FOUND FALSE)
+      set(torvane_NOT_FOUND_MESSAGE "torvane has no component \"${torvane_component}\", only \"client\"")
+    endif()
+  endif()
+endforeach()
+unset(torvane_component)

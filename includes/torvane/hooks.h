@@ -37,6 +37,10 @@ void GetWriterInfo(Long& id, String& name);
 // type that gives null is a failed allocation; for an unknown one the library keeps the node's data as raw bytes.
 NodeData* AllocNodeData(Long type, Bool& known);
 
+// Not a hook, but what one can answer: the library's own class for an object or tag of type `type`, as far as it has
+// one that reads what a file holds of the type. `known` as above.
+NodeData* AllocLibraryNodeData(Long type, Bool& known);
+
 // New empty root lists, with the client's member classes behind them. Null when memory is short. The caller owns them.
 RootObject* AllocRootObject();
 RootMaterial* AllocRootMaterial();

@@ -10,6 +10,7 @@
 #include "torvane/bytes/file_stream.h"
 #include "torvane/bytes/memory_block_writer.h"
 #include "torvane/bytes/network_connection.h"
+#include "torvane/client.h"
 #include "torvane/document/base_document.h"
 #include "torvane/hooks.h"
 #include "torvane/ids.h"

@@ -1,4 +1,5 @@
 // The built plug-in, taken apart.
+#include <algorithm>
 #include <set>
 
 #include <gtest/gtest.h>
@@ -65,7 +66,19 @@ TEST(PluginFile, DescribesItselfToTheHost)
   const std::map<std::string, Bytes> resources = ThePlugin().Resources();
   ASSERT_TRUE(resources.contains("PIPL/16000/1033"));
   EXPECT_EQ(resources.at("PIPL/16000/1033"), list);
-  EXPECT_EQ(resources.size(), 1u);
+  ASSERT_TRUE(resources.contains("16/1/1033")); // its version
+  EXPECT_EQ(resources.size(), 2u);
+}
+
+TEST(PluginFile, TellsItsVersionAsTheProgramDoes)
+{
+  for (const char* file : {TEST_PLUGIN, TEST_Q7R}) {
+    const std::map<std::string, Bytes> resources = PluginImage(ReadWholeFile(file)).Resources();
+    ASSERT_TRUE(resources.contains("16/1/1033")) << file;
+    const Bytes& version = resources.at("16/1/1033");
+    const Bytes head = {0xBD, 0x04, 0xEF, 0xFE, 0, 0, 1, 0, 0, 0, 1, 0}; // signature, form 1.0, version 1.0
+    EXPECT_NE(std::search(version.begin(), version.end(), head.begin(), head.end()), version.end()) << file;
+  }
 }
 
 } // namespace

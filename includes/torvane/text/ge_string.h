@@ -28,7 +28,8 @@ class String
   String() noexcept = default;
   String(const String& other) noexcept;
   String(String&& other) noexcept;
-  // Bytes up to the terminator, decoded. A null pointer gives the empty string.
+  // Bytes up to the terminator, decoded: by the code page table, unless told otherwise. What isn't plain ASCII is
+  // mostly UTF-8: FromUtf8. A null pointer gives the empty string.
   String(const char* text, StringEncoding encoding = STRINGENCODING_DEFAULT) noexcept;
   // `count` characters, or -1 for all up to a terminating 0. A null pointer gives the empty string.
   explicit String(const UniChar* text, Long count = -1) noexcept;
@@ -150,6 +151,11 @@ class String
   };
   CharRef operator[](Long index) noexcept { return {*this, index}; }
   UniChar operator[](Long index) const noexcept { return index >= 0 && index < length_ ? block_[index] : UniChar{0}; }
+
+  // The text of UTF-8 bytes: `length` of them, or -1 for all up to the terminator.
+  [[nodiscard]] static String FromUtf8(const char* text, Long length = -1) noexcept;
+  // As GetCStringCopy, in UTF-8.
+  [[nodiscard]] char* GetUtf8Copy() const noexcept { return GetCStringCopy(STRINGENCODING_UTF8); }
 
   [[nodiscard]] static String FromLong(Long value) noexcept;
   [[nodiscard]] static String FromLLong(LLong value) noexcept;

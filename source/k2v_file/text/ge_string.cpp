@@ -59,6 +59,13 @@ String::String(String&& other) noexcept
 
 String::String(const char* text, StringEncoding encoding) noexcept { SetCString(text, -1, encoding); }
 
+String String::FromUtf8(const char* text, Long length) noexcept
+{
+  String string;
+  string.SetCString(text, length, STRINGENCODING_UTF8);
+  return string;
+}
+
 String::String(const UniChar* text, Long count) noexcept { SetUcBlock(text, count); }
 
 String::String(Long count, UniChar fill) noexcept { FillChars(count, fill); }

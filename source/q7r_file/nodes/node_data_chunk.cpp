@@ -39,13 +39,27 @@ NodeData* AllocNodeDataFor(const BaseList2D& node, Long type, Bool& known)
   return NewObj<PolygonObjectData>();
 }
 
+namespace
+{
+
+// A hook knows the type and gives nothing. That is a failure; but what the file holds stays in the node, for where the
+// failure passes for one that can be skipped. The end tag stays to be read.
+void KeepUnreadBody(HyperFile& file, Long level, Long type, NodeDataSlot slot)
+{
+  const Bool isPolygon = type == kObjectPolygon && NodeCast<BaseObject>(&slot.node);
+  AttachNodeData(isPolygon ? NewObj<PolygonObjectData>() : nullptr, slot);
+  if (!isPolygon && slot.raw.Read(file, level) && !file.GetFile().Seek(-1, kSeekRelative))
+    file.SetError(FILEERROR_SEEK);
+}
+
+} // namespace
+
 Bool ReadNodeDataBody(HyperFile& file, Long id, Long level, Long type, NodeDataSlot slot)
 {
   Bool known = false;
   NodeData* data = AllocNodeDataFor(slot.node, type, known);
   if (known && !data) {
-    DeleteObj(slot.data);
-    slot.raw.Free();
+    KeepUnreadBody(file, level, type, slot);
     return false;
   }
   if (!AttachNodeData(data, slot))

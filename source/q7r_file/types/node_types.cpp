@@ -51,12 +51,13 @@ NodeData* MakeData(const NodeType&, Long type)
 // What the library doesn't interpret: new data write an empty body at level 0.
 NodeData* MakeOpaqueData(const NodeType& row, Long type) { return NewObj<OpaqueObjectData>(type, 0, row.label); }
 
-// The client's own data, or the library's for a client that knows none.
+// The client's own polygon data, or the library's for a client that has none, whether it says that it knows the type or
+// not: without data a file's polygon object would be lost. A lack of memory is noticed by the watch of who asks.
 NodeData* MakePolygonData(const NodeType&, Long type)
 {
   Bool known = false;
   NodeData* data = AllocNodeData(type, known);
-  return data || known ? data : NewObj<PolygonObjectData>();
+  return data ? data : NewObj<PolygonObjectData>();
 }
 
 using DataMaker = NodeData* (*)(const NodeType& row, Long type);
@@ -259,6 +260,16 @@ BaseMaterial* MakeMaterial(Long type)
 {
   const NodeType* row = FindNodeType(type, BaseMaterial::kNodeKind);
   return row ? NodeCast<BaseMaterial>(row->make(*row, type)) : NewObj<BaseMaterial>(kMaterialPlugin, type);
+}
+
+NodeData* AllocLibraryNodeData(Long type, Bool& known)
+{
+  const NodeType* row = FindRow(type);
+  // Neither plain data nor those of points read the chunk of a node's data: its bytes are kept without them.
+  known = row && row->makeData && row->makeData != MakeData<NodeData> && row->makeData != MakeData<PointObjectData>;
+  if (!known)
+    return nullptr;
+  return row->makeData == MakePolygonData ? NewObj<PolygonObjectData>() : row->makeData(*row, type);
 }
 
 NodeData* AllocObjectDataOfType(Long type, Bool& known) { return DataOfType(type, BaseObject::kNodeKind, known); }

@@ -1,5 +1,6 @@
-// A program of the library's user: it has its own hooks and uses nothing but the installed package. Saves a document
-// with one object under the name that it is given, loads it again and looks whether the object is there.
+// A program of the library's user: it has its own hooks, classes that derive from the library's and ask for their
+// types, and uses nothing but the installed package. Saves a document under the name that it is given, and looks
+// whether it loads and comes back whole, whatever the hook for node data answers.
 #include <cstdio>
 #include <cstdlib>
 
@@ -7,14 +8,24 @@
 #include "torvane/hooks.h"
 #include "torvane/memory/memory.h"
 #include "torvane/nodes/root_list.h"
+#include "torvane/objects/light_object_data.h"
 #include "torvane/objects/point_object.h"
 #include "torvane/objects/point_object_data.h"
 #include "torvane/text/ge_string.h"
 
+#include <filesystem>
+#include <string>
+#include <typeinfo>
+
 namespace
 {
 
-long gBlocks = 0; // allocated and not yet freed
+long gBlocks = 0;          // allocated and not yet freed
+bool gSaysKnown = false;   // what the hook for node data answers beside its null
+bool gGivesLights = false; // it has data for lights
+
+class OwnLight : public _torvane_::LightObjectData
+{};
 
 void* Counted(void* block)
 {
@@ -51,10 +62,10 @@ void GetWriterInfo(Long& id, String& name)
   name = "client";
 }
 
-NodeData* AllocNodeData(Long, Bool& known)
+NodeData* AllocNodeData(Long type, Bool& known)
 {
-  known = false;
-  return nullptr;
+  known = gSaysKnown || gGivesLights;
+  return gGivesLights && type == kObjectLight ? NewObj<OwnLight>() : nullptr;
 }
 
 RootObject* AllocRootObject() { return NewObj<RootObject>(); }
@@ -85,6 +96,7 @@ bool Save(const char* path)
     BaseObject* polygons = AllocObject(kObjectPolygon);
     document->InsertObject(polygons, object);
     saved = polygons && ResizePolygons(*polygons, 3, 1, 1);
+    document->InsertObject(AllocObject(kObjectLight), polygons);
   }
   if (saved) {
     FileProblem problem;
@@ -101,8 +113,22 @@ bool Load(const char* path)
   const BaseObject* polygons = object ? object->GetNext() : nullptr;
   bool found = polygons && object->GetName() == kName && GetPointCount(*polygons) == 3 && GetPolygonData(*polygons) &&
                GetPolygonData(*polygons)->GetNgons();
+  const NodeData* light = found && polygons->GetNext() ? polygons->GetNext()->GetObjectData() : nullptr;
+  found =
+      found && gGivesLights == (light && typeid(*light) == typeid(OwnLight) && dynamic_cast<const OwnLight*>(light));
   BaseDocument::Free(document);
   return found;
+}
+
+// Loads the file and saves it beside itself: neither a hook that knows nothing nor one that knows and gives nothing
+// makes it smaller.
+bool ComesBack(const std::string& path)
+{
+  const std::string again = path + ".again";
+  BaseDocument* document = LoadDocument(path.c_str(), LoadObjects | LoadMaterials);
+  const bool saved = document && SaveDocument(document, again.c_str(), 0);
+  BaseDocument::Free(document);
+  return saved && std::filesystem::file_size(again) == std::filesystem::file_size(path);
 }
 
 } // namespace
@@ -112,7 +138,13 @@ int main(int argc, char** argv)
   if (argc != 2)
     return EXIT_FAILURE;
   bool saved = Save(argv[1]);
-  bool loaded = saved && Load(argv[1]);
-  std::printf("saved: %d, loaded: %d, blocks left: %ld\n", saved, loaded, gBlocks);
-  return loaded && gBlocks == 0 ? EXIT_SUCCESS : EXIT_FAILURE;
+  bool loaded = saved && Load(argv[1]) && ComesBack(argv[1]);
+  gSaysKnown = true;
+  bool kept = Load(argv[1]) && ComesBack(argv[1]);
+  gSaysKnown = false;
+  gGivesLights = true;
+  bool derived = Load(argv[1]);
+  std::printf("saved: %d, loaded: %d, kept: %d, derived: %d, blocks left: %ld\n", saved, loaded, kept, derived,
+              gBlocks);
+  return loaded && kept && derived && gBlocks == 0 ? EXIT_SUCCESS : EXIT_FAILURE;
 }

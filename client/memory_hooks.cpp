@@ -1,4 +1,4 @@
-// The library's memory hooks: the C library's heap.
+// The memory hooks: the heap of the C library.
 #include <cstdlib>
 
 #include "torvane/hooks.h"
