@@ -145,7 +145,8 @@ TEST(ProjectLayers, OfAllKindsAreWhatTheyWere)
     }
   }
   EXPECT_EQ(project.root->layers[3]->source, project.root->layers[4]->source);
-  ASSERT_EQ(3U, project.warnings.size()); // the lost source, the model, the place of lights that aren't spot lights
+  // The lost source, the model, the place of lights that aren't spot lights, and parallel and ambient ones.
+  ASSERT_EQ(4U, project.warnings.size());
   EXPECT_EQ("shot.aep: layer \"Own name\": its source, item 999, is not in the project", project.warnings[0]);
 }
 
