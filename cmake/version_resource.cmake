@@ -4,7 +4,6 @@ function(add_version_resource target RESOURCE_FILE_TYPE RESOURCE_FILE RESOURCE_D
   if(NOT WIN32)
     return()
   endif()
-  enable_language(RC)
   configure_file(${PROJECT_SOURCE_DIR}/packaging/windows/version.rc.in ${CMAKE_CURRENT_BINARY_DIR}/${target}_version.rc @ONLY)
   target_sources(${target} PRIVATE ${CMAKE_CURRENT_BINARY_DIR}/${target}_version.rc)
 endfunction()
