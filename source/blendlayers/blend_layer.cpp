@@ -8,6 +8,14 @@ namespace _torvane_
 
 BlendFields BlendLayer::FieldsOf() const { return const_cast<BlendLayer*>(this)->Fields(); }
 
+// What goes down through folders in folders asks for one setting at a time: all of them in the frame of each level
+// would take most of a stack.
+[[gnu::noinline]] BlendField BlendLayer::FieldAt(Long index) const
+{
+  const BlendFields all = FieldsOf();
+  return index < all.count ? all.fields[index] : BlendField();
+}
+
 Bool BlendLayer::CopyLayerTo(BlendLayer& destination, TransArray* translation) const
 {
   if (destination.layerType_ != layerType_)
@@ -20,28 +28,25 @@ Bool BlendLayer::CopyLayerTo(BlendLayer& destination, TransArray* translation) c
   destination.enabled_ = enabled_;
   destination.layerId_ = layerId_;
   destination.blendMode_ = blendMode_;
-  const BlendFields from = FieldsOf();
-  const BlendFields to = destination.Fields();
-  for (Long i = 0; i < from.count; ++i) {
-    if (!CopyField(from.fields[i], to.fields[i], translation))
-      return false;
-  }
-  return true;
+  Bool copied = true;
+  for (Long i = 0; copied && FieldAt(i).value; ++i)
+    copied = CopyField(FieldAt(i), destination.FieldAt(i), translation);
+  return copied;
 }
 
 Bool BlendLayer::ReadLayer(HyperFile& file, Long level)
 {
   Bool read = true;
-  for (const BlendField& field : Fields())
-    read = ReadField(file, level, field) && read;
+  for (Long i = 0; FieldAt(i).value; ++i)
+    read = ReadField(file, level, FieldAt(i)) && read;
   return read;
 }
 
 Bool BlendLayer::WriteLayer(HyperFile& file) const
 {
   Bool written = true;
-  for (const BlendField& field : FieldsOf())
-    written = WriteField(file, field) && written;
+  for (Long i = 0; FieldAt(i).value; ++i)
+    written = WriteField(file, FieldAt(i)) && written;
   return written;
 }
 
@@ -51,13 +56,10 @@ Bool BlendLayer::LayersDiffer(const BlendLayer& other) const
       selected_ != other.selected_ || enabled_ != other.enabled_ || layerId_ != other.layerId_ ||
       blendMode_ != other.blendMode_ || layerMark_ != other.layerMark_)
     return true;
-  const BlendFields own = FieldsOf();
-  const BlendFields others = other.FieldsOf();
-  for (Long i = 0; i < own.count; ++i) {
-    if (FieldsDiffer(own.fields[i], others.fields[i]))
-      return true;
-  }
-  return false;
+  Bool differ = false;
+  for (Long i = 0; !differ && FieldAt(i).value; ++i)
+    differ = FieldsDiffer(FieldAt(i), other.FieldAt(i));
+  return differ;
 }
 
 Bool BlendLayer::LayersEqualIgnoringFlags(const BlendLayer& other, Long) const

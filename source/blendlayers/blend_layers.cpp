@@ -2,6 +2,7 @@
 #include "torvane/shaders/blend_layers.h"
 
 #include "blendlayers/blend_fields.h"
+#include "k2v_file/memory/stack_room.h"
 #include "torvane/memory/assertion.h"
 #include "torvane/stream/hyper_file.h"
 #include "torvane/values/ge_data.h"
@@ -209,6 +210,8 @@ Bool CBlendLayers::CopyLayersTo(CBlendLayers& other, TransArray* translation) co
   if (&other == this)
     return true;
   other.FlushLayers();
+  if (!HasStackRoom())
+    return false;
   for (const BlendLayer* layer : layers_) {
     BlendLayer* copy = other.AppendLayer(layer->GetLayerType());
     if (!copy || !layer->CopyLayerTo(*copy, translation))
@@ -243,9 +246,12 @@ Bool CBlendLayers::WriteOneLayer(HyperFile& file, BlendLayer& layer)
 
 Bool CBlendLayers::WriteList(HyperFile& file, Long level) const
 {
+  if (!file.EnterLoop()) // a list that could not be read again, so deep does it lie
+    return false;
   Bool written = file.WriteLong(GetCount()) && file.WriteLong(level);
   for (BlendLayer* layer : layers_)
     written = WriteOneLayer(file, *layer) && written;
+  file.LeaveLoop();
   return written;
 }
 

@@ -123,13 +123,13 @@ Bool CKey::GetParameter(const ParameterPath& path, GeData& value)
   switch (id) {
   case kKeyTime:
     value = GeData(time_);
-    return true;
+    return value.GetType() == kDataTime;
   case kKeyLeftTime:
     value = GeData(leftTime_);
-    return true;
+    return value.GetType() == kDataTime;
   case kKeyRightTime:
     value = GeData(rightTime_);
-    return true;
+    return value.GetType() == kDataTime;
   case kKeyLeftValue:
     value = GeData(leftValue_);
     return true;

@@ -211,6 +211,9 @@ Bool CTrack::CopyTo(PrivateChunk& destination, ULong flags, TransArray* translat
   auto* target = NodeCast<CTrack>(&destination);
   if (!target)
     return false;
+  if (target == this)
+    return true;
+  const AllocationWatch watch;
   if (!BaseList2D::CopyTo(destination, flags, translation) ||
       !curve_.CopyWithTranslation(target->curve_, flags, translation))
     return false;
@@ -222,7 +225,8 @@ Bool CTrack::CopyTo(PrivateChunk& destination, ULong flags, TransArray* translat
     if (!target->extraCurves_[slot])
       return false;
   }
-  trackLink_.CopyLinkTo(&target->trackLink_, translation);
+  if (!trackLink_.CopyLinkTo(&target->trackLink_, translation))
+    return false;
   target->path_ = path_;
   target->before_ = before_;
   target->after_ = after_;
@@ -230,7 +234,7 @@ Bool CTrack::CopyTo(PrivateChunk& destination, ULong flags, TransArray* translat
   for (Long i = 0; i < kExtraNumbers; ++i)
     target->extra_[i] = extra_[i];
   target->kind_ = kind_;
-  return true;
+  return !watch.Failed();
 }
 
 Bool CTrack::GetParameter(const ParameterPath& path, GeData& value)
@@ -244,7 +248,7 @@ Bool CTrack::GetParameter(const ParameterPath& path, GeData& value)
     return true;
   case kTrackLink:
     value = GeData(trackLink_);
-    return true;
+    return value.GetType() == kDataLink;
   case kTrackBefore:
     value = GeData(before_);
     return true;
@@ -267,7 +271,7 @@ Bool CTrack::SetParameter(const ParameterPath& path, const GeData& value)
     return true;
   case kTrackLink:
     trackLink_.SetLink(value.GetLink());
-    return true;
+    return trackLink_.GetLink() == value.GetLink();
   case kTrackBefore:
     before_ = value.GetLong();
     return true;

@@ -3,6 +3,7 @@
 #include <atomic>
 #include <cstring>
 
+#include "k2v_file/stream/value_forms.h"
 #include "torvane/memory/owned.h"
 #include "torvane/nodes/private_chunk.h"
 #include "torvane/stream/hyper_file.h"
@@ -20,6 +21,7 @@ constexpr char kGoalMark[] = {'a', 'g', 'o', 'a', 'l', '1'};
 constexpr LLong kMarkSize = 6;
 constexpr LLong kRecordSize = kMarkSize + static_cast<LLong>(sizeof(GeAliasID));
 constexpr LLong kNameLengthSize = 4;
+constexpr LLong kValueHead = StoredSize(kTagMemory); // in front of a record
 
 std::atomic<GeAliasID> gNextTrunkId{1};
 
@@ -56,7 +58,7 @@ class ReadRecord
  public:
   explicit ReadRecord(HyperFile& file)
   {
-    const UChar* next = file.GetFile().ReadWindow(1 + static_cast<LLong>(sizeof(ULong)) + kRecordSize);
+    const UChar* next = file.GetFile().ReadWindow(kValueHead + kRecordSize);
     if (next && next[0] == kTagMemory && bytes::GetBig<ULong>(next + 1) == kRecordSize)
       bytes_ = file.ReadMemoryInto(record_, kRecordSize, size_) ? record_ : nullptr;
     else if (file.ReadMemory(block_, size_))

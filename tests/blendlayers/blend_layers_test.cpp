@@ -2,9 +2,11 @@
 // copied and found.
 #include <gtest/gtest.h>
 
+#include "support/assertion_counter.h"
 #include "support/assertion_record.h"
 #include "support/byte_writer.h"
 #include "support/counting_memory.h"
+#include "support/every_failed_allocation.h"
 #include "support/memory_file.h"
 #include "support/text.h"
 #include "torvane/shaders/base_shader.h"
@@ -120,13 +122,16 @@ ByteWriter AllLayers(Long level)
 }
 
 // Reads a stack with `body` in its chunk; a Long behind it must be in step.
-bool ReadStack(Stack& stack, const Bytes& body)
+bool ReadStack(Stack& stack, const Bytes& body, Long* error = nullptr)
 {
   ByteWriter w;
   w.Header().Long(kCustomBlendLayers).Start(0, 2).Append(body).End().Long(77);
   MemoryReadFile memory(w.bytes);
   Long witness = 0;
-  return stack.value.Read(memory.file) && memory.file.ReadLong(witness) && witness == 77;
+  const bool read = stack.value.Read(memory.file) && memory.file.ReadLong(witness) && witness == 77;
+  if (error)
+    *error = memory.file.GetError();
+  return read;
 }
 
 } // namespace
@@ -408,15 +413,55 @@ TEST(BlendLayers, CopyAndCompareEverySetting)
   EXPECT_TRUE(copy.IsEqual(stack.value));
   stack.Data().SetBlendVersion(3);
   EXPECT_FALSE(copy.IsEqual(stack.value));
+}
 
-  bool done = false;
-  for (LLong step = 0; !done && step < 500; ++step) {
-    counting_memory::FailAfter(step);
-    const GeData clone(stack.value);
-    counting_memory::FailNever();
-    done = clone.GetCustom() != nullptr;
+TEST(BlendLayers, AreReadAndCopiedWholeOrTellThatMemoryIsShort)
+{
+  const Bytes body = AllLayers(3).Long(2).bytes;
+  Stack whole;
+  ASSERT_TRUE(ReadStack(whole, body));
+  const auto like = [&](const auto& stack) { return stack->value.IsEqual(whole.value); };
+  EveryFailedAllocation(
+      [&] {
+        auto stack = std::make_unique<Stack>();
+        Long error = FILEERROR_NONE;
+        const bool read = ReadStack(*stack, body, &error);
+        EXPECT_EQ(error, read ? FILEERROR_NONE : FILEERROR_MEMORY);
+        return read ? std::move(stack) : nullptr;
+      },
+      like);
+  EveryFailedAllocation(
+      [&] {
+        auto copy = std::make_unique<Stack>();
+        copy->value = whole.value;
+        return copy->value.GetCustom() ? std::move(copy) : nullptr;
+      },
+      like);
+}
+
+// What a reader would refuse isn't written.
+TEST(BlendLayers, AreRefusedInASaveWhenTheyNestTooDeepToBeReadAgain)
+{
+  AssertionCounter quiet;
+  Stack stack;
+  CBlendLayers* layers = &stack.Layers();
+  for (Long lists = 1; lists <= HyperFile::kMaxLoopDepth + 1; ++lists) {
+    if (lists == 100 || lists >= HyperFile::kMaxLoopDepth) {
+      const bool fits = lists <= HyperFile::kMaxLoopDepth;
+      Long error = FILEERROR_NONE;
+      const Bytes written = WriteToMemory(
+          [&](HyperFile& file) {
+            stack.value.Write(file);
+            error = file.GetError();
+          },
+          true);
+      EXPECT_EQ(error, fits ? FILEERROR_NONE : FILEERROR_TOO_DEEP) << lists;
+      MemoryReadFile again(written);
+      Stack back;
+      EXPECT_TRUE(back.value.Read(again.file) == fits || lists > 100) << lists;
+    }
+    layers = &layers->AppendLayer(kBlendFolder)->AsFolder()->GetChildren();
   }
-  EXPECT_TRUE(done);
 }
 
 TEST(BlendLayers, NameAndReleaseTheirShader)

@@ -4,6 +4,7 @@
 #include "support/assertion_record.h"
 #include "support/byte_writer.h"
 #include "support/counting_memory.h"
+#include "support/every_failed_allocation.h"
 #include "support/memory_file.h"
 #include "torvane/shaders/gradient.h"
 #include "torvane/values/ge_data.h"
@@ -226,12 +227,15 @@ TEST(Gradient, PreparesItsKnotsInOrderOfPosition)
   for (Long i = 0; i < 500; ++i)
     EXPECT_EQ(many.GetKnotCache()[i].position, i / 500.0);
 
-  for (LLong step : {0, 1}) { // the cache of the transparency, then the gradient's own
-    counting_memory::FailAfter(step);
-    EXPECT_FALSE(gradient.PrepareGradient());
-    counting_memory::FailNever();
-    EXPECT_TRUE(!gradient.GetKnotCache() && !gradient.GetAlpha()->GetKnotCache());
-  }
+  const auto prepare = [&] {
+    gradient.FreeGradientCache();
+    const bool prepared = gradient.PrepareGradient();
+    EXPECT_EQ(gradient.GetKnotCache() && gradient.GetAlpha()->GetKnotCache(), prepared); // both or none
+    EXPECT_EQ(gradient.GetKnotCache() || gradient.GetAlpha()->GetKnotCache(), prepared);
+    gradient.FreeGradientCache();
+    return prepared;
+  };
+  EveryFailedAllocation(prepare);
 }
 
 TEST(Gradient, BlendsAsWorkedOutByHand)

@@ -7,6 +7,7 @@
 #include "k2v_file/hyper_file_bytes.h"
 #include "support/assertion_counter.h"
 #include "support/counting_memory.h"
+#include "support/every_failed_allocation.h"
 #include "support/pictures.h"
 #include "support/temp_folder.h"
 #include "torvane/pictures/bitmap_filters.h"
@@ -279,29 +280,27 @@ TEST(PictureFiles, FailCleanlyWhenMemoryOrDiskIsShort)
   Fill(source, SmoothPicture(200, 100, 3));
   for (Long format : {kImageFormatBmp, kImageFormatJpeg}) {
     const Bytes whole = SaveToMemory(source, format);
-    Long result = 0;
-    for (int allocations = 0; result != IMAGERESULT_OK; ++allocations) {
-      MemoryDescription description;
-      Filename name;
-      name.SetMemoryWrite(&description);
-      counting_memory::FailAfter(allocations);
-      result = source.Save(name, format, nullptr, 0);
-      counting_memory::FailNever();
+    EveryFailedAllocation([&] {
+      const Long result = [&] {
+        MemoryDescription description;
+        Filename name;
+        name.SetMemoryWrite(&description);
+        return source.Save(name, format, nullptr, 0);
+      }();
       EXPECT_TRUE(result == IMAGERESULT_OK || result == IMAGERESULT_MEMORY || result == IMAGERESULT_FILE) << result;
-      ASSERT_LT(allocations, 50);
-    }
+      return result == IMAGERESULT_OK;
+    });
     const BmpLoader bmp;
     const JpgLoader jpeg;
     const BitmapLoaderData& loader = format == kImageFormatBmp ? static_cast<const BitmapLoaderData&>(bmp) : jpeg;
-    result = 0;
-    for (int allocations = 0; result != IMAGERESULT_OK; ++allocations) {
-      Bitmap bitmap;
-      counting_memory::FailAfter(allocations);
-      result = LoadFromMemory(loader, whole, bitmap);
-      counting_memory::FailNever();
-      EXPECT_TRUE(result == IMAGERESULT_OK || result == IMAGERESULT_MEMORY || result == IMAGERESULT_OPEN) << result;
-      ASSERT_LT(allocations, 50);
-    }
+    EveryFailedAllocation(
+        [&] {
+          auto bitmap = std::make_unique<Bitmap>();
+          const Long result = LoadFromMemory(loader, whole, *bitmap);
+          EXPECT_TRUE(result == IMAGERESULT_OK || result == IMAGERESULT_MEMORY || result == IMAGERESULT_OPEN) << result;
+          return result == IMAGERESULT_OK ? std::move(bitmap) : nullptr;
+        },
+        [](const auto& bitmap) { return PixelsOf(*bitmap); });
     if (std::filesystem::exists("/dev/full")) {
       EXPECT_NE(IMAGERESULT_OK, source.Save("/dev/full", format, nullptr, 0));
     }

@@ -10,6 +10,7 @@
 
 #include "support/assertion_counter.h"
 #include "support/counting_memory.h"
+#include "support/every_failed_allocation.h"
 #include "torvane/bytes/base_file.h"
 
 namespace
@@ -238,17 +239,14 @@ TEST_F(NetworkTest, OnlyReadingAndWritingAloneAreAllowed)
 
 TEST_F(NetworkTest, OpeningFailsCleanlyWhereverMemoryRunsOut)
 {
-  BaseFile file;
   Long last = FILEERROR_NONE;
-  for (LLong allocations = 0; allocations < 20; ++allocations) {
-    counting_memory::FailAfter(allocations);
+  EveryFailedAllocation([&] {
+    BaseFile file;
     const Bool opened = file.Open(nearName, kFileRead);
-    counting_memory::FailNever();
-    if (opened)
-      break;
-    last = file.GetError();
-  }
-  EXPECT_TRUE(file.Close());
+    last = opened ? last : file.GetError();
+    EXPECT_EQ(file.Close(), opened);
+    return opened;
+  });
   EXPECT_EQ(last, FILEERROR_MEMORY) << "the block is what is allocated last";
 }
 

@@ -9,6 +9,7 @@
 #include "source/k2v_file/pictures/run_coding.h"
 #include "support/assertion_counter.h"
 #include "support/counting_memory.h"
+#include "support/every_failed_allocation.h"
 #include "support/temp_folder.h"
 
 using namespace _torvane_;
@@ -370,14 +371,12 @@ TEST(PaintTextures, SurviveCutsAndMemoryShortage)
     const std::string result = Load(Bytes(whole.begin(), whole.begin() + static_cast<long>(size)), cut);
     EXPECT_TRUE(result.rfind("error", 0) == 0 || all.rfind(result, 0) == 0) << result;
   }
-  std::string result;
-  for (int allocations = 0; result != all; ++allocations) {
-    ASSERT_LT(allocations, 200);
-    counting_memory::FailAfter(allocations);
-    result = Load(whole);
-    counting_memory::FailNever();
-    EXPECT_TRUE(result == all || result.rfind("error", 0) == 0) << result;
-  }
+  EveryFailedAllocation(
+      [&] {
+        const std::string result = Load(whole);
+        return result.rfind("error", 0) == 0 ? nullptr : std::make_unique<std::string>(result);
+      },
+      [](const auto& result) { return *result; });
 }
 
 TEST(PaintTextures, GoThroughFilesOnDisk)

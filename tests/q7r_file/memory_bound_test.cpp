@@ -3,6 +3,7 @@
 
 #include "support/byte_writer.h"
 #include "support/counting_memory.h"
+#include "support/record_samples.h"
 #include "support/scene_bytes.h"
 #include "torvane/tags/joint_weight_table.h"
 
@@ -85,6 +86,21 @@ std::vector<Crowd> Crowds()
   entry("container", ByteWriter().Long(132).Start(132, 1).Long(-1).End().bytes);
   for (Long type : {1000997, 1009290, 1024869, 200000275, 3000000})
     entry(std::to_string(type), ByteWriter().Long(type).Append(emptyChunk.bytes).bytes);
+  const std::vector<std::uint8_t> none = ByteWriter().Start(132, 1).Long(-1).End().bytes;
+  entry("gradient", ByteWriter().Long(1000481).Start(0, 1).Append(none).Bool(false).End().bytes);
+  entry("gradient with transparency",
+        ByteWriter().Long(1000481).Start(0, 1).Append(none).Bool(true).Append(none).End().bytes);
+  entry("blend layers", ByteWriter().Long(1011131).Start(0, 2).Long(0).Long(3).Long(2).End().bytes);
+  const char* settings[] = {
+      "L R B L L3", "L R k", "R R R",         "R R R B",  "R L", "L [132,1 L-1 L1 L1000481 [0,1 [132,1 L-1 ] B ] ] B B",
+      "R R",        "R R",   "L R L B R R R", "R B B V V"};
+  for (int type = 1; type <= 10; ++type) {
+    const std::string layer = "L" + std::to_string(type) + " B S L L " + settings[type - 1] + " B";
+    crowds.push_back({"blend layer " + std::to_string(type), inObject({110050}), RecordBytes(ParseRecord(layer)),
+                      RecordBytes(ParseRecord("L L [132,1 L-1 L7 L1011131 [0,2 L1100 L3"))});
+  }
+  crowds.push_back(
+      {"identifier", inObject({110068}), ByteWriter().Long(7).Memory("").bytes, ByteWriter().Long(1100).bytes});
   return crowds;
 }
 

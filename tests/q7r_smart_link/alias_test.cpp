@@ -13,6 +13,7 @@
 #include "support/assertion_counter.h"
 #include "support/byte_writer.h"
 #include "support/counting_memory.h"
+#include "support/every_failed_allocation.h"
 #include "support/memory_file.h"
 #include "torvane/values/base_container.h"
 
@@ -392,31 +393,44 @@ TEST_F(AliasTest, HandsLinksOnWhenAnIdGetsASecondGoal)
   EXPECT_FALSE(first.HasLinks());
 }
 
-TEST_F(AliasTest, LeavesLinksEmptyOrWholeWhenMemoryRunsOut)
+TEST_F(AliasTest, TranslatesAndCopiesAllLinksOrTellsThatMemoryIsShort)
 {
-  for (LLong count = 0; count < 400; ++count) {
+  struct Net
+  {
     GeAliasGoal goals[20];
     GeAliasLink links[20], copies[20];
-    std::vector<Bool> goalDone, linkDone;
+  };
+  const auto make = [] {
+    auto net = std::make_unique<Net>();
+    bool done = true;
     {
       TransArray translation;
-      counting_memory::FailAfter(count);
       for (std::size_t i = 0; i < 20; ++i) {
         if (i % 2)
-          goalDone.push_back(translation.RegisterGoal(i + 1, goals[i]));
-        linkDone.push_back(translation.RegisterLink(i + 1, links[i], nullptr));
+          done = translation.RegisterGoal(i + 1, net->goals[i]) && done;
+        done = translation.RegisterLink(i + 1, net->links[i], nullptr) && done;
         if (i % 2 == 0)
-          goalDone.push_back(translation.RegisterGoal(i + 1, goals[i]));
+          done = translation.RegisterGoal(i + 1, net->goals[i]) && done;
       }
       translation.FinishTranslation(false);
     }
     for (std::size_t i = 0; i < 20; ++i) {
-      EXPECT_EQ(links[i].GetLinkGoal(), goalDone[i] && linkDone[i] ? &goals[i] : nullptr) << count;
-      const Bool copied = links[i].CopyLinkTo(&copies[i], nullptr);
-      EXPECT_EQ(copied, copies[i].GetLinkGoal() == links[i].GetLinkGoal());
+      GeAliasGoal* goal = net->links[i].GetLinkGoal();
+      EXPECT_TRUE(!goal || goal == &net->goals[i]);
+      const Bool copied = net->links[i].CopyLinkTo(&net->copies[i], nullptr);
+      EXPECT_EQ(copied, net->copies[i].GetLinkGoal() == goal);
+      done = done && copied;
     }
-    counting_memory::FailNever();
-  }
+    return done ? std::move(net) : nullptr;
+  };
+  EveryFailedAllocation(make, [](const auto& net) {
+    std::vector<std::ptrdiff_t> ends;
+    for (const auto& links : {net->links, net->copies}) {
+      for (std::size_t i = 0; i < 20; ++i)
+        ends.push_back(links[i].GetLinkGoal() ? links[i].GetLinkGoal() - net->goals : -1);
+    }
+    return ends;
+  });
   EXPECT_EQ(reports_.Take(), 0);
 }
 

@@ -6,8 +6,11 @@
 #include "support/assertion_counter.h"
 #include "support/counting_memory.h"
 #include "support/every_failed_allocation.h"
+#include "support/full_scene.h"
 #include "support/memory_file.h"
 #include "support/record_samples.h"
+#include "support/scene_bytes.h"
+#include "support/scene_corpus.h"
 #include "support/text.h"
 #include "torvane/materials/base_material.h"
 #include "torvane/memory/owned.h"
@@ -119,6 +122,26 @@ TEST(Records, AreKeptCopiedAndWrittenInTheCurrentForm)
   }
 }
 
+// The files that fuzzing begins with have each record where it belongs: it is read there, and written again.
+TEST(Records, StandInTheFilesForFuzzing)
+{
+  const std::vector<CorpusFile> files = SceneCorpus();
+  std::size_t place = 0;
+  for (const RecordSample& sample : RecordSamples()) {
+    while (files[place].name.rfind("foreign-chunk-in", 0) == 0 || files[place].name.rfind("foreign-member", 0) == 0)
+      ++place;
+    const CorpusFile& file = files[place++];
+    SCOPED_TRACE(file.name);
+    const DocumentPtr document = LoadFromBytes(file.bytes);
+    ASSERT_NE(document, nullptr);
+    EXPECT_TRUE(sample.now == "-" || Difference(*document, CurrentChunk(sample)).empty())
+        << Difference(*document, CurrentChunk(sample));
+  }
+  for (const CorpusFile& file : files)
+    EXPECT_NE(LoadFromBytes(file.bytes), nullptr) << file.name;
+  EXPECT_EQ(files.back().name, "everything");
+}
+
 // Each value that is kept is kept by itself, whatever the others are.
 TEST(Records, KeepEachValueByItself)
 {
@@ -191,6 +214,7 @@ TEST(Records, TakeNoMemoryForCountsThatTheFileDoesNotHold)
 
 TEST(Records, AreReadAndCopiedWholeOrNotAtAllWhenAnAllocationFails)
 {
+  AssertionCounter silence;
   for (const RecordSample& sample : RecordSamples()) {
     SCOPED_TRACE(sample.name);
     const Bytes chunk = Chunk(sample.chunk, sample.level, ParseRecord(sample.body), sample.version);
@@ -198,7 +222,7 @@ TEST(Records, AreReadAndCopiedWholeOrNotAtAllWhenAnAllocationFails)
       // The moment of its making is all that differs between two of these.
       if (auto* tag = NodeCast<BaseTag>(node.get()); tag && tag->GetType() == kTagCompositing)
         tag->GetDataInstance().SetLong(kCompositingClock, 0);
-      return WithoutMarkers(WriteToMemory([&](HyperFile& file) { node->WriteChunks(file); }));
+      return full_scene::Comparable(WriteToMemory([&](HyperFile& file) { node->WriteChunks(file); }));
     };
     EveryFailedAllocation(
         [&] {
@@ -208,6 +232,18 @@ TEST(Records, AreReadAndCopiedWholeOrNotAtAllWhenAnAllocationFails)
         written);
     const NodePtr node(sample.make());
     Read(*node, sample, chunk);
+    // Straight onto a new node, without what an entry to copying does; and a node copied onto itself stays as it is.
+    if (const NodePtr copy(sample.make()); node->CopyTo(*copy, 0, nullptr)) {
+      EveryFailedAllocation(
+          [&] {
+            NodePtr made(sample.make());
+            return made && node->CopyTo(*made, 0, nullptr) ? std::move(made) : nullptr;
+          },
+          written);
+    }
+    written(node); // leaves a check sum in an object
+    const Bytes before = written(node);
+    EXPECT_TRUE(node->CopyTo(*node, 0, nullptr) && written(node) == before);
     const bool hasClones = NodePtr(node->MakeClone(0, nullptr)) != nullptr;
     EveryFailedAllocation([&] { return NodePtr(hasClones ? node->MakeClone(0, nullptr) : CopyOf(*node, sample)); },
                           written);

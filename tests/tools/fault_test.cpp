@@ -163,6 +163,8 @@ const Verb kVerbs[] = {
     {"info {scene.q7r}", ""},
     {"tree --json {scene.q7r}", ""},
     {"dump {scene.q7r}", ""},
+    {"check {scene.q7r}", ""},
+    {"convert {scene.q7r} {out.glb} --force", "out.glb"},
     {"ies {l.ies}", ""},
 };
 INSTANTIATE_TEST_SUITE_P(Verbs, Faults, testing::ValuesIn(kVerbs));

@@ -53,7 +53,7 @@ inline void PutBig(UChar* place, Bits value, std::index_sequence<Index...>)
 }
 
 template <class Bits, std::size_t... Index>
-inline Bits GetBig(const UChar* place, std::index_sequence<Index...>)
+constexpr Bits GetBig(const UChar* place, std::index_sequence<Index...>)
 {
   return static_cast<Bits>(((static_cast<ULLong>(place[Index]) << (8 * (sizeof(Bits) - 1 - Index))) | ...));
 }
@@ -77,7 +77,7 @@ inline void PutBig(UChar* place, Bits value)
 }
 
 template <class Bits>
-inline Bits GetBig(const UChar* place)
+constexpr Bits GetBig(const UChar* place)
 {
   return GetBig<Bits>(place, std::make_index_sequence<sizeof(Bits)>());
 }

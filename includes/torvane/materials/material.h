@@ -51,6 +51,8 @@ class Material : public BaseMaterial
   Bool IsInstanceOf(Long type) const override;
   Bool ReadChunk(HyperFile& file, Long id, Long level) override;
   void WriteChunks(HyperFile& file) override;
+  // What stands in the chunk of a channel is written back there.
+  Bool KeepChunk(HyperFile& file, Long id, Long level) override;
   // Channel objects are not copied.
   Bool CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation) override;
 
@@ -75,11 +77,17 @@ class Material : public BaseMaterial
  private:
   template <class Visitor>
   Bool VisitChannels(Visitor& visitor);
+  Bool ReadChannel(HyperFile& file, Long place);
+  void WriteChannel(HyperFile& file, Long place) const;
+  Bool CopyKeptInChannels(Material& destination) const;
   Bool ReadOldChannels(HyperFile& file, Long level);
 
   Long channelState_[kMaterialChannelCount]; // 0 or 1, by place
   struct Channels;
   Channels* channels_ = nullptr; // owned
+  struct KeptInChannels;
+  KeptInChannels* kept_ = nullptr; // owned; made with the first chunk that is kept
+  Long readPlace_ = -1;            // of the channel whose chunk is being read
 };
 
 // A new standard material that the caller owns; null when memory is short.

@@ -42,8 +42,8 @@ class UniqueIDArray : public GeTempDynSortSearchArray<UniqueIDEntry, Long, GeMem
   Bool AdoptEntry(Long appId, void* data, LLong size);
   // For reading many: takes the block without a search. SettleEntries is due before anything else.
   Bool AppendEntry(Long appId, void* data, LLong size);
-  // Sorts what was appended. Of entries with equal ids the last one stays.
-  void SettleEntries();
+  // Sorts what was appended. Of entries with equal ids the last one stays. Gives the comparisons that it took.
+  LLong SettleEntries();
   void FreeEntries();
 };
 
@@ -75,6 +75,7 @@ class BaseList2D : public GeListNode
   void RemoveFromList() override;
 
   const String& GetName() const { return name_; }
+  // Without memory the name is empty: an AllocationWatch tells.
   void SetName(const String& name) { name_ = name; }
   BaseContainer& GetDataInstance() { return data_; }
   const BaseContainer& GetDataInstance() const { return data_; }

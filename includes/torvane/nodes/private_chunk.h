@@ -45,7 +45,7 @@ class PrivateChunk : public GeTempPublicNode2D<PrivateChunk>
   virtual void WriteChunks(HyperFile& file);
   // Copies this node's content onto `destination`, a node of the same class. `flags` are those of ids.h.
   virtual Bool CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation);
-  // False when the parameter isn't known here.
+  // False when the parameter isn't known here, or when memory was too short to give or to take the whole value.
   virtual Bool GetParameter(const ParameterPath& path, GeData& value);
   virtual Bool SetParameter(const ParameterPath& path, const GeData& value);
   // The level of the chunk that holds a NodeData's own values.
@@ -63,7 +63,8 @@ class PrivateChunk : public GeTempPublicNode2D<PrivateChunk>
   // FILEERROR_TOO_DEEP.
   void WriteAsChunk(HyperFile& file, Long id);
   // The entry to CopyTo. Without an array, and unless kCopyNoTranslation is set, links inside the copy are translated
-  // here: they point at copies of what was copied along and else at what the source points at.
+  // here: they point at copies of what was copied along and else at what the source points at. False also where memory,
+  // or the stack of the thread, is too small.
   Bool CopyWithTranslation(PrivateChunk& destination, ULong flags, TransArray* translation);
 
   Bool GetParameterById(Long id, GeData& value);
@@ -71,6 +72,7 @@ class PrivateChunk : public GeTempPublicNode2D<PrivateChunk>
 
  private:
   struct Loop;
+  static Bool ReadLoopHeader(HyperFile& file);
   Bool ReadOneChunk(HyperFile& file, Loop& loop);
   Bool EndLoopChunk(HyperFile& file, Loop& loop);
 };

@@ -48,7 +48,7 @@ class RootList2D : public PrivateChunk
   Bool InsertAfter(BaseList2D* node, BaseList2D* reference);  // first when the reference is null
   Bool InsertBefore(BaseList2D* node, BaseList2D* reference); // first when the reference has no predecessor
   void RemoveMember(BaseList2D* node);
-  // Deletes all members, first to last, and what was kept.
+  // Deletes all members with what is below them, and what was kept.
   void FreeAll();
   LLong GetCount() const;
 

@@ -119,6 +119,8 @@ class BaseObject : public BaseList4D
 
   // Every setter of the transform does nothing on an object with a Protection Tag (5629). The matrices are taken apart
   // into position, rotation and scale; each maps what the getter of its name maps.
+  // Without memory for its first value the frozen part stays as it was: SetParameter tells that by false, these by an
+  // AllocationWatch around them.
   void SetRelPos(const Vector& value);
   void SetRelRot(const Vector& value);
   void SetRelScale(const Vector& value);

@@ -114,6 +114,7 @@ class CBlendLayers
 
 inline constexpr Long kBlendListLevel = 3; // of the layers that are written
 
+struct BlendField;
 struct BlendFields;
 
 class BlendLayer : public GeMemory
@@ -172,6 +173,8 @@ class BlendLayer : public GeMemory
  protected:
   // The class's own settings, in file order. Pointers lead into this layer.
   virtual BlendFields Fields() = 0;
+  // One of them; without a value behind the last.
+  BlendField FieldAt(Long index) const;
 
  private:
   friend class CBlendLayers;

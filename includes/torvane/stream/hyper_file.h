@@ -240,8 +240,9 @@ class HyperFile : public GeMemory
   // without it elements of the same id are replaced. Also gives false, with no error set, on a stray tag inside the
   // chunk form.
   Bool ReadContainer(BaseContainer& container, Bool flush);
-  // How many places were looked at to find elements by their ids, in all containers so far: a measure of the work.
+  // How many places were looked at to find or to order what was read by its ids: a measure of the work.
   LLong GetLookupCount() const { return lookups_; }
+  void AddLookups(LLong count) { lookups_ += count; }
 
   // Arrays of files below version 11925. Each gives a new block that the caller owns and its count; a count of 0
   // gives a null block and true.
@@ -284,7 +285,8 @@ class HyperFile : public GeMemory
   LLong GetTicks() const { return ticks_; }
 
   // Opens and leaves one level of nested reading (chunk loops, containers). Entering deeper than kMaxLoopDepth sets
-  // FILEERROR_CHUNK_STRUCTURE and gives false; every successful Enter needs its Leave.
+  // FILEERROR_CHUNK_STRUCTURE and gives false, in a file that is written FILEERROR_TOO_DEEP; so does one for which the
+  // stack of the thread is too small. Every successful Enter needs its Leave.
   static constexpr Long kMaxLoopDepth = 4000;
   Bool EnterLoop();
   void LeaveLoop() { --loopDepth_; }

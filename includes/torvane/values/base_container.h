@@ -85,6 +85,8 @@ class BaseContainer
   Filename GetFilename(Long id, const Filename& defaultValue = Filename()) const;
   void* GetPointer(Long id, void* defaultValue = nullptr) const;
 
+  // Without memory an entry keeps its value, or is left without one: an AllocationWatch tells, and so does the result
+  // of SetData.
   void SetBool(Long id, Bool value) { SetData(id, GeData(value)); }
   void SetLong(Long id, Long value) { SetData(id, GeData(value)); }
   void SetLLong(Long id, LLong value) { SetData(id, GeData(value)); }

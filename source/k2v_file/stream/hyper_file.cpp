@@ -3,6 +3,7 @@
 
 #include <cstring>
 
+#include "k2v_file/memory/stack_room.h"
 #include "k2v_file/stream/file_magic.h"
 #include "torvane/links/alias.h"
 #include "torvane/memory/assertion.h"
@@ -239,7 +240,7 @@ Bool HyperFile::EnterLoop()
 {
   if (error_ != FILEERROR_NONE)
     return false;
-  if (loopDepth_ >= kMaxLoopDepth)
+  if (loopDepth_ >= kMaxLoopDepth || !HasStackRoom())
     return Fail(mode_ == kHyperFileWrite ? FILEERROR_TOO_DEEP : FILEERROR_CHUNK_STRUCTURE, file_.GetPosition());
   ++loopDepth_;
   return true;

@@ -115,7 +115,7 @@ class Converter
   // Goes into a container whose tag is next, inside of the one that was opened at `open_`.
   Bool OpenContainer(LLong end)
   {
-    constexpr LLong kHead = kTagSize + kLengthSize + StoredSize(kTagLong);
+    constexpr LLong kHead = StoredSize(kTagLegacyContainer, kTagLong);
     if (end - position_ < kHead || source_[position_] != kTagLegacyContainer ||
         source_[position_ + kTagSize + kLengthSize] != kTagLong)
       return false;

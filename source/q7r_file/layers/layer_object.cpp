@@ -52,6 +52,8 @@ Bool LayerObject::CopyTo(PrivateChunk& destination, ULong flags, TransArray* tra
   auto* target = NodeCast<LayerObject>(&destination);
   if (!target)
     return false;
+  if (target == this)
+    return true;
   if (!BaseList4D::CopyTo(destination, flags, translation))
     return false;
   for (Long i = 0; i < kLayerFlagCount; ++i)
@@ -63,11 +65,10 @@ Bool LayerObject::CopyTo(PrivateChunk& destination, ULong flags, TransArray* tra
     auto* clone = NodeCast<LayerObject>(child->MakeClone(flags, translation));
     if (!clone)
       return false;
-    if (!target->MakeChildList()) {
+    if (!target->MakeChildList() || !clone->InsertUnderLast(target)) {
       DeleteObj(clone);
       return false;
     }
-    clone->InsertUnderLast(target);
   }
   return !target->children_ || children_->CopyKeptChunks(*target->children_);
 }

@@ -1,5 +1,7 @@
 #include "torvane/materials/material.h"
 
+#include <utility>
+
 #include "k2v_file/stream/chunk_visitor.h"
 #include "q7r_file/materials/material_defaults.h"
 #include "torvane/shaders/base_shader.h"
@@ -13,8 +15,6 @@ namespace
 constexpr Long kChunkChannels = 5703;
 constexpr Long kChunkOldChannelEntry = 5706; // known and empty
 constexpr Long kChunkOldChannelList = 5707;  // known and empty
-
-// Files below this version have no channel in the last place.
 
 constexpr Long kChannelAtStart[] = {0, 8};
 
@@ -68,11 +68,46 @@ struct Material::Channels
   BaseChannel places[kMaterialChannelCount];
 };
 
-Material::~Material() { DeleteObj(channels_); }
+struct Material::KeptInChannels
+{
+  KeptChunks places[kMaterialChannelCount];
+};
+
+Material::~Material()
+{
+  DeleteObj(channels_);
+  DeleteObj(kept_);
+}
 
 Bool Material::IsInstanceOf(Long type) const { return type == kMaterialStandard || BaseMaterial::IsInstanceOf(type); }
 
-// Each switch is followed by the channel's own chunk, which this node reads: nothing in it belongs to the channel.
+// A channel's own chunk, which this node reads: nothing in it belongs to the channel.
+Bool Material::ReadChannel(HyperFile& file, Long place)
+{
+  const Long outer = std::exchange(readPlace_, place);
+  const Bool read = ReadChunks(file, true);
+  readPlace_ = outer;
+  return read;
+}
+
+void Material::WriteChannel(HyperFile& file, Long place) const
+{
+  file.WriteChunkStart(kNodeChannel, 0);
+  if (kept_)
+    kept_->places[place].Write(file);
+  file.WriteChunkEnd();
+}
+
+Bool Material::KeepChunk(HyperFile& file, Long id, Long level)
+{
+  if (readPlace_ < 0)
+    return BaseMaterial::KeepChunk(file, id, level);
+  if (!kept_)
+    kept_ = NewObj<KeptInChannels>();
+  return kept_ && kept_->places[readPlace_].Read(file, id, level);
+}
+
+// Each switch is followed by the channel's chunk.
 template <class Visitor>
 Bool Material::VisitChannels(Visitor& v)
 {
@@ -81,9 +116,9 @@ Bool Material::VisitChannels(Visitor& v)
       break;
     v.Bool(channelState_[i]);
     if constexpr (Visitor::kReading)
-      v.Note(v.Good() && ReadChunks(v.File(), true));
+      v.Note(v.Good() && ReadChannel(v.File(), i));
     else
-      BaseChannel().WriteChunks(v.File());
+      WriteChannel(v.File(), i);
   }
   return v.Good();
 }
@@ -129,6 +164,21 @@ void Material::WriteChunks(HyperFile& file)
   WriteChunk(file, kChunkChannels, 0, [this](ChunkWriter& v) { return VisitChannels(v); });
 }
 
+Bool Material::CopyKeptInChannels(Material& destination) const
+{
+  if (!kept_) {
+    DeleteObj(destination.kept_);
+    return true;
+  }
+  if (!destination.kept_)
+    destination.kept_ = NewObj<KeptInChannels>();
+  for (Long i = 0; i < kMaterialChannelCount; ++i) {
+    if (!destination.kept_ || !kept_->places[i].CopyTo(destination.kept_->places[i]))
+      return false;
+  }
+  return true;
+}
+
 Bool Material::CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation)
 {
   auto* target = NodeCast<Material>(&destination);
@@ -136,7 +186,7 @@ Bool Material::CopyTo(PrivateChunk& destination, ULong flags, TransArray* transl
     return false;
   for (Long i = 0; i < kMaterialChannelCount; ++i)
     target->channelState_[i] = channelState_[i];
-  return BaseMaterial::CopyTo(destination, flags, translation);
+  return CopyKeptInChannels(*target) && BaseMaterial::CopyTo(destination, flags, translation);
 }
 
 Long Material::ChannelIsOn(Long channel) const

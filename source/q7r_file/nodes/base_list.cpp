@@ -149,7 +149,7 @@ Bool BaseList2D::ReadUniqueIds(HyperFile& file)
     }
   }
   if (count >= 1)
-    uniqueIds_->SettleEntries();
+    file.AddLookups(uniqueIds_->SettleEntries());
   return file.SkipToEndChunk();
 }
 
@@ -193,26 +193,24 @@ Bool BaseList2D::ReadChunk(HyperFile& file, Long id, Long level)
   }
 }
 
-Bool BaseList2D::KeepChunk(HyperFile& file, Long id, Long level)
-{
-  return !IsLibraryChunk(id) && file.GetFileVersion() >= kVersionCurrent && keptChunks_.Read(file, id, level);
-}
+Bool BaseList2D::KeepChunk(HyperFile& file, Long id, Long level) { return keptChunks_.Read(file, id, level); }
 
 Bool BaseList2D::CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation)
 {
   auto* target = NodeCast<BaseList2D>(&destination);
   if (!target)
     return false;
+  const AllocationWatch watch;
   if (!(flags & kCopyNoInfo))
     target->info_ = info_;
   if (!data_.CopyTo(target->data_, flags, translation))
     return false;
-  target->markerDrawn_ = false; // a copy is never the same node
+  target->markerDrawn_ = target == this && markerDrawn_; // a copy is never the same node
   if (!keptChunks_.CopyTo(target->keptChunks_))
     return false;
-  link_.CopyLinkTo(&target->link_, translation);
   target->name_ = name_;
-  if (!GeListNode::CopyTo(destination, flags, translation))
+  if (!link_.CopyLinkTo(&target->link_, translation) || watch.Failed() ||
+      !GeListNode::CopyTo(destination, flags, translation))
     return false;
   if (!dynamicParameters_)
     DeleteObj(target->dynamicParameters_);

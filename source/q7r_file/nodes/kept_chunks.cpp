@@ -1,5 +1,6 @@
 #include "torvane/nodes/kept_chunks.h"
 
+#include "torvane/ids.h"
 #include "torvane/stream/hyper_file.h"
 #include "torvane/stream/raw_chunk_body.h"
 
@@ -36,6 +37,8 @@ KeptChunks::Chunk* KeptChunks::Append(Long id)
 
 Bool KeptChunks::Read(HyperFile& file, Long id, Long level)
 {
+  if (IsLibraryChunk(id) || file.GetFileVersion() < kVersionCurrent)
+    return false;
   Chunk* chunk = Append(id);
   if (!chunk) {
     file.SetError(FILEERROR_MEMORY);
@@ -55,6 +58,8 @@ void KeptChunks::Write(HyperFile& file) const
 
 Bool KeptChunks::CopyTo(KeptChunks& destination) const
 {
+  if (&destination == this)
+    return true;
   destination.Flush();
   for (const Chunk* chunk = first_; chunk; chunk = chunk->next) {
     Chunk* copy = destination.Append(chunk->id);

@@ -83,11 +83,12 @@ Bool BaseList2D::GetParameter(const ParameterPath& path, GeData& value)
   if (!found)
     return false;
   value = *found;
-  return true;
+  return value.GetType() == found->GetType();
 }
 
 Bool BaseList2D::SetParameter(const ParameterPath& path, const GeData& value)
 {
+  const AllocationWatch watch;
   BaseContainer* container = &data_;
   const Step step = WalkToLastLevel(path, [&](const ParameterLevel& level, Long below) {
     switch (level.dtype) {
@@ -105,7 +106,7 @@ Bool BaseList2D::SetParameter(const ParameterPath& path, const GeData& value)
   });
   if (step != Step::kOn)
     return step == Step::kDone;
-  return container->SetData(path[-1].id, value) != nullptr;
+  return container->SetData(path[-1].id, value) && !watch.Failed();
 }
 
 } // namespace _torvane_

@@ -7,9 +7,11 @@ Bool GetVectorParameter(const Vector& vector, const ParameterPath& path, GeData&
 {
   Vector copy = vector;
   Long component = path[1].id;
-  if (component == 0)
+  if (component == 0) {
     value = GeData(vector);
-  else if (const Real* place = ComponentOf(copy, component))
+    return value.GetType() == kDataVector;
+  }
+  if (const Real* place = ComponentOf(copy, component))
     value = GeData(*place);
   return true;
 }

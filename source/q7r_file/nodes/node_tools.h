@@ -20,7 +20,7 @@ Node* CloneNode(PrivateChunk& source, Node* clone, ULong flags, TransArray* tran
 }
 
 // A Vector parameter as a whole, or one component by the path's second level. A component of another number does
-// nothing. Always true.
+// nothing. False only when memory is too short for the value.
 Bool GetVectorParameter(const Vector& vector, const ParameterPath& path, GeData& value);
 Bool SetVectorParameter(Vector& vector, const ParameterPath& path, const GeData& value);
 

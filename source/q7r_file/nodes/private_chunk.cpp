@@ -1,5 +1,6 @@
 #include "torvane/nodes/private_chunk.h"
 
+#include "k2v_file/memory/stack_room.h"
 #include "torvane/document/base_document.h"
 #include "torvane/stream/hyper_file.h"
 #include "torvane/values/ge_data.h"
@@ -138,23 +139,25 @@ Bool PrivateChunk::ReadOneChunk(HyperFile& file, Loop& loop)
   return file.HasMemory() || loop.End(false);
 }
 
+// Reads the start of a chunk; an end mark passes.
+Bool PrivateChunk::ReadLoopHeader(HyperFile& file)
+{
+  UChar tag = 0;
+  if (!file.ReadValueHeader(tag))
+    return false;
+  Long id = 0;
+  Long level = 0;
+  if (tag == kTagChunkStart)
+    return file.ReadChunkStart(id, level);
+  if (tag == kTagChunkEnd)
+    return true;
+  file.SetError(FILEERROR_WRONG_VALUE);
+  return false;
+}
+
 Bool PrivateChunk::ReadChunks(HyperFile& file, Bool consumeHeader)
 {
-  if (consumeHeader) {
-    UChar tag = 0;
-    if (!file.ReadValueHeader(tag))
-      return false;
-    Long id = 0;
-    Long level = 0;
-    if (tag == kTagChunkStart) {
-      if (!file.ReadChunkStart(id, level))
-        return false;
-    } else if (tag != kTagChunkEnd) {
-      file.SetError(FILEERROR_WRONG_VALUE);
-      return false;
-    }
-  }
-  return ReadChunkLoop(file, true);
+  return (!consumeHeader || ReadLoopHeader(file)) && ReadChunkLoop(file, true);
 }
 
 void PrivateChunk::WriteAsChunk(HyperFile& file, Long id)
@@ -169,6 +172,8 @@ void PrivateChunk::WriteAsChunk(HyperFile& file, Long id)
 
 Bool PrivateChunk::CopyWithTranslation(PrivateChunk& destination, ULong flags, TransArray* translation)
 {
+  if (!HasStackRoom())
+    return false;
   AllocationWatch watch;
   if (translation || (flags & kCopyNoTranslation))
     return CopyTo(destination, flags, translation) && !watch.Failed();
@@ -179,9 +184,17 @@ Bool PrivateChunk::CopyWithTranslation(PrivateChunk& destination, ULong flags, T
   return !watch.Failed();
 }
 
-Bool PrivateChunk::GetParameterById(Long id, GeData& value) { return GetParameter(ParameterPath(id), value); }
+Bool PrivateChunk::GetParameterById(Long id, GeData& value)
+{
+  const AllocationWatch watch;
+  return GetParameter(ParameterPath(id), value) && !watch.Failed();
+}
 
-Bool PrivateChunk::SetParameterById(Long id, const GeData& value) { return SetParameter(ParameterPath(id), value); }
+Bool PrivateChunk::SetParameterById(Long id, const GeData& value)
+{
+  const AllocationWatch watch;
+  return SetParameter(ParameterPath(id), value) && !watch.Failed();
+}
 
 const NodeKind& NodeData::GetOwnerKind() const { return BaseList2D::kNodeKind; }
 

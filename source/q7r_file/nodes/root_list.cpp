@@ -89,9 +89,18 @@ void RootList2D::RemoveMember(BaseList2D* node)
     node->RemoveFromList();
 }
 
+// The children of a member become members before it is deleted, so that a chain of them takes no more of the stack than
+// one.
 void RootList2D::FreeAll()
 {
   while (BaseList2D* member = GetFirst()) {
+    auto* parent = NodeCast<BaseList4D>(member);
+    RootList2D* children = parent ? parent->GetChildRoot() : nullptr;
+    while (BaseList2D* child = children ? children->GetFirst() : nullptr) {
+      child->Remove();
+      child->SetListHead(nullptr);
+      list_.InsertLast(child);
+    }
     member->Remove();
     DeleteObj(member);
   }
@@ -132,10 +141,7 @@ Bool RootList2D::EntersChunk(Long id)
   return true;
 }
 
-Bool RootList2D::KeepChunk(HyperFile& file, Long id, Long level)
-{
-  return !IsLibraryChunk(id) && file.GetFileVersion() >= kVersionCurrent && keptChunks_.Read(file, id, level);
-}
+Bool RootList2D::KeepChunk(HyperFile& file, Long id, Long level) { return keptChunks_.Read(file, id, level); }
 
 Bool RootList2D::ReadChunk(HyperFile& file, Long id, Long level)
 {
@@ -167,6 +173,8 @@ Bool RootList2D::CopyTo(PrivateChunk& destination, ULong flags, TransArray* tran
   auto* target = NodeCast<RootList2D>(&destination);
   if (!target)
     return false;
+  if (target == this)
+    return true;
   // Members of a copied list always take their children along.
   flags &= ~kCopyNoChildren;
   target->FreeAll();
@@ -179,9 +187,7 @@ Bool RootList2D::CopyTo(PrivateChunk& destination, ULong flags, TransArray* tran
       return false;
     }
   }
-  if (!CopyKeptChunks(*target))
-    return false;
-  return true;
+  return CopyKeptChunks(*target);
 }
 
 Bool RootObject::EntersChunk(Long id) { return id == kChunkNestedList || RootList2D::EntersChunk(id); }

@@ -11,12 +11,15 @@ class EntryOrder : public GeSortAndSearch
  public:
   Long Compare(const void* a, const void* b) override
   {
+    ++comparisons;
     const auto& first = *static_cast<const UniqueIDEntry*>(a);
     const auto& second = *static_cast<const UniqueIDEntry*>(b);
     if (first.appId != second.appId)
       return first.appId < second.appId ? -1 : 1;
     return first.order - second.order;
   }
+
+  LLong comparisons = 0;
 };
 
 } // namespace
@@ -55,7 +58,7 @@ Bool UniqueIDArray::AdoptEntry(Long appId, void* data, LLong size)
 
 Bool UniqueIDArray::AppendEntry(Long appId, void* data, LLong size) { return Append({appId, GetCount(), size, data}); }
 
-void UniqueIDArray::SettleEntries()
+LLong UniqueIDArray::SettleEntries()
 {
   EntryOrder order;
   GeTempDynArray<UniqueIDEntry>::Sort(order);
@@ -69,6 +72,7 @@ void UniqueIDArray::SettleEntries()
   }
   while (GetCount() > kept)
     Pop();
+  return order.comparisons;
 }
 
 void UniqueIDArray::FreeEntries()

@@ -387,6 +387,8 @@ Bool BaseObject::CopyTo(PrivateChunk& destination, ULong flags, TransArray* tran
   auto* target = NodeCast<BaseObject>(&destination);
   if (!target)
     return false;
+  if (target == this)
+    return true;
   if (!CopyObjectData(*target, flags, translation))
     return false;
   if (!BaseList2D::CopyTo(*target, flags, translation) || !tags_.CopyWithTranslation(target->tags_, flags, translation))

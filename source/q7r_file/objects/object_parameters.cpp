@@ -126,8 +126,9 @@ constinit const BaseObject::VectorParameter BaseObject::kVectorParameters[] = {
 
 Bool BaseObject::GetParameter(const ParameterPath& path, GeData& value)
 {
+  const AllocationWatch watch;
   if (objectData_ && objectData_->GetParameter(path, value))
-    return true;
+    return !watch.Failed();
   if (const LongParameter* row = FindRow(kLongParameters, path[0].id)) {
     value = GeData(row->get(*this));
     return true;
@@ -135,16 +136,18 @@ Bool BaseObject::GetParameter(const ParameterPath& path, GeData& value)
   const VectorParameter* row = FindRow(kVectorParameters, path[0].id);
   if (!row)
     return BaseList2D::GetParameter(path, value);
-  return !NamesVectorPart(path[1].id) || GetVectorParameter(row->get(*this), path, value);
+  return !NamesVectorPart(path[1].id) || (GetVectorParameter(row->get(*this), path, value) && !watch.Failed());
 }
 
 Bool BaseObject::SetParameter(const ParameterPath& path, const GeData& value)
 {
-  if (objectData_ && objectData_->SetParameter(path, value))
-    return true;
+  const AllocationWatch watch;
+  const Bool taken = objectData_ && objectData_->SetParameter(path, value);
+  if (taken || watch.Failed())
+    return !watch.Failed();
   if (const LongParameter* row = FindRow(kLongParameters, path[0].id)) {
     row->set(*this, value.GetLong());
-    return true;
+    return !watch.Failed();
   }
   const VectorParameter* row = FindRow(kVectorParameters, path[0].id);
   if (!row)
@@ -154,7 +157,7 @@ Bool BaseObject::SetParameter(const ParameterPath& path, const GeData& value)
   Vector whole = row->get(*this);
   SetVectorParameter(whole, path, value);
   row->set(*this, whole);
-  return true;
+  return !watch.Failed();
 }
 
 } // namespace _torvane_

@@ -101,6 +101,8 @@ Bool BaseTag::CopyTo(PrivateChunk& destination, ULong flags, TransArray* transla
   auto* target = NodeCast<BaseTag>(&destination);
   if (!target)
     return false;
+  if (target == this)
+    return true;
   if (GetType() != target->GetType() || GetDiskType() != target->GetDiskType() ||
       !target->GetNodeKind().Is(GetNodeKind()))
     return false;
@@ -113,12 +115,16 @@ Bool BaseTag::CopyTo(PrivateChunk& destination, ULong flags, TransArray* transla
 
 Bool BaseTag::GetParameter(const ParameterPath& path, GeData& value)
 {
-  return (nodeData_ && nodeData_->GetParameter(path, value)) || BaseList2D::GetParameter(path, value);
+  const AllocationWatch watch;
+  const Bool known = nodeData_ && nodeData_->GetParameter(path, value);
+  return known || watch.Failed() ? !watch.Failed() : BaseList2D::GetParameter(path, value);
 }
 
 Bool BaseTag::SetParameter(const ParameterPath& path, const GeData& value)
 {
-  return (nodeData_ && nodeData_->SetParameter(path, value)) || BaseList2D::SetParameter(path, value);
+  const AllocationWatch watch;
+  const Bool known = nodeData_ && nodeData_->SetParameter(path, value);
+  return known || watch.Failed() ? !watch.Failed() : BaseList2D::SetParameter(path, value);
 }
 
 BaseTag* BaseTag::MakeEmpty() const

@@ -98,8 +98,6 @@ Long LengthOfTiles(Long id)
 
 Bool IsPlace(Long id) { return id == kTexturePosition || id == kTextureSize || id == kTextureRotation; }
 
-// Files below this version hold values that were dropped then.
-
 Real QuotientOrOne(Real a, Real b) { return b != 0.0 ? a / b : 1.0; }
 
 } // namespace
@@ -154,6 +152,7 @@ Bool TextureTag::GetParameter(const ParameterPath& path, GeData& value)
 
 Bool TextureTag::SetParameter(const ParameterPath& path, const GeData& value)
 {
+  const AllocationWatch watch;
   const Long id = path[0].id;
   if (const Long length = LengthOfTiles(id); length != 0) {
     const Real tiles = value.GetReal();
@@ -165,7 +164,7 @@ Bool TextureTag::SetParameter(const ParameterPath& path, const GeData& value)
   } else {
     SetPreset(id, value);
   }
-  return BaseTag::SetParameter(path, value);
+  return BaseTag::SetParameter(path, value) && !watch.Failed();
 }
 
 void TextureTag::SetPreset(Long id, const GeData& value)

@@ -444,6 +444,7 @@ constexpr ResultText kResultTexts[] = {
 
 Long LoadIESFile(IESLight*& light, const Filename& name, IESFactors factors)
 {
+  const AllocationWatch watch;
   BaseFile file;
   if (!file.Open(name, kFileRead))
     return kIESNotOpened;
@@ -458,6 +459,8 @@ Long LoadIESFile(IESLight*& light, const Filename& name, IESFactors factors)
   IESParser parser(file, *loaded, factors);
   if (result == kIESUnreadable && file.Seek(0) && parser.Parse())
     result = kIESLoaded;
+  if (watch.Failed())
+    result = kIESNoMemory;
   if (result == kIESLoaded) {
     DeleteObj(light);
     light = loaded;

@@ -126,7 +126,7 @@ Bool LightObjectData::SetParameter(const ParameterPath& path, const GeData& valu
   if (slot.kind == LightKind::kNone)
     return NodeData::SetParameter(path, value);
   if (!NeedSettings())
-    return true;
+    return false;
   switch (slot.kind) {
   case LightKind::kLong:
     settings_->longs[slot.index] = path[0].id == kLightKnotCount ? ClampKnotCount(value.GetLong()) : value.GetLong();
