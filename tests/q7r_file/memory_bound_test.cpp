@@ -91,9 +91,10 @@ std::vector<Crowd> Crowds()
   entry("gradient with transparency",
         ByteWriter().Long(1000481).Start(0, 1).Append(none).Bool(true).Append(none).End().bytes);
   entry("blend layers", ByteWriter().Long(1011131).Start(0, 2).Long(0).Long(3).Long(2).End().bytes);
-  const char* settings[] = {
-      "L R B L L3", "L R k", "R R R",         "R R R B",  "R L", "L [132,1 L-1 L1 L1000481 [0,1 [132,1 L-1 ] B ] ] B B",
-      "R R",        "R R",   "L R L B R R R", "R B B V V"};
+  const char* settings[] = {"L R B L L3", "L R k", "R R R",
+                            "R R R B",    "R L",   "L [132,1 L-1 L1 L1000481 [0,1 [132,1 L-1 ] B ] ] B B",
+                            "R R",        "R R",   "L R L B R R R",
+                            "R B B V0 V0"};
   for (int type = 1; type <= 10; ++type) {
     const std::string layer = "L" + std::to_string(type) + " B S L L " + settings[type - 1] + " B";
     crowds.push_back({"blend layer " + std::to_string(type), inObject({110050}), RecordBytes(ParseRecord(layer)),
