@@ -5,6 +5,8 @@
 #include <fstream>
 #include <iterator>
 
+#include "gltf/text.h"
+
 namespace gltf
 {
 
@@ -115,6 +117,18 @@ PictureFile LookAtPicture(std::vector<std::uint8_t> bytes)
   else
     picture.state = PictureState::kOther;
   return picture;
+}
+
+std::filesystem::path LocatePicture(const std::filesystem::path& folder, const std::string& name)
+{
+  if (name.find('\0') != std::string::npos)
+    return {};
+  std::error_code error;
+  const std::filesystem::path path = folder / ToPath(name);
+  if (std::filesystem::is_regular_file(path, error))
+    return path;
+  const std::filesystem::path beside = folder / ToPath(LastPart(name));
+  return std::filesystem::is_regular_file(beside, error) ? beside : path;
 }
 
 PictureFile ReadPictureFile(const std::filesystem::path& path, bool keepBytes)

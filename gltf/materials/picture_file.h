@@ -3,6 +3,7 @@
 
 #include <cstdint>
 #include <filesystem>
+#include <string>
 #include <vector>
 
 namespace gltf
@@ -23,6 +24,11 @@ struct PictureFile
   bool hasAlpha = false;           // a PNG that may let through what is behind it
   std::vector<std::uint8_t> bytes; // only if asked for
 };
+
+// Where the picture lies that a scene in `folder` names: the file as it is named, from that folder if need be; else one
+// of that name beside the scene, for scenes that came from elsewhere with their pictures. It may be that neither
+// exists.
+std::filesystem::path LocatePicture(const std::filesystem::path& folder, const std::string& name);
 
 // Looks at a file, whose kind is told by its first bytes. Devices and folders count as missing.
 PictureFile ReadPictureFile(const std::filesystem::path& path, bool keepBytes);

@@ -31,24 +31,9 @@ const Picture& Pictures::Find(const std::string& name)
   return found != byName_.end() ? found->second : byName_.emplace(name, Read(name)).first->second;
 }
 
-// The file as it is named, from the scene's folder if need be; else one of that name beside the scene, for scenes that
-// came from elsewhere with their pictures.
-fs::path Pictures::Locate(const std::string& name) const
-{
-  const fs::path& folder = context_.options.sceneFolder;
-  std::error_code error;
-  fs::path path = folder / ToPath(name);
-  if (!fs::is_regular_file(path, error)) {
-    const fs::path beside = folder / ToPath(LastPart(name));
-    if (fs::is_regular_file(beside, error))
-      path = beside;
-  }
-  return path;
-}
-
 Picture Pictures::Read(const std::string& name)
 {
-  const fs::path path = name.find('\0') == std::string::npos ? Locate(name) : fs::path();
+  const fs::path path = LocatePicture(context_.options.sceneFolder, name);
   std::error_code error;
   const fs::path real = fs::weakly_canonical(path, error);
   const auto found = byPath_.find(real);

@@ -29,7 +29,6 @@ class Pictures
 
  private:
   Picture Read(const std::string& name);
-  std::filesystem::path Locate(const std::string& name) const;
   std::size_t AddImage(const std::filesystem::path& path, const PictureFile& file);
   std::size_t SamplerOf(bool repeatX, bool repeatY);
 

@@ -6,6 +6,7 @@
 #include <string_view>
 #include <utility>
 
+#include "output/json_output.h"
 #include "output/terminal.h"
 
 namespace q7r
@@ -45,6 +46,58 @@ std::string Coloured(const char* word, const char* colour)
   return HasColour() ? std::string("\033[") + colour + "m" + word + "\033[0m" : word;
 }
 
+// The failure that was caught, with its parts where they are known.
+Failure Caught()
+{
+  try {
+    throw;
+  } catch (const Failure& failure) {
+    return failure;
+  } catch (const std::bad_alloc&) {
+    return Failure("not enough memory");
+  } catch (const std::exception& error) {
+    return Failure(error.what());
+  }
+}
+
+void TellTextOrNull(ValueSink& json, const char* name, const std::string& text)
+{
+  if (text.empty())
+    json.Key(name), json.Null();
+  else
+    json.Member(name, text);
+}
+
+void PrintFailure(const Failure& failure)
+{
+  PrintJson([&failure](ValueSink& json) {
+    json.Key("error");
+    json.BeginObject();
+    TellTextOrNull(json, "file", failure.File());
+    if (failure.Offset() < 0)
+      json.Key("offset"), json.Null();
+    else
+      json.Member("offset", failure.Offset());
+    TellTextOrNull(json, "path", failure.Chunks());
+    json.Member("message", failure.Message());
+    json.EndObject();
+  });
+  FlushStandardOutput();
+}
+
+// False where standard output takes nothing: then the failure is to be told elsewhere.
+bool TriedToPrint(const Failure& failure)
+{
+  if (!TheTalk().json || IsStandardOutputBroken())
+    return false;
+  try {
+    PrintFailure(failure);
+  } catch (const Failure&) {
+    return false;
+  }
+  return true;
+}
+
 } // namespace
 
 Talk& TheTalk()
@@ -55,15 +108,9 @@ Talk& TheTalk()
 
 int TellFailure()
 {
-  std::string line;
-  try {
-    throw;
-  } catch (const std::bad_alloc&) {
-    line = "not enough memory";
-  } catch (const std::exception& error) {
-    line = error.what();
-  }
-  Tell(Coloured("q7r:", kRed) + " " + line + "\n");
+  const Failure failure = Caught();
+  if (!TriedToPrint(failure))
+    Tell(Coloured("q7r:", kRed) + " " + failure.what() + "\n");
   return kNotDone;
 }
 

@@ -47,6 +47,7 @@ class Failure : public std::runtime_error
 struct Talk
 {
   bool quiet = false;   // failures alone
+  bool json = false;    // failures as JSON, on standard output
   bool verbose = false; // every warning, where else one stands for all of its kind
 };
 Talk& TheTalk();

@@ -35,6 +35,9 @@ class BaseMaterial : public BaseList2D
   BaseMaterial* GetNext() const { return NodeCast<BaseMaterial>(BaseList2D::GetNext()); }
   BaseMaterial* GetPrev() const { return NodeCast<BaseMaterial>(BaseList2D::GetPrev()); }
 
+  // What a plug-in's material holds behind its type and name; empty for others.
+  const RawChunkBody& GetRawBody() const { return raw_; }
+
   // The picture that is written with the material; empty on a new one.
   Bitmap& GetPreview() { return preview_; }
   const Bitmap& GetPreview() const { return preview_; }

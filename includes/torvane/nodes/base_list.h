@@ -126,6 +126,9 @@ class BaseList2D : public GeListNode
   // path.
   CTrack* FindTrack(const ParameterPath& path) const;
 
+  // Chunks of other programs among the node's own.
+  const KeptChunks& GetKeptChunks() const { return keptChunks_; }
+
   // Parameters added at run time. Adding takes the smallest free key from 1 on and gives the path (700, 5, 0),
   // (key, type, 0), or an empty path on failure. The others take such a path.
   const BaseContainer* GetDynamicParameters() const { return dynamicParameters_; } // null while there are none

@@ -2,12 +2,11 @@
 #pragma once
 
 #include "torvane/memory/memory.h"
+#include "torvane/stream/raw_chunk_body.h"
 #include "torvane/types.h"
 
 namespace _torvane_
 {
-
-class HyperFile;
 
 // A list of chunks, in the order in which they were read.
 class KeptChunks
@@ -18,7 +17,18 @@ class KeptChunks
   KeptChunks(const KeptChunks&) = delete; // use CopyTo
   KeptChunks& operator=(const KeptChunks&) = delete;
 
+  struct Chunk
+  {
+    explicit Chunk(Long chunkId) : id(chunkId) {}
+
+    Long id;
+    RawChunkBody body;
+    Chunk* next = nullptr;
+  };
+
   Bool IsEmpty() const { return !first_; }
+  // The chunks one by one; null when nothing is kept.
+  const Chunk* GetFirst() const { return first_; }
   void Flush();
   // Adds the chunk whose start was just read and consumes it with its end. False on an error of the file, which is
   // FILEERROR_MEMORY when memory is short. False, and nothing is read, for a chunk of this library's own numbers, since
@@ -29,8 +39,6 @@ class KeptChunks
   Bool CopyTo(KeptChunks& destination) const;
 
  private:
-  struct Chunk;
-
   Chunk* Append(Long id);
 
   Chunk* first_ = nullptr; // owned

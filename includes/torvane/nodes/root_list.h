@@ -51,6 +51,8 @@ class RootList2D : public PrivateChunk
   // Deletes all members with what is below them, and what was kept.
   void FreeAll();
   LLong GetCount() const;
+  // Members under labels that nobody knows.
+  const KeptChunks& GetKeptChunks() const { return keptChunks_; }
 
   // Copies what was kept, for those that copy the members on their own. False when memory is short.
   Bool CopyKeptChunks(RootList2D& destination) const { return keptChunks_.CopyTo(destination.keptChunks_); }

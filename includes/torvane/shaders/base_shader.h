@@ -37,6 +37,9 @@ class BaseShader : public BaseList4D
   BaseShader* GetNext() const { return NodeCast<BaseShader>(BaseList4D::GetNext()); }
   BaseShader* GetPrev() const { return NodeCast<BaseShader>(BaseList4D::GetPrev()); }
 
+  // What stands behind type and name in a file.
+  const RawChunkBody& GetRawBody() const { return raw_; }
+
   // The file of a bitmap shader; an empty name for any other type.
   Filename BitmapFilename() const;
   Bool HasBitmapFilename() const { return BitmapFilename().Content(); }

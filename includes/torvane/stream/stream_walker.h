@@ -34,6 +34,15 @@ class StreamWalker
   // The next value; false behind the last one, and where one can't be read.
   Bool Next(StreamValue& value);
 
+  // From now on Next hands every byte of Memory, Image, Array and the legacy forms to `take`, in pieces, where it would
+  // pass over them else; null ends that. An Array's bytes are those of its elements.
+  using BlockReader = void (*)(void* context, const UChar* bytes, LLong size);
+  void ReadBlocksInto(BlockReader take, void* context)
+  {
+    takeBlock_ = take;
+    blockContext_ = context;
+  }
+
   // What went wrong, where and why; code 0 while all is well. A file that ends inside a chunk is a problem too.
   const FileProblem& GetProblem() const { return file_.GetProblem(); }
   // The place and the reason for people, more exact than GetProblemText: "byte 90, in chunk 110059/110024: a text is
@@ -59,7 +68,11 @@ class StreamWalker
   Bool ReadText(StreamValue& value, LLong size);
   Bool ReadBlock(StreamValue& value, const UChar* start, LLong startSize, LLong size);
 
+  Bool PassBlock(LLong size);
+
   HyperFile file_;
+  BlockReader takeBlock_ = nullptr;
+  void* blockContext_ = nullptr;
   Long depth_ = 0;
   String reason_;
 };

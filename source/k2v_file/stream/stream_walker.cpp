@@ -158,9 +158,27 @@ Bool StreamWalker::ReadBlock(StreamValue& value, const UChar* start, LLong start
   const LLong elementSize = value.tag == kTagArray ? GetElementSize(static_cast<Long>(value.integer)) : 1;
   value.size = size / (elementSize > 0 ? elementSize : 1);
   value.headCount = static_cast<Long>(size < StreamValue::kHeadBytes ? size : StreamValue::kHeadBytes);
-  const Bool read = size == 0 || (bytes.ReadBytes(value.head, value.headCount) == value.headCount &&
-                                  bytes.Seek(size - value.headCount, kSeekRelative));
-  return read || FailCut(value);
+  if (size > 0 && bytes.ReadBytes(value.head, value.headCount) != value.headCount)
+    return FailCut(value);
+  if (takeBlock_)
+    takeBlock_(blockContext_, value.head, value.headCount);
+  return PassBlock(size - value.headCount) || FailCut(value);
+}
+
+Bool StreamWalker::PassBlock(LLong size)
+{
+  BaseFile& bytes = file_.GetFile();
+  if (!takeBlock_)
+    return size == 0 || bytes.Seek(size, kSeekRelative);
+  UChar piece[4096];
+  while (size > 0) {
+    const LLong count = size < LLong{sizeof piece} ? size : LLong{sizeof piece};
+    if (bytes.ReadBytes(piece, count) != count)
+      return false;
+    takeBlock_(blockContext_, piece, count);
+    size -= count;
+  }
+  return true;
 }
 
 } // namespace _torvane_

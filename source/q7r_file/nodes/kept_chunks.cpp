@@ -2,19 +2,9 @@
 
 #include "torvane/ids.h"
 #include "torvane/stream/hyper_file.h"
-#include "torvane/stream/raw_chunk_body.h"
 
 namespace _torvane_
 {
-
-struct KeptChunks::Chunk
-{
-  explicit Chunk(Long chunkId) : id(chunkId) {}
-
-  Long id;
-  RawChunkBody body;
-  Chunk* next = nullptr;
-};
 
 void KeptChunks::Flush()
 {

@@ -1,6 +1,8 @@
 #include "geometry_details.h"
 
-#include "node_details.h"
+#include <algorithm>
+#include <vector>
+
 #include "torvane/objects/point_object.h"
 #include "torvane/objects/point_object_data.h"
 #include "torvane/tags/selection_tag.h"
@@ -14,44 +16,114 @@ using namespace _torvane_;
 namespace
 {
 
-// One entry of an array.
-Json EntryJson(const Vector& point) { return ToJson(point); }
-Json EntryJson(const PolygonCorners& polygon) { return {polygon.a, polygon.b, polygon.c, polygon.d}; }
-Json EntryJson(const SplineSegment& segment) { return {segment.points, segment.closed != 0}; }
-Json EntryJson(const TangentPair& pair) { return {ToJson(pair.left), ToJson(pair.right)}; }
-Json EntryJson(SReal weight) { return weight; }
-Json EntryJson(const PackedNormals& normals) { return normals.components; }
-Json EntryJson(const SelectSegment& segment) { return {segment.first, segment.last}; }
+// The numbers of one entry, and how many there are.
+template <class Entry>
+struct EntryForm;
 
-Json EntryJson(const PackedUVWQuad& quad)
+template <>
+struct EntryForm<Vector>
 {
-  Json corners = Json::array();
-  for (const PackedUVW& corner : quad.corners)
-    corners.push_back(ToJson(UnpackUVW(corner)));
-  return corners;
-}
+  static constexpr NumberRows kForm = {nullptr, 0, 3, 0, false, true, nullptr};
+  static void Get(const Vector& point, double* row) { row[0] = point.x, row[1] = point.y, row[2] = point.z; }
+};
+
+template <>
+struct EntryForm<PolygonCorners>
+{
+  static constexpr NumberRows kForm = {nullptr, 0, 4, 0, true, true, nullptr};
+  static void Get(const PolygonCorners& polygon, double* row)
+  {
+    row[0] = polygon.a, row[1] = polygon.b, row[2] = polygon.c, row[3] = polygon.d;
+  }
+};
+
+template <>
+struct EntryForm<TangentPair>
+{
+  static constexpr NumberRows kForm = {nullptr, 0, 6, 3, false, true, nullptr};
+  static void Get(const TangentPair& pair, double* row)
+  {
+    EntryForm<Vector>::Get(pair.left, row);
+    EntryForm<Vector>::Get(pair.right, row + 3);
+  }
+};
+
+template <>
+struct EntryForm<SReal>
+{
+  static constexpr NumberRows kForm = {nullptr, 0, 1, 0, false, true, nullptr};
+  static void Get(SReal weight, double* row) { *row = static_cast<double>(weight); }
+};
+
+template <>
+struct EntryForm<ULong>
+{
+  static constexpr NumberRows kForm = {nullptr, 0, 1, 0, true, true, nullptr};
+  static void Get(ULong number, double* row) { *row = number; }
+};
+
+template <>
+struct EntryForm<PackedNormals>
+{
+  static constexpr NumberRows kForm = {nullptr, 0, 12, 0, true, true, nullptr};
+  static void Get(const PackedNormals& normals, double* row) { std::copy_n(normals.components, 12, row); }
+};
+
+template <>
+struct EntryForm<SelectSegment>
+{
+  static constexpr NumberRows kForm = {nullptr, 0, 2, 0, true, true, nullptr};
+  static void Get(const SelectSegment& segment, double* row) { row[0] = segment.first, row[1] = segment.last; }
+};
+
+template <>
+struct EntryForm<PackedUVWQuad>
+{
+  static constexpr NumberRows kForm = {nullptr, 0, 12, 3, false, true, nullptr};
+  static void Get(const PackedUVWQuad& quad, double* row)
+  {
+    for (std::size_t corner = 0; corner < 4; ++corner)
+      EntryForm<Vector>::Get(UnpackUVW(quad.corners[corner]), row + 3 * corner);
+  }
+};
 
 template <class Entry>
-Json ArrayJson(const Entry* entries, Long count)
+void TellArray(ValueSink& sink, const Entry* entries, Long count)
 {
-  Json array = Json::array();
-  for (Long i = 0; i < count; ++i)
-    array.push_back(EntryJson(entries[i]));
-  return array;
+  NumberRows rows = EntryForm<Entry>::kForm;
+  rows.entries = entries;
+  rows.count = count;
+  rows.get = [](const void* all, long long index, double* row) {
+    EntryForm<Entry>::Get(static_cast<const Entry*>(all)[index], row);
+  };
+  sink.Rows(rows);
 }
 
-Json SelectionJson(const BaseSelect& selection)
+// The second of the two is a truth value.
+void TellArray(ValueSink& sink, const SplineSegment* segments, Long count)
 {
-  return ArrayJson(selection.SegmentArray(), selection.SegmentCount());
+  sink.BeginArray(ValueSink::Layout::kLine);
+  for (Long i = 0; i < count; ++i) {
+    sink.BeginArray();
+    sink.Integer(segments[i].points);
+    sink.Bool(segments[i].closed != 0);
+    sink.EndArray();
+  }
+  sink.EndArray();
 }
 
-Json ValuesOf(const SelectionTag& tag) { return SelectionJson(tag.GetSelect()); }
+void TellSelection(ValueSink& sink, const BaseSelect& selection)
+{
+  TellArray(sink, selection.SegmentArray(), selection.SegmentCount());
+}
+
+void TellValuesOf(ValueSink& sink, const SelectionTag& tag) { TellSelection(sink, tag.GetSelect()); }
 LLong CountOf(const SelectionTag& tag) { return tag.GetSelect().SelectedCount(); }
 
 template <class Tag>
-Json ValuesOf(const Tag& tag)
+void TellValuesOf(ValueSink& sink, const Tag& tag)
 {
-  return ArrayJson(tag.GetArray(), tag.GetCount());
+  TellArray(sink, tag.GetArray(), tag.GetCount());
 }
 
 template <class Tag>
@@ -63,7 +135,7 @@ LLong CountOf(const Tag& tag)
 struct ArrayKind
 {
   const NodeKind& kind;
-  Json (*values)(const BaseTag& tag);
+  void (*tell)(ValueSink& sink, const BaseTag& tag);
   LLong (*count)(const BaseTag& tag);
   const char* one;
   const char* many;
@@ -72,7 +144,7 @@ struct ArrayKind
 template <class Tag>
 constexpr ArrayKind KindOf(const char* one, const char* many)
 {
-  return {Tag::kNodeKind, [](const BaseTag& tag) { return ValuesOf(*NodeCast<Tag>(&tag)); },
+  return {Tag::kNodeKind, [](ValueSink& sink, const BaseTag& tag) { TellValuesOf(sink, *NodeCast<Tag>(&tag)); },
           [](const BaseTag& tag) { return CountOf(*NodeCast<Tag>(&tag)); }, one, many};
 }
 
@@ -134,10 +206,12 @@ const NgonData* NgonsOf(const BaseObject& object)
 
 } // namespace
 
-Json TagValues(BaseTag& tag)
+void TellTagValues(ValueSink& sink, BaseTag& tag)
 {
-  const ArrayKind* kind = FindKind(tag);
-  return kind ? kind->values(tag) : Json();
+  if (const ArrayKind* kind = FindKind(tag)) {
+    sink.Key("values");
+    kind->tell(sink, tag);
+  }
 }
 
 std::string TagCountWords(BaseTag& tag)
@@ -162,15 +236,26 @@ std::string GeometryWords(BaseObject& object)
   return words;
 }
 
-void AddGeometry(BaseObject& object, Json& json)
+void TellGeometry(ValueSink& sink, BaseObject& object)
 {
-  for (const NamedSelection& one : SelectionsOf(object))
-    json["selections"][one.name] = SelectionJson(*one.selection);
-  const NgonData* ngons = NgonsOf(object);
-  for (Long i = 0; ngons && i < ngons->GetCount(); ++i) {
-    const NgonEntry& entry = *ngons->GetEntry(i);
-    json["ngons"].push_back(std::vector<ULong>(entry.edges, entry.edges + entry.count));
+  const std::vector<NamedSelection> selections = SelectionsOf(object);
+  if (!selections.empty()) {
+    sink.Key("selections");
+    sink.BeginObject();
+    for (const NamedSelection& one : selections) {
+      sink.Key(one.name);
+      TellSelection(sink, *one.selection);
+    }
+    sink.EndObject();
   }
+  const NgonData* ngons = NgonsOf(object);
+  if (!ngons)
+    return;
+  sink.Key("ngons");
+  sink.BeginArray();
+  for (Long i = 0; i < ngons->GetCount(); ++i)
+    TellArray(sink, ngons->GetEntry(i)->edges, ngons->GetEntry(i)->count);
+  sink.EndArray();
 }
 
 } // namespace q7r

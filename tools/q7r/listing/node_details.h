@@ -3,28 +3,28 @@
 #pragma once
 
 #include <string>
-#include <vector>
 
-#include "json_text.h"
-#include "node_index.h"
+#include "output/value_sink.h"
+#include "torvane/document/base_document.h"
 
 namespace q7r
 {
 
-// The parameters of an object's own data, by id; an empty object where there are none.
-Json ObjectParams(_torvane_::BaseObject& object);
-// The measured distribution of a light; null without one.
-Json ObjectIES(_torvane_::BaseObject& object);
-// The array of a tag; null for a tag without one.
-Json TagValues(_torvane_::BaseTag& tag);
-Json MaterialsJson(_torvane_::BaseDocument& document, NodeIndex& index);
-Json ViewsJson(_torvane_::BaseDocument& document, NodeIndex& index);
-
-// A few words about a node for the listing of people, such as "8 points"; empty where there is nothing to tell.
+// A few words about a node, such as "8 points"; empty where there is nothing to tell.
+std::string SummaryOf(_torvane_::BaseList2D& node);
 std::string ObjectWords(_torvane_::BaseObject& object);
-std::string TagWords(_torvane_::BaseTag& tag);
-// The lines of materials with their shaders, and of views with their draws.
-std::vector<std::string> MaterialLines(_torvane_::BaseDocument& document);
-std::vector<std::string> ViewLines(_torvane_::BaseDocument& document);
+std::string MaterialWords(_torvane_::BaseList2D& material);
+std::string DrawWords(_torvane_::BaseList2D& draw);
+
+// The parameters of an object's own data, by id ("params"); an empty object where there are none.
+void TellObjectParams(ValueSink& sink, _torvane_::BaseObject& object);
+// The measured distribution of a light ("ies"); nothing without one.
+void TellObjectIES(ValueSink& sink, _torvane_::BaseObject& object);
+
+// "name" in quotes.
+std::string QuotedName(const _torvane_::BaseList2D& node);
+// "  (1, 2, 3)" without the spaces.
+std::string NumbersText(const double* numbers, double factor = 1.0);
+std::string ColorText(const _torvane_::Vector& color);
 
 } // namespace q7r

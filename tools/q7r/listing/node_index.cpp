@@ -1,5 +1,9 @@
 #include "node_index.h"
 
+#include <algorithm>
+#include <string>
+#include <unordered_set>
+
 #include "torvane/document/base_document.h"
 #include "torvane/materials/base_material.h"
 
@@ -31,34 +35,48 @@ const NodeIndex::Places& NodeIndex::PlacesIn(const RootList2D& list)
   return entry->second;
 }
 
-Json NodeIndex::PathOf(const GeListNode* node)
+std::vector<long long> NodeIndex::PathOf(const GeListNode* node)
 {
-  Json path = Json::array();
+  std::vector<long long> path;
   const auto* named = NodeCast<BaseList2D>(node);
   while (const RootList2D* list = named ? ListOf(*named) : nullptr) {
     const Places& places = PlacesIn(*list);
     const auto found = places.find(named);
     if (found == places.end())
-      return nullptr;
-    path.insert(path.begin(), found->second);
+      return {};
+    path.push_back(static_cast<long long>(found->second));
     named = list->GetOwner();
   }
-  return path.empty() ? Json() : path;
+  std::reverse(path.begin(), path.end());
+  return path;
 }
 
-Json NodeIndex::LinksOf(const BaseContainer& container)
+void NodeIndex::TellPath(ValueSink& sink, const GeListNode* node)
 {
-  Json links = Json::object();
+  const std::vector<long long> path = PathOf(node);
+  if (path.empty())
+    return sink.Null();
+  sink.BeginArray(ValueSink::Layout::kLine);
+  for (const long long place : path)
+    sink.Integer(place);
+  sink.EndArray();
+}
+
+void NodeIndex::TellLinks(ValueSink& sink, const BaseContainer& container)
+{
+  sink.BeginObject(ValueSink::Layout::kLine);
+  std::unordered_set<Long> told;
   BaseContainer::Iterator iterator;
   Long id = 0;
   const GeData* value = nullptr;
   for (bool more = container.BrowseFirst(iterator, id, value); more; more = container.BrowseNext(iterator, id, value)) {
-    Json path = value->GetAliasLink() ? PathOf(value->GetLink()) : Json();
-    const std::string key = std::to_string(id);
-    if (!path.is_null() && !links.contains(key))
-      links[key] = std::move(path);
+    const GeListNode* target = value->GetAliasLink() ? value->GetLink() : nullptr;
+    if (!target || PathOf(target).empty() || !told.insert(id).second)
+      continue;
+    sink.Key(std::to_string(id));
+    TellPath(sink, target);
   }
-  return links;
+  sink.EndObject();
 }
 
 } // namespace q7r

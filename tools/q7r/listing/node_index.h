@@ -3,8 +3,10 @@
 
 #include <cstddef>
 #include <unordered_map>
+#include <vector>
 
-#include "json_text.h"
+#include "output/value_sink.h"
+#include "torvane/document/base_document.h"
 
 namespace q7r
 {
@@ -14,14 +16,15 @@ class NodeIndex
  public:
   // A node's places in its lists, from the root list down: [2, 0] is the first child of the third member. Null for
   // null and for what is no named node.
-  Json PathOf(const _torvane_::GeListNode* node);
+  void TellPath(ValueSink& sink, const _torvane_::GeListNode* node);
   // The paths of what the links of a container lead to, by id; links that lead nowhere are left out.
-  Json LinksOf(const _torvane_::BaseContainer& container);
+  void TellLinks(ValueSink& sink, const _torvane_::BaseContainer& container);
 
  private:
   using Places = std::unordered_map<const _torvane_::BaseList2D*, std::size_t>;
 
   const Places& PlacesIn(const _torvane_::RootList2D& list);
+  std::vector<long long> PathOf(const _torvane_::GeListNode* node);
 
   std::unordered_map<const _torvane_::RootList2D*, Places> lists_; // each counted when it is first asked for
 };

@@ -4,10 +4,12 @@
 #include "geometry_details.h"
 #include "ies_text.h"
 #include "node_details.h"
+#include "parameter_names.h"
 #include "scene_file.h"
 #include "torvane/objects/camera_object_data.h"
 #include "torvane/objects/light_object_data.h"
 #include "torvane/views/base_draw.h"
+#include "values.h"
 
 namespace q7r
 {
@@ -34,24 +36,10 @@ std::string Labelled(const char* label, Real number, const char* unit)
   return text;
 }
 
-std::string ColorText(const Vector& color)
-{
-  char text[100];
-  std::snprintf(text, sizeof text, ", color (%.6g, %.6g, %.6g)", color.x, color.y, color.z);
-  return text;
-}
-
-std::string ProjectionText(Long projection)
-{
-  if (projection == 0)
-    return "perspective";
-  return projection == 4 ? "parallel" : "projection " + std::to_string(projection);
-}
-
 std::string CameraWords(BaseObject& camera)
 {
   const BaseContainer& settings = camera.GetDataInstance();
-  std::string words = " " + ProjectionText(settings.GetLong(kCameraProjection));
+  std::string words = ProjectionWords(settings.GetLong(kCameraProjection));
   words += Labelled("focal length", settings.GetReal(kCameraFocalLength), " mm");
   words += Labelled("aperture", settings.GetReal(kCameraApertureWidth), " mm");
   const GeData field = Parameter(camera, kCameraFieldOfView);
@@ -60,26 +48,11 @@ std::string CameraWords(BaseObject& camera)
   return words + Labelled("focus", settings.GetReal(kCameraFocusDistance), "");
 }
 
-std::string LightTypeText(Long type)
-{
-  switch (type) {
-  case kLightPoint:
-    return "point";
-  case kLightSpot:
-    return "spot";
-  case kLightOther:
-    return "parallel";
-  case kLightIES:
-    return "measured";
-  default:
-    return "light type " + std::to_string(type);
-  }
-}
-
 std::string LightWords(BaseObject& light)
 {
   const Long type = Parameter(light, kLightType).GetLong();
-  std::string words = " " + LightTypeText(type) + ColorText(Parameter(light, kLightColor).GetVector());
+  std::string words = LightTypeWords(type);
+  words += ", color " + ColorText(Parameter(light, kLightColor).GetVector());
   words += Labelled("intensity", 100.0 * Parameter(light, kLightBrightness).GetReal(), " %");
   if (Parameter(light, kLightShadow).GetLong() != 0)
     words += Labelled("shadow", 100.0 * Parameter(light, kLightShadowDensity).GetReal(), " %");
@@ -94,45 +67,29 @@ std::string LightWords(BaseObject& light)
   return words;
 }
 
-Json DrawJson(BaseDraw& draw, NodeIndex& index)
-{
-  const BaseObject& editor = *draw.GetEditorCamera();
-  Json camera = ToJson(editor.GetDataInstance());
-  camera["pos"] = ToJson(editor.GetRelPos());
-  camera["scale"] = ToJson(editor.GetRelScale());
-  camera["rot"] = ToJson(editor.GetRelRot());
-  return {{"sceneCamera", LinkJson(draw.GetSceneCamera())},
-          {"sceneCameraIndex", index.PathOf(draw.GetSceneCamera().GetLink())},
-          {"data", ToJson(draw.GetDataInstance())},
-          {"camera", std::move(camera)}};
-}
-
-BaseDraw* FirstDraw(ViewPanel& panel) { return NodeCast<BaseDraw>(panel.GetDraws().GetFirst()); }
-
-ViewPanel* FirstPanel(BaseDocument& document) { return NodeCast<ViewPanel>(document.GetViewPanelRoot()->GetFirst()); }
-
 } // namespace
 
-Json ObjectParams(BaseObject& object)
+void TellObjectParams(ValueSink& sink, BaseObject& object)
 {
-  Json params = Json::object();
-  if (!LightDataOf(object))
-    return params;
+  sink.Key("params");
+  sink.BeginObject();
   for (const LightParameterRange& range : kLightParameters) {
-    for (Long id = range.first; id <= range.last; ++id)
-      params[std::to_string(id)] = ToJson(Parameter(object, id));
+    for (Long id = range.first; id <= range.last && LightDataOf(object); ++id)
+      Tell(sink, std::to_string(id), Parameter(object, id));
   }
-  return params;
+  sink.EndObject();
 }
 
-Json ObjectIES(BaseObject& object)
+void TellObjectIES(ValueSink& sink, BaseObject& object)
 {
   const IESLight* light = GetIESLight(&object);
   if (!light)
-    return {};
-  Json json = IESJson(*light);
-  json["lumensTimesWatts"] = light->GetLumens();
-  return json;
+    return;
+  sink.Key("ies");
+  sink.BeginObject();
+  TellIES(sink, *light);
+  sink.Member("lumensTimesWatts", light->GetLumens());
+  sink.EndObject();
 }
 
 std::string ObjectWords(BaseObject& object)
@@ -142,31 +99,15 @@ std::string ObjectWords(BaseObject& object)
   return LightDataOf(object) ? LightWords(object) : GeometryWords(object);
 }
 
-Json ViewsJson(BaseDocument& document, NodeIndex& index)
+std::string DrawWords(BaseList2D& node)
 {
-  Json views = Json::array();
-  for (ViewPanel* panel = FirstPanel(document); panel; panel = panel->GetNext()) {
-    Json draws = Json::array();
-    for (BaseDraw* draw = FirstDraw(*panel); draw; draw = draw->GetNext())
-      draws.push_back(DrawJson(*draw, index));
-    views.push_back({{"draws", std::move(draws)}});
-  }
-  return views;
-}
-
-std::vector<std::string> ViewLines(BaseDocument& document)
-{
-  std::vector<std::string> lines;
-  for (ViewPanel* panel = FirstPanel(document); panel; panel = panel->GetNext()) {
-    lines.push_back("panel");
-    for (BaseDraw* draw = FirstDraw(*panel); draw; draw = draw->GetNext()) {
-      const Long projection = draw->GetEditorCamera()->GetDataInstance().GetLong(kCameraProjection);
-      const auto* camera = NodeCast<BaseList2D>(draw->GetSceneCamera().GetLink());
-      lines.push_back("  " + ProjectionText(projection) +
-                      (camera ? " through \"" + ToUtf8(camera->GetName()) + "\"" : std::string()));
-    }
-  }
-  return lines;
+  auto& draw = static_cast<BaseDraw&>(node);
+  const BaseObject* editor = draw.GetEditorCamera();
+  if (!editor)
+    throw std::bad_alloc();
+  const BaseList2D* camera = TargetOf(draw.GetSceneCamera());
+  return ProjectionWords(editor->GetDataInstance().GetLong(kCameraProjection)) +
+         (camera ? " through " + QuotedName(*camera) : std::string());
 }
 
 } // namespace q7r

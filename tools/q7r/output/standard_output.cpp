@@ -28,6 +28,8 @@ void Require(bool good)
 
 } // namespace
 
+bool IsStandardOutputBroken() { return isBroken; }
+
 void Print(std::string_view text)
 {
   errno = 0;

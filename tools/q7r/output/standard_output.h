@@ -14,6 +14,9 @@ void PrintLine(std::string_view text);
 #endif
 void PrintFormatted(const char* format, ...);
 
+// True once something could not be written: nothing that is printed arrives any more.
+bool IsStandardOutputBroken();
+
 // Writes what is pending. Also finds what went wrong with what others printed there.
 void FlushStandardOutput();
 

@@ -1,8 +1,8 @@
 // q7r compositions: what a project or composition file holds.
-#include <cstdio>
 #include <memory>
-#include <nlohmann/json.hpp>
 
+#include "output/json_output.h"
+#include "output/standard_output.h"
 #include "project_input.h"
 #include "verbs/verbs.h"
 
@@ -27,31 +27,34 @@ struct Options
   bool json = false;
 };
 
-void PrintJson(const std::vector<host::CompositionSummary>& compositions)
+void TellCompositions(ValueSink& json, const std::vector<host::CompositionSummary>& compositions)
 {
-  nlohmann::ordered_json list = nlohmann::ordered_json::array();
-  for (const host::CompositionSummary& c : compositions)
-    list.push_back({{"name", c.name},
-                    {"id", c.id},
-                    {"width", c.width},
-                    {"height", c.height},
-                    {"frameRate", c.frameRate},
-                    {"frames", c.frames},
-                    {"seconds", c.seconds},
-                    {"layers", c.layers},
-                    {"exported", c.exported},
-                    {"active", c.isActive}});
-  const auto replace = nlohmann::ordered_json::error_handler_t::replace;
-  std::printf("%s\n", nlohmann::ordered_json{{"compositions", list}}.dump(2, ' ', false, replace).c_str());
+  json.Key("compositions");
+  json.BeginArray();
+  for (const host::CompositionSummary& c : compositions) {
+    json.BeginObject();
+    json.Member("name", c.name);
+    json.Member("id", c.id);
+    json.Member("width", c.width);
+    json.Member("height", c.height);
+    json.Member("frameRate", c.frameRate);
+    json.Member("frames", c.frames);
+    json.Member("seconds", c.seconds);
+    json.Member("layers", c.layers);
+    json.Member("exported", c.exported);
+    json.Member("active", c.isActive);
+    json.EndObject();
+  }
+  json.EndArray();
 }
 
 int Compositions(const Options& options)
 {
   const std::vector<host::CompositionSummary> compositions = OpenProject(options.file)->Compositions();
   if (options.json)
-    PrintJson(compositions);
+    PrintJson([&](ValueSink& json) { TellCompositions(json, compositions); });
   else
-    std::fputs(CompositionTable(compositions).c_str(), stdout);
+    Print(CompositionTable(compositions));
   return kDone;
 }
 

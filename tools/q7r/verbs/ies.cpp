@@ -4,6 +4,8 @@
 
 #include "file_list.h"
 #include "listing/ies_text.h"
+#include "listing/parameter_names.h"
+#include "output/json_output.h"
 #include "output/standard_output.h"
 #include "scene_file.h"
 #include "standard_input.h"
@@ -43,24 +45,6 @@ IESPtr LoadIES(const std::string& path)
   if (result != kIESLoaded)
     throw Failure(InputName(path), GetIESResultText(result));
   return IESPtr(loaded);
-}
-
-Json Numbers(const Real* numbers, Long count)
-{
-  Json json = Json::array();
-  for (Long i = 0; i < count; ++i)
-    json.push_back(numbers[i]);
-  return json;
-}
-
-Json Numbers(const GeTempDynArray<Real>& numbers) { return Numbers(numbers.Data(), numbers.GetCount()); }
-
-Json RowsJson(const IESLight& light)
-{
-  Json rows = Json::array();
-  for (Long i = 0; light.IsComplete() && i < light.GetHorizontalCount(); ++i)
-    rows.push_back(Numbers(light.candela.Data() + i * light.GetVerticalCount(), light.GetVerticalCount()));
-  return rows;
 }
 
 const char* VersionText(Long version)
@@ -109,7 +93,7 @@ void PrintIES(const IESLight& light)
   Row("luminaire", ToUtf8(light.luminaire));
   Row("lamp catalogue", ToUtf8(light.lampCatalogue));
   Row("lamp", ToUtf8(light.lamp));
-  Row("shape", light.shape == -1 ? "none" : std::to_string(light.shape));
+  Row("shape", IESShapeWords(light.shape));
   Row("size", SizeOf(light.size));
   Row("vertical angles", AnglesText(light.verticalAngles));
   Row("horizontal angles", AnglesText(light.horizontalAngles));
@@ -118,44 +102,25 @@ void PrintIES(const IESLight& light)
   Row("lumens", NumberText(light.GetLumens()));
 }
 
-Json LightJson(const IESLight& light)
+void PrintIESJson(const IESLight& light)
 {
-  Json json = IESJson(light);
-  json["lumens"] = light.GetLumens();
-  return json;
+  PrintJson([&light](ValueSink& json) {
+    TellIES(json, light);
+    json.Member("lumens", light.GetLumens());
+  });
 }
 
 int ShowIES(const std::string& file, const Options& options)
 {
   const IESPtr light = LoadIES(file);
   if (options.json)
-    PrintLine(LightJson(*light).dump(1, ' ', false, Json::error_handler_t::replace));
+    PrintIESJson(*light);
   else
     PrintIES(*light);
   return kDone;
 }
 
 } // namespace
-
-Json IESJson(const IESLight& light)
-{
-  return {{"fileVersion", light.fileVersion},
-          {"tiltMode", light.tiltMode},
-          {"manufacturer", ToJson(light.manufacturer)},
-          {"luminaireCatalogue", ToJson(light.luminaireCatalogue)},
-          {"luminaire", ToJson(light.luminaire)},
-          {"lampCatalogue", ToJson(light.lampCatalogue)},
-          {"lamp", ToJson(light.lamp)},
-          {"shape", light.shape},
-          {"size", ToJson(light.size)},
-          {"verticalCount", light.GetVerticalCount()},
-          {"horizontalCount", light.GetHorizontalCount()},
-          {"verticalAngles", Numbers(light.verticalAngles)},
-          {"horizontalAngles", Numbers(light.horizontalAngles)},
-          {"candela", RowsJson(light)},
-          {"maxCandela", light.maxCandela},
-          {"totalFlux", light.GetTotalFlux()}};
-}
 
 void AddIES(CLI::App& program, int& status)
 {

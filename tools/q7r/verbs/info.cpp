@@ -4,9 +4,10 @@
 #include <memory>
 
 #include "file_list.h"
-#include "listing/json_text.h"
 #include "listing/scene_counts.h"
 #include "listing/type_names.h"
+#include "listing/values.h"
+#include "output/json_output.h"
 #include "output/standard_output.h"
 #include "scene_file.h"
 #include "verbs.h"
@@ -42,37 +43,46 @@ std::string Parameter(BaseDocument& document, Long id)
   return value.GetType() == kDataString ? ToUtf8(value.GetString()) : std::string();
 }
 
-Json ByType(const std::map<Long, long long>& counts)
+void TellTypes(ValueSink& sink, const char* name, const std::map<Long, long long>& counts)
 {
-  Json json = Json::object();
+  sink.Key(name);
+  sink.BeginObject();
   for (const auto& [type, count] : counts)
-    json[std::to_string(type)] = count;
-  return json;
+    sink.Member(std::to_string(type), count);
+  sink.EndObject();
 }
 
-Json InfoJson(BaseDocument& document, const SceneCounts& counts, std::uintmax_t size)
+// The texts that a document has about itself.
+constexpr struct
+{
+  const char* name;
+  Long id;
+} kTexts[] = {{"writer", kDocumentWriterText},
+              {"saved", kDocumentSaveText},
+              {"creator", kDocumentCreatorText},
+              {"created", kDocumentCreationText}};
+
+void TellInfo(ValueSink& sink, BaseDocument& document, const SceneCounts& counts, std::uintmax_t size)
 {
   const DocumentPref& pref = document.GetPref();
-  return {{"size", size},
-          {"version", document.GetLoadedVersion()},
-          {"name", ToJson(document.GetName())},
-          {"writer", Parameter(document, kDocumentWriterText)},
-          {"saved", Parameter(document, kDocumentSaveText)},
-          {"creator", Parameter(document, kDocumentCreatorText)},
-          {"created", Parameter(document, kDocumentCreationText)},
-          {"fps", pref.GetFps()},
-          {"min", ToJson(pref.GetMinTime())},
-          {"max", ToJson(pref.GetMaxTime())},
-          {"objects", Sum(counts.objects)},
-          {"objectTypes", ByType(counts.objects)},
-          {"tags", Sum(counts.tags)},
-          {"tagTypes", ByType(counts.tags)},
-          {"materials", document.GetMaterialRoot()->GetCount()},
-          {"layers", document.GetLayerRoot()->GetCount()},
-          {"renderSettings", document.GetRenderDataRoot()->GetCount()},
-          {"views", document.GetViewPanelRoot()->GetCount()},
-          {"tracks", counts.tracks},
-          {"keys", counts.keys}};
+  sink.Member("size", size);
+  sink.Member("version", document.GetLoadedVersion());
+  Tell(sink, "name", document.GetName());
+  for (const auto& text : kTexts)
+    sink.Member(text.name, Parameter(document, text.id));
+  sink.Member("fps", pref.GetFps());
+  Tell(sink, "min", pref.GetMinTime());
+  Tell(sink, "max", pref.GetMaxTime());
+  sink.Member("objects", Sum(counts.objects));
+  TellTypes(sink, "objectTypes", counts.objects);
+  sink.Member("tags", Sum(counts.tags));
+  TellTypes(sink, "tagTypes", counts.tags);
+  sink.Member("materials", document.GetMaterialRoot()->GetCount());
+  sink.Member("layers", document.GetLayerRoot()->GetCount());
+  sink.Member("renderSettings", document.GetRenderDataRoot()->GetCount());
+  sink.Member("views", document.GetViewPanelRoot()->GetCount());
+  sink.Member("tracks", counts.tracks);
+  sink.Member("keys", counts.keys);
 }
 
 std::string TypesText(const std::map<Long, long long>& counts)
@@ -89,37 +99,37 @@ void Row(const char* label, const std::string& text)
     PrintFormatted("%-16s %s\n", label, text.c_str());
 }
 
-void PrintInfo(const Json& info, const SceneCounts& counts)
+void PrintInfo(BaseDocument& document, const SceneCounts& counts, std::uintmax_t size)
 {
-  auto number = [&info](const char* key) { return info[key].dump(); };
-  auto seconds = [&info](const char* key) { return info[key][0].get<double>() / info[key][1].get<double>(); };
+  const DocumentPref& pref = document.GetPref();
   char range[80];
-  std::snprintf(range, sizeof range, "%g to %g s", seconds("min"), seconds("max"));
-  Row("size", SizeText(info["size"].get<std::uintmax_t>()));
-  Row("version", number("version"));
-  for (const char* key : {"name", "writer", "saved", "creator", "created"})
-    Row(key, info[key].get<std::string>());
-  Row("frame rate", number("fps") + " fps");
+  std::snprintf(range, sizeof range, "%g to %g s", pref.GetMinTime().Get(), pref.GetMaxTime().Get());
+  Row("size", SizeText(size));
+  Row("version", std::to_string(document.GetLoadedVersion()));
+  Row("name", ToUtf8(document.GetName()));
+  for (const auto& text : kTexts)
+    Row(text.name, Parameter(document, text.id));
+  Row("frame rate", std::to_string(pref.GetFps()) + " fps");
   Row("range", range);
-  Row("objects", number("objects") + TypesText(counts.objects));
-  Row("tags", number("tags") + TypesText(counts.tags));
-  Row("materials", number("materials"));
-  Row("layers", number("layers"));
-  Row("render settings", number("renderSettings"));
-  Row("views", number("views"));
-  Row("tracks", number("tracks"));
-  Row("keys", number("keys"));
+  Row("objects", std::to_string(Sum(counts.objects)) + TypesText(counts.objects));
+  Row("tags", std::to_string(Sum(counts.tags)) + TypesText(counts.tags));
+  Row("materials", std::to_string(document.GetMaterialRoot()->GetCount()));
+  Row("layers", std::to_string(document.GetLayerRoot()->GetCount()));
+  Row("render settings", std::to_string(document.GetRenderDataRoot()->GetCount()));
+  Row("views", std::to_string(document.GetViewPanelRoot()->GetCount()));
+  Row("tracks", std::to_string(counts.tracks));
+  Row("keys", std::to_string(counts.keys));
 }
 
 int Info(const std::string& file, const Options& options)
 {
   DocumentPtr document = LoadScene(file);
   const SceneCounts counts = CountScene(*document);
-  Json info = InfoJson(*document, counts, InputSize(file));
+  const std::uintmax_t size = InputSize(file);
   if (options.json)
-    PrintLine(info.dump(1, ' ', false, Json::error_handler_t::replace));
+    PrintJson([&](ValueSink& json) { TellInfo(json, *document, counts, size); });
   else
-    PrintInfo(info, counts);
+    PrintInfo(*document, counts, size);
   return kDone;
 }
 

@@ -21,5 +21,6 @@ void AddCompositions(CLI::App& program, int& status);
 void AddExtract(CLI::App& program, int& status);
 void AddConvert(CLI::App& program, int& status);
 void AddView(CLI::App& program, int& status);
+void AddDiff(CLI::App& program, int& status);
 
 } // namespace q7r

@@ -1,0 +1,96 @@
+// What a scene holds, told once for all listings: for programs, for people and for comparing.
+#pragma once
+
+#include <array>
+#include <string>
+#include <string_view>
+#include <utility>
+
+#include "node_index.h"
+#include "output/value_sink.h"
+#include "torvane/animation/ctrack.h"
+#include "torvane/document/base_document.h"
+#include "torvane/materials/base_material.h"
+#include "torvane/tags/base_tag.h"
+#include "torvane/views/base_draw.h"
+
+namespace q7r
+{
+
+// How much is told.
+struct Scope
+{
+  bool data = true;      // containers, parameters and arrays; without them what a line for people takes
+  bool keys = true;      // of tracks
+  bool words = true;     // what numbers mean, in words and by names
+  bool places = true;    // what follows from where nodes stand: numbers in lists, places in the world
+  bool origin = true;    // who wrote the file and when, and the like
+  bool identity = false; // markers and states of nodes
+  int depth = -1;        // levels of children; -1: all
+  std::string objects;   // a pattern for names: these objects alone, with all below them; empty: everything
+};
+
+// The lists that a node owns, with the names that listings give them.
+struct NodeList
+{
+  const char* name = nullptr;
+  const _torvane_::RootList2D* root = nullptr; // null: an empty list
+};
+
+class NodeLists
+{
+ public:
+  explicit NodeLists(_torvane_::BaseList2D& node);
+
+  const NodeList* begin() const { return lists_.data(); }
+  const NodeList* end() const { return lists_.data() + count_; }
+
+ private:
+  void Add(const char* name, const _torvane_::RootList2D* root, bool always);
+
+  static constexpr std::size_t kMost = 8;
+  std::array<NodeList, kMost> lists_;
+  std::size_t count_ = 0;
+};
+
+class SceneTeller
+{
+ public:
+  SceneTeller(ValueSink& sink, Scope scope) : sink_(sink), scope_(std::move(scope)) {}
+
+  // The members of an object: the document and its lists.
+  void TellScene(_torvane_::BaseDocument& document);
+  // The members that tell a node without its lists.
+  void TellOwn(_torvane_::BaseList2D& node);
+  // An object for a key.
+  void TellKey(_torvane_::CKey& key);
+
+ private:
+  void TellList(const NodeList& list, int depth);
+  void TellNode(_torvane_::BaseList2D& node, int depth);
+  void TellMatches(_torvane_::BaseList2D* first, const std::string& above);
+  void TellLists(_torvane_::BaseList2D& node, int depth);
+  void TellObject(_torvane_::BaseObject& object);
+  void TellObjectData(_torvane_::BaseObject& object);
+  void TellTag(_torvane_::BaseTag& tag);
+  void TellMaterial(_torvane_::BaseMaterial& material);
+  void TellDocument(_torvane_::BaseDocument& document);
+  void TellDraw(_torvane_::BaseDraw& draw);
+  void TellTrack(_torvane_::CTrack& track);
+  void TellKeys(const _torvane_::CCurve& curve);
+  void TellCurves(_torvane_::CTrack& track);
+  void TellParticulars(_torvane_::BaseList2D& node);
+  void TellData(_torvane_::BaseList2D& node);
+  void TellKept(_torvane_::BaseList2D& node);
+  void TellIdentity(_torvane_::BaseList2D& node);
+
+  ValueSink& sink_;
+  const Scope scope_;
+  NodeIndex index_;
+  _torvane_::Matrix up_; // the global matrix of the object above
+};
+
+// True if a name fits a pattern: "*" for any text, "?" for one character, all else for itself.
+bool Fits(std::string_view name, std::string_view pattern);
+
+} // namespace q7r
