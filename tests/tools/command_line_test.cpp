@@ -122,7 +122,7 @@ TEST_F(CommandLine, LeavesAnExistingFileAloneWithoutForce)
     EXPECT_EQ(ReadWholeFile(old).size(), 8U);
     const RunResult forced = RunQ7r(arguments + " --force");
     EXPECT_EQ(forced.status, 0) << forced.err;
-    EXPECT_EQ(RunQ7r("check " + Quoted(old)).status, 0);
+    EXPECT_EQ(RunQ7r("info " + Quoted(old)).status, 0);
   }
 }
 
@@ -154,8 +154,7 @@ TEST_F(CommandLine, SaysWhatIsWrongWithASceneFileAndDestroysNothing)
     SCOPED_TRACE(c.name);
     const std::string file = Write(c.name, c.bytes);
     for (const std::string& arguments :
-         {"info " + Quoted(file), "tree --json " + Quoted(file),
-          "resave " + Quoted(file) + " " + Quoted(folder_ / "new.q7r"),
+         {"info " + Quoted(file), "tree " + Quoted(file), "resave " + Quoted(file) + " " + Quoted(folder_ / "new.q7r"),
           "resave --force " + Quoted(file) + " " + Quoted(file),
           "merge " + Quoted(folder_ / "scene.q7r") + " " + Quoted(file) + " -o " + Quoted(folder_ / "new.q7r")})
       ExpectRefusal(RunQ7r(arguments), {"q7r: " + file + ": ", c.says});
@@ -197,7 +196,7 @@ TEST_F(CommandLine, TellsArgumentsThatItCannotTake)
   };
   for (const auto& c : cases)
     ExpectRefusal(RunQ7r(c.arguments), {c.says});
-  for (const char* verb : {"", "export", "info", "tree", "dump", "check", "resave", "merge"}) {
+  for (const char* verb : {"", "export", "info", "tree", "dump", "check", "resave", "merge", "diff"}) {
     const RunResult run = RunQ7r(std::string(verb) + " --help");
     EXPECT_EQ(run.status, 0) << verb;
     EXPECT_NE(run.out.find("Usage: q7r"), std::string::npos) << run.out;

@@ -121,10 +121,10 @@ TEST(GeometryTree, CountsInWords)
   const TempFolder folder;
   const RunResult run = RunQ7r("tree " + Quoted(WriteScene(folder)));
   EXPECT_EQ(run.status, 0) << run.err;
-  for (const char* line : {"Polygon \"roof\"  pos (0, 0, 0) 3 points, 2 polygons, 1 n-gon, 1 edge hidden\n",
+  for (const char* line : {"Polygon \"roof\"  pos (0, 0, 0)  3 points, 2 polygons, 1 n-gon, 1 edge hidden\n",
                            "    tag Point Selection \"tops\" 6 selected\n", "    tag Vertex Map \"heat\" 3 weights\n",
                            "    tag UVW \"UVW\" 2 polygons\n", "    tag Normals 1 polygon\n",
-                           "Spline \"arc\"  pos (0, 0, 0) 1 point\n", "    tag Segments 2 segments\n"})
+                           "Spline \"arc\"  pos (0, 0, 0)  1 point\n", "    tag Segments 2 segments\n"})
     EXPECT_NE(run.out.find(line), std::string::npos) << line << "is missing in\n" << run.out;
 }
 

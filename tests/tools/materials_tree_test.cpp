@@ -43,7 +43,7 @@ TEST(MaterialsTree, ListsColourChannelsAndShaders)
   const RunResult run = RunQ7r("tree " + Quoted(WriteScene(folder)));
   EXPECT_EQ(run.status, 0) << run.err;
   EXPECT_NE(run.out.find("materials\n"
-                         "  Material \"Wall\"  color (1, 0.5, 0.25)  channels -1 0\n"
+                         "  Material \"Wall\"  color (1, 0.5, 0.25)  channels -1, color\n"
                          "    shader Bitmap \"Image\"  \"wall.png\"\n"
                          "      shader type 1012345\n"
                          "  type 1012345 \"Grain\"\n"

@@ -87,7 +87,8 @@ class Search
     std::unordered_map<std::string, int> names;
     for (BaseList2D* node = list.root ? list.root->GetFirst() : nullptr; node; node = node->GetNext()) {
       Node(*node, Below(path, labels.Next(*node)));
-      const bool isNamed = NodeCast<BaseObject>(node) || NodeCast<BaseMaterial>(node) || NodeCast<LayerObject>(node);
+      // Materials share names whenever layers of one source do, and nothing finds them by name.
+      const bool isNamed = NodeCast<BaseObject>(node) || NodeCast<LayerObject>(node);
       if (isNamed && node->GetName().Content() && ++names[ToUtf8(node->GetName())] == 2)
         Warn("name", Below(path, ToUtf8(node->GetName())), "the name stands more than once in this list");
     }

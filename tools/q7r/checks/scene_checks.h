@@ -39,7 +39,7 @@ class LinkCheck
 };
 
 // Pictures that aren't where the scene, which lies in `folder`, says; a scene without objects; tags that point at
-// nothing; parameters beyond their ranges; names that come more than once in a list of objects, materials or layers.
+// nothing; parameters beyond their ranges; names that come more than once in a list of objects or layers.
 void AddSceneWarnings(_torvane_::BaseDocument& document, const std::filesystem::path& folder,
                       std::vector<SceneWarning>& warnings);
 

@@ -18,6 +18,8 @@ std::string DrawWords(_torvane_::BaseList2D& draw);
 
 // The parameters of an object's own data, by id ("params"); an empty object where there are none.
 void TellObjectParams(ValueSink& sink, _torvane_::BaseObject& object);
+// The knots of a light ("knots"), and the values that it keeps for other programs ("extra"), where it has any.
+void TellLightLists(ValueSink& sink, _torvane_::BaseObject& object);
 // The measured distribution of a light ("ies"); nothing without one.
 void TellObjectIES(ValueSink& sink, _torvane_::BaseObject& object);
 

@@ -1,5 +1,9 @@
 // Cameras, lights and views in listings.
+#include <algorithm>
 #include <cstdio>
+#include <iterator>
+#include <new>
+#include <vector>
 
 #include "geometry_details.h"
 #include "ies_text.h"
@@ -78,6 +82,71 @@ void TellObjectParams(ValueSink& sink, BaseObject& object)
       Tell(sink, std::to_string(id), Parameter(object, id));
   }
   sink.EndObject();
+}
+
+namespace
+{
+
+// Position, value, colour and mode.
+void AddKnot(std::vector<Real>& numbers, const LightKnot& knot)
+{
+  numbers.insert(numbers.end(),
+                 {knot.position, knot.value, knot.color.x, knot.color.y, knot.color.z, static_cast<Real>(knot.mode)});
+}
+
+std::vector<Real> ExtraNumbers(const LightExtraBlock& block)
+{
+  std::vector<Real> numbers;
+  AddKnot(numbers, block.head);
+  for (const LightExtraBlock::Layer& layer : block.layers) {
+    for (const Bool flag : layer.flags)
+      numbers.push_back(flag ? 1.0 : 0.0);
+    for (const Long mode : layer.modes)
+      numbers.push_back(mode);
+    numbers.insert(numbers.end(), std::begin(layer.numbers), std::end(layer.numbers));
+    numbers.insert(numbers.end(), {layer.color.x, layer.color.y, layer.color.z, static_cast<Real>(layer.last)});
+  }
+  for (const LightKnot& knot : block.knots)
+    AddKnot(numbers, knot);
+  return numbers;
+}
+
+void TellNumbers(ValueSink& sink, const std::vector<Real>& numbers)
+{
+  NumberRows rows;
+  rows.entries = numbers.data();
+  rows.count = static_cast<long long>(numbers.size());
+  rows.whole = false;
+  rows.get = [](const void* all, long long index, double* row) { *row = static_cast<const Real*>(all)[index]; };
+  sink.Rows(rows);
+}
+
+} // namespace
+
+void TellLightLists(ValueSink& sink, BaseObject& object)
+{
+  LightObjectData* light = LightDataOf(object);
+  if (!light)
+    return;
+  const LightExtraBlock* block = light->GetExtraBlock();
+  if (!block)
+    throw std::bad_alloc();
+  const Long count = Parameter(object, kLightKnotCount).GetLong();
+  if (count > 0) {
+    sink.Key("knots");
+    sink.BeginArray();
+    for (Long i = 0; i < count; ++i) {
+      std::vector<Real> numbers;
+      AddKnot(numbers, light->GetKnots()[i]);
+      TellNumbers(sink, numbers);
+    }
+    sink.EndArray();
+  }
+  const std::vector<Real> extra = ExtraNumbers(*block);
+  if (std::any_of(extra.begin(), extra.end(), [](Real number) { return number != 0.0; })) {
+    sink.Key("extra");
+    TellNumbers(sink, extra);
+  }
 }
 
 void TellObjectIES(ValueSink& sink, BaseObject& object)

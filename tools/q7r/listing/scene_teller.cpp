@@ -376,6 +376,7 @@ void SceneTeller::TellObject(BaseObject& object)
 void SceneTeller::TellObjectData(BaseObject& object)
 {
   TellObjectParams(sink_, object);
+  TellLightLists(sink_, object);
   TellObjectIES(sink_, object);
   TellGeometry(sink_, object);
   TellRaw(sink_, object.GetRawLevel(), object.GetRawData(), object.GetRawSize());
@@ -442,7 +443,7 @@ void SceneTeller::TellDraw(BaseDraw& draw)
   sink_.Key("camera");
   sink_.BeginObject();
   TellTransform(sink_, editor.GetRelPos(), editor.GetRelScale(), editor.GetRelRot());
-  Tell(sink_, "data", editor.GetDataInstance());
+  TellEntries(sink_, editor.GetDataInstance());
   if (scope_.words)
     TellNamed(sink_, editor);
   sink_.EndObject();

@@ -71,6 +71,7 @@ void TreeText::BeginArray(Layout)
   if (form && isPending_)
     PrintNode();
   if (form && isOfScene) {
+    depth_ = 0;
     Print(form->heading);
     depth_ = 1;
   }

@@ -211,6 +211,12 @@ void Tell(ValueSink& sink, const GeData& value)
 void Tell(ValueSink& sink, const BaseContainer& container, EntryFilter skip)
 {
   sink.BeginObject();
+  TellEntries(sink, container, skip);
+  sink.EndObject();
+}
+
+void TellEntries(ValueSink& sink, const BaseContainer& container, EntryFilter skip)
+{
   SeenIds seen(container);
   BaseContainer::Iterator iterator;
   Long id = 0;
@@ -219,7 +225,6 @@ void Tell(ValueSink& sink, const BaseContainer& container, EntryFilter skip)
     if (seen.IsNew(id) && !(skip && skip(id)))
       Tell(sink, std::to_string(id), *value);
   }
-  sink.EndObject();
 }
 
 void TellBytes(ValueSink& sink, Long level, const void* data, LLong size)

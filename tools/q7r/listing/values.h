@@ -31,6 +31,8 @@ void Tell(ValueSink& sink, std::string_view name, const Value& value)
 // are left out.
 using EntryFilter = bool (*)(_torvane_::Long id);
 void Tell(ValueSink& sink, const _torvane_::BaseContainer& container, EntryFilter skip = nullptr);
+// The same within an object that was begun.
+void TellEntries(ValueSink& sink, const _torvane_::BaseContainer& container, EntryFilter skip = nullptr);
 
 // Bytes that nobody here understands: level, size and check sum.
 void TellBytes(ValueSink& sink, const _torvane_::RawChunkBody& body);

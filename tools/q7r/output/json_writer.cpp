@@ -192,7 +192,11 @@ void JsonWriter::PutNumber(double value, bool whole)
                                       place);
     return;
   }
-  char* end = std::to_chars(place, place + kLongestNumber, value).ptr;
+  // Without an exponent where that isn't longer than people like it.
+  const double size = std::fabs(value);
+  const bool isCommon = value == 0.0 || (size >= 1e-5 && size < 1e15);
+  const auto format = isCommon ? std::chars_format::fixed : std::chars_format::scientific;
+  char* end = std::to_chars(place, place + kLongestNumber, value, format).ptr;
   const auto isOfReal = [](char c) { return c == '.' || c == 'e'; };
   if (std::find_if(place, end, isOfReal) == end) {
     *end++ = '.';

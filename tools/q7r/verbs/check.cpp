@@ -22,8 +22,8 @@ namespace
 
 constexpr const char* kHelp = R"(Walks every value of a scene file and loads it, and tells what is wrong and where.
 Of a scene that can be read it also tells what is odd, as warnings: missing pictures, no
-objects, links to nothing, parameters out of their range, names that a list has more than
-once. Prints a line for each; exit status 1 when there is one, 2 when the file is no scene
+objects, links to nothing, parameters out of their range, names that a list of objects
+or layers has more than once. Prints a line for each; exit status 1 when there is one, 2 when the file is no scene
 file or can't be read at all.
 
 Example: q7r check shot.q7r)";
@@ -126,7 +126,7 @@ void AddCheck(CLI::App& program, int& status)
   auto options = std::make_shared<Options>();
   options->headed = false; // each line begins with its file
   CLI::App* verb = program.add_subcommand("check", kHelp);
-  AddFileList(*verb, *options, "a scene file", "as one JSON object");
+  AddFileList(*verb, *options, "a scene file", "as one JSON object (docs/json.md)");
   verb->callback([options, &status] {
     status = ShowEach(*options, [&](const std::string& file) { return Check(file, *options); });
   });

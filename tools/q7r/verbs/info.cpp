@@ -139,7 +139,7 @@ void AddInfo(CLI::App& program, int& status)
 {
   auto options = std::make_shared<Options>();
   CLI::App* verb = program.add_subcommand("info", kHelp);
-  AddFileList(*verb, *options, "a scene file", "as one JSON object");
+  AddFileList(*verb, *options, "a scene file", "as one JSON object (docs/json.md)");
   verb->callback([options, &status] {
     status = ShowEach(*options, [&](const std::string& file) { return Info(file, *options); });
   });
