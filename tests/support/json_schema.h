@@ -3,6 +3,7 @@
 #pragma once
 
 #include <algorithm>
+#include <map>
 #include <regex>
 #include <string>
 
@@ -65,6 +66,12 @@ class JsonSchema
     return (place.empty() ? "the whole" : place) + " " + what;
   }
 
+  static const std::regex& Compiled(const std::string& pattern)
+  {
+    static std::map<std::string, std::regex> all; // to compile one takes longer than to use it
+    return all.try_emplace(pattern, pattern).first->second;
+  }
+
   std::string CheckReference(const Json& value, const Json& schema, const std::string& place) const
   {
     const std::string path = schema["$ref"].get<std::string>().substr(1);
@@ -100,7 +107,7 @@ class JsonSchema
   std::string CheckText(const Json& value, const Json& schema, const std::string& place) const
   {
     const std::string pattern = schema["pattern"];
-    const bool fits = !value.is_string() || std::regex_search(value.get<std::string>(), std::regex(pattern));
+    const bool fits = !value.is_string() || std::regex_search(value.get<std::string>(), Compiled(pattern));
     return fits ? "" : Say(place, "doesn't fit " + pattern);
   }
 
@@ -140,13 +147,14 @@ class JsonSchema
   {
     if (!value.is_object())
       return {};
+    const Json patterns = schema.value("patternProperties", Json::object());
     for (const auto& [name, member] : value.items()) {
       const Json* found = nullptr;
       if (schema.contains("properties") && schema["properties"].contains(name))
         found = &schema["properties"][name];
-      for (const auto& [pattern, rule] : schema.value("patternProperties", Json::object()).items()) {
-        if (!found && std::regex_search(name, std::regex(pattern)))
-          found = &schema["patternProperties"][pattern];
+      for (const auto& [pattern, rule] : patterns.items()) {
+        if (!found && std::regex_search(name, Compiled(pattern)))
+          found = &patterns.at(pattern);
       }
       if (!found)
         return Say(place, "has \"" + name + "\", of which the schema doesn't know");

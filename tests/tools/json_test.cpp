@@ -39,7 +39,7 @@ std::vector<std::uint8_t> StrangeScene()
   w.Header().Start(110059, 0).Start(777002, 1).Long(5).End().Start(110107, 0).Start(110100, 0).Start(5154, 0);
   w.Start(777001, 3).Bool(true).End().Start(110064, 9).Long(1012345).Long(0).String(u"Fog").Real(0.25).End();
   w.Start(110108, 0).Start(110100, 0).Start(5691, 0).Start(110064, 8).Long(1012346).Long(0).String(u"Mark").LLong(1);
-  for (int i = 0; i < 7; ++i)
+  for (int i = 0; i < 8; ++i)
     w.End();
   return w.bytes;
 }
@@ -100,7 +100,7 @@ TEST(Json, FitsTheSchemaInEveryVerb)
       const Json json = Parsed(text);
       ASSERT_EQ(Schema().Fault(json, c.form), "");
       ASSERT_EQ(json["schema"], 1);
-      if (text.size() < 4000) {
+      if (text.size() == run.out.size() && text.size() < 4000) {
         ASSERT_EQ(Schema().Fault(json), "");
       }
     }

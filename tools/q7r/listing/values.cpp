@@ -1,6 +1,7 @@
 #include "values.h"
 
 #include <algorithm>
+#include <iterator>
 #include <unordered_set>
 #include <vector>
 
@@ -124,6 +125,23 @@ void MaskLinks(std::vector<UChar>& bytes)
   }
 }
 
+// What a scene file begins with.
+constexpr UChar kHeader[] = {'Q', 'Q', '7', 'R', 'Q', '7', 'R', '6', 0, 0, kVersionCurrent >> 8, kVersionCurrent & 255,
+                             0};
+
+// Tells the bytes of a scene file behind its header.
+void TellFile(ValueSink& sink, Long level, std::vector<UChar>& bytes)
+{
+  MaskLinks(bytes);
+  const std::size_t header = std::min(bytes.size(), std::size(kHeader));
+  const auto size = static_cast<LLong>(bytes.size() - header);
+  Crc64 sum;
+  sum.Update(bytes.data() + header, size);
+  sink.Member("level", level);
+  sink.Member("size", size);
+  sink.Member("crc64", HexText(sum.GetCrc()));
+}
+
 } // namespace
 
 std::string HexText(unsigned long long number)
@@ -229,11 +247,10 @@ void TellEntries(ValueSink& sink, const BaseContainer& container, EntryFilter sk
 
 void TellBytes(ValueSink& sink, Long level, const void* data, LLong size)
 {
-  Crc64 sum;
-  sum.Update(data, size);
-  sink.Member("level", level);
-  sink.Member("size", size);
-  sink.Member("crc64", HexText(sum.GetCrc()));
+  std::vector<UChar> bytes(std::begin(kHeader), std::end(kHeader));
+  const auto* first = static_cast<const UChar*>(data);
+  bytes.insert(bytes.end(), first, first + size);
+  TellFile(sink, level, bytes);
 }
 
 void TellBytes(ValueSink& sink, const RawChunkBody& body)
@@ -243,7 +260,6 @@ void TellBytes(ValueSink& sink, const RawChunkBody& body)
 
 void TellWritten(ValueSink& sink, Long level, void (*write)(const void* what, HyperFile& file), const void* what)
 {
-  constexpr std::size_t kHeaderSize = 13;
   MemoryDescription written;
   Filename name;
   name.SetMemoryWrite(&written);
@@ -257,9 +273,7 @@ void TellWritten(ValueSink& sink, Long level, void (*write)(const void* what, Hy
     throw std::bad_alloc();
   const auto* first = static_cast<const UChar*>(written.data);
   std::vector<UChar> bytes(first, first + written.size);
-  MaskLinks(bytes);
-  const std::size_t header = std::min(bytes.size(), kHeaderSize);
-  TellBytes(sink, level, bytes.data() + header, static_cast<LLong>(bytes.size() - header));
+  TellFile(sink, level, bytes);
 }
 
 } // namespace q7r

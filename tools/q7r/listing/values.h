@@ -34,10 +34,11 @@ void Tell(ValueSink& sink, const _torvane_::BaseContainer& container, EntryFilte
 // The same within an object that was begun.
 void TellEntries(ValueSink& sink, const _torvane_::BaseContainer& container, EntryFilter skip = nullptr);
 
-// Bytes that nobody here understands: level, size and check sum.
+// Bytes that nobody here understands: level, size and check sum, from which the numbers of links are left out: they mean
+// something within one file only.
 void TellBytes(ValueSink& sink, const _torvane_::RawChunkBody& body);
 void TellBytes(ValueSink& sink, _torvane_::Long level, const void* data, _torvane_::LLong size);
-// What `write` writes, but for the numbers of links, which mean something within one file only.
+// The same of what `write` writes.
 void TellWritten(ValueSink& sink, _torvane_::Long level, void (*write)(const void* what, _torvane_::HyperFile& file),
                  const void* what);
 
