@@ -34,8 +34,8 @@ void Tell(ValueSink& sink, const _torvane_::BaseContainer& container, EntryFilte
 // The same within an object that was begun.
 void TellEntries(ValueSink& sink, const _torvane_::BaseContainer& container, EntryFilter skip = nullptr);
 
-// Bytes that nobody here understands: level, size and check sum, from which the numbers of links are left out: they mean
-// something within one file only.
+// Bytes that nobody here understands: level, size and check sum, from which the numbers of links are left out: they
+// mean something within one file only.
 void TellBytes(ValueSink& sink, const _torvane_::RawChunkBody& body);
 void TellBytes(ValueSink& sink, _torvane_::Long level, const void* data, _torvane_::LLong size);
 // The same of what `write` writes.
