@@ -83,6 +83,8 @@ TEST(Json, FitsTheSchemaInEveryVerb)
       {"compositions", "compositions " + Quoted(comp), 0},
       {"diff", "diff " + Quoted(full) + " " + Quoted(strange), 1},
       {"diff", "diff --all " + Quoted(full) + " " + Quoted(full), 0},
+      {"written", "resave " + Quoted(full) + " " + Quoted(folder / "again.q7r"), 0},
+      {"error", "resave " + Quoted(full) + " " + Quoted(folder / "again.q7r"), 2},
       {"error", "info " + Quoted(folder / "none.q7r"), 2},
       {"error", "tree " + Quoted(cut), 2},
       {"error", "dance", 2},

@@ -34,6 +34,15 @@ std::vector<std::string> ArgumentsOf(int argc, char** argv)
   return arguments;
 }
 
+// Verbs that list something have an option of their own.
+void AddJson(CLI::App& program)
+{
+  for (CLI::App* verb : program.get_subcommands({})) {
+    if (!verb->get_option_no_throw("--json"))
+      verb->add_flag("--json")->description("tell what was written, and failures, as JSON (docs/json.md)");
+  }
+}
+
 int Run(const std::vector<std::string>& arguments)
 {
   CLI::App program(kDescription, "q7r");
@@ -48,6 +57,7 @@ int Run(const std::vector<std::string>& arguments)
         q7r::AddPreview, q7r::AddIES, q7r::AddCompositions, q7r::AddExtract, q7r::AddConvert, q7r::AddView,
         q7r::AddDiff})
     add(program, status);
+  AddJson(program);
   q7r::RequireVerb(program, arguments);
   try {
     program.parse(std::vector<std::string>(arguments.rbegin(), arguments.rend())); // taken from the end

@@ -47,7 +47,7 @@ class Failure : public std::runtime_error
 struct Talk
 {
   bool quiet = false;   // failures alone
-  bool json = false;    // failures as JSON, on standard output
+  bool json = false;    // failures, and what was written, as JSON on standard output
   bool verbose = false; // every warning, where else one stands for all of its kind
 };
 Talk& TheTalk();

@@ -7,6 +7,8 @@
 #include <memory>
 #include <system_error>
 
+#include "json_output.h"
+#include "report.h"
 #include "standard_input.h"
 #include "standard_output.h"
 #include "temporary_file.h"
@@ -103,12 +105,27 @@ void Copy(const fs::path& source, RawOutput& output)
   output.Close();
 }
 
+void TellWritten(ValueSink& json, const std::string& path, std::uintmax_t size, const std::string& words)
+{
+  json.Key("written");
+  json.BeginObject(ValueSink::Layout::kLine);
+  json.Member("file", path);
+  json.Member("size", size);
+  if (!words.empty())
+    json.Member("summary", words);
+  json.EndObject();
+}
+
 // "shot.q7r: 640 x 480 pixels, 12.3 KB".
 void TellWritten(const std::string& path, const fs::path& partial, const std::string& words)
 {
   if (TheTalk().quiet)
     return;
-  PrintLine(path + ": " + (words.empty() ? "" : words + ", ") + SizeText(fs::file_size(partial)));
+  const std::uintmax_t size = fs::file_size(partial);
+  if (TheTalk().json)
+    PrintJson([&](ValueSink& json) { TellWritten(json, path, size, words); });
+  else
+    PrintLine(path + ": " + (words.empty() ? "" : words + ", ") + SizeText(size));
   FlushStandardOutput();
 }
 
