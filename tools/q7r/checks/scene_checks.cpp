@@ -5,7 +5,7 @@
 #include <string_view>
 #include <unordered_map>
 
-#include "gltf/picture_file.h"
+#include "gltf/materials/picture_file.h"
 #include "listing/node_path.h"
 #include "listing/parameter_names.h"
 #include "listing/scene_teller.h"

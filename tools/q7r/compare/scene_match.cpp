@@ -41,7 +41,8 @@ void CollectLonely(BaseList2D* first, const SceneMatch::Partners& partners, Memb
   for (BaseList2D* node = first; node; node = node->GetNext()) {
     if (partners.find(node) == partners.end())
       lonely.push_back(node);
-    CollectLonely(static_cast<BaseObject*>(node)->GetDown(), partners, lonely);
+    if (const auto* object = NodeCast<BaseObject>(node))
+      CollectLonely(object->GetDown(), partners, lonely);
   }
 }
 

@@ -114,7 +114,8 @@ std::string SummaryOf(BaseList2D& node)
     return RenderWords(*data);
   if (auto* document = NodeCast<BaseDocument>(&node))
     return DocumentWords(*document);
-  return NodeCast<BaseDraw>(&node) ? DrawWords(node) : std::string();
+  auto* draw = NodeCast<BaseDraw>(&node);
+  return draw ? DrawWords(*draw) : std::string();
 }
 
 } // namespace q7r

@@ -6,6 +6,7 @@
 
 #include "output/value_sink.h"
 #include "torvane/document/base_document.h"
+#include "torvane/views/base_draw.h"
 
 namespace q7r
 {
@@ -14,7 +15,7 @@ namespace q7r
 std::string SummaryOf(_torvane_::BaseList2D& node);
 std::string ObjectWords(_torvane_::BaseObject& object);
 std::string MaterialWords(_torvane_::BaseList2D& material);
-std::string DrawWords(_torvane_::BaseList2D& draw);
+std::string DrawWords(_torvane_::BaseDraw& draw);
 
 // The parameters of an object's own data, by id ("params"); an empty object where there are none.
 void TellObjectParams(ValueSink& sink, _torvane_::BaseObject& object);

@@ -168,9 +168,8 @@ std::string ObjectWords(BaseObject& object)
   return LightDataOf(object) ? LightWords(object) : GeometryWords(object);
 }
 
-std::string DrawWords(BaseList2D& node)
+std::string DrawWords(BaseDraw& draw)
 {
-  auto& draw = static_cast<BaseDraw&>(node);
   const BaseObject* editor = draw.GetEditorCamera();
   if (!editor)
     throw std::bad_alloc();

@@ -59,14 +59,14 @@ void TellTransform(ValueSink& sink, const Vector& pos, const Vector& scale, cons
 void TellUnit(ValueSink& sink, const BaseDocument& document)
 {
   sink.Key("unit");
-  const CustomData* unit = document.GetDataInstance().GetCustomDataType(kKeyDocumentUnit, kCustomUnitScale);
+  const auto* unit =
+      NodeCast<UnitScaleData>(document.GetDataInstance().GetCustomDataType(kKeyDocumentUnit, kCustomUnitScale));
   if (!unit)
     return sink.Null();
-  const auto& scale = static_cast<const UnitScaleData&>(*unit);
   sink.BeginObject(ValueSink::Layout::kLine);
-  sink.Member("factor", scale.scale);
-  sink.Member("code", scale.unit);
-  sink.Member("metres", GetUnitFactor(&scale));
+  sink.Member("factor", unit->scale);
+  sink.Member("code", unit->unit);
+  sink.Member("metres", GetUnitFactor(unit));
   sink.EndObject();
 }
 

@@ -80,12 +80,11 @@ void TellCustom(ValueSink& sink, const CustomData& custom)
 {
   sink.BeginObject(ValueSink::Layout::kLine);
   sink.Member("custom", custom.GetTypeId());
-  if (custom.GetTypeId() == kCustomGradient) {
-    TellGradient(sink, static_cast<const GradientData&>(custom));
-  } else if (custom.GetTypeId() == kCustomUnitScale) {
-    const auto& unit = static_cast<const UnitScaleData&>(custom);
-    sink.Member("factor", unit.scale);
-    sink.Member("code", unit.unit);
+  if (const auto* gradient = NodeCast<GradientData>(&custom)) {
+    TellGradient(sink, *gradient);
+  } else if (const auto* unit = NodeCast<UnitScaleData>(&custom)) {
+    sink.Member("factor", unit->scale);
+    sink.Member("code", unit->unit);
   } else {
     TellWritten(
         sink, custom.GetChunkLevel(),
@@ -174,12 +173,8 @@ void Tell(ValueSink& sink, const BaseTime& time) { sink.Time(time.GetNumerator()
 
 void Tell(ValueSink& sink, const String& text) { sink.Text(ToUtf8(text)); }
 
-const BaseList2D* TargetOf(const GeAliasLink& link)
-{
-  const GeListNode* target = link.GetLink();
-  // A file may point a link at a thing that has a goal but is no named node.
-  return target && target->GoalIsWrittenElsewhere() ? static_cast<const BaseList2D*>(target) : nullptr;
-}
+// A file may point a link at a thing that has a goal but is no named node.
+const BaseList2D* TargetOf(const GeAliasLink& link) { return NodeCast<BaseList2D>(link.GetLink()); }
 
 std::string PathText(const BaseList2D& node)
 {
