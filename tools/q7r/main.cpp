@@ -52,10 +52,9 @@ int Run(const std::vector<std::string>& arguments)
   // Known before the arguments are understood: they may be what is wrong.
   q7r::TheTalk().json = std::find(arguments.begin(), arguments.end(), "--json") != arguments.end();
   int status = q7r::kDone;
-  for (auto add :
-       {q7r::AddExport, q7r::AddInfo, q7r::AddTree, q7r::AddDump, q7r::AddCheck, q7r::AddResave, q7r::AddMerge,
-        q7r::AddPreview, q7r::AddIES, q7r::AddCompositions, q7r::AddExtract, q7r::AddConvert, q7r::AddView,
-        q7r::AddDiff})
+  for (auto add : {q7r::AddExport, q7r::AddInfo, q7r::AddTree, q7r::AddDump, q7r::AddCheck, q7r::AddResave,
+                   q7r::AddMerge, q7r::AddPreview, q7r::AddIES, q7r::AddCompositions, q7r::AddExtract, q7r::AddConvert,
+                   q7r::AddView, q7r::AddDiff})
     add(program, status);
   AddJson(program);
   q7r::RequireVerb(program, arguments);
