@@ -117,7 +117,7 @@ void SampledTrack::AddSampledKey(const BaseTime& time, Real value)
   KeyValues key;
   key.time = time;
   key.switches = kKeyMaskAutomatic | kKeyMaskClamp;
-  if (content_ == Content::kValue)
+  if (content_ == Content::kValue && key.value != value) // as CKey::SetValue: -0.0 leaves the 0.0 of a new key
     key.value = value;
   Long place = 0;
   if (curve->SetKeyValues(key, &place) && content_ == Content::kData)
