@@ -70,8 +70,6 @@ SceneTransform Place(const LayerSample& sample, const TransformRules& rules, con
 
 const SceneTransform& TransformConverter::Convert(const LayerSample& sample)
 {
-  if (!isFirst_ && IsSame(sample, last_))
-    return result_;
   if (rules_.useRotation && (isFirst_ || !HasSameFrame(sample, last_, rules_))) {
     frame_ = SampleFrame(sample, rules_, FlipY(sample.position));
     angles_ = MatrixToAngles(frame_, kExportRotationOrder);

@@ -67,8 +67,8 @@ struct SceneTransform
 // rotation that lie closest to it, so that keys don't jump by whole turns.
 SceneTransform ConvertTransform(const LayerSample& sample, const TransformRules& rules, const Vector* previousRotation);
 
-// Converts the samples of one object one after the other, each with the rotation before it. What stands still isn't
-// converted again.
+// Converts the samples of one object one after the other, each with the rotation before it. A rotation that stands
+// still isn't computed again; which of its angles are closest is, since that may differ in the last digit.
 class TransformConverter
 {
  public:
