@@ -162,6 +162,26 @@ TEST(Records, KeepEachValueByItself)
   }
 }
 
+// Parameters that samples tell can be set to other values, each by itself.
+TEST(Records, TakeTheParametersThatTheyTell)
+{
+  for (const RecordSample& sample : RecordSamples()) {
+    SCOPED_TRACE(sample.name);
+    const NodePtr node(sample.make());
+    std::vector<RecordValue> values = ParseRecord(sample.body);
+    Read(*node, sample, Chunk(sample.chunk, sample.level, values, sample.version));
+    std::erase_if(values, [](const RecordValue& value) { return value.origin != '@' || value.kind == 'S'; });
+    for (RecordValue& value : values) {
+      ChangeValue(value);
+      const double number = std::stod(value.text);
+      EXPECT_TRUE(node->SetParameterById(value.id, value.kind == 'V'   ? GeData(Vector(number, 0, 0))
+                                                   : value.kind == 'T' ? GeData(BaseTime(number))
+                                                                       : GeData(number)));
+    }
+    CheckParameters(*node, values);
+  }
+}
+
 TEST(Records, AreRefusedWhereverTheyAreCut)
 {
   AssertionCounter silence;
