@@ -8,6 +8,7 @@
 #include "support/counting_memory.h"
 #include "support/every_failed_allocation.h"
 #include "support/memory_file.h"
+#include "support/record_samples.h"
 #include "support/text.h"
 #include "torvane/shaders/base_shader.h"
 #include "torvane/shaders/blend_layers.h"
@@ -59,66 +60,15 @@ double RealOf(const BlendLayer& layer, Long id)
   return value.GetReal();
 }
 
-// What opens a layer in a file; ended by `Tail` from level 2 on.
-ByteWriter Head(Long type, Long id, bool selected = false)
-{
-  return ByteWriter().Long(type).Bool(selected).String(u"L").Long(id).Long(0);
-}
+// What opens a layer in a file.
+std::string Head(int type, int id) { return "L" + std::to_string(type) + " B0 SL L" + std::to_string(id) + " L0 "; }
 
-// The values of the settings that the table in the file tells, all different from the defaults.
-ByteWriter Settings(Long type, Long level)
-{
-  ByteWriter w;
-  const Bytes gradient = ByteWriter()
-                             .Start(132, 1)
-                             .Long(-1)
-                             .Long(1)
-                             .Long(1000481)
-                             .Start(0, 1)
-                             .Start(132, 1)
-                             .Long(-1)
-                             .Long(1000)
-                             .Long(15)
-                             .Long(5)
-                             .End()
-                             .Bool(false)
-                             .End()
-                             .End()
-                             .bytes;
-  switch (type) {
-  case 1:
-    return w.Long(4).Real(0.5).Bool(false).Long(0).Long(3);
-  case 2:
-    return w.Long(4).Real(0.5).Memory(std::string_view("alias2\0\0\0\0\0\0\0\0", 14));
-  case 3:
-    return w.Real(0.25).Real(0.5).Real(2);
-  case 4:
-    return w.Real(10).Real(0.5).Real(0.25).Bool(true);
-  case 5:
-    return w.Real(0.5).Long(7);
-  case 6:
-    w.Long(3).Append(gradient).Bool(true);
-    return level >= 1 ? w.Bool(true) : w;
-  case 9:
-    return w.Long(1).Real(0.5).Long(2).Bool(true).Real(6).Real(7).Real(8);
-  case 10:
-    return w.Real(0.5).Bool(true).Bool(true).Vector(2, 3, 4).Vector(5, 6, 7);
-  default:
-    return w.Real(0.25).Real(0.5);
-  }
-}
-
-// A list of one layer of each type, ids 1 to 10, as level `level` holds it.
+// A list of one layer of each type, ids 1 to 10, with values that differ from the defaults.
 ByteWriter AllLayers(Long level)
 {
-  ByteWriter w;
-  w.Long(10).Long(level);
-  for (Long type = 1; type <= 10; ++type) {
-    w.Append(Head(type, type, type == 5).bytes).Append(Settings(type, level).bytes);
-    if (level >= 2)
-      w.Bool(type != 3);
-  }
-  return w;
+  const std::string& value = FindRecordSample(level >= 2 ? "blend layers" : "blend layers 1").body;
+  const std::size_t start = value.find("L#10");
+  return ByteWriter().Append(Record(value.substr(start, value.find(" L2 ] ] C=0") - start)));
 }
 
 // Reads a stack with `body` in its chunk; a Long behind it must be in step.
@@ -139,13 +89,10 @@ bool ReadStack(Stack& stack, const Bytes& body, Long* error = nullptr)
 TEST(BlendLayers, ReadFoldersByTheLevelOfTheirOwnList)
 {
   // A folder of level 3 in a list of level 1, and one of level 0 in that.
-  ByteWriter inner;
-  inner.Append(Head(1, 2).bytes).Long(1).Real(1).Bool(true).Long(1).Long(0).Append(Head(7, 3).bytes).Real(0).Real(1);
-  ByteWriter w;
-  w.Long(2).Long(1).Append(Head(1, 1).bytes).Long(1).Real(1).Bool(true).Long(1).Long(3).Append(inner.bytes).Bool(false);
-  w.Append(Head(7, 4).bytes).Real(0).Real(1).Long(2);
+  const std::string inner = Head(1, 2) + "L1 R1 B1 L1 L0 " + Head(7, 3) + "R0 R1 ";
+  const std::string outer = Head(1, 1) + "L1 R1 B1 L1 L3 " + inner + "B0 " + Head(7, 4) + "R0 R1 L2";
   Stack stack;
-  ASSERT_TRUE(ReadStack(stack, w.bytes));
+  ASSERT_TRUE(ReadStack(stack, Record("L2 L1 " + outer)));
   EXPECT_EQ(Ids(stack.Layers()), "1(2(3)) 4");
   EXPECT_FALSE(stack.Layers().FindById(2)->IsEnabled());
   EXPECT_TRUE(stack.Layers().FindById(3)->IsEnabled());
@@ -156,17 +103,15 @@ TEST(BlendLayers, RefuseDamagedStacks)
   const counting_memory::BalanceCheck balance;
   const AssertionRecord record;
   Stack stack;
-  EXPECT_FALSE(ReadStack(stack, ByteWriter().Long(1).Long(3).Append(Head(11, 1).bytes).Bool(true).Long(2).bytes));
+  EXPECT_FALSE(ReadStack(stack, Record("L1 L3 " + Head(11, 1) + "B1 L2")));
   ASSERT_GE(record.Reports().size(), 2U);
   EXPECT_EQ(record.Reports()[0], "blendlayers:41");
   EXPECT_EQ(record.Reports()[1], "blendlayers:152");
   EXPECT_EQ(stack.value.GetType(), kDataNil);
 
   // A Colorize layer without a gradient: the values behind it are read, but the list has failed.
-  ByteWriter plain;
-  plain.Header().Long(1).Long(3).Append(Head(6, 1).bytes).Long(2).Start(132, 1).Long(-1).Long(1).Long(15).Long(1).End();
-  plain.Bool(true).Bool(true).Bool(true).Long(77);
-  MemoryReadFile memory(plain.bytes);
+  MemoryReadFile memory(
+      ByteWriter().Header().Append(Record("L1 L3 " + Head(6, 1) + "L2 [132,1 L-1 L1 L15 L1 ] B1 B1 B1 L77")).bytes);
   CBlendLayers layers;
   Long witness = 0;
   EXPECT_FALSE(layers.ReadList(memory.file, true));
@@ -182,7 +127,7 @@ TEST(BlendLayers, RefuseDamagedStacks)
   // Folders in folders without end.
   ByteWriter deep;
   for (int i = 0; i < 20000; ++i)
-    deep.Long(1).Long(3).Append(Head(1, 1).bytes).Long(1).Real(1).Bool(true);
+    deep.Append(Record("L1 L3 " + Head(1, 1) + "L1 R1 B1"));
   EXPECT_FALSE(ReadStack(stack = Stack(), deep.bytes));
 }
 

@@ -6,6 +6,7 @@
 #include "support/counting_memory.h"
 #include "support/every_failed_allocation.h"
 #include "support/memory_file.h"
+#include "support/record_samples.h"
 #include "torvane/shaders/gradient.h"
 #include "torvane/values/ge_data.h"
 
@@ -41,35 +42,15 @@ BaseContainer& KnotAt(GradientData& gradient, Long index)
   return *gradient.GetSettings().GetContainerInstance(kGradientKnots)->GetIndexData(index)->GetContainer();
 }
 
-Bytes KnotBytes(const Knot& knot)
-{
-  const Vector& c = knot.color;
-  return ByteWriter()
-      .Long(0)
-      .Long(132)
-      .Start(132, 1)
-      .Long(-1)
-      .Long(1000)
-      .Long(23)
-      .Vector(c.x, c.y, c.z)
-      .Long(1001)
-      .Long(19)
-      .Real(knot.brightness)
-      .Long(1004)
-      .Long(15)
-      .Long(knot.id)
-      .End()
-      .bytes;
-}
-
 // The settings of a gradient with those knots.
 Bytes SettingsBytes(std::initializer_list<Knot> knots)
 {
-  ByteWriter w;
-  w.Start(132, 1).Long(-1).Long(1001).Long(132).Start(132, 1).Long(-1);
+  std::string text = "[132,1 L-1 L1001 L132 [132,1 L-1 ";
   for (const Knot& knot : knots)
-    w.Append(KnotBytes(knot));
-  return w.End().End().bytes;
+    text += "L0 L132 [132,1 L-1 L1000 L23 V" + std::to_string(knot.color.x) + "," + std::to_string(knot.color.y) + "," +
+            std::to_string(knot.color.z) + " L1001 L19 R" + std::to_string(knot.brightness) + " L1004 L15 L" +
+            std::to_string(knot.id) + " ] ";
+  return Record(text + "] ]");
 }
 
 // Reads a container's value from its type on, with a Long 77 behind it that must be in step.
