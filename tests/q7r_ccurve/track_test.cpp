@@ -81,43 +81,6 @@ TEST(Track, WritesReadsAndClonesItsCurvesBySlot)
   }
 }
 
-TEST(Track, ReadsTheChunksOfOlderFiles)
-{
-  struct Case
-  {
-    const char* what;
-    Long level;
-    int curves; // in the chunk, with keys at 1, 2, ... seconds, other values between
-    int taken;
-  };
-  for (const Case& c :
-       {Case{"none", 0, 0, 0}, {"one", 0, 1, 1}, {"three", 1, 3, 3}, {"four", 2, 4, 4}, {"six", 2, 6, 4}}) {
-    SCOPED_TRACE(c.what);
-    ByteWriter w;
-    w.Start(110418, c.level).Long(44).Start(77, 1).Long(1).End();
-    for (int i = 1; i <= c.curves; ++i)
-      Curve(w, true, i, i).String(u"between");
-    w.End();
-    w.Start(110414, 1).Long(5).Long(6).String(u"other").Start(3, 3).Long(1).End().End();
-    Node(w, u"Old");
-    CTrack track;
-    ASSERT_TRUE(ReadInto(track, w.bytes));
-    EXPECT_EQ(Utf8(track.GetName()), "Old"); // what stood behind is in step
-    EXPECT_EQ(track.GetBefore(), 5);
-    EXPECT_EQ(track.GetAfter(), 6);
-    EXPECT_EQ(track.GetKind(), 0);
-    for (Long number = 1; number <= 4; ++number) {
-      const CCurve* curve = track.GetCurve(number, 0);
-      const bool isTaken = number <= c.taken;
-      EXPECT_EQ(curve && curve->GetKeyCount() == 1, isTaken) << number;
-      if (isTaken) {
-        EXPECT_EQ(curve->GetKey(0)->GetTime(), BaseTime(number, 1));
-      }
-    }
-    EXPECT_EQ(track.GetCurve(5, 0), nullptr);
-  }
-}
-
 TEST(Track, RefusesAnythingButACurveInACurvesPlace)
 {
   ByteWriter w;

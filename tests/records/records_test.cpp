@@ -182,6 +182,32 @@ TEST(Records, TakeTheParametersThatTheyTell)
   }
 }
 
+TEST(Records, LeadTheirLinksToWhatIsReadBehindThem)
+{
+  const Bytes goal = Record("[110050,0 L0 L0 K C1 M61676F616C310000000000000005 S ] ]");
+  for (const RecordSample& sample : RecordSamples()) {
+    auto values = ParseRecord(sample.body);
+    const auto isLink = [](const RecordValue& value) { return value.kind == 'k' && value.mark != '='; };
+    const auto links = std::count_if(values.begin(), values.end(), isLink);
+    if (links == 0 || sample.now == "-" || sample.version < 7500)
+      continue;
+    for (RecordValue& value : values)
+      value.text = isLink(value) ? "5" : value.text;
+    const Bytes chunk = Chunk(sample.chunk, sample.level, values, sample.version);
+    const NodePtr node(sample.make());
+    BaseList2D target;
+    {
+      MemoryReadFile memory(ByteWriter().Header("Q7R6", sample.version).Append(chunk).End().Append(goal).bytes);
+      ASSERT_TRUE(node->ReadChunkLoop(memory.file, true) && target.ReadChunkLoop(memory.file, true)) << sample.name;
+    }
+    std::string written = ToHex(WriteToMemory([&](HyperFile& file) { node->WriteChunks(file); }));
+    std::ptrdiff_t found = 0;
+    for (std::size_t place = 0; (place = written.find("61 6C 69 61 73 32 ", place)) != std::string::npos; place += 18)
+      found += written.compare(place + 18, 23, "00 00 00 00 00 00 00 00") != 0;
+    EXPECT_EQ(found, links) << sample.name;
+  }
+}
+
 TEST(Records, AreRefusedWhereverTheyAreCut)
 {
   AssertionCounter silence;
