@@ -1,8 +1,6 @@
 // Nodes and their bytes, for the tests of node classes.
 #pragma once
 
-#include <cctype>
-#include <string_view>
 #include <vector>
 
 #include "support/byte_writer.h"
@@ -10,25 +8,6 @@
 #include "torvane/nodes/base_list.h"
 
 using Bytes = std::vector<std::uint8_t>;
-
-// The bytes of pairs of hexadecimal digits; all else is passed over.
-inline Bytes FromHex(std::string_view text)
-{
-  auto valueOf = [](char c) { return c <= '9' ? c - '0' : c - 'A' + 10; };
-  Bytes bytes;
-  int high = -1;
-  for (char c : text) {
-    if (!std::isxdigit(static_cast<unsigned char>(c)))
-      continue;
-    if (high < 0) {
-      high = valueOf(c);
-    } else {
-      bytes.push_back(static_cast<std::uint8_t>(high * 16 + valueOf(c)));
-      high = -1;
-    }
-  }
-  return bytes;
-}
 
 // Gives the node the marker 00 01 ... 0F.
 inline void SetCountingMarker(_torvane_::BaseList2D& node)

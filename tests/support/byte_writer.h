@@ -2,6 +2,7 @@
 #pragma once
 
 #include <bit>
+#include <cctype>
 #include <cstdint>
 #include <string>
 #include <string_view>
@@ -127,3 +128,19 @@ inline std::string ToHex(const std::uint8_t* data, std::size_t size)
 }
 
 inline std::string ToHex(const std::vector<std::uint8_t>& bytes) { return ToHex(bytes.data(), bytes.size()); }
+
+// The bytes of pairs of hexadecimal digits; all else is passed over.
+inline std::vector<std::uint8_t> FromHex(std::string_view text)
+{
+  std::vector<std::uint8_t> bytes;
+  int high = -1;
+  for (char c : text) {
+    if (!std::isxdigit(static_cast<unsigned char>(c)))
+      continue;
+    const int digit = c <= '9' ? c - '0' : (c | 32) - 'a' + 10;
+    if (high >= 0)
+      bytes.push_back(static_cast<std::uint8_t>(high * 16 + digit));
+    high = high < 0 ? digit : -1;
+  }
+  return bytes;
+}

@@ -25,14 +25,6 @@ std::string Unfold(const std::string& body)
   return Unfold(text + body.substr(close + 2));
 }
 
-std::vector<std::uint8_t> Hex(const std::string& digits)
-{
-  std::vector<std::uint8_t> bytes;
-  for (std::size_t i = 0; i + 1 < digits.size(); i += 2)
-    bytes.push_back(static_cast<std::uint8_t>(std::stoi(digits.substr(i, 2), nullptr, 16)));
-  return bytes;
-}
-
 std::vector<double> Numbers(const std::string& list)
 {
   std::vector<double> numbers;
@@ -136,7 +128,7 @@ void PutValue(ByteWriter& w, const RecordValue& value, Long version)
     w.Filename(units);
     break;
   case 'M':
-    w.Memory(Hex(text));
+    w.Memory(FromHex(text));
     break;
   case 'k':
     w.Memory(std::string("alias2\0\0\0\0\0\0\0", 13) + static_cast<char>(number()));
@@ -148,7 +140,7 @@ void PutValue(ByteWriter& w, const RecordValue& value, Long version)
     PutArray(w, text, version);
     break;
   case 'X':
-    w.Append(Hex(text));
+    w.Append(FromHex(text));
     break;
   case '[':
     w.Start(integer(), std::stoi(text.substr(text.find(',') + 1)));

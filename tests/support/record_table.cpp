@@ -1,9 +1,9 @@
 #include <algorithm>
-#include <fstream>
 #include <map>
 #include <sstream>
 
 #include "support/record_samples.h"
+#include "support/text_table.h"
 #include "torvane/animation/ctrack.h"
 #include "torvane/document/base_document.h"
 #include "torvane/layers/layer_object.h"
@@ -71,22 +71,6 @@ const std::map<std::string, Maker> kMakers = {
     {"VertexMapTag", Tag<kTagVertexMap>},
 };
 
-// The lines of the table, those that are indented behind the line that they continue.
-std::vector<std::string> Lines()
-{
-  std::vector<std::string> lines;
-  std::ifstream table(TEST_SOURCE_DIR "/tests/support/records.txt");
-  for (std::string line; std::getline(table, line);) {
-    if (line.empty() || line[0] == '#')
-      continue;
-    if (line[0] == ' ')
-      lines.back() += line.substr(1);
-    else
-      lines.push_back(line);
-  }
-  return lines;
-}
-
 std::vector<RecordSample> ReadTable()
 {
   std::vector<RecordSample> samples;
@@ -98,7 +82,7 @@ std::vector<RecordSample> ReadTable()
       text += (text.empty() ? "" : " ") + (word[0] == '$' ? texts.at(word) : word);
     return text;
   };
-  for (const std::string& line : Lines()) {
+  for (const std::string& line : TextTable("support/records.txt")) {
     std::istringstream cells(line);
     std::string name, head, body, now;
     if (line[0] == '$') {
