@@ -11,7 +11,6 @@ namespace _torvane_
 namespace
 {
 
-constexpr const char* kModule = "k2v_file";
 constexpr Long kFirstBlock = 2;
 constexpr Long kLargestBlock = 64;
 constexpr ULLong kSameBits = 8; // Reals whose bit patterns are closer than this count as the same
@@ -312,7 +311,7 @@ GeData* BaseContainer::SetData(Long id, const GeData& value)
   GeData& stored = *place;
   if (stored.type_ == value.type_) {
     if (stored.type_ == kDataContainer && stored.payload_.container == value.payload_.container) {
-      ReportAssertion(kModule, __LINE__, "a container was set onto itself");
+      ReportAssertion("k2v_file", __LINE__, "a container was set onto itself");
       return &stored;
     }
     if (!IsSameValue(stored, value))

@@ -295,3 +295,56 @@ Bool BaseDocument::SetParameter(const ParameterPath& path, const GeData& value)
     axisLocks_[AxisLockRow()][id - kDocumentFirstAxisLock] = value.GetBool();
     return true;
   }
+  if (const Parameter* row = Parameter::Find(id)) {
+    row->set(*this, value);
+    return !watch.Failed();
+  }
+  return !IsInfoText(id) && BaseList2D::SetParameter(path, value);
+}
+
+// A copy that fails leaves no nodes behind.
+Bool BaseDocument::CopyTo(PrivateChunk& destination, ULong flags, TransArray*)
+{
+  auto* target = NodeCast<BaseDocument>(&destination);
+  if (!target)
+    return false;
+  if (target == this)
+    return true;
+  AllocationWatch watch;
+  AliasTranslator translator;
+  Bool copied = translator.MakeTranslator() && CopyContent(*target, flags, translator.GetArray()) && !watch.Failed();
+  translator.Finish(copied);
+  copied = copied && !watch.Failed();
+  if (!copied) {
+    for (RootList2D* root : std::initializer_list<RootList2D*>{target->materials_, target->objects_, target->layers_,
+                                                               target->renderData_, target->viewPanels_})
+      root->FreeAll();
+  }
+  return copied;
+}
+
+Bool BaseDocument::CopyContent(BaseDocument& target, ULong flags, TransArray* translation)
+{
+  if (!BaseList2D::CopyTo(target, flags, translation) || !pref_.CopyTo(target.pref_, flags, translation) ||
+      !preview_.CopyTo(target.preview_))
+    return false;
+  target.fileName_ = fileName_;
+  target.time_ = time_;
+  target.mode_ = mode_;
+  target.tool_ = tool_;
+  for (Long i = 0; i < kSettingsCount; ++i) {
+    if (!settings_[i].CopyTo(target.settings_[i], flags, translation))
+      return false;
+  }
+  return CopyRoots(target, flags, translation);
+}
+
+Bool BaseDocument::CopyRoots(BaseDocument& target, ULong flags, TransArray* translation)
+{
+  return renderData_->CopyTo(*target.renderData_, flags, translation) &&
+         viewPanels_->CopyTo(*target.viewPanels_, flags, translation) &&
+         materials_->CopyTo(*target.materials_, flags, translation) &&
+         objects_->CopyTo(*target.objects_, flags, translation) && layers_->CopyTo(*target.layers_, flags, translation);
+}
+
+} // namespace _torvane_
