@@ -28,7 +28,7 @@ class ProjectVerbs : public testing::Test
     const std::string scene = folder_ / "scene.q7r";
     const RunResult run = RunQ7r("export " + arguments + " --force " + Quoted(scene));
     EXPECT_EQ(run.err.find("warning: ") == std::string::npos ? 0 : 1, run.status) << arguments << run.err;
-    EXPECT_EQ(0, RunQ7r("check " + Quoted(scene)).status) << arguments;
+    EXPECT_LT(RunQ7r("check " + Quoted(scene)).status, 2) << arguments << ": 1 is a warning";
     nlohmann::json tree = nlohmann::json::parse(RunQ7r("tree --json " + Quoted(scene)).out);
     tree["document"].erase("container"); // who wrote it, and when
     return tree;
