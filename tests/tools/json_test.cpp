@@ -131,7 +131,7 @@ TEST(Json, TellsWhereAndWhy)
 {
   const TempFolder folder;
   const std::string cut =
-      WriteText(folder, "cut.q7r", std::string("QQ7RQ7R6\0\0\x32\xC8\0\x01\0\x01\xAD\xEB\0\0\0\0\x0F\0", 26));
+      WriteText(folder, "cut.q7r", std::string("QQ7RQ7R6\0\0\x32\xC8\0\x01\0\x01\xAD\xEB\0\0\0\0\x0F\0\0\0", 26));
   const Json error = Parsed(RunQ7r("tree --json " + Quoted(cut)).out)["error"];
   EXPECT_EQ(error["file"], cut);
   EXPECT_EQ(error["path"], "110059");

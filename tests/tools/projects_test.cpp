@@ -31,6 +31,7 @@ class ProjectVerbs : public testing::Test
     EXPECT_LT(RunQ7r("check " + Quoted(scene)).status, 2) << arguments << ": 1 is a warning";
     nlohmann::json tree = nlohmann::json::parse(RunQ7r("tree --json " + Quoted(scene)).out);
     tree["document"].erase("container"); // who wrote it, and when
+    tree["document"]["named"].erase("saveDate");
     return tree;
   }
   // Exports every composition of a project twice: from it, and from what is extracted of it. Gives how many objects
