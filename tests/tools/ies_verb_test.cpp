@@ -119,7 +119,7 @@ TEST(IESVerb, SaysInAPlainSentenceWhyAFileCannotBeRead)
     const RunResult json = RunQ7r("ies --json " + Quoted(path));
     EXPECT_EQ(json.status, 2);
     EXPECT_EQ(json.err, "");
-    ExpectParts(json.out, {path, says, "\"error\""});
+    ExpectParts(json.out, {Json(path).dump(), says, "\"error\""});
   }
   EXPECT_EQ(RunQ7r("ies").status, 2);
   ExpectParts(RunQ7r("ies --help").out, {"Usage: q7r", "Example: q7r ies"});

@@ -184,7 +184,7 @@ TEST(Tree, ChoosesObjectsKeysAndDepth)
   const auto objects = [&](const std::string& options) {
     return Parsed(RunQ7r("tree --json " + options + " " + scene).out)["objects"];
   };
-  const Json arm = objects("--objects 'A*l?ft'");
+  const Json arm = objects("--objects " + Quoted("A*l?ft"));
   ASSERT_EQ(arm.size(), 1U);
   EXPECT_EQ(arm[0]["below"], "Body");
   EXPECT_EQ(arm[0]["global"][0], 2.0);

@@ -78,8 +78,7 @@ TEST_F(ManyFiles, GoIntoAFolderWithTheirNames)
   const std::string a = Write("in/a.json", kSolid), b = Write("in/b.lottie.json", kSolid), bad = Write("bad.json", "{");
   const RunResult run = RunQ7r("export " + a + " " + bad + " " + b + " --jobs 3 -o " + Place("new/scenes"));
   EXPECT_EQ(run.status, 2) << run.err;
-  EXPECT_EQ(Count(run.err, "new/scenes/a.q7r: 3 layers: 1 camera, 1 solid") + Count(run.err, "bad.json: byte"), 2U)
-      << run.err;
+  EXPECT_EQ(Count(run.err, "a.q7r: 3 layers: 1 camera, 1 solid") + Count(run.err, "bad.json: byte"), 2U) << run.err;
   for (const std::string name : {"a", "b.lottie"})
     EXPECT_EQ(RunQ7r("check " + Place("new/scenes/" + name + ".q7r")).status, 0);
   const std::string scenes = Place("new/scenes/a.q7r") + " " + Place("new/scenes/b.lottie.q7r");

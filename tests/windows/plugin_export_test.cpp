@@ -40,7 +40,8 @@ std::vector<fs::path> Examples()
 {
   std::vector<fs::path> files;
   for (const fs::directory_entry& entry : fs::directory_iterator(TEST_SOURCE_DIR "/examples"))
-    files.push_back(entry.path());
+    if (entry.is_regular_file())
+      files.push_back(entry.path());
   return files;
 }
 
