@@ -39,7 +39,7 @@ Matrix SampleFrame(const LayerSample& sample, const TransformRules& rules, const
 template <class T>
 bool IsSame(const T& a, const T& b)
 {
-  return std::memcmp(&a, &b, sizeof a) == 0;
+  return std::memcmp(&a, &b, sizeof a) == 0; // NOLINT(bugprone-suspicious-memory-comparison)
 }
 
 // True if SampleFrame gives the same for both.

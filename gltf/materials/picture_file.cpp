@@ -124,10 +124,10 @@ std::filesystem::path LocatePicture(const std::filesystem::path& folder, const s
   if (name.find('\0') != std::string::npos)
     return {};
   std::error_code error;
-  const std::filesystem::path path = folder / ToPath(name);
+  std::filesystem::path path = folder / ToPath(name);
   if (std::filesystem::is_regular_file(path, error))
     return path;
-  const std::filesystem::path beside = folder / ToPath(LastPart(name));
+  std::filesystem::path beside = folder / ToPath(LastPart(name));
   return std::filesystem::is_regular_file(beside, error) ? beside : path;
 }
 

@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <cmath>
+#include <iterator>
 #include <limits>
 
 namespace host
@@ -119,10 +120,9 @@ OrderedJson WriteProperty(const Property& property, std::size_t lastFrame)
     json = WriteKeys(property);
   } else {
     json["s"] = true;
-    for (std::size_t c = 0; c < property.Split().size(); ++c) {
-      constexpr const char* kKeys[] = {"x", "y", "z"};
+    constexpr const char* kKeys[] = {"x", "y", "z"};
+    for (std::size_t c = 0; c < std::min(std::size(kKeys), property.Split().size()); ++c)
       json[kKeys[c]] = WriteProperty(property.Split()[c], lastFrame);
-    }
   }
   if (!property.Expression().empty())
     json["x"] = property.Expression();

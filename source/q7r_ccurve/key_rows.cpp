@@ -12,7 +12,7 @@ namespace
 Bool HasTangents(const KeyRowTangents& tangents)
 {
   const KeyRowTangents none;
-  return std::memcmp(&tangents, &none, sizeof none) != 0;
+  return std::memcmp(&tangents, &none, sizeof none) != 0; // NOLINT(bugprone-suspicious-memory-comparison)
 }
 
 } // namespace

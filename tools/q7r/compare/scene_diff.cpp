@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <charconv>
 #include <cstdio>
+#include <new>
 #include <unordered_set>
 
 #include "listing/node_path.h"
@@ -208,6 +209,8 @@ void SceneDiff::CompareCurves(const CCurve* curveA, const CCurve* curveB, const 
   for (Long a = 0, b = 0; a < countA || b < countB;) {
     CKey* keyA = a < countA ? curveA->GetKey(a) : nullptr;
     CKey* keyB = b < countB ? curveB->GetKey(b) : nullptr;
+    if ((a < countA && !keyA) || (b < countB && !keyB) || (!keyA && !keyB))
+      throw std::bad_alloc();
     const bool isOne = keyA && keyB && comparison_.AreEqual(keyA->GetTime().Get(), keyB->GetTime().Get());
     const bool isOfA = keyA && (isOne || !keyB || keyA->GetTime().Get() < keyB->GetTime().Get());
     const bool isOfB = isOne || !isOfA;

@@ -46,7 +46,7 @@ void PrintFormatted(const char* format, ...)
   std::va_list arguments;
   va_start(arguments, format);
   errno = 0;
-  const int count = std::vfprintf(stdout, format, arguments);
+  const int count = std::vfprintf(stdout, format, arguments); // NOLINT(clang-analyzer-valist.Uninitialized)
   va_end(arguments);
   Require(count >= 0);
 }
