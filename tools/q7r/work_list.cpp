@@ -5,6 +5,7 @@
 #include <filesystem>
 #include <map>
 #include <mutex>
+#include <system_error>
 #include <thread>
 
 #include "output/output_file.h"
@@ -161,8 +162,12 @@ int DoWork(const std::vector<Work>& all, unsigned jobs, const std::function<void
   Workshop shop(list, work);
   const std::size_t wanted = jobs > 0 ? jobs : std::max(1U, std::thread::hardware_concurrency());
   std::vector<std::thread> others;
-  for (std::size_t i = 1; i < std::min(wanted, list.size()); ++i)
-    others.emplace_back([&shop] { shop.Run(); });
+  try {
+    for (std::size_t i = 1; i < std::min(wanted, list.size()); ++i)
+      others.emplace_back([&shop] { shop.Run(); });
+  } catch (const std::system_error&) {
+    // The system gives no more threads: those that are there do the work.
+  }
   shop.Run();
   for (std::thread& other : others)
     other.join();
