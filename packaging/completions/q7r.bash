@@ -9,10 +9,12 @@ _q7r() {
     mapfile -t COMPREPLY < <(compgen -W "$("$program" "$verb" --help 2>/dev/null |
       sed -n 's/^  \(-[a-zA-Z],\)\{0,1\}\(--[a-z][a-z-]*\).*/\2/p')" -- "$word")
   elif [[ ${COMP_WORDS[COMP_CWORD - 1]} == --composition ]]; then
-    local IFS=$'\n' names
-    names=$("$program" compositions --json "${COMP_WORDS[2]}" 2>/dev/null | sed -n 's/^ *"name": "\(.*\)",$/\1/p')
-    mapfile -t COMPREPLY < <(compgen -W "$names" -- "${word#\"}")
-    COMPREPLY=("${COMPREPLY[@]@Q}")
+    # Names are somebody's texts: compgen would run what looks like a command in them.
+    local name
+    while IFS= read -r name; do
+      [[ $name == "${word#[\"\']}"* ]] && COMPREPLY+=("${name@Q}")
+    done < <("$program" compositions --json "${COMP_WORDS[2]}" 2>/dev/null |
+      sed -n 's/^ *"name": "\(.*\)",$/\1/; T; s/\\\(["\\]\)/\1/g; p')
   fi
 }
 complete -o default -o bashdefault -F _q7r q7r

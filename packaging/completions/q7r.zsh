@@ -6,7 +6,7 @@ if ((CURRENT == 2)); then
   _describe verb verbs
 elif [[ $PREFIX == -* ]]; then
   options=(${(f)"$($words[1] $words[2] --help 2>/dev/null |
-    sed -n 's/^  \(-[a-zA-Z],\)\{0,1\}\(--[a-z][a-z-]*\)\( TEXT\| INT\| FLOAT\)\{0,1\}[^ ]* *\(.*\)/\2:\4/p')"})
+    sed -n 's/^  \(-[a-zA-Z],\)\{0,1\}\(--[a-z][a-z-]*\)\( [^ ][^ ]*\)* *\(.*\)/\2:\4/p')"})
   _describe option options
 else
   _files

@@ -66,6 +66,16 @@ Real CCurve::ValueOf(Long index) const
   return HasRows() ? keyRoot_.GetRows()[index].value : NodeAt(index)->GetValue();
 }
 
+const CKey* CCurve::PeekKey(Long index, CKey& scratch) const
+{
+  if (index < 0 || index >= GetKeyCount())
+    return nullptr;
+  if (!HasRows())
+    return NodeAt(index);
+  scratch.FromRow(keyRoot_.GetRows()[index], keyRoot_.GetRows().GetTangents(index));
+  return &scratch;
+}
+
 Bool CCurve::GetKeyValues(Long index, KeyValues& values) const
 {
   if (index < 0 || index >= GetKeyCount())

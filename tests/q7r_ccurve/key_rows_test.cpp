@@ -189,17 +189,21 @@ TEST(KeyRows, ProgressIsToldAtTheSamePlaces)
 
 bool AreEqual(const CCurve& a, const CCurve& b)
 {
+  CKey ofA;
+  CKey ofB;
   for (Long i = 0; i < a.GetKeyCount(); ++i) {
     KeyValues x;
     KeyValues y;
-    if (!a.GetKeyValues(i, x) || !b.GetKeyValues(i, y) || x.time != y.time || x.value != y.value ||
-        x.leftTime != y.leftTime || x.rightValue != y.rightValue || x.interpolation != y.interpolation ||
-        x.switches != y.switches || a.GetTangents(i).rightValue != b.GetTangents(i).rightValue)
+    if (!a.GetKeyValues(i, x) || !b.GetKeyValues(i, y) || !a.PeekKey(i, ofA)->IsEqual(*b.PeekKey(i, ofB)) ||
+        x.time != y.time || x.value != y.value || x.leftTime != y.leftTime || x.rightValue != y.rightValue ||
+        x.interpolation != y.interpolation || x.switches != y.switches ||
+        a.GetTangents(i).rightValue != b.GetTangents(i).rightValue)
       return false;
   }
   KeyValues none;
   return a.GetKeyCount() == b.GetKeyCount() && a.GetValue(0.77) == b.GetValue(0.77) &&
-         !a.GetKeyValues(a.GetKeyCount(), none) && !a.GetKeyValues(-1, none);
+         !a.GetKeyValues(a.GetKeyCount(), none) && !a.GetKeyValues(-1, none) && !a.PeekKey(a.GetKeyCount(), ofA) &&
+         !a.PeekKey(-1, ofA);
 }
 
 TEST(KeyRows, ChangeAndEvaluateLikeNodes)
@@ -251,6 +255,8 @@ TEST(KeyRows, TakeFewBytesAndAskForNoNodeToBeLookedAt)
   const LLong rows = counting_memory::Get().bytes - before;
   EXPECT_EQ(read.GetKeyCount(), kKeys);
   EXPECT_LE(rows, 64 * kKeys + 4096);
+  CKey scratch;
+  EXPECT_EQ(read.PeekKey(9, scratch), &scratch);
   read.GetValue(100.0);
   EXPECT_EQ(counting_memory::Get().bytes - before, rows);
   ASSERT_TRUE(read.GetKey(0));

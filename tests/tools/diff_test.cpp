@@ -211,6 +211,9 @@ TEST(Diff, LeavesOutWhatDoesNotMatter)
   FindTag<PointTag>(*near, kTagPoint)->GetArray()[0].x = 1e-7;
   const std::string moved = Save(folder, "near.q7r", *near);
   EXPECT_EQ(Diff(one, moved, "--tolerance 1e-6").status, 0);
+  const RunResult quiet = Diff(one, moved, "--quiet");
+  EXPECT_EQ(quiet.status, 1);
+  EXPECT_EQ(quiet.out + quiet.err, "");
   const Json json = Json::parse(Diff(one, moved, "--json").out);
   EXPECT_EQ(json["count"], 2);
   EXPECT_EQ(json["same"], false);
@@ -261,7 +264,9 @@ TEST(Check, WarnsOfWhatIsOdd)
   document->GetFirstRenderData()->GetDataInstance().SetReal(kRenderFrameRate, 0);
   const std::string odd = Save(folder, "odd.q7r", *document);
   const RunResult run = RunQ7r("check " + Quoted(odd));
-  EXPECT_EQ(run.status, 1);
+  const RunResult quiet = RunQ7r("check --quiet " + Quoted(odd));
+  EXPECT_EQ(run.status + quiet.status, 2);
+  EXPECT_EQ(quiet.out, "");
   EXPECT_EQ(std::count(run.out.begin(), run.out.end(), '\n'), 5) << run.out;
   for (const char* part :
        {"objects/Eye: the name stands more than once in this list", "focalLength (500) is -1: it goes above 0",

@@ -67,6 +67,11 @@ TEST_F(ManyFiles, AreLookedAtInTurnAndPastABadOne)
     EXPECT_EQ(run.err, "q7r: " + (folder_ / "bad.q7r") + ": not a scene file but a text\n");
     EXPECT_EQ(RunQ7r(verb + " " + a + " " + b).status, 0);
   }
+  // --quiet: what is wrong alone.
+  const RunResult quiet = RunQ7r("check --quiet " + files);
+  EXPECT_EQ(quiet.out, "");
+  EXPECT_EQ(quiet.status, 2);
+
   const std::string ies = Quoted(TEST_SOURCE_DIR "/README.md");
   EXPECT_EQ(Count(RunQ7r("ies " + ies + " " + ies).err, "README.md"), 2U);
   const std::string json = RunQ7r("info --json " + a + " " + b).out;

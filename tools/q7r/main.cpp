@@ -21,7 +21,9 @@ input or output wherever a file does. Exit status:
 
   0  done
   1  done, but something was warned of, or check or diff found something
-  2  not done, or not with each of several files)";
+  2  not done, or not with each of several files
+
+q7r VERB --help tells more of a verb.)";
 
 // "q7r help export" is "q7r export --help".
 std::vector<std::string> ArgumentsOf(int argc, char** argv)
@@ -46,6 +48,7 @@ void AddJson(CLI::App& program)
 int Run(const std::vector<std::string>& arguments)
 {
   CLI::App program(kDescription, "q7r");
+  program.formatter(q7r::HelpFormat());
   program.allow_windows_style_options(false); // "/..." is a path everywhere
   program.set_version_flag("-V,--version", "q7r 1.0.0 (scene file version 13000)");
   program.require_subcommand(1);

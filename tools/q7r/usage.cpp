@@ -1,6 +1,7 @@
 #include "usage.h"
 
 #include <algorithm>
+#include <sstream>
 
 #include "report.h"
 
@@ -89,7 +90,23 @@ std::string NoVerbText(const CLI::App& program, const std::vector<std::string>& 
   return "there is no verb \"" + arguments.front() + "\"" + Guess(arguments.front(), VerbsOf(program));
 }
 
+class Format final : public CLI::Formatter
+{
+ public:
+  std::string make_subcommand(const CLI::App* verb) const override
+  {
+    const std::string help = verb->get_description();
+    std::string clause = help.substr(0, std::min(help.find_first_of(".:;"), help.find("\n\n")));
+    std::replace(clause.begin(), clause.end(), '\n', ' ');
+    std::ostringstream line;
+    CLI::detail::format_help(line, verb->get_name(), clause, 16);
+    return line.str();
+  }
+};
+
 } // namespace
+
+std::shared_ptr<CLI::Formatter> HelpFormat() { return std::make_shared<Format>(); }
 
 std::string UsageText(const CLI::App& program, const CLI::ParseError& error, const std::vector<std::string>& arguments)
 {

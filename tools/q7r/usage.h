@@ -2,6 +2,7 @@
 #pragma once
 
 #include <CLI/CLI.hpp>
+#include <memory>
 #include <string>
 #include <vector>
 
@@ -18,6 +19,9 @@ void RequireVerb(const CLI::App& program, const std::vector<std::string>& argume
 // The candidate that differs least from a word: by letters that are missing, too many, other or swapped. Empty when all
 // differ too much to have been meant.
 std::string Nearest(const std::string& word, const std::vector<std::string>& candidates);
+
+// How help is set out: the program's has for each verb the first clause of what the verb's own help says.
+std::shared_ptr<CLI::Formatter> HelpFormat();
 
 // Adds --quiet, and --verbose unless `verbose`, which tells what it does, is null.
 void AddTalkOptions(CLI::App& verb, const char* verbose = nullptr);

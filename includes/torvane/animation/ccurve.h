@@ -46,6 +46,9 @@ class CCurve : public BaseList2D
   CKey* FindKey(const BaseTime& time, Long* index = nullptr, Long mode = kFindExact) const;
   Long GetKeyCount() const { return keyRoot_.GetRowCount() + keys_.GetCount(); }
   CKey* GetKey(Long index) const; // null out of range and when memory is short
+  // A key to look at, for which the curve's keys need not become nodes: the node if it is one, else `scratch`, which
+  // then has all that the key holds and must stand in no curve. Null out of range.
+  const CKey* PeekKey(Long index, CKey& scratch) const;
   // A key's values; false out of range.
   Bool GetKeyValues(Long index, KeyValues& values) const;
   // Puts a key with these values at its time, in place of one that stands there. False, with nothing changed, for a

@@ -3,7 +3,6 @@
 #include <algorithm>
 #include <charconv>
 #include <cstdio>
-#include <new>
 #include <unordered_set>
 
 #include "listing/node_path.h"
@@ -206,11 +205,11 @@ void SceneDiff::CompareCurves(const CCurve* curveA, const CCurve* curveB, const 
 {
   const Long countA = curveA ? curveA->GetKeyCount() : 0;
   const Long countB = curveB ? curveB->GetKeyCount() : 0;
+  CKey scratchA;
+  CKey scratchB;
   for (Long a = 0, b = 0; a < countA || b < countB;) {
-    CKey* keyA = a < countA ? curveA->GetKey(a) : nullptr;
-    CKey* keyB = b < countB ? curveB->GetKey(b) : nullptr;
-    if ((a < countA && !keyA) || (b < countB && !keyB) || (!keyA && !keyB))
-      throw std::bad_alloc();
+    const CKey* keyA = a < countA ? curveA->PeekKey(a, scratchA) : nullptr;
+    const CKey* keyB = b < countB ? curveB->PeekKey(b, scratchB) : nullptr;
     const bool isOne = keyA && keyB && comparison_.AreEqual(keyA->GetTime().Get(), keyB->GetTime().Get());
     const bool isOfA = keyA && (isOne || !keyB || keyA->GetTime().Get() < keyB->GetTime().Get());
     const bool isOfB = isOne || !isOfA;
@@ -224,7 +223,7 @@ void SceneDiff::CompareCurves(const CCurve* curveA, const CCurve* curveB, const 
   }
 }
 
-void SceneDiff::CompareKeys(CKey& a, CKey& b, const std::string& path)
+void SceneDiff::CompareKeys(const CKey& a, const CKey& b, const std::string& path)
 {
   const auto haveEqualBits = [&] {
     return a.GetNBit(-1) == b.GetNBit(-1) && a.GetNBit(-2) == b.GetNBit(-2) && a.GetNBit(-3) == b.GetNBit(-3) &&

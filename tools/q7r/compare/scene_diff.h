@@ -55,7 +55,7 @@ class SceneDiff
   void CompareOrder(const Members& a, const Members& b, const std::string& path);
   void CompareTracks(_torvane_::CTrack& a, _torvane_::CTrack& b, const std::string& path);
   void CompareCurves(const _torvane_::CCurve* a, const _torvane_::CCurve* b, const std::string& path);
-  void CompareKeys(_torvane_::CKey& a, _torvane_::CKey& b, const std::string& path);
+  void CompareKeys(const _torvane_::CKey& a, const _torvane_::CKey& b, const std::string& path);
   void FindMovedBelow(_torvane_::BaseList2D& removed, const std::string& path);
   void ReportMoved(_torvane_::BaseList2D& a, _torvane_::BaseList2D& b, const std::string& path);
   void Tell(const Difference& difference);

@@ -449,7 +449,7 @@ void SceneTeller::TellDraw(BaseDraw& draw)
   sink_.EndObject();
 }
 
-void SceneTeller::TellKey(CKey& key)
+void SceneTeller::TellKey(const CKey& key)
 {
   sink_.BeginObject(ValueSink::Layout::kLine);
   Tell(sink_, "time", key.GetTime());
@@ -470,9 +470,10 @@ void SceneTeller::TellKey(CKey& key)
 
 void SceneTeller::TellKeys(const CCurve& curve)
 {
+  CKey scratch;
   sink_.BeginArray();
   for (Long i = 0; i < curve.GetKeyCount(); ++i)
-    TellKey(*curve.GetKey(i));
+    TellKey(*curve.PeekKey(i, scratch));
   sink_.EndArray();
 }
 

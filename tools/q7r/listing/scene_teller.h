@@ -63,7 +63,7 @@ class SceneTeller
   // The members that tell a node without its lists.
   void TellOwn(_torvane_::BaseList2D& node);
   // An object for a key.
-  void TellKey(_torvane_::CKey& key);
+  void TellKey(const _torvane_::CKey& key);
 
  private:
   void TellList(const NodeList& list, int depth);

@@ -83,6 +83,8 @@ void PrintFindings(const std::string& file, const Findings& findings)
   const std::string name = InputName(file);
   for (const std::string& line : findings.problems)
     PrintLine(line);
+  if (TheTalk().quiet)
+    return;
   for (const SceneWarning& warning : findings.warnings)
     PrintLine(name + ": warning: " + (warning.path.empty() ? "" : warning.path + ": ") + warning.message);
   if (findings.AreNone())
@@ -127,6 +129,7 @@ void AddCheck(CLI::App& program, int& status)
   options->headed = false; // each line begins with its file
   CLI::App* verb = program.add_subcommand("check", kHelp);
   AddFileList(*verb, *options, "a scene file", "as one JSON object (docs/json.md)");
+  verb->add_flag("--quiet", TheTalk().quiet, "print what is wrong alone, no warnings and nothing for a good file");
   verb->callback([options, &status] {
     status = ShowEach(*options, [&](const std::string& file) { return Check(file, *options); });
   });

@@ -34,6 +34,7 @@ struct Options
   std::string b;
   DiffOptions diff;
   bool json = false;
+  bool quiet = false;
 };
 
 std::string RowText(const RowsValue& rows, long long index)
@@ -122,6 +123,11 @@ void TellDifference(ValueSink& json, const Difference& difference, const Compari
   json.EndObject();
 }
 
+int DiffSilently(BaseDocument& a, BaseDocument& b, const DiffOptions& options)
+{
+  return SceneDiff(a, b, options, [](const Difference&, const Comparison&) {}).Run() == 0 ? kDone : kProblems;
+}
+
 int DiffAsText(BaseDocument& a, BaseDocument& b, const DiffOptions& options)
 {
   const long long count = SceneDiff(a, b, options, PrintDifference).Run();
@@ -150,6 +156,8 @@ int Diff(const Options& options)
 {
   const DocumentPtr a = LoadScene(options.a);
   const DocumentPtr b = LoadScene(options.b);
+  if (options.quiet)
+    return DiffSilently(*a, *b, options.diff);
   return options.json ? DiffAsJson(*a, *b, options.diff) : DiffAsText(*a, *b, options.diff);
 }
 
@@ -165,7 +173,8 @@ void AddDiff(CLI::App& program, int& status)
       ->option_text("NUMBER [0]")
       ->check(CLI::NonNegativeNumber);
   verb->add_flag("--all", options->diff.all, "also dates, who wrote the file, markers and states");
-  verb->add_flag("--json", options->json, "as one JSON object (docs/json.md)");
+  CLI::Option* json = verb->add_flag("--json", options->json, "as one JSON object (docs/json.md)");
+  verb->add_flag("--quiet", options->quiet, "print nothing: the exit status tells")->excludes(json);
   verb->callback([options, &status] { status = Diff(*options); });
 }
 
