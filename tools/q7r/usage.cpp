@@ -95,8 +95,9 @@ class Format final : public CLI::Formatter
  public:
   std::string make_subcommand(const CLI::App* verb) const override
   {
-    const std::string help = verb->get_description();
-    std::string clause = help.substr(0, std::min(help.find_first_of(".:;"), help.find("\n\n")));
+    std::string clause = verb->get_description();
+    for (const char* end : {".\n", ". ", "\n\n", ": ", ":\n", "; ", ";\n"})
+      clause.resize(std::min(clause.find(end), clause.size()));
     std::replace(clause.begin(), clause.end(), '\n', ' ');
     std::ostringstream line;
     CLI::detail::format_help(line, verb->get_name(), clause, 16);
