@@ -80,8 +80,8 @@ FileBytes::FileBytes(const std::filesystem::path& file)
   while (stream.read(piece.data(), static_cast<std::streamsize>(piece.size())) || stream.gcount() > 0)
     owned_.insert(owned_.end(), piece.begin(), piece.begin() + stream.gcount());
   if (!stream.is_open() || stream.bad()) // a folder opens, but is bad to read
-    throw CompositionError(OneLine(PathToUtf8(file)) + ": " +
-                           (errno ? std::generic_category().message(errno) : "cannot be read"));
+    throw CompositionError(OneLine(PathToUtf8(file)),
+                           errno ? std::generic_category().message(errno) : "cannot be read");
 }
 
 FileBytes::~FileBytes()

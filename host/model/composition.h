@@ -5,12 +5,14 @@
 #include "host/model/property.h"
 
 #include <array>
+#include <cstddef>
 #include <deque>
 #include <filesystem>
 #include <optional>
 #include <stdexcept>
 #include <string>
 #include <string_view>
+#include <utility>
 #include <vector>
 
 namespace host
@@ -93,7 +95,27 @@ struct Project
 class CompositionError : public std::runtime_error
 {
  public:
-  using std::runtime_error::runtime_error;
+  // `message` tells the place, if any, and the reason; `offset` is the byte in the file, or -1, and `path` leads there:
+  // a JSON pointer or the chunks around it.
+  CompositionError(const std::string& file, const std::string& message, std::ptrdiff_t offset = -1,
+                   std::string path = {})
+      : std::runtime_error(file + ": " + message),
+        file_(file),
+        message_(message),
+        path_(std::move(path)),
+        offset_(offset)
+  {}
+
+  const std::string& File() const { return file_; }
+  const std::string& Message() const { return message_; }
+  const std::string& Path() const { return path_; }
+  std::ptrdiff_t Offset() const { return offset_; }
+
+ private:
+  std::string file_;
+  std::string message_;
+  std::string path_;
+  std::ptrdiff_t offset_;
 };
 
 // Reads a composition file. Throws CompositionError.

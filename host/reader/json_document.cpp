@@ -94,13 +94,14 @@ class Builder : public nlohmann::json_sax<Json>
   bool isOutOfRange_ = false;
 };
 
-std::string BytePlace(std::string_view text, std::size_t position)
+// Lines and columns count from 1.
+std::string BytePlace(std::string_view text, std::size_t offset)
 {
-  const std::string_view before = text.substr(0, std::min(position, text.size()));
+  const std::string_view before = text.substr(0, offset);
   const auto line = 1 + std::count(before.begin(), before.end(), '\n');
   const std::size_t lineStart = before.rfind('\n') + 1; // npos + 1 is 0
-  return "byte " + std::to_string(position) + " (line " + std::to_string(line) + ", column " +
-         std::to_string(before.size() - lineStart) + ")";
+  return "byte " + std::to_string(offset) + " (line " + std::to_string(line) + ", column " +
+         std::to_string(before.size() - lineStart + 1) + ")";
 }
 
 // Writes the pointer of `wanted` behind `pointer` if it lies in `value`. Depth is bounded by kMaxDepth.
@@ -134,13 +135,14 @@ JsonDocument::JsonDocument(std::string_view name, std::string_view text) : name_
   Builder builder(root_);
   if (Json::sax_parse(text, &builder))
     return;
-  const std::string start = name_ + ": ";
   if (builder.IsTooDeep())
-    throw CompositionError(start + "nested deeper than " + std::to_string(kMaxDepth));
-  const char* reason = builder.IsOutOfRange()              ? ": number out of range"
-                       : builder.ErrorByte() > text.size() ? ": the file ends before its JSON does"
-                                                           : ": not JSON";
-  throw CompositionError(start + BytePlace(text, builder.ErrorByte()) + reason);
+    throw CompositionError(name_, "nested deeper than " + std::to_string(kMaxDepth));
+  // The parser counts what it has taken, with the byte that it can't take.
+  const std::size_t offset = builder.ErrorByte() - std::min<std::size_t>(builder.ErrorByte(), 1);
+  const char* reason = builder.IsOutOfRange()  ? ": number out of range"
+                       : offset >= text.size() ? ": the file ends before its JSON does"
+                                               : ": not JSON";
+  throw CompositionError(name_, BytePlace(text, offset) + reason, static_cast<std::ptrdiff_t>(offset));
 }
 
 std::string JsonDocument::Pointer(const Json& value) const
@@ -153,12 +155,13 @@ std::string JsonDocument::Pointer(const Json& value) const
 void JsonDocument::Refuse(const Json& at, std::string_view reason) const
 {
   const std::string pointer = Pointer(at);
-  throw CompositionError(name_ + ": " + pointer + (pointer.empty() ? "" : ": ") + std::string(reason));
+  throw CompositionError(name_, pointer + (pointer.empty() ? "" : ": ") + std::string(reason), -1, pointer);
 }
 
 void JsonDocument::RefuseMember(const Json& object, std::string_view key, std::string_view reason) const
 {
-  throw CompositionError(name_ + ": " + Pointer(object) + '/' + std::string(key) + ": " + std::string(reason));
+  const std::string pointer = Pointer(object) + '/' + std::string(key);
+  throw CompositionError(name_, pointer + ": " + std::string(reason), -1, pointer);
 }
 
 const Json& JsonDocument::Object(const Json& value) const

@@ -92,7 +92,7 @@ void FindMovedFootage(Project& project, const fs::path& folder, const std::strin
 {
   std::error_code ignored;
   if (!fs::is_directory(folder, ignored))
-    throw CompositionError(OneLine(PathToUtf8(folder)) + ": is no folder");
+    throw CompositionError(OneLine(PathToUtf8(folder)), "is no folder");
   FolderSearch search(folder);
   for (Item& item : project.items) {
     if (item.kind != ItemKind::kFootage || item.path.empty() || IsFile(PathFromUtf8(item.path)))

@@ -96,14 +96,14 @@ bool HasSuffix(const std::filesystem::path& file, std::string_view suffix)
 void RefuseOthers(std::string_view bytes, const std::string& name)
 {
   const std::size_t first = bytes.find_first_not_of("\xEF\xBB\xBF \t\r\n");
-  const std::string start = OneLine(name) + ": ";
+  const std::string file = OneLine(name);
   if (first == std::string_view::npos)
-    throw CompositionError(start + "is empty");
+    throw CompositionError(file, "is empty");
   if (bytes.starts_with("QQ7R"))
-    throw CompositionError(start + "is a scene file, no project or composition");
+    throw CompositionError(file, "is a scene file, no project or composition");
   constexpr std::string_view kFirstOfJson = "{[\"-0123456789tfn";
   if (kFirstOfJson.find(bytes[first]) == std::string_view::npos)
-    throw CompositionError(start + "neither an After Effects project nor a composition (JSON)");
+    throw CompositionError(file, "neither an After Effects project nor a composition (JSON)");
 }
 
 } // namespace

@@ -63,7 +63,7 @@ std::vector<Value> SamplesReader::Resample(const std::vector<Value>& samples) co
     return samples;
   const double count = static_cast<double>(samples.size() - 1) * framesPerSample_.ToDouble() + 1;
   if (!(count < kMostSamples))
-    throw CompositionError(name_ + ": its samples last too many frames of the composition");
+    throw CompositionError(name_, "its samples last too many frames of the composition");
   std::vector<Value> resampled;
   for (std::int64_t frame = 0; static_cast<double>(frame) < count; ++frame) {
     const auto nearest = static_cast<std::size_t>((Ratio(frame) / framesPerSample_).Round());

@@ -66,11 +66,11 @@ TEST(CompositionErrors, NameThePlaceWithinWhatIsRead)
       {Changed("/layers/1/pe", "{}"), "/layers/1/pe/k: missing"},
       {Changed("/layers/0/parent", "2"), "/layers/0/parent: the chain of parents loops"},
       {"[]", "expected an object"},
-      {"", "byte 1 (line 1, column 0): the file ends before its JSON does"},
-      {"{\n  \"w\": 1,\n  oops", "byte 15 (line 3, column 3): not JSON"},
-      {"{\"w\": 1} x", "byte 10 (line 1, column 10): not JSON"},
-      {"{\"w\": 1e999}", "byte 11 (line 1, column 11): number out of range"},
-      {"{\"w\": \"\xFF\"}", "byte 8 (line 1, column 8): not JSON"},
+      {"", "byte 0 (line 1, column 1): the file ends before its JSON does"},
+      {"{\n  \"w\": 1,\n  oops", "byte 14 (line 3, column 3): not JSON"},
+      {"{\"w\": 1} x", "byte 9 (line 1, column 10): not JSON"},
+      {"{\"w\": 1e999}", "byte 10 (line 1, column 11): number out of range"},
+      {"{\"w\": \"\xFF\"}", "byte 7 (line 1, column 8): not JSON"},
       {std::string(100000, '['), "nested deeper than 1000"},
   };
   for (const auto& [text, message] : cases)

@@ -140,6 +140,13 @@ TEST(Json, TellsWhereAndWhy)
   const Json missing = Parsed(RunQ7r("info --json " + Quoted(folder / "none.q7r")).out)["error"];
   EXPECT_EQ(missing["message"], "No such file or directory");
   EXPECT_EQ(missing["offset"], nullptr);
+  const std::tuple<const char*, const char*, Json, Json> inputs[] = {
+      {"a.json", "{\"w\":\n", 6, nullptr}, {"b.json", "{\"w\": \"x\"}", nullptr, "/w"}, {"c.aep", "RIFX", 0, nullptr}};
+  for (const auto& [name, text, offset, path] : inputs) {
+    const std::string input = WriteText(folder, name, text);
+    const Json wrong = Parsed(RunQ7r("compositions --json " + Quoted(input)).out)["error"];
+    EXPECT_EQ(Json({wrong["file"], wrong["offset"], wrong["path"]}), Json({input, offset, path})) << wrong;
+  }
 }
 
 TEST(Json, KeepsEveryCharacterAndDigit)

@@ -6,6 +6,7 @@
 #include <string_view>
 #include <utility>
 
+#include "host/model/composition.h"
 #include "output/json_output.h"
 #include "output/terminal.h"
 
@@ -53,6 +54,8 @@ Failure Caught()
     throw;
   } catch (const Failure& failure) {
     return failure;
+  } catch (const host::CompositionError& error) {
+    return Failure(error.File(), error.Message(), error.Offset(), error.Path());
   } catch (const std::bad_alloc&) {
     return Failure("not enough memory");
   } catch (const std::exception& error) {
@@ -78,7 +81,7 @@ void PrintFailure(const Failure& failure)
       json.Key("offset"), json.Null();
     else
       json.Member("offset", failure.Offset());
-    TellTextOrNull(json, "path", failure.Chunks());
+    TellTextOrNull(json, "path", failure.Path());
     json.Member("message", failure.Message());
     json.EndObject();
   });

@@ -21,25 +21,25 @@ class Failure : public std::runtime_error
 {
  public:
   explicit Failure(const std::string& line) : std::runtime_error(line), message_(line) {}
-  // With its parts, for programs. `offset` is a place in the file, or -1; `chunks` the chunks around it. `message`
-  // tells both in words.
-  Failure(const std::string& file, const std::string& message, long long offset = -1, std::string chunks = {})
+  // With its parts, for programs. `offset` is a place in the file, or -1; `path` leads there: the chunks around it, or
+  // a JSON pointer. `message` tells both in words.
+  Failure(const std::string& file, const std::string& message, long long offset = -1, std::string path = {})
       : std::runtime_error(file + ": " + message),
         file_(file),
         message_(message),
-        chunks_(std::move(chunks)),
+        path_(std::move(path)),
         offset_(offset)
   {}
 
   const std::string& File() const { return file_; } // empty where it isn't known apart
   const std::string& Message() const { return message_; }
-  const std::string& Chunks() const { return chunks_; }
+  const std::string& Path() const { return path_; }
   long long Offset() const { return offset_; }
 
  private:
   std::string file_;
   std::string message_;
-  std::string chunks_;
+  std::string path_;
   long long offset_ = -1;
 };
 

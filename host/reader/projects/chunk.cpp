@@ -167,7 +167,8 @@ Chunk ChunkDocument::Root() const
 void ChunkDocument::Refuse(std::size_t offset, const std::string& reason) const
 {
   const std::string path = Path(offset);
-  throw CompositionError(name_ + ": " + Place(offset) + (path.empty() ? "" : " (" + path + ")") + ": " + reason);
+  throw CompositionError(name_, Place(offset) + (path.empty() ? "" : " (" + path + ")") + ": " + reason,
+                         static_cast<std::ptrdiff_t>(offset), path);
 }
 
 std::string ChunkDocument::Place(std::size_t offset) const

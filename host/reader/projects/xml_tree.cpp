@@ -62,7 +62,7 @@ void TreeBuilder::Refuse(std::ptrdiff_t at, const std::string& reason) const
 {
   const std::string_view before = text_.substr(0, static_cast<std::size_t>(std::max<std::ptrdiff_t>(at, 0)));
   const auto line = 1 + std::count(before.begin(), before.end(), '\n');
-  throw CompositionError(name_ + ": line " + std::to_string(line) + ": " + reason);
+  throw CompositionError(name_, "line " + std::to_string(line) + ": " + reason, std::max<std::ptrdiff_t>(at, 0));
 }
 
 void TreeBuilder::PutWord(std::uint32_t word)
