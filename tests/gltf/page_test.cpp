@@ -101,6 +101,15 @@ TEST_F(ViewVerb, WritesThePageThatExportWrites)
   EXPECT_EQ(RunQ7r("export " + Quoted(folder_ / "in.json") + " " + Quoted(folder_ / "x.html")).status, 0);
   EXPECT_EQ(ReadWholeFile(folder_ / "page.HTML"), ReadWholeFile(folder_ / "x.html"));
   EXPECT_NE(ReadOutput(folder_ / "x.html").find("<title>in</title>"), std::string::npos);
+  const RunResult quiet = View("quiet.html", "--quiet");
+  EXPECT_EQ(quiet.out + quiet.err, "");
+  for (const std::string output : {"-", "/dev/stdout"}) {
+    const RunResult piped = RunQ7r("view " + Quoted(folder_ / "in.q7r") + " -o " + output);
+    EXPECT_EQ(piped.err, "");
+    EXPECT_EQ(piped.out, ReadOutput(folder_ / "x.html"));
+    const RunResult glb = RunQ7r("convert " + Quoted(folder_ / "in.q7r") + " " + output);
+    EXPECT_EQ(gltf::CheckGlb({glb.out.begin(), glb.out.end()}), "") << glb.err;
+  }
 }
 
 TEST_F(ViewVerb, RefusesWithOneSentence)

@@ -46,9 +46,8 @@ void WriteMain(const gltf::Model& model, const std::string& title, GltfForm form
 }
 
 // Neither of two files takes its place before both are written.
-void WriteModel(const gltf::Model& model, const std::string& title, const std::string& output)
+void WriteModel(const gltf::Model& model, const std::string& title, const std::string& output, GltfForm form)
 {
-  const GltfForm form = GltfFormOf(output);
   auto writeMain = [&](const std::string& partial) {
     RawOutput file{fs::path(partial)};
     WriteMain(model, title, form, [&file](const std::uint8_t* data, std::size_t size) {
@@ -71,16 +70,15 @@ void WriteModel(const gltf::Model& model, const std::string& title, const std::s
 
 } // namespace
 
-GltfForm GltfFormOf(const std::string& path)
+GltfForm GltfFormOf(const std::string& path, GltfForm ofDevices)
 {
-  if (IsStandard(path))
-    return GltfForm::kGlb;
   std::string suffix = fs::path(path).extension().string();
   std::transform(suffix.begin(), suffix.end(), suffix.begin(),
                  [](char c) { return c >= 'A' && c <= 'Z' ? static_cast<char>(c + ('a' - 'A')) : c; });
   return suffix == ".glb"    ? GltfForm::kGlb
          : suffix == ".gltf" ? GltfForm::kGltf
          : suffix == ".html" ? GltfForm::kPage
+         : IsDevice(path)    ? ofDevices
                              : GltfForm::kNone;
 }
 
@@ -94,17 +92,17 @@ void RequireGltfOutput(const std::string& output, const std::string& scene, bool
   }
 }
 
-int WriteGltf(_torvane_::BaseDocument& document, const std::string& scene, const std::string& output,
+int WriteGltf(_torvane_::BaseDocument& document, const std::string& scene, const std::string& output, GltfForm form,
               gltf::Options options)
 {
   options.sceneFolder = fs::absolute(scene).parent_path();
-  options.outputFolder = fs::absolute(output).parent_path();
-  if (GltfFormOf(output) == GltfForm::kGltf)
+  options.outputFolder = FolderOfOutput(output);
+  if (form == GltfForm::kGltf)
     options.bufferName = gltf::PercentEncoded(TextOf(fs::path(BytesPath(output)).filename()));
-  options.embed = options.embed || GltfFormOf(output) == GltfForm::kPage;
+  options.embed = options.embed || form == GltfForm::kPage;
   try {
     const gltf::Model model = gltf::Convert(document, options);
-    WriteModel(model, TextOf(fs::path(scene).stem()), output);
+    WriteModel(model, IsStandard(scene) ? "Scene" : TextOf(fs::path(scene).stem()), output, form);
     for (const std::string& line : model.account.Lines())
       TellNote(line);
     return model.account.HasProblems() ? kProblems : kDone;

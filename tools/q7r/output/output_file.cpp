@@ -201,6 +201,11 @@ bool IsDevice(const std::string& path)
   return DescriptorOf(path) >= 0 || (fs::exists(status) && !fs::is_regular_file(status) && !fs::is_directory(status));
 }
 
+fs::path FolderOfOutput(const std::string& path)
+{
+  return IsDevice(path) ? fs::current_path() : fs::absolute(path).parent_path();
+}
+
 void RequireWritable(const std::string& path, bool force)
 {
   if (!HasFileName(path))

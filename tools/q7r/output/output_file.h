@@ -3,6 +3,7 @@
 // the cause.
 #pragma once
 
+#include <filesystem>
 #include <functional>
 #include <memory>
 #include <string>
@@ -20,6 +21,9 @@ bool HasFileName(const std::string& path);
 
 // Something that exists and is written to, never replaced: a device, a pipe, standard output.
 bool IsDevice(const std::string& path);
+
+// The folder that an output will lie in. Where what goes into a device ends isn't known: then the folder of the shell.
+std::filesystem::path FolderOfOutput(const std::string& path);
 
 // Refuses a path that no file can be written to: a folder, one without a file name or in a folder that isn't there,
 // and an existing file unless `force` is set; on a terminal the user is asked. To be called before the work begins.

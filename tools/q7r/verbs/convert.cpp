@@ -3,6 +3,7 @@
 
 #include "gltf_file.h"
 #include "scene_file.h"
+#include "standard_input.h"
 #include "usage.h"
 #include "verbs.h"
 #include "work_list.h"
@@ -30,6 +31,8 @@ struct Options : WorkOptions
   gltf::Options conversion;
 };
 
+GltfForm FormOf(const Work& work) { return GltfFormOf(work.output, GltfForm::kGlb); }
+
 int Convert(Options& options)
 {
   options.conversion.pointers = !options.noPointers;
@@ -38,14 +41,14 @@ int Convert(Options& options)
   return DoWork(
       PlanWork(options, ".glb"), options.jobs,
       [&](const Work& work) {
-        const GltfForm form = GltfFormOf(work.output);
+        const GltfForm form = FormOf(work);
         if (form != GltfForm::kGlb && form != GltfForm::kGltf)
-          throw Failure(work.output, "the name must end with .glb or .gltf");
+          throw Failure(InputName(work.output), "the name must end with .glb or .gltf");
         RequireGltfOutput(work.output, work.input, options.force);
       },
       [&](const Work& work) {
         const DocumentPtr document = LoadScene(work.input);
-        return WriteGltf(*document, work.input, work.output, options.conversion);
+        return WriteGltf(*document, work.input, work.output, FormOf(work), options.conversion);
       });
 }
 

@@ -122,11 +122,11 @@ int ExportAsGltf(host::StandaloneHost& player, const host::Composition& composit
   const bool quiet = PlayExport(player, work.output, scene->Path().string());
   const DocumentPtr document = LoadScene(scene->Path().string());
   TellAccount(composition, *document, work.output);
-  const int status = WriteGltf(*document, work.input, work.output, {});
+  const int status = WriteGltf(*document, work.input, work.output, GltfFormOf(work.output), {});
   return quiet ? status : kProblems;
 }
 
-bool IsGltf(const Work& work) { return !IsStandard(work.output) && GltfFormOf(work.output) != GltfForm::kNone; }
+bool IsGltf(const Work& work) { return GltfFormOf(work.output) != GltfForm::kNone; }
 
 void RequireOutput(const Work& work, bool force)
 {
@@ -134,12 +134,6 @@ void RequireOutput(const Work& work, bool force)
     RequireGltfOutput(work.output, work.input, force);
   else
     RequireWritable(work.output, force);
-}
-
-// Where a scene that goes into a pipe will be isn't known: then the folder of the shell.
-std::filesystem::path FolderOf(const std::string& output)
-{
-  return IsDevice(output) ? std::filesystem::current_path() : std::filesystem::absolute(output).parent_path();
 }
 
 int ExportOne(const Work& work, const Options& options)
@@ -154,7 +148,7 @@ int ExportOne(const Work& work, const Options& options)
   }
   host::Project project = ReadProjectToExport(input);
   if (options.relative && !IsGltf(work)) // a glTF file's are always
-    MakeRelative(project, FolderOf(work.output));
+    MakeRelative(project, FolderOfOutput(work.output));
   const host::Composition& chosen = *project.root; // stays where it is when the project moves
   const bool isWarned = !project.warnings.empty();
   host::StandaloneHost player(std::move(project));
