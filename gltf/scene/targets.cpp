@@ -70,9 +70,22 @@ Matrix Targets::WorldOf(std::size_t index, const std::optional<Real>& time, int 
   return world;
 }
 
+// Where an object is. Its own rotation, and with it what it looks at, has no part in that.
+Vector Targets::PointOf(std::size_t index, const std::optional<Real>& time, int depth)
+{
+  const std::size_t parent = tree_[index].parent;
+  const Matrix world = parent == kNone ? Matrix() : WorldOf(parent, time, depth);
+  return world * OwnPlaceOf(index, time).position;
+}
+
+Place Targets::OwnPlaceOf(std::size_t index, const std::optional<Real>& time) const
+{
+  return time && motions_[index] ? motions_[index]->At(*time) : gltf::RestOf(*tree_[index].object);
+}
+
 Place Targets::PlaceOf(std::size_t index, const std::optional<Real>& time, const Matrix& parent, int depth)
 {
-  Place place = time && motions_[index] ? motions_[index]->At(*time) : gltf::RestOf(*tree_[index].object);
+  Place place = OwnPlaceOf(index, time);
   if (targets_[index] != kNone && !worlds_[index].busy && depth < kMaxDepth) {
     worlds_[index].busy = true;
     place.rotation = LookFrom(index, place.position, time, parent, depth + 1);
@@ -84,7 +97,7 @@ Place Targets::PlaceOf(std::size_t index, const std::optional<Real>& time, const
 Matrix Targets::LookFrom(std::size_t index, const Vector& from, const std::optional<Real>& time, const Matrix& parent,
                          int depth)
 {
-  const Vector to = Invert(parent) * WorldOf(targets_[index], time, depth).off;
+  const Vector to = Invert(parent) * PointOf(targets_[index], time, depth);
   Matrix frame = LookAtMatrix(from, to, from + Vector(0.0, 1.0, 0.0));
   frame.off = Vector();
   return frame;
@@ -93,20 +106,24 @@ Matrix Targets::LookFrom(std::size_t index, const Vector& from, const std::optio
 Targets::Span Targets::SpanOf(std::size_t index)
 {
   Span span = {std::numeric_limits<Real>::infinity(), -std::numeric_limits<Real>::infinity(), 0};
-  std::unordered_set<std::size_t> seen;
-  std::vector<std::size_t> open = {index};
-  while (!open.empty()) {
-    std::size_t one = open.back();
-    open.pop_back();
-    for (; one != kNone && seen.insert(one).second; one = tree_[one].parent) {
-      ++span.objects;
-      if (targets_[one] != kNone)
-        open.push_back(targets_[one]);
-      if (motions_[one]) {
-        span.first = std::min(span.first, motions_[one]->First());
-        span.last = std::max(span.last, motions_[one]->Last());
-      }
+  std::unordered_set<std::size_t> seen = {index};
+  std::vector<std::size_t> open = {index}; // whose rotations have a part in it
+  auto take = [&](std::size_t one) {
+    ++span.objects;
+    if (motions_[one]) {
+      span.first = std::min(span.first, motions_[one]->First());
+      span.last = std::max(span.last, motions_[one]->Last());
     }
+    for (std::size_t above = tree_[one].parent; above != kNone && seen.insert(above).second;
+         above = tree_[above].parent)
+      open.push_back(above);
+  };
+  while (!open.empty()) {
+    const std::size_t one = open.back();
+    open.pop_back();
+    take(one);
+    if (targets_[one] != kNone)
+      take(targets_[one]);
   }
   return span;
 }

@@ -36,6 +36,8 @@ class Targets
 
   Matrix RotationAt(std::size_t index, const std::optional<Real>& time);
   Matrix WorldOf(std::size_t index, const std::optional<Real>& time, int depth);
+  Vector PointOf(std::size_t index, const std::optional<Real>& time, int depth);
+  Place OwnPlaceOf(std::size_t index, const std::optional<Real>& time) const;
   Place PlaceOf(std::size_t index, const std::optional<Real>& time, const Matrix& parent, int depth);
   Matrix LookFrom(std::size_t index, const Vector& from, const std::optional<Real>& time, const Matrix& parent,
                   int depth);

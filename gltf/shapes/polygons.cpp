@@ -288,21 +288,30 @@ class PolygonMesh
   {
     const Json attributes = AddAttributes();
     bool lacksCoordinates = false;
+    std::vector<std::pair<std::size_t, std::vector<std::uint32_t>>> byMaterial;
     // In the order of the tags; what no tag covers comes first.
     auto add = [&](const TextureTag* tag) {
       const auto found = triangles_.find(tag);
       if (found == triangles_.end() || found->second.empty())
         return;
       lacksCoordinates = lacksCoordinates || (tag && !uvw_ && materials_.HasPicture(*tag));
-      primitives.push_back({{"attributes", attributes},
-                            {"indices", context_.output.AddIndices(found->second, vertices_.size())},
-                            {"material", materials_.Find(tag, uvw_ != nullptr).material}});
+      const std::size_t material = materials_.Find(tag, uvw_ != nullptr).material;
+      const auto same = std::find_if(byMaterial.begin(), byMaterial.end(),
+                                     [material](const auto& part) { return part.first == material; });
+      if (same == byMaterial.end())
+        byMaterial.emplace_back(material, std::move(found->second));
+      else
+        same->second.insert(same->second.end(), found->second.begin(), found->second.end());
     };
     add(nullptr);
     for (const BaseTag* tag = object_.GetFirstTag(); tag; tag = tag->GetNext()) {
       if (const auto* texture = NodeCast<TextureTag>(tag))
         add(texture);
     }
+    for (const auto& [material, indices] : byMaterial)
+      primitives.push_back({{"attributes", attributes},
+                            {"indices", context_.output.AddIndices(indices, vertices_.size())},
+                            {"material", material}});
     if (lacksCoordinates)
       context_.output.account.Tell(Loss::kNoCoordinates);
   }

@@ -225,6 +225,9 @@ TEST_F(GltfMotion, TargetsAreFollowedBelowATurningParent)
   BaseObject* target = Add(kObjectNull, "target");
   target->SetRelPos({0, 0, 1000});
   SetTarget(*camera, *target);
+  BaseObject* far = Add(kObjectNull, "far"); // what the target looks at doesn't move it
+  AddTrack(*far, Component(kObjectRelPos, 0), {{0, 0}, {2, 100}});
+  SetTarget(*target, *far);
   AddTrack(*parent, Component(kObjectRelRot, 0), {{0, 0}, {1, kQuarter}}); // order 6: about y
   AddTrack(*camera, Component(kObjectRelRot, 1), {{0, 0}, {1, 1}});        // doesn't count
   const Converted scene = Convert();

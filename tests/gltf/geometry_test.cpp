@@ -83,19 +83,22 @@ TEST_F(GltfGeometry, CornersShareVerticesWhereTheyAreEqual)
 
 TEST_F(GltfGeometry, EachMaterialDrawsItsSelection)
 {
-  BaseObject* mesh = AddMesh("mesh", {{0, 1, 2, 2}, {0, 2, 3, 3}, {1, 2, 3, 3}});
+  BaseObject* mesh = AddMesh("mesh", {{0, 1, 2, 2}, {0, 2, 3, 3}, {1, 2, 3, 3}, {1, 3, 4, 4}});
   for (const auto& [name, first, last] :
-       {std::tuple{"left", 0, 0}, std::tuple{"both", 0, 1}, std::tuple{"other", 2, 2}})
+       {std::tuple{"left", 0, 0}, std::tuple{"both", 0, 1}, std::tuple{"other", 2, 2}, std::tuple{"last", 3, 3}})
     ASSERT_TRUE(AddTag<SelectionTag>(*mesh, kTagPolygonSelection, name)->GetSelect().SelectAll(first, last));
   // Tags go in at the top: the last one made is the first one.
   AddTexture(*mesh, *AddMaterial("nowhere", {1, 1, 1}))->GetDataInstance().SetString(1006, "none");
   AddTexture(*mesh, *AddMaterial("green", {0, 1, 0}))->GetDataInstance().SetString(1006, "left");
-  AddTexture(*mesh, *AddMaterial("red", {1, 0, 0}))->GetDataInstance().SetString(1006, "both");
+  Material* red = AddMaterial("red", {1, 0, 0});
+  AddTexture(*mesh, *red)->GetDataInstance().SetString(1006, "both");
+  AddTexture(*mesh, *red)->GetDataInstance().SetString(1006, "last");
   const Converted scene = Convert();
   const Json& primitives = scene.json["meshes"][0]["primitives"];
   ASSERT_EQ(primitives.size(), 3U);
   EXPECT_FALSE(scene.MaterialOf("mesh", 0).contains("name")) << "what no tag covers is grey";
   EXPECT_EQ(scene.MaterialOf("mesh", 1)["name"], "red");
+  EXPECT_EQ(scene.Numbers(primitives[1]["indices"]).size(), 6U) << "what two tags of one material draw";
   EXPECT_EQ(scene.MaterialOf("mesh", 2)["name"], "green");
   EXPECT_EQ(scene.Numbers(primitives[2]["indices"]).size(), 3U);
   EXPECT_EQ(scene.Lost(Loss::kTextureSelection), 1U);
