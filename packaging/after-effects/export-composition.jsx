@@ -2,7 +2,8 @@
 // can't install the plug-in. In After Effects, on macOS and Windows: File > Scripts > Run Script File.
 //
 // What scripts can't ask is left to the defaults of the composition file: the film size and the type of a camera.
-// Nothing in the project is changed. ExtendScript is ECMAScript 3: no let, no arrow functions, no JSON object.
+// Nothing in the project is changed. ExtendScript is ECMAScript 3: no let, no arrow functions, no JSON object. Of
+// choices (a ? b : c) it takes several in a row the wrong way round, unless parentheses tell.
 
 (function exportComposition() {
   "use strict";
@@ -287,8 +288,16 @@
   }
 
   function lightTypeName(type) {
-    return type === LightType.PARALLEL ? "parallel" : type === LightType.SPOT ? "spot" :
-      type === LightType.AMBIENT ? "ambient" : "point";
+    switch (type) {
+    case LightType.PARALLEL:
+      return "parallel";
+    case LightType.SPOT:
+      return "spot";
+    case LightType.AMBIENT:
+      return "ambient";
+    default:
+      return "point";
+    }
   }
 
   var LIGHT_OPTIONS = [
@@ -361,7 +370,13 @@
     if (item instanceof CompItem) {
       return 0;
     }
-    return !item.hasVideo ? 6 : item.mainSource.isStill ? 2 : fileCount(item) > 1 ? 8 : 9;
+    if (!item.hasVideo) {
+      return 6;
+    }
+    if (item.mainSource.isStill) {
+      return 2;
+    }
+    return fileCount(item) > 1 ? 8 : 9;
   }
 
   function addSource(layer, output, result) {
@@ -458,7 +473,9 @@
 
   function openProgress(total) {
     var window = new Window("palette", TITLE), done = 0, bar;
-    bar = window.add("progressbar", undefined, 0, total);
+    bar = window.add("progressbar");
+    bar.minvalue = 0;
+    bar.maxvalue = Math.max(1, total);
     bar.preferredSize = [320, 12];
     window.show();
     return {
@@ -477,7 +494,8 @@
     file.encoding = "UTF-8";
     file.lineFeed = "Unix";
     if (!file.open("w")) {
-      alert("Could not write " + file.fsName + ": " + file.error, TITLE);
+      alert("Could not write " + file.fsName + ": " + file.error +
+        "\nScripts may write files where Preferences > Scripting & Expressions allows it.", TITLE);
       return;
     }
     write(file, value);
@@ -493,7 +511,7 @@
       alert("Please open a composition first: the one that is to be exported.", TITLE);
       return;
     }
-    file = File.saveDialog("Save the composition as", "*.json");
+    file = File.saveDialog("Save the composition as", "Composition file:*.json");
     if (!file) {
       return;
     }

@@ -103,9 +103,9 @@ class File {
 }
 
 class Window {
-  add(kind, bounds, value, maximum) { return (this.bar = { value, maximum }); }
+  add() { return (this.bar = { value: 0, minvalue: 0, maxvalue: 100 }); }
   show() {}
-  update() { session.progress.push(this.bar.value / this.bar.maximum); }
+  update() { session.progress.push(this.bar.value / this.bar.maxvalue); }
   close() { ++session.closed; }
 }
 
