@@ -78,9 +78,11 @@ std::vector<CompositionSummary> CompositionFile::Compositions()
   return summaries;
 }
 
+constexpr std::string_view kByteOrderMarkAndSpace = "\xEF\xBB\xBF \t\r\n";
+
 bool BeginsAsJson(std::string_view bytes)
 {
-  const std::size_t first = bytes.find_first_not_of(" \t\r\n");
+  const std::size_t first = bytes.find_first_not_of(kByteOrderMarkAndSpace);
   return first != std::string_view::npos && bytes[first] == '{';
 }
 
@@ -95,7 +97,7 @@ bool HasSuffix(const std::filesystem::path& file, std::string_view suffix)
 // What is neither a project nor JSON is told at once, in words of the one who gave it.
 void RefuseOthers(std::string_view bytes, const std::string& name)
 {
-  const std::size_t first = bytes.find_first_not_of("\xEF\xBB\xBF \t\r\n");
+  const std::size_t first = bytes.find_first_not_of(kByteOrderMarkAndSpace);
   const std::string file = OneLine(name);
   if (first == std::string_view::npos)
     throw CompositionError(file, "is empty");

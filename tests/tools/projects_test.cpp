@@ -165,8 +165,13 @@ TEST_F(ProjectVerbs, ListAndChoose)
   const RunResult list = RunQ7r("compositions " + Quoted(shot));
   EXPECT_EQ(0, list.status);
   EXPECT_EQ("* Main   1920 x 1080  25 fps  3 s (75 frames)  4 layers, 5 exported  id 1\n"
-            "  Inner  300 x 1080  29.97 fps  10.01 s (300 frames)  1 layers, 1 exported  id 2\n",
+            "  Inner  300 x 1080  29.97 fps  10.01 s (300 frames)  1 layer, 1 exported  id 2\n",
             list.out);
+  // What a file holds tells what it is, not its name.
+  EXPECT_EQ(list.out, RunQ7r("compositions " + Quoted(Write("binary.aepx", Shot()))).out);
+  const std::string json = "\xEF\xBB\xBF{\"fr\":25,\"op\":10,\"w\":8,\"h\":4,\"nm\":\"J\",\"layers\":[]}";
+  EXPECT_EQ("* J     8 x 4  25 fps  0.4 s (10 frames)  0 layers, 0 exported\n",
+            RunQ7r("compositions " + Quoted(Write("json.aep", json))).out);
   const std::string out = " " + Quoted(folder_ / "out.q7r");
   const RunResult choice = RunQ7r("export " + Quoted(none) + out);
   EXPECT_EQ(2, choice.status);

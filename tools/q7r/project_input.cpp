@@ -141,8 +141,9 @@ std::string CompositionTable(const Summaries& compositions)
     name.resize(width, ' ');
     table += (c.isActive ? "* " : "  ") + name + "  " + std::to_string(c.width) + " x " + std::to_string(c.height) +
              "  " + Format("%.6g fps", c.frameRate) + "  " + Format("%.6g s", c.seconds) +
-             Format(" (%.6g frames)", c.frames) + "  " + std::to_string(c.layers) + " layers, " +
-             std::to_string(c.exported) + " exported" + (c.id.empty() ? "" : "  id " + host::OneLine(c.id)) + "\n";
+             Format(" (%.6g frames)", c.frames) + "  " + std::to_string(c.layers) +
+             (c.layers == 1 ? " layer, " : " layers, ") + std::to_string(c.exported) + " exported" +
+             (c.id.empty() ? "" : "  id " + host::OneLine(c.id)) + "\n";
   }
   return table;
 }

@@ -149,7 +149,8 @@ void ProjectBuilder::ReadLayer(const Build& build, const Chunk& chunk, const Lay
   SetSpan(record, properties, clock, layer);
   const Chunk* overrides = properties.Find("ADBE Layer Overrides");
   const std::optional<Chunk> count = overrides ? overrides->Find("CprC"_tag) : std::nullopt;
-  if (count && count->Get(Field<std::uint32_t>{0}) > 0)
+  if (count && count->Size() >= 4 &&
+      count->Get(Field<std::uint32_t>{0}) > 0) // what nobody knows is no reason to refuse
     doubts_.insert("values of Essential Graphics are passed over: nested compositions have their own");
   ReadStreams(properties, {build.settings, record, clock, doubts_}, layer);
 }
