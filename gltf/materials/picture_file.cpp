@@ -123,12 +123,15 @@ std::filesystem::path LocatePicture(const std::filesystem::path& folder, const s
 {
   if (name.find('\0') != std::string::npos)
     return {};
-  std::error_code error;
-  std::filesystem::path path = folder / ToPath(name);
-  if (std::filesystem::is_regular_file(path, error))
-    return path;
-  std::filesystem::path beside = folder / ToPath(LastPart(name));
-  return std::filesystem::is_regular_file(beside, error) ? beside : path;
+  std::string turned = name;
+  std::replace(turned.begin(), turned.end(), '\\', '/');
+  for (const std::string& wanted : {name, turned, LastPart(name)}) {
+    std::error_code error;
+    std::filesystem::path path = folder / ToPath(wanted);
+    if (std::filesystem::is_regular_file(path, error))
+      return path;
+  }
+  return folder / ToPath(name);
 }
 
 PictureFile ReadPictureFile(const std::filesystem::path& path, bool keepBytes)

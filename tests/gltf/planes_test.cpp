@@ -158,12 +158,14 @@ TEST_F(GltfPlanes, NameTheirPicturesFromWhereTheFileLies)
   AddPlane("b", 1, 1, AddPicture("b", "plain.jpg"));
   AddPlane("c", 1, 1, AddPicture("c", folder_ / "out/../plain.jpg"));
   AddPlane("d", 1, 1, AddPicture("d", "C:\\films\\plain.jpg"));
+  Write("pictures/other.jpg", Jpeg());
+  AddPlane("e", 1, 1, AddPicture("e", "pictures\\other.jpg"));
   const Converted scene = Convert();
-  EXPECT_EQ(scene.json["images"],
-            Json::parse(R"([{"uri": "../pictures/)" + encoded + R"("}, {"uri": "../plain.jpg"}])"));
+  EXPECT_EQ(scene.json["images"], Json::parse(R"([{"uri": "../pictures/)" + encoded +
+                                              R"("}, {"uri": "../plain.jpg"}, {"uri": "../pictures/other.jpg"}])"));
   EXPECT_EQ(scene.json["samplers"],
             Json::parse(R"([{"magFilter": 9729, "minFilter": 9987, "wrapS": 33071, "wrapT": 33071}])"));
-  EXPECT_EQ(scene.json["textures"].size(), 2U);
+  EXPECT_EQ(scene.json["textures"].size(), 3U);
   ExpectNear(scene.Numbers(scene.Primitive("a")["attributes"]["TEXCOORD_0"]), {0, 1, 1, 1, 1, 0, 0, 0});
   EXPECT_FALSE(scene.Account().HasProblems());
 }
