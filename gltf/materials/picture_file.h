@@ -25,9 +25,9 @@ struct PictureFile
   std::vector<std::uint8_t> bytes; // only if asked for
 };
 
-// Where the picture lies that a scene in `folder` names: the file as it is named, from that folder if need be, also with
-// the separators of Windows; else one of that name beside the scene, for scenes that came from elsewhere with their
-// pictures. It may be that none exists.
+// Where the picture lies that a scene in `folder` names: the file as it is named, from that folder if need be, also
+// with the separators of Windows; else one of that name beside the scene, for scenes that came from elsewhere with
+// their pictures. It may be that none exists.
 std::filesystem::path LocatePicture(const std::filesystem::path& folder, const std::string& name);
 
 // Looks at a file, whose kind is told by its first bytes. Devices and folders count as missing.

@@ -169,7 +169,7 @@ TEST_F(ProjectVerbs, ListAndChoose)
             list.out);
   // What a file holds tells what it is, not its name.
   EXPECT_EQ(list.out, RunQ7r("compositions " + Quoted(Write("binary.aepx", Shot()))).out);
-  const std::string json = "\xEF\xBB\xBF{\"fr\":25,\"op\":10,\"w\":8,\"h\":4,\"nm\":\"J\",\"layers\":[]}";
+  const std::string json = "\xEF\xBB\xBF{\"fr\":25,\"ip\":0,\"op\":10,\"w\":8,\"h\":4,\"nm\":\"J\",\"layers\":[]}";
   EXPECT_EQ("* J     8 x 4  25 fps  0.4 s (10 frames)  0 layers, 0 exported\n",
             RunQ7r("compositions " + Quoted(Write("json.aep", json))).out);
   const std::string out = " " + Quoted(folder_ / "out.q7r");
