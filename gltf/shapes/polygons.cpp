@@ -4,6 +4,7 @@
 #include <cmath>
 #include <cstring>
 #include <map>
+#include <unordered_map>
 #include <unordered_set>
 
 #include "gltf/shapes/meshes.h"
@@ -288,7 +289,8 @@ class PolygonMesh
   {
     const Json attributes = AddAttributes();
     bool lacksCoordinates = false;
-    std::vector<std::pair<std::size_t, std::vector<std::uint32_t>>> byMaterial;
+    std::unordered_map<std::size_t, std::vector<std::uint32_t>> byMaterial;
+    std::vector<std::size_t> order;
     // In the order of the tags; what no tag covers comes first.
     auto add = [&](const TextureTag* tag) {
       const auto found = triangles_.find(tag);
@@ -296,21 +298,19 @@ class PolygonMesh
         return;
       lacksCoordinates = lacksCoordinates || (tag && !uvw_ && materials_.HasPicture(*tag));
       const std::size_t material = materials_.Find(tag, uvw_ != nullptr).material;
-      const auto same = std::find_if(byMaterial.begin(), byMaterial.end(),
-                                     [material](const auto& part) { return part.first == material; });
-      if (same == byMaterial.end())
-        byMaterial.emplace_back(material, std::move(found->second));
-      else
-        same->second.insert(same->second.end(), found->second.begin(), found->second.end());
+      const auto [part, isFirst] = byMaterial.try_emplace(material);
+      if (isFirst)
+        order.push_back(material);
+      part->second.insert(part->second.end(), found->second.begin(), found->second.end());
     };
     add(nullptr);
     for (const BaseTag* tag = object_.GetFirstTag(); tag; tag = tag->GetNext()) {
       if (const auto* texture = NodeCast<TextureTag>(tag))
         add(texture);
     }
-    for (const auto& [material, indices] : byMaterial)
+    for (const std::size_t material : order)
       primitives.push_back({{"attributes", attributes},
-                            {"indices", context_.output.AddIndices(indices, vertices_.size())},
+                            {"indices", context_.output.AddIndices(byMaterial[material], vertices_.size())},
                             {"material", material}});
     if (lacksCoordinates)
       context_.output.account.Tell(Loss::kNoCoordinates);
