@@ -264,7 +264,7 @@ TEST(HyperFileContainer, LimitsTheDepthOfNesting)
       BaseContainer container;
       bool fits = depth <= HyperFile::kMaxLoopDepth;
       EXPECT_EQ(read.file.ReadContainer(container, true), fits) << depth << legacy;
-      EXPECT_EQ(read.file.GetError(), fits ? FILEERROR_NONE : FILEERROR_CHUNK_STRUCTURE);
+      EXPECT_EQ(read.file.GetError(), fits ? FILEERROR_NONE : FILEERROR_TOO_DEEP);
       EXPECT_TRUE(!fits || read.file.GetPosition() == static_cast<LLong>(writer.bytes.size()));
     }
   }

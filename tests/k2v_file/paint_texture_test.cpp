@@ -301,7 +301,7 @@ TEST(PaintTextures, FailOnWhatCannotBe)
       {"pixels of an older form", ByteWriter().Append(start).Start(kPixels, 1).End().End().bytes, "error -7"},
       {"a string for a size", ByteWriter().Append(start).Start(kTexture, 1).String(u"4").End().End().bytes,
        "error -100"},
-      {"lists in lists", lists.bytes, "error -103"},
+      {"lists in lists", lists.bytes, "error -106"},
       {"no rows", AlphaFile(2, 3, 1, 1, empty), "error -100"},
       {"wider than the file explains", AlphaFile(2, 2147483647, 1, 1, empty), "error -100"},
       {"more components than the file explains", AlphaFile(2, 3, 1, 2147483647, empty), "error -100"},

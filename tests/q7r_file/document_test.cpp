@@ -6,7 +6,7 @@
 
 #include "q7r_file/node_bytes.h"
 #include "support/assertion_counter.h"
-#include "support/counting_memory.h"
+#include "support/every_failed_allocation.h"
 #include "support/record_samples.h"
 #include "support/scene_bytes.h"
 #include "support/temp_folder.h"
@@ -366,16 +366,14 @@ TEST(Document, ACopyThatFailsLeavesNoNodesBehind)
   AddObject(*source, "A")->MakeTag(kTagProtection);
   source->InsertMaterial(MakeMaterial(kMaterialStandard));
   source->InsertLayer(AllocLayer());
-  DocumentPtr target = NewDocument();
-  bool copied = false;
-  for (LLong count = 0; !copied; count += 3) {
-    counting_memory::FailAfter(count);
-    copied = source->CopyWithTranslation(*target, 0, nullptr);
-    counting_memory::FailNever();
-    for (RootList2D* root :
-         std::initializer_list<RootList2D*>{target->GetObjectRoot(), target->GetMaterialRoot(), target->GetLayerRoot()})
-      EXPECT_EQ(root->IsEmpty(), !copied) << count;
-  }
+  EveryFailedAllocation([&] {
+    DocumentPtr target = NewDocument();
+    if (!target || source->CopyWithTranslation(*target, 0, nullptr))
+      return target;
+    EXPECT_TRUE(target->GetObjectRoot()->IsEmpty() && target->GetMaterialRoot()->IsEmpty());
+    EXPECT_TRUE(target->GetLayerRoot()->IsEmpty());
+    return DocumentPtr();
+  });
 }
 
 TEST(Document, NestingWithoutEndIsAnErrorAndNoCrash)
@@ -387,7 +385,7 @@ TEST(Document, NestingWithoutEndIsAnErrorAndNoCrash)
   AssertionCounter quiet;
   FileProblem problem;
   EXPECT_EQ(LoadFromBytes(w.bytes, 3, &problem), nullptr);
-  EXPECT_EQ(problem.code, FILEERROR_CHUNK_STRUCTURE);
+  EXPECT_EQ(problem.code, FILEERROR_TOO_DEEP);
   EXPECT_EQ(Utf8(GetChunkPathText(problem)), "110059/110107/110100/5154/110100/110100/5154/110100/.../"
                                              "110100/5154/110100/110100/5154/110100/110100/5154");
 }

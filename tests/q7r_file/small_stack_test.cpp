@@ -80,9 +80,9 @@ TEST(SmallStack, TakesShallowNestsAndRefusesDeepOnes)
     RunOnSmallStack([&] {
       FileProblem problem;
       EXPECT_EQ(LoadFromBytes(deep, 3, &problem), nullptr) << nest.name;
-      EXPECT_EQ(problem.code, FILEERROR_CHUNK_STRUCTURE) << nest.name;
+      EXPECT_EQ(problem.code, FILEERROR_TOO_DEEP) << nest.name;
       LoadFromBytes(shallow, 3, &problem);
-      EXPECT_NE(problem.code, FILEERROR_CHUNK_STRUCTURE) << nest.name; // some end in another fault
+      EXPECT_NE(problem.code, FILEERROR_TOO_DEEP) << nest.name; // some end in another fault
     });
   }
 }

@@ -17,9 +17,9 @@ inline constexpr Long FILEERROR_INVALID = -6;           // the operation does no
 inline constexpr Long FILEERROR_MEMORY = -7;            // no memory
 inline constexpr Long FILEERROR_WRONG_VALUE = -100;     // bad magic, ident, header, tag, array size or type
 inline constexpr Long FILEERROR_CHUNK_STRUCTURE = -103; // a value where only a chunk start or end may stand
-inline constexpr Long FILEERROR_TOO_DEEP = -105;        // written things nest deeper than a reader follows
 inline constexpr Long FILEERROR_PREMATURE_END = -104;   // the walk to a chunk's end stopped on an error
 inline constexpr Long FILEERROR_OLD_VERSION = -105;     // the file is older than the caller takes
+inline constexpr Long FILEERROR_TOO_DEEP = -106;        // things nest deeper than a reader follows
 
 // Where and why reading or writing a file failed.
 struct FileProblem

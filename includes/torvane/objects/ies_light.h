@@ -87,6 +87,8 @@ class IESLight : public GeMemory
 
   void FindMaximum();
 
+  Bool HasSamples() const;
+  Real SampleAt(Real vertical, Real horizontal) const; // in degrees
   Real GetHorizontalPosition(Real angle) const;
   Real GetMeanIntensity(Long vertical) const;
   Real SampleRow(Long row, const Interval& vertical) const;

@@ -284,9 +284,9 @@ class HyperFile : public GeMemory
   // Values since progress was last told.
   LLong GetTicks() const { return ticks_; }
 
-  // Opens and leaves one level of nested reading (chunk loops, containers). Entering deeper than kMaxLoopDepth sets
-  // FILEERROR_CHUNK_STRUCTURE and gives false, in a file that is written FILEERROR_TOO_DEEP; so does one for which the
-  // stack of the thread is too small. Every successful Enter needs its Leave.
+  // Opens and leaves one level of nested reading or writing (chunk loops, containers). Entering deeper than
+  // kMaxLoopDepth sets FILEERROR_TOO_DEEP and gives false; so does a level for which the stack of the thread is too
+  // small. Every successful Enter needs its Leave.
   static constexpr Long kMaxLoopDepth = 4000;
   Bool EnterLoop();
   void LeaveLoop() { --loopDepth_; }

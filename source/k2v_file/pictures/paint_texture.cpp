@@ -195,7 +195,7 @@ Bool K2VAlpha::ReadChunk(HyperFile& file, Long id, Long)
     return false;
   if (id == kChunkList) {
     if (lists_ >= kMaxLists)
-      return file.Fail(FILEERROR_CHUNK_STRUCTURE, file.GetPosition());
+      return file.Fail(FILEERROR_TOO_DEEP, file.GetPosition());
     index_ = 0;
     ++lists_;
     const Bool list = ReadChunks(file, false);

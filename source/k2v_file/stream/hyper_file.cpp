@@ -241,7 +241,7 @@ Bool HyperFile::EnterLoop()
   if (error_ != FILEERROR_NONE)
     return false;
   if (loopDepth_ >= kMaxLoopDepth || !HasStackRoom())
-    return Fail(mode_ == kHyperFileWrite ? FILEERROR_TOO_DEEP : FILEERROR_CHUNK_STRUCTURE, file_.GetPosition());
+    return Fail(FILEERROR_TOO_DEEP, file_.GetPosition());
   ++loopDepth_;
   return true;
 }

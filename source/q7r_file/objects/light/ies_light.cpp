@@ -50,6 +50,39 @@ Vector DrawDirection(RandomGenerator& random)
   }
 }
 
+// The angles of a direction, in degrees: from the lamp's axis, and around it from 0 to 360.
+struct Angles
+{
+  Real vertical;
+  Real horizontal;
+};
+
+Angles GetAngles(const Vector& direction)
+{
+  Real horizontal = 90.0;
+  if (direction.y != 0.0)
+    horizontal = RadiansToDegrees(std::atan2(direction.x, direction.y));
+  else if (direction.x < 0.0)
+    horizontal = -90.0;
+  if (horizontal < 0.0)
+    horizontal += kCircle;
+  return {RadiansToDegrees(SafeAcos(kPoleFactor * direction.z)), horizontal};
+}
+
+// The directions that every flux is sampled in. To find them takes most of a sample's time.
+const Angles (&GetFluxDirections())[kFluxSamples]
+{
+  static Angles directions[kFluxSamples];
+  static const Bool drawn = [] {
+    RandomGenerator random(kFluxSeed);
+    for (Angles& angles : directions)
+      angles = GetAngles(DrawDirection(random));
+    return true;
+  }();
+  (void)drawn;
+  return directions;
+}
+
 // A number of a stored distribution, whose form changed with the version.
 template <class Visitor, class Number>
 Bool VisitNumber(Visitor& v, Long version, Number& number)
@@ -145,22 +178,22 @@ Real IESLight::SampleRow(Long row, const Interval& vertical) const
 
 Real IESLight::SampleIESLight(const Vector& direction) const
 {
-  if (GetVerticalCount() == 0 || GetHorizontalCount() == 0 || !IsComplete())
+  if (!HasSamples())
     return 0.0;
-  const Real vertical = RadiansToDegrees(SafeAcos(kPoleFactor * direction.z));
+  const Angles angles = GetAngles(direction);
+  return SampleAt(angles.vertical, angles.horizontal);
+}
+
+Bool IESLight::HasSamples() const { return GetVerticalCount() > 0 && GetHorizontalCount() > 0 && IsComplete(); }
+
+Real IESLight::SampleAt(Real vertical, Real horizontal) const
+{
   if (!(vertical >= verticalAngles[0] && vertical <= verticalAngles[GetVerticalCount() - 1]))
     return 0.0;
-  Real horizontal = 90.0;
-  if (direction.y != 0.0)
-    horizontal = RadiansToDegrees(std::atan2(direction.x, direction.y));
-  else if (direction.x < 0.0)
-    horizontal = -90.0;
-  if (horizontal < 0.0)
-    horizontal += 360.0;
   const Interval rows(horizontalAngles, horizontalAngles[0], GetHorizontalPosition(horizontal));
   const Interval columns(verticalAngles, 0.0, vertical);
   const Real low = SampleRow(rows.low, columns);
-  const Real high = SampleRow(rows.high, columns);
+  const Real high = rows.high == rows.low ? low : SampleRow(rows.high, columns);
   Real value = low + (high - low) * rows.fraction;
   if (maxCandela > 0.0)
     value /= maxCandela;
@@ -185,10 +218,11 @@ Real IESLight::GetTotalFlux() const
 {
   if (!fluxIsOpen_)
     return totalFlux_;
-  RandomGenerator random(kFluxSeed);
   Real sum = 0.0;
-  for (Long i = 0; i < kFluxSamples && candela.GetCount() > 0; ++i) // without a table every sample is 0
-    sum += SampleIESLight(DrawDirection(random));
+  if (HasSamples()) {
+    for (const Angles& angles : GetFluxDirections())
+      sum += SampleAt(angles.vertical, angles.horizontal);
+  }
   fluxIsOpen_ = false;
   return totalFlux_ = sum * kFluxOfSample;
 }
