@@ -128,17 +128,20 @@ TEST_F(Output, SaysWhyThereIsNone)
 {
   const std::string scene = Quoted(folder_ / "s.q7r");
   const std::string old = Quoted(folder_ / "old.q7r");
-  WriteWholeFile(folder_ / "old.q7r", {1, 2, 3});
+  for (const char* name : {"old.q7r", "old.gltf", "old.bin"})
+    WriteWholeFile(folder_ / name, {1, 2, 3});
   for (const std::string& verb :
        {"info " + scene, "info --json " + scene, "tree " + scene, "tree --json " + scene, "dump " + scene,
         "dump --json " + scene, "check " + scene, std::string("--help"), std::string("--version"),
-        "resave --force " + scene + " " + old, "export --force " + Quoted(folder_ / "c.json") + " " + old}) {
+        "resave --force " + scene + " " + old, "export --force " + Quoted(folder_ / "c.json") + " " + old,
+        "convert --force " + scene + " " + Quoted(folder_ / "old.gltf")}) {
     SCOPED_TRACE(verb);
     const RunResult full = RunQ7r(verb + " >/dev/full");
     EXPECT_EQ(full.status, 2);
     EXPECT_NE(full.err.find("standard output: No space left on device"), std::string::npos) << full.err;
     EXPECT_EQ(RunQ7r(verb + " >&-").status, 2);
-    EXPECT_EQ(SizeOf("old.q7r"), 3);
+    for (const char* name : {"old.q7r", "old.gltf", "old.bin"})
+      EXPECT_EQ(SizeOf(name), 3);
   }
   for (const std::string& verb :
        {"export --force " + Quoted(folder_ / "c.json") + " " + old, "resave --force " + scene + " " + old}) {
@@ -147,7 +150,7 @@ TEST_F(Output, SaysWhyThereIsNone)
     EXPECT_NE(limited.err.find("old.q7r: File too large"), std::string::npos) << limited.err;
     EXPECT_EQ(SizeOf("old.q7r"), 3);
   }
-  EXPECT_EQ(std::distance(fs::directory_iterator(folder_.Path()), {}), 3);
+  EXPECT_EQ(std::distance(fs::directory_iterator(folder_.Path()), {}), 5);
 }
 
 #endif

@@ -45,27 +45,25 @@ void WriteMain(const gltf::Model& model, const std::string& title, GltfForm form
     write(reinterpret_cast<const std::uint8_t*>(model.json.data()), model.json.size());
 }
 
-// Neither of two files takes its place before both are written.
-void WriteModel(const gltf::Model& model, const std::string& title, const std::string& output, GltfForm form)
+// A file that `fill` hands its bytes to, piece by piece.
+template <class Fill>
+FileWriter RawFile(Fill fill)
 {
-  auto writeMain = [&](const std::string& partial) {
+  return [fill](const std::string& partial) {
     RawOutput file{fs::path(partial)};
-    WriteMain(model, title, form, [&file](const std::uint8_t* data, std::size_t size) {
-      file.Write(reinterpret_cast<const char*>(data), size);
-    });
+    fill(
+        [&file](const std::uint8_t* data, std::size_t size) { file.Write(reinterpret_cast<const char*>(data), size); });
     file.Close();
     return std::string();
   };
-  if (form != GltfForm::kGltf || model.bytes.Size() == 0)
-    return WriteOutput(output, writeMain);
-  WriteOutput(BytesPath(output), [&](const std::string& partial) {
-    RawOutput file{fs::path(partial)};
-    model.bytes.ForEachBlock(
-        [&file](const std::uint8_t* data, std::size_t size) { file.Write(reinterpret_cast<const char*>(data), size); });
-    file.Close();
-    WriteOutput(output, writeMain);
-    return std::string();
-  });
+}
+
+void WriteModel(const gltf::Model& model, const std::string& title, const std::string& output, GltfForm form)
+{
+  std::vector<Output> files{{output, RawFile([&](const gltf::Sink& write) { WriteMain(model, title, form, write); })}};
+  if (form == GltfForm::kGltf && model.bytes.Size() > 0)
+    files.push_back({BytesPath(output), RawFile([&](const auto& write) { model.bytes.ForEachBlock(write); })});
+  WriteOutputs(files);
 }
 
 } // namespace

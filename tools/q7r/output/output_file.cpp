@@ -141,25 +141,90 @@ void WriteDevice(const Place& place, const std::string& path, const FileWriter& 
     TellWritten(path, partial->Path(), words);
 }
 
-void ReplaceFile(const Place& place, const std::string& path, const FileWriter& write)
+// A file that is written, checked and on the disk beside its place.
+class StagedFile
 {
-  std::optional<unsigned> mode;
-  if (place.Exists())
-    mode = static_cast<unsigned>(place.status.permissions()) & 0777U;
-  TemporaryFile file(fs::absolute(place.Folder()), place.Exists());
-  std::string words;
-  if (IsPlain(file.Path())) {
-    words = write(file.Path().string());
-  } else {
-    const std::unique_ptr<TemporaryFile> partial = MakePlainFile();
-    words = write(partial->Path().string());
-    RawOutput output(file.Path());
-    Copy(partial->Path(), output);
+ public:
+  StagedFile(const Place& place, const FileWriter& write)
+      : place_(place), file_(fs::absolute(place.Folder()), place.Exists())
+  {
+    std::optional<unsigned> mode;
+    if (place.Exists())
+      mode = static_cast<unsigned>(place.status.permissions()) & 0777U;
+    if (IsPlain(file_.Path())) {
+      words_ = write(file_.Path().string());
+    } else {
+      const std::unique_ptr<TemporaryFile> partial = MakePlainFile();
+      words_ = write(partial->Path().string());
+      RawOutput output(file_.Path());
+      Copy(partial->Path(), output);
+    }
+    file_.Finish(mode);
   }
-  file.Finish(mode);
-  // Said before, so that a full standard output is found while the old file is still there.
-  TellWritten(path, file.Path(), words);
-  file.MoveTo(place.file);
+
+  void Tell(const std::string& path) const { TellWritten(path, file_.Path(), words_); }
+  void Move() { file_.MoveTo(place_.file); }
+
+  // Gives what it will replace a second name, to put it back by. Not every file system can.
+  void KeepOld()
+  {
+    if (!place_.Exists())
+      return;
+    old_ = std::make_unique<TemporaryFile>(fs::absolute(place_.Folder()), true);
+    std::error_code error;
+    fs::remove(old_->Path(), error);
+    fs::create_hard_link(place_.file, old_->Path(), error);
+    if (error)
+      old_.reset();
+  }
+
+  void PutBack()
+  {
+    std::error_code error;
+    if (old_)
+      fs::rename(old_->Path(), place_.file, error);
+    else if (!place_.Exists())
+      fs::remove(place_.file, error);
+  }
+
+ private:
+  Place place_;
+  TemporaryFile file_;
+  std::unique_ptr<TemporaryFile> old_;
+  std::string words_;
+};
+
+// What the system answers is told of the file.
+template <class Action>
+void DoFor(const std::string& path, Action&& action)
+{
+  try {
+    action();
+  } catch (const std::system_error& error) {
+    Fail(path, error.code());
+  }
+}
+
+// Moves each to its place, the last one first.
+void MoveAll(const std::vector<Output>& outputs, std::vector<std::unique_ptr<StagedFile>>& files)
+{
+  for (std::size_t i = files.size(); i-- > 0;) {
+    if (!files[i])
+      continue;
+    try {
+      DoFor(outputs[i].path, [&] {
+        if (i > 0)
+          files[i]->KeepOld();
+        files[i]->Move();
+      });
+    } catch (const Failure&) {
+      for (std::size_t moved = i + 1; moved < files.size(); ++moved) {
+        if (files[moved])
+          files[moved]->PutBack();
+      }
+      throw;
+    }
+  }
 }
 
 bool AskReplace(const std::string& path)
@@ -221,17 +286,27 @@ void RequireWritable(const std::string& path, bool force)
     throw Failure(path, "exists already; --force replaces it");
 }
 
-void WriteOutput(const std::string& path, const FileWriter& write)
+void WriteOutput(const std::string& path, const FileWriter& write) { WriteOutputs({{path, write}}); }
+
+void WriteOutputs(const std::vector<Output>& outputs)
 {
-  try {
-    const Place place = FindPlace(path);
-    if (place.IsDevice())
-      WriteDevice(place, path, write);
-    else
-      ReplaceFile(place, path, write);
-  } catch (const std::system_error& error) {
-    Fail(path, error.code());
+  std::vector<std::unique_ptr<StagedFile>> files(outputs.size());
+  for (std::size_t i = 0; i < outputs.size(); ++i) {
+    const Output& output = outputs[i];
+    DoFor(output.path, [&] {
+      const Place place = FindPlace(output.path);
+      if (place.IsDevice())
+        WriteDevice(place, output.path, output.write);
+      else
+        files[i] = std::make_unique<StagedFile>(place, output.write);
+    });
   }
+  // Said before they are moved, so that a full standard output is found while the old files are still there.
+  for (std::size_t i = 0; i < outputs.size(); ++i) {
+    if (files[i])
+      DoFor(outputs[i].path, [&] { files[i]->Tell(outputs[i].path); });
+  }
+  DoUndisturbed([&] { MoveAll(outputs, files); });
 }
 
 void WriteOutput(const std::string& path, std::string_view bytes, const std::string& words)

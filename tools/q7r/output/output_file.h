@@ -8,6 +8,7 @@
 #include <memory>
 #include <string>
 #include <string_view>
+#include <vector>
 
 #include "scene_file.h"
 
@@ -36,6 +37,16 @@ using FileWriter = std::function<std::string(const std::string& partial)>;
 // Lets `write` make the file and puts it in its place. A link stays a link, and a file that is replaced hands on its
 // rights. A device or pipe is written to. What was written is told in one line: "shot.q7r: 640 x 480 pixels, 12.3 KB".
 void WriteOutput(const std::string& path, const FileWriter& write);
+
+struct Output
+{
+  std::string path;
+  FileWriter write;
+};
+
+// The same for files that belong together: none takes its place before all are written. When one can't take it, the
+// others give theirs back.
+void WriteOutputs(const std::vector<Output>& outputs);
 
 // The same for bytes that are in memory.
 void WriteOutput(const std::string& path, std::string_view bytes, const std::string& words = {});

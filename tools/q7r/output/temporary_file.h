@@ -4,6 +4,7 @@
 
 #include <cstdint>
 #include <filesystem>
+#include <functional>
 #include <optional>
 #include <string>
 #include <vector>
@@ -38,6 +39,9 @@ class TemporaryFile
   std::string guarded_; // the path as the one who cleans up after a signal takes it
   int slot_ = -1;       // where he finds it
 };
+
+// Does something that no signal (on Windows: but for those of the keyboard) may end in the middle.
+void DoUndisturbed(const std::function<void()>& action);
 
 // A file that is open for writing from its start, without a buffer. Throws std::system_error.
 class RawOutput

@@ -60,7 +60,7 @@ void CatchEndings()
   }
 }
 
-// No signal comes between the making of a file and its entry in the table.
+// Signals that come meanwhile wait for its end.
 class SignalPause
 {
  public:
@@ -123,7 +123,7 @@ TemporaryFile::TemporaryFile(const fs::path& folder, bool isPrivate)
 
 void TemporaryFile::Create(bool isPrivate)
 {
-  const SignalPause pause;
+  const SignalPause pause;                       // none comes between the making of the file and its entry in the table
   const mode_t rights = isPrivate ? 0600 : 0666; // less what the process's mask takes away
   const int descriptor = Require(::open(guarded_.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC, rights));
   slot_ = TakeSlot(guarded_.c_str());
@@ -172,6 +172,12 @@ void TemporaryFile::MoveTo(const fs::path& target)
     ::fsync(descriptor);
     ::close(descriptor);
   }
+}
+
+void DoUndisturbed(const std::function<void()>& action)
+{
+  const SignalPause pause;
+  action();
 }
 
 RawOutput::RawOutput(const fs::path& existing)

@@ -118,6 +118,11 @@ void TemporaryFile::MoveTo(const fs::path& target)
   slot_ = -1;
 }
 
+void DoUndisturbed(const std::function<void()>& action)
+{
+  action(); // the keyboard's handler ends the program from a thread of its own
+}
+
 RawOutput::RawOutput(const fs::path& existing)
     : descriptor_(::_wopen(existing.c_str(), _O_WRONLY | _O_BINARY | _O_NOINHERIT))
 {
