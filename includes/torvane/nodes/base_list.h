@@ -115,11 +115,11 @@ class BaseList2D : public GeListNode
 
   // The lists of shaders and tracks are null until the first member. False when memory for the list is short: the
   // shader or track then stays the caller's.
-  RootShader* GetShaderRoot() const { return shaders_; }
+  RootShader* GetShaderRoot() const { return Extra().shaders; }
   BaseShader* GetShaders() const;
   Bool InsertShader(BaseShader* shader, BaseShader* after); // first when `after` is null
   Bool InsertShaderLast(BaseShader* shader);
-  RootCTrack* GetTrackRoot() const { return tracks_; }
+  RootCTrack* GetTrackRoot() const { return Extra().tracks; }
   CTrack* GetFirstTrack() const;
   Bool InsertTrackLast(CTrack* track);
   // The first track whose path begins with the ids of `path`; data types and creators play no part. Null for an empty
@@ -127,11 +127,11 @@ class BaseList2D : public GeListNode
   CTrack* FindTrack(const ParameterPath& path) const;
 
   // Chunks of other programs among the node's own.
-  const KeptChunks& GetKeptChunks() const { return keptChunks_; }
+  const KeptChunks& GetKeptChunks() const { return Extra().keptChunks; }
 
   // Parameters added at run time. Adding takes the smallest free key from 1 on and gives the path (700, 5, 0),
   // (key, type, 0), or an empty path on failure. The others take such a path.
-  const BaseContainer* GetDynamicParameters() const { return dynamicParameters_; } // null while there are none
+  const BaseContainer* GetDynamicParameters() const { return Extra().dynamicParameters; } // null while there are none
   ParameterPath AddDynamicParameter(const BaseContainer& settings);
   Bool RemoveDynamicParameter(const ParameterPath& path);
   const BaseContainer* FindDynamicParameter(const ParameterPath& path) const;
@@ -146,34 +146,51 @@ class BaseList2D : public GeListNode
 
   String name_;
   GeAliasLink link_;
-  mutable NodeMarker marker_;
-  mutable Bool markerDrawn_ = false;
-  UniqueIDArray* uniqueIds_ = nullptr;         // owned; null until the first extra identifier
-  BaseContainer* dynamicParameters_ = nullptr; // owned; null until the first one
-  BaseDocument* document_ = nullptr;           // not owned; null outside a document
+  BaseDocument* document_ = nullptr; // not owned; null outside a document
   Long type_;
   ULong info_ = 0;
-  RootShader* shaders_ = nullptr; // owned, as the tracks; most nodes, every key for one, have neither
-  RootCTrack* tracks_ = nullptr;
   BaseContainer data_;
   RootList2D* listHead_ = nullptr; // the list that holds the node; not owned
-  KeptChunks keptChunks_;
+  mutable NodeMarker marker_;
+  mutable Bool markerDrawn_ = false;
 
  private:
+  // What most nodes, every key for one, have nothing of. All is owned; the pointers are null until the first member.
+  struct Extras
+  {
+    ~Extras();
+
+    UniqueIDArray* uniqueIds = nullptr;
+    BaseContainer* dynamicParameters = nullptr;
+    RootShader* shaders = nullptr;
+    RootCTrack* tracks = nullptr;
+    KeptChunks keptChunks;
+  };
+  static const Extras kNoExtras;
+
+  const Extras& Extra() const { return extras_ ? *extras_ : kNoExtras; }
+  // Made if there are none; null when memory is short. So are the parts.
+  Extras* NeedExtras();
+  template <class Part>
+  Part* NeedExtra(Part* Extras::*part);
+  BaseContainer* NeedDynamicParameters();
+
   template <class Visitor>
   Bool VisitHeader(Visitor& visitor);
   template <class Visitor>
   Bool VisitMarker(Visitor& visitor);
   template <class Root>
-  Root* NeedRoot(Root*& root);
+  Root* NeedRoot(Root* Extras::*root);
   template <class Root>
-  Bool ReadRoot(Root*& root, HyperFile& file);
+  Bool ReadRoot(Root* Extras::*root, HyperFile& file);
   template <class Root>
-  Bool CopyRoot(const Root* root, BaseList2D& target, Root*& targetRoot, ULong flags, TransArray* translation);
-  BaseContainer* NeedDynamicParameters();
+  Bool CopyRoot(Root* Extras::*root, BaseList2D& target, ULong flags, TransArray* translation) const;
+  Bool CopyExtras(BaseList2D& target, ULong flags, TransArray* translation) const;
   static Bool SkipOneChunk(HyperFile& file);
   Bool ReadUniqueIds(HyperFile& file);
   void WriteUniqueIds(HyperFile& file);
+
+  Extras* extras_ = nullptr; // owned; null until the first of them
 };
 
 // Settings of a new dynamic parameter of a data type, named `name`, with the type's limits and steps.
@@ -203,15 +220,21 @@ class BaseList4D : public BaseList2D
   // no list.
   void InsertBefore(BaseList4D* reference);
   void InsertAfter(BaseList4D* reference);
-  // Put this node first or last among the children of `parent`. False, and nothing happens, if it is null or has no
-  // child list: the node then stays the caller's.
+  // Put this node first or last among the children of `parent`. False, and nothing happens, if it is null, has no child
+  // list or no memory for one: the node then stays the caller's.
   Bool InsertUnder(BaseList4D* parent);
   Bool InsertUnderLast(BaseList4D* parent);
 
-  RootList2D* GetChildRoot() const { return children_; }
+  // The child list. What can be changed is made if there is none: null where a class makes none by itself, and when
+  // memory is short.
+  RootList2D* GetChildRoot();
+  const RootList2D* GetChildRoot() const { return children_; }
 
  protected:
-  RootList2D* children_ = nullptr; // owned; null where a class has no children
+  // A new list for GetChildRoot.
+  virtual RootList2D* AllocChildRoot() const { return nullptr; }
+
+  RootList2D* children_ = nullptr; // owned; null until it is needed
 };
 
 } // namespace _torvane_

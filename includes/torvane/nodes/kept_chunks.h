@@ -30,9 +30,11 @@ class KeptChunks
   // The chunks one by one; null when nothing is kept.
   const Chunk* GetFirst() const { return first_; }
   void Flush();
+  // False for a chunk of this library's own numbers, since whoever refused it had a reason, and in older files, whose
+  // values may have other forms.
+  static Bool Keeps(const HyperFile& file, Long id);
   // Adds the chunk whose start was just read and consumes it with its end. False on an error of the file, which is
-  // FILEERROR_MEMORY when memory is short. False, and nothing is read, for a chunk of this library's own numbers, since
-  // whoever refused it had a reason, and in older files, whose values may have other forms.
+  // FILEERROR_MEMORY when memory is short. False, and nothing is read, for a chunk that isn't kept.
   Bool Read(HyperFile& file, Long id, Long level);
   void Write(HyperFile& file) const;
   // Replaces what the destination has. False when memory is short: the destination is then empty.

@@ -101,19 +101,15 @@ class RootObject : public RootList2D
   virtual BaseObject* AllocMember(Long type);
 };
 
-// Tags of an object.
+// Tags of an object, the list's owner.
 class RootTag : public RootList2D
 {
  public:
-  explicit RootTag(BaseObject* tagOwner) : tagOwner_(tagOwner) {}
   const NodeKind& GetMemberKind() const override;
   Bool ReadChunk(HyperFile& file, Long id, Long level) override;
 
  protected:
   void OnEnter(BaseList2D& tag) override; // sets the tag's object
-
- private:
-  BaseObject* tagOwner_;
 };
 
 // Materials of a document.

@@ -49,7 +49,7 @@ class BaseObject : public BaseList4D
   static constexpr NodeKindOf<BaseObject> kNodeKind{"object", &BaseList4D::kNodeKind};
   const NodeKind& GetNodeKind() const override { return kNodeKind; }
 
-  // Makes its child list through the client's hook.
+  // Its child list comes from the client's hook, with the first child.
   explicit BaseObject(Long type);
   ~BaseObject() override;
 
@@ -172,11 +172,11 @@ class BaseObject : public BaseList4D
   Vector relPos_;
   Vector relRot_;
   Vector relScale_ = Vector(1.0, 1.0, 1.0);
-  Matrix rotationMatrix_;
   FrozenPart* frozen_ = nullptr;   // owned; made with the first frozen value
   DisplayPart* display_ = nullptr; // owned; made with the first value that isn't the default
   ULong frozenFlags_ = 0;
   Long rotationOrder_ = kRotationOrderScene;
+  Long turnedIn_ = kNotTurned; // the order in which `relRot_` turns the object; kNotTurned: it doesn't
   RootTag tags_;
   Long editorMode_ = kObjectModeUndefined;
   Long renderMode_ = kObjectModeUndefined;
@@ -187,6 +187,7 @@ class BaseObject : public BaseList4D
 
   // Of this object's type too; the object data are copied later.
   BaseObject* MakeEmpty() const override;
+  RootList2D* AllocChildRoot() const override;
 
  private:
   struct LongParameter;
@@ -194,8 +195,11 @@ class BaseObject : public BaseList4D
   static const LongParameter kLongParameters[];
   static const VectorParameter kVectorParameters[];
 
+  static constexpr Long kNotTurned = -1;
+
   Bool IsProtected() const { return GetTag(kTagProtection) != nullptr; }
   Bool HasFrozenTransform() const { return (frozenFlags_ & (kFrozenPos | kFrozenRot | kFrozenScale)) != 0; }
+  Matrix GetRelRotation() const;
   Matrix GetRotation() const;
   static const FrozenPart kNoFrozenPart;
   static const DisplayPart kPlainDisplay;
@@ -226,7 +230,6 @@ class BaseObject : public BaseList4D
   template <class Visitor>
   void VisitLegacyList(Visitor& v, RootObject*& list);
   Bool ReadTransform(HyperFile& file, Long level);
-  Bool ReadChildren(HyperFile& file);
   Bool ReadObjectData(HyperFile& file, Long id, Long level);
   void StoreModelCheckSum();
   enum class DataForm;

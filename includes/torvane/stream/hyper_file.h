@@ -387,6 +387,10 @@ class HyperFile : public GeMemory
   Bool GrowChunks();
   void NotePath();
   Bool ReadBodySize(const ValueForm& form, LLong& left);
+  void WriteElements(const BaseContainer& container);
+  Bool WriteShared(const BaseContainer& container);
+  Bool MayHoldShared(const BaseContainer& container) const;
+  Bool ReadShared(BaseContainer& container);
   Bool ReadContainer(ContainerIndex& target, Bool flush);
   Bool ReadContainerChunk(ContainerIndex& target, Bool flush, Long expected);
   Bool ReadContainerLegacy(ContainerIndex& target, Bool flush);

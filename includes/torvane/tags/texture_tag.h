@@ -48,6 +48,7 @@ class TextureTag : public BaseTag
   const NodeKind& GetNodeKind() const override { return kNodeKind; }
 
   TextureTag();
+  ~TextureTag() override;
 
   Bool ReadChunk(HyperFile& file, Long id, Long level) override;
   // The matrix of the destination is computed anew.
@@ -71,12 +72,13 @@ class TextureTag : public BaseTag
   void SetRotation(const Vector& rotation) { SetPlace(kTextureRotation, rotation); }
 
   // The three as a matrix, whose axes have the lengths of the size. It is computed when it is first asked for after
-  // one of them was set by an operation or a parameter.
+  // one of them was set by an operation or a parameter. Identity when memory is short.
   const Matrix& TextureMatrix();
   // Takes the three from a matrix; of the rotations that mean the same, the one nearest to the present one.
   void SetTextureMatrix(const Matrix& matrix);
 
  private:
+  Matrix* NeedMatrix();
   void SetPlace(Long id, const Vector& value);
   Real GetTiles(Long id) const;
   void SetPreset(Long id, const GeData& value);
@@ -84,8 +86,8 @@ class TextureTag : public BaseTag
   void ReadOldAspects(ChunkReader& v);
   Bool ReadLinkEntry(HyperFile& file, Long id);
 
+  Matrix* textureMatrix_ = nullptr; // owned; null until it is first asked for
   Bool matrixValid_ = false;
-  Matrix textureMatrix_;
 };
 
 } // namespace _torvane_

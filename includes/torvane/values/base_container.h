@@ -1,9 +1,10 @@
 // An ordered list of ids and values. Order is that of insertion and is what a file keeps. There is no index: containers
 // are small, and every lookup scans from the start.
 //
-// New nodes of a class share one table of default elements, in static memory, until their container is to be changed:
-// it then takes a copy. Whatever gives a value that can be changed counts as a change; asking a container that is const
-// does not, and what its values lead to (links, containers, custom objects) is to be left as it is.
+// New nodes of a class share one table of default elements, in static memory. A container has elements of its own in
+// place of those that it changes, and takes a copy of all when there are more than a few or when some are added or
+// removed. Whatever gives a value that can be changed counts as a change; asking a container that is const does not,
+// and what its values lead to (links, containers, custom objects) is to be left as it is.
 #pragma once
 
 #include "torvane/memory/memory.h"
@@ -17,6 +18,7 @@ class BaseDocument;
 class BaseList2D;
 class ContainerIndex;
 struct ContainerDefault;
+class HyperFile;
 class TransArray;
 
 class BaseContainer
@@ -36,7 +38,7 @@ class BaseContainer
   void Flush();
 
   // Makes room for so many elements in one block, if there is no room for any. False when memory is short.
-  Bool Reserve(Long count) { return free_ || blocks_ || count < 1 || AddBlock(count); }
+  Bool Reserve(Long count) { return blocks_ || count < 1 || AddBlock(count); }
   // Appends without searching, so that a second element of the same id can arise. A negative id is stored as -1. The
   // element's value, or null when memory is short.
   GeData* InsertData(Long id, const GeData& value);
@@ -69,9 +71,11 @@ class BaseContainer
   // Sets every element of `defaults`, a container from DefaultsOf; an empty container shares them. False when memory is
   // short.
   Bool SetDefaults(const BaseContainer& defaults);
-  // Makes this new container that of a table. `places` has kDefaultSize bytes for each of the rows and
-  // outlives all containers.
-  void BuildDefaults(const ContainerDefault* rows, LLong count, void* places);
+  // A table of elements that containers share: container_defaults.h.
+  struct Defaults;
+  // Makes this new container that of a table, whose rows have different ids. `places` has kDefaultSize bytes for each
+  // of the rows, and outlives all containers, as `defaults` does.
+  void BuildDefaults(const ContainerDefault* rows, Defaults& defaults, void* places);
 
   // A getter gives the default only when the id is absent.
   Bool GetBool(Long id, Bool defaultValue = false) const;
@@ -126,7 +130,7 @@ class BaseContainer
   class Iterator
   {
     friend class BaseContainer;
-    const Element* element_ = nullptr;
+    const Element* place_ = nullptr; // of a shared element also where one of the container's own is shown
   };
   // Gives each element's id and value in order; false at the end.
   Bool BrowseFirst(Iterator& iterator, Long& id, const GeData*& value) const;
@@ -145,38 +149,55 @@ class BaseContainer
 
  private:
   friend class ContainerIndex; // finds elements by id while a file is read
+  friend class HyperFile;      // compares and writes shared elements as bytes
 
   struct Block;
 
-  Element* NewElement(Long id);
+  // The elements in order: the container's own, or the shared ones, for which Shown gives what takes their place.
+  const Element* GetFirstPlace() const;
+  const Element* Shown(const Element* place) const
+  {
+    const Element* own = defaults_ ? FindOwn(place->id) : nullptr;
+    return own ? own : place;
+  }
+  Element* FindOwn(Long id) const;
+  Element* NewOwn(Long id);
+  Element* NewElement(Long id) { return TakeCopy() ? NewOwn(id) : nullptr; }
+  Bool TakesChange() const;
   Bool AddBlock(Long capacity);
-  void Append(Element* element);
+  void Link(Element* element);
+  void Append(Element* element)
+  {
+    Link(element);
+    ++dirty_;
+  }
   void Unlink(Element* element, Element* previous);
   void Recycle(Element* element);
   GeData* FillNew(Element* element, const GeData& value);
-  Element* Find(Long id) const;
-  Element* FindAt(Long index) const;
-  static Bool Visit(const Iterator& iterator, Long& id, const GeData*& value);
+  const Element* Find(Long id) const;
+  const Element* FindAt(Long index) const;
   static void BuildDefault(GeData& value, const ContainerDefault& row, void* payload);
   void Swap(BaseContainer& other);
-  void Share(const BaseContainer& source);
-  Bool IsShared() const { return head_ && !blocks_; }
-  Bool TakeCopy();
+  void Share(const Defaults& defaults);
+  Bool IsShared() const { return defaults_ != nullptr; }
+  Bool TakeCopy() { return !IsShared() || TakeFirst(GetCount()); }
+  Bool TakeFirst(Long count);
   GeData* Change(const Element* element);
+  Bool Visit(const Iterator& iterator, Long& id, const GeData*& value) const;
   Bool AppendCopies(const BaseContainer& source, ULong flags, TransArray* translation);
   BaseContainer* EnterGroup(Long id);
   Bool SetComponent(Long id, Long componentId, Real value);
   void FreeElements();
   void DropElements(BaseContainer*& pending);
 
-  Element* head_ = nullptr;
+  Element* head_ = nullptr; // of the container's own elements; where it shares others, in no order
   Element* tail_ = nullptr;
-  Block* blocks_ = nullptr; // where the elements lie, the newest first; owned; null where they are shared
+  Block* blocks_ = nullptr; // where they lie, the newest first; owned
   // NOLINTBEGIN(readability-identifier-naming): private, although members of an unnamed union
   union
   {
-    Element* free_ = nullptr; // places of removed elements, linked through `next`
-    BaseContainer* pending_;  // of a container that waits to be freed: the next one that does
+    const Defaults* defaults_ = nullptr; // the elements that it shares
+    BaseContainer* pending_;             // of a container that waits to be freed: the next one that does
   };
   // NOLINTEND(readability-identifier-naming)
   Long id_;

@@ -1,6 +1,8 @@
 #include "torvane/values/base_container.h"
 
+#include <algorithm>
 #include <bit>
+#include <iterator>
 
 #include "k2v_file/values/container_defaults.h"
 #include "torvane/memory/assertion.h"
@@ -13,7 +15,8 @@ namespace
 
 constexpr Long kFirstBlock = 2;
 constexpr Long kLargestBlock = 64;
-constexpr ULLong kSameBits = 8; // Reals whose bit patterns are closer than this count as the same
+constexpr Long kMostChanged = 4; // shared elements that are changed one by one
+constexpr ULLong kSameBits = 8;  // Reals whose bit patterns are closer than this count as the same
 
 constinit const GeData kNothing{};
 
@@ -50,6 +53,7 @@ Bool IsSameValue(const GeData& a, const GeData& b)
 struct BaseContainer::Block
 {
   Block* next;
+  Element* free; // places of removed elements, linked through `next`; used of the newest block alone
   Long capacity;
   Long used;
 
@@ -60,9 +64,7 @@ struct BaseContainer::Block
 
 BaseContainer::BaseContainer(const BaseContainer& other) : id_(other.id_)
 {
-  if (other.IsShared())
-    Share(other);
-  else if (!AppendCopies(other, 0, nullptr))
+  if (!AppendCopies(other, 0, nullptr))
     FreeElements();
 }
 
@@ -95,35 +97,89 @@ BaseContainer& BaseContainer::operator=(BaseContainer&& other) noexcept
 
 BaseContainer::~BaseContainer() { FreeElements(); }
 
-// Shows the elements of a table of defaults. They have no block of their own here, which is how they are told apart.
-void BaseContainer::Share(const BaseContainer& source)
+const BaseContainer::Element* BaseContainer::GetFirstPlace() const { return defaults_ ? defaults_->first : head_; }
+
+BaseContainer::Element* BaseContainer::FindOwn(Long id) const
 {
-  head_ = source.head_;
-  tail_ = source.tail_;
-  dirty_ = static_cast<UWord>(dirty_ + source.GetCount());
+  Element* element = head_;
+  while (element && element->id != id)
+    element = element->next;
+  return element;
 }
 
-// Gives this container elements of its own before they change. False, with nothing changed, when memory is short.
-Bool BaseContainer::TakeCopy()
+// Shows the elements of a table. The container is empty.
+void BaseContainer::Share(const Defaults& defaults)
 {
-  if (!IsShared())
-    return true;
-  BaseContainer copy;
-  if (!copy.AppendCopies(*this, 0, nullptr))
+  defaults_ = &defaults;
+  dirty_ = static_cast<UWord>(dirty_ + defaults.count);
+}
+
+// True if one more of the shared elements may be changed on its own.
+Bool BaseContainer::TakesChange() const
+{
+  Long count = 0;
+  for (const Element* element = head_; element; element = element->next)
+    ++count;
+  return IsShared() && count < kMostChanged;
+}
+
+// Makes the first of the shared elements the container's own, and shares no others. What was its own before is among
+// them and stays where it lies. False, with nothing changed, when memory is short.
+Bool BaseContainer::TakeFirst(Long count)
+{
+  BaseContainer taken;
+  if (count > 0 && !taken.AddBlock(count))
     return false;
-  Swap(copy);
+  Element* changed[kMostChanged] = {};
+  std::size_t changes = 0;
+  for (Element* element = head_; element; element = element->next)
+    changed[changes++] = element;
+  const auto changedOf = [&changed](const Element& place) {
+    Element* const* found = std::find_if(std::begin(changed), std::end(changed),
+                                         [&place](const Element* each) { return each && each->id == place.id; });
+    return found == std::end(changed) ? nullptr : *found;
+  };
+  const Element* place = defaults_->first;
+  for (Long i = 0; i < count; ++i, place = place->next) {
+    Element* copy = changedOf(*place) ? nullptr : taken.NewOwn(place->id);
+    if (copy && !copy->value.Assign(place->value, 0, nullptr))
+      return false;
+    if (copy)
+      taken.Link(copy);
+  }
+  Element* copy = std::exchange(taken.head_, nullptr);
+  taken.tail_ = nullptr;
+  place = defaults_->first;
+  for (Long i = 0; i < count; ++i, place = place->next) {
+    Element* element = changedOf(*place);
+    if (!element)
+      element = std::exchange(copy, copy->next);
+    element->next = nullptr;
+    taken.Link(element);
+  }
+  if (taken.blocks_) {
+    taken.blocks_->next = std::exchange(blocks_, nullptr);
+    head_ = tail_ = nullptr;
+  }
+  Swap(taken);
   return true;
 }
 
 // The value of an element of this container, to be changed; null without an element and when memory is short.
 GeData* BaseContainer::Change(const Element* element)
 {
-  if (!element || !IsShared())
-    return element ? &const_cast<Element*>(element)->value : nullptr;
-  Long index = 0;
-  for (const Element* before = head_; before != element; before = before->next)
-    ++index;
-  return TakeCopy() ? &FindAt(index)->value : nullptr;
+  if (!element)
+    return nullptr;
+  if (!IsShared() || FindOwn(element->id) == element)
+    return &const_cast<Element*>(element)->value;
+  const Long id = element->id;
+  if (!TakesChange())
+    return TakeCopy() ? &FindOwn(id)->value : nullptr;
+  Element* own = NewOwn(id);
+  GeData* value = FillNew(own, element->value);
+  if (value)
+    Link(own);
+  return value;
 }
 
 // Exchanges the elements.
@@ -131,8 +187,8 @@ void BaseContainer::Swap(BaseContainer& other)
 {
   std::swap(head_, other.head_);
   std::swap(tail_, other.tail_);
-  std::swap(free_, other.free_);
   std::swap(blocks_, other.blocks_);
+  std::swap(defaults_, other.defaults_);
 }
 
 // The places of a small container stay: most often the elements that a file holds take those of the defaults.
@@ -143,8 +199,8 @@ void BaseContainer::Flush()
     return FreeElements();
   for (Element* element = head_; element; element = element->next)
     element->value.Free();
-  tail_->next = free_;
-  free_ = head_;
+  tail_->next = blocks_->free;
+  blocks_->free = head_;
   head_ = tail_ = nullptr;
 }
 
@@ -163,7 +219,7 @@ void BaseContainer::FreeElements()
 
 void BaseContainer::DropElements(BaseContainer*& pending)
 {
-  for (Element* element = IsShared() ? nullptr : head_; element;) {
+  for (Element* element = head_; element;) {
     Element* next = element->next;
     GeData& value = element->value;
     if (value.type_ == kDataContainer) {
@@ -175,7 +231,8 @@ void BaseContainer::DropElements(BaseContainer*& pending)
     element->~Element();
     element = next;
   }
-  head_ = tail_ = free_ = nullptr;
+  head_ = tail_ = nullptr;
+  defaults_ = nullptr;
   while (blocks_) {
     Block* block = blocks_;
     blocks_ = block->next;
@@ -184,16 +241,14 @@ void BaseContainer::DropElements(BaseContainer*& pending)
 }
 
 // A nil element that is in no list yet; null when memory is short.
-BaseContainer::Element* BaseContainer::NewElement(Long id)
+BaseContainer::Element* BaseContainer::NewOwn(Long id)
 {
-  if (!TakeCopy())
-    return nullptr;
-  Element* place = free_;
+  Element* place = blocks_ ? blocks_->free : nullptr;
   if (place) {
-    free_ = place->next;
+    blocks_->free = place->next;
   } else {
     if (!blocks_ || blocks_->used == blocks_->capacity) {
-      Long capacity = blocks_ ? blocks_->capacity * 2 : kFirstBlock;
+      Long capacity = blocks_ ? blocks_->capacity * 2 : IsShared() ? 1 : kFirstBlock;
       if (capacity > kLargestBlock)
         capacity = kLargestBlock;
       if (!AddBlock(capacity))
@@ -209,15 +264,15 @@ Bool BaseContainer::AddBlock(Long capacity)
   void* place = GeAllocNC(static_cast<LLong>(sizeof(Block)) + capacity * static_cast<LLong>(sizeof(Element)));
   if (!place)
     return false;
-  blocks_ = ::new (place) Block{blocks_, capacity, 0};
+  blocks_ = ::new (place) Block{blocks_, nullptr, capacity, 0};
   return true;
 }
 
-void BaseContainer::Append(Element* element)
+// Puts an element behind the container's own ones.
+void BaseContainer::Link(Element* element)
 {
   (tail_ ? tail_->next : head_) = element;
   tail_ = element;
-  ++dirty_;
 }
 
 // Takes an element out of the list and destroys it. `previous` is null for the head.
@@ -234,16 +289,19 @@ void BaseContainer::Unlink(Element* element, Element* previous)
 void BaseContainer::Recycle(Element* element)
 {
   element->value.Free();
-  element->next = free_;
-  free_ = element;
+  element->next = blocks_->free;
+  blocks_->free = element;
 }
 
-BaseContainer::Element* BaseContainer::Find(Long id) const
+const BaseContainer::Element* BaseContainer::Find(Long id) const
 {
-  Element* element = head_;
-  while (element && element->id != id)
-    element = element->next;
-  return element;
+  const Element* place = FindOwn(id);
+  if (place || !IsShared())
+    return place;
+  place = defaults_->first;
+  while (place && place->id != id)
+    place = place->next;
+  return place;
 }
 
 // ---------------------------------------------------------------------------------------------------------------
@@ -281,16 +339,16 @@ GeData* BaseContainer::InsertData(Long id, GeData&& value)
 GeData* BaseContainer::InsertDataAfter(Long id, const GeData& value, const GeData* after)
 {
   Long index = 0;
-  const Element* found = head_;
-  for (; found && &found->value != after; found = found->next)
+  const Element* found = GetFirstPlace();
+  for (; found && &Shown(found)->value != after; found = found->next)
     ++index;
-  if (found && found == tail_)
+  if (found && !found->next)
     return InsertData(id, value);
   Element* element = NewElement(id);
   GeData* stored = FillNew(element, value);
   if (!stored)
     return nullptr;
-  Element* previous = found ? FindAt(index) : nullptr;
+  Element* previous = found ? const_cast<Element*>(FindAt(index)) : nullptr;
   Element*& place = previous ? previous->next : head_;
   element->next = place;
   place = element;
@@ -348,8 +406,8 @@ Bool BaseContainer::RemoveIndex(Long index)
 Long BaseContainer::FindIndex(Long id) const
 {
   Long index = 0;
-  for (const Element* element = head_; element; element = element->next, ++index) {
-    if (element->id == id)
+  for (const Element* place = GetFirstPlace(); place; place = place->next, ++index) {
+    if (place->id == id)
       return index;
   }
   return -1;
@@ -357,6 +415,8 @@ Long BaseContainer::FindIndex(Long id) const
 
 Long BaseContainer::GetCount() const
 {
+  if (IsShared())
+    return defaults_->count;
   Long count = 0;
   for (const Element* element = head_; element; element = element->next)
     ++count;
@@ -364,12 +424,12 @@ Long BaseContainer::GetCount() const
 }
 
 // The element at a position, or null.
-BaseContainer::Element* BaseContainer::FindAt(Long index) const
+const BaseContainer::Element* BaseContainer::FindAt(Long index) const
 {
-  Element* element = index < 0 ? nullptr : head_;
-  for (; element && index > 0; --index)
-    element = element->next;
-  return element;
+  const Element* place = index < 0 ? nullptr : GetFirstPlace();
+  for (; place && index > 0; --index)
+    place = place->next;
+  return place ? Shown(place) : nullptr;
 }
 
 GeData* BaseContainer::GetIndexData(Long index) { return Change(FindAt(index)); }
@@ -412,40 +472,43 @@ const GeData* BaseContainer::FindData(Long id) const
 
 Bool BaseContainer::BrowseFirst(Iterator& iterator, Long& id, const GeData*& value) const
 {
-  iterator.element_ = head_;
+  iterator.place_ = GetFirstPlace();
   return Visit(iterator, id, value);
 }
 
 Bool BaseContainer::BrowseNext(Iterator& iterator, Long& id, const GeData*& value) const
 {
-  iterator.element_ = iterator.element_ ? iterator.element_->next : nullptr;
+  iterator.place_ = iterator.place_ ? iterator.place_->next : nullptr;
   return Visit(iterator, id, value);
 }
 
-Bool BaseContainer::Visit(const Iterator& iterator, Long& id, const GeData*& value)
+Bool BaseContainer::Visit(const Iterator& iterator, Long& id, const GeData*& value) const
 {
-  const Element* element = iterator.element_;
-  if (!element)
+  const Element* place = iterator.place_;
+  if (!place)
     return false;
-  id = element->id;
-  value = &element->value;
+  id = place->id;
+  value = &Shown(place)->value;
   return true;
 }
 
 // ---------------------------------------------------------------------------------------------------------------
 
-// Appends copies to this container, which is new. Nested containers are copied here and not by their values, to need
-// little of the stack for each level.
+// Fills this container, which is new. Nested containers are copied here and not by their values, to need little of the
+// stack for each level.
 Bool BaseContainer::AppendCopies(const BaseContainer& source, ULong flags, TransArray* translation)
 {
-  Long count = source.GetCount();
+  Long count = 0;
+  for (const Element* element = source.head_; element; element = element->next)
+    ++count;
   if (count > 0 && !AddBlock(count))
     return false;
+  defaults_ = source.defaults_;
   for (const Element* element = source.head_; element; element = element->next) {
-    Element* copy = NewElement(element->id);
+    Element* copy = NewOwn(element->id);
     if (!copy)
       return false;
-    Append(copy);
+    Link(copy);
     if (element->value.type_ != kDataContainer) {
       if (!copy->value.Assign(element->value, flags, translation))
         return false;
@@ -456,11 +519,10 @@ Bool BaseContainer::AppendCopies(const BaseContainer& source, ULong flags, Trans
       return false;
     BaseContainer& target = *copy->value.payload_.container;
     target.id_ = nested->id_;
-    if (nested->IsShared())
-      target.Share(*nested);
-    else if (!target.AppendCopies(*nested, flags, translation))
+    if (!target.AppendCopies(*nested, flags, translation))
       return false;
   }
+  dirty_ = static_cast<UWord>(dirty_ + GetCount());
   return true;
 }
 
@@ -470,9 +532,7 @@ Bool BaseContainer::CopyTo(BaseContainer& destination, ULong flags, TransArray* 
   if (&destination == this)
     return true;
   BaseContainer copy(id_);
-  if (IsShared())
-    copy.Share(*this); // its links are empty: there is nothing to translate
-  else if (!copy.AppendCopies(*this, flags, translation))
+  if (!copy.AppendCopies(*this, flags, translation))
     return false;
   destination.dirty_ = static_cast<UWord>(destination.dirty_ + destination.GetCount() + copy.dirty_);
   destination.id_ = copy.id_;
@@ -490,11 +550,14 @@ BaseContainer* BaseContainer::GetClone(ULong flags, TransArray* translation) con
 
 Bool BaseContainer::IsEqual(const BaseContainer& other) const
 {
-  const Element* a = head_;
-  const Element* b = other.head_;
+  const Element* a = GetFirstPlace();
+  const Element* b = other.GetFirstPlace();
   Bool equal = id_ == other.id_;
-  for (; equal && a && b; a = a->next, b = b->next)
-    equal = a->id == b->id && a->value.GetType() == b->value.GetType() && a->value.IsEqual(b->value);
+  for (; equal && a && b; a = a->next, b = b->next) {
+    const GeData& value = Shown(a)->value;
+    const GeData& same = other.Shown(b)->value;
+    equal = a->id == b->id && value.GetType() == same.GetType() && value.IsEqual(same);
+  }
   return equal && !a && !b;
 }
 

@@ -53,25 +53,28 @@ void BaseContainer::BuildDefault(GeData& value, const ContainerDefault& row, voi
   }
 }
 
-void BaseContainer::BuildDefaults(const ContainerDefault* rows, LLong count, void* places)
+void BaseContainer::BuildDefaults(const ContainerDefault* rows, Defaults& defaults, void* places)
 {
   auto* place = static_cast<UChar*>(places);
-  for (LLong i = 0; i < count; ++i, place += kDefaultSize) {
+  Element** last = &defaults.first;
+  for (Long i = 0; i < defaults.count; ++i, place += kDefaultSize) {
     auto* element = ::new (static_cast<void*>(place)) Element{nullptr, rows[i].id, GeData()};
     BuildDefault(element->value, rows[i], place + sizeof(Element));
-    Append(element);
+    *last = element;
+    last = &element->next;
   }
+  Share(defaults);
 }
 
 Bool BaseContainer::SetDefaults(const BaseContainer& defaults)
 {
-  if (!head_) {
+  if (!GetFirstPlace()) {
     FreeElements();
-    Share(defaults);
+    Share(*defaults.defaults_);
     return true;
   }
-  for (const Element* element = defaults.head_; element; element = element->next) {
-    if (!SetData(element->id, element->value))
+  for (const Element* place = defaults.GetFirstPlace(); place; place = place->next) {
+    if (!SetData(place->id, place->value))
       return false;
   }
   return true;

@@ -101,7 +101,7 @@ Bool BaseMaterial::ReadChunk(HyperFile& file, Long id, Long level)
 void BaseMaterial::WriteChunks(HyperFile& file)
 {
   if (GetShaders())
-    shaders_->WriteAsChunk(file, kChunkShaders);
+    GetShaderRoot()->WriteAsChunk(file, kChunkShaders);
   if (preview_.GetEncodedSize() <= 0 && preview_.GetBw() < 1)
     SetBit(kMaterialNoPreview);
   BaseList2D::WriteChunks(file);

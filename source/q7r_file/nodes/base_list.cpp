@@ -13,39 +13,60 @@ namespace _torvane_
 
 BaseList2D::BaseList2D(Long type) : type_(type) {}
 
-BaseList2D::~BaseList2D()
+BaseList2D::~BaseList2D() { DeleteObj(extras_); }
+
+BaseList2D::Extras::~Extras()
 {
-  DeleteObj(tracks_);
-  DeleteObj(shaders_);
-  DeleteObj(uniqueIds_);
-  DeleteObj(dynamicParameters_);
+  DeleteObj(tracks);
+  DeleteObj(shaders);
+  DeleteObj(uniqueIds);
+  DeleteObj(dynamicParameters);
+}
+
+constinit const BaseList2D::Extras BaseList2D::kNoExtras{};
+
+BaseList2D::Extras* BaseList2D::NeedExtras()
+{
+  if (!extras_)
+    extras_ = NewObj<Extras>();
+  return extras_;
+}
+
+template <class Part>
+Part* BaseList2D::NeedExtra(Part* Extras::*part)
+{
+  Extras* extras = NeedExtras();
+  if (extras && !(extras->*part))
+    extras->*part = NewObj<Part>();
+  return extras ? extras->*part : nullptr;
 }
 
 // The list, made if there is none; null when memory is short.
 template <class Root>
-Root* BaseList2D::NeedRoot(Root*& root)
+Root* BaseList2D::NeedRoot(Root* Extras::*root)
 {
-  if (!root && (root = NewObj<Root>()))
-    root->SetOwner(this);
-  return root;
+  Root* list = NeedExtra(root);
+  if (list)
+    list->SetOwner(this);
+  return list;
 }
 
 template <class Root>
-Bool BaseList2D::ReadRoot(Root*& root, HyperFile& file)
+Bool BaseList2D::ReadRoot(Root* Extras::*root, HyperFile& file)
 {
-  if (NeedRoot(root))
-    return root->ReadChunks(file, false);
+  if (Root* list = NeedRoot(root))
+    return list->ReadChunks(file, false);
   file.SetError(FILEERROR_MEMORY);
   return false;
 }
 
 template <class Root>
-Bool BaseList2D::CopyRoot(const Root* root, BaseList2D& target, Root*& targetRoot, ULong flags, TransArray* translation)
+Bool BaseList2D::CopyRoot(Root* Extras::*root, BaseList2D& target, ULong flags, TransArray* translation) const
 {
-  if (root)
-    return target.NeedRoot(targetRoot) && const_cast<Root*>(root)->CopyWithTranslation(*targetRoot, flags, translation);
-  if (targetRoot && !(flags & kCopyNoBranches))
-    targetRoot->FreeAll();
+  if (Root* list = Extra().*root)
+    return target.NeedRoot(root) && list->CopyWithTranslation(*(target.extras_->*root), flags, translation);
+  if (Root* others = target.Extra().*root; others && !(flags & kCopyNoBranches))
+    others->FreeAll();
   return true;
 }
 
@@ -80,11 +101,12 @@ Bool BaseList2D::VisitHeader(Visitor& v)
   v.Goal(goal_);
   v.String(name_);
   if (v.Level() >= 1) {
-    Long present = dynamicParameters_ && dynamicParameters_->GetCount() > 0 ? 1 : 0;
+    const BaseContainer* parameters = Extra().dynamicParameters;
+    Long present = parameters && parameters->GetCount() > 0 ? 1 : 0;
     v.Long(present);
     if (present >= 1 && v.Good()) {
-      if (NeedDynamicParameters())
-        v.Container(*dynamicParameters_);
+      if (BaseContainer* list = NeedDynamicParameters())
+        v.Container(*list);
       else
         v.File().SetError(FILEERROR_MEMORY);
     }
@@ -129,35 +151,33 @@ Bool BaseList2D::ReadUniqueIds(HyperFile& file)
   Long count = 0;
   if (!file.ReadLong(count))
     return false;
-  if (count >= 1) {
-    if (uniqueIds_)
-      uniqueIds_->FreeEntries();
-    else
-      uniqueIds_ = NewObj<UniqueIDArray>();
-    if (!uniqueIds_)
-      return false;
-  }
+  UniqueIDArray* entries = count >= 1 ? NeedExtra(&Extras::uniqueIds) : nullptr;
+  if (entries)
+    entries->FreeEntries();
+  else if (count >= 1)
+    return false;
   for (Long i = 0; i < count; ++i) {
     Long appId = 0;
     void* data = nullptr;
     LLong size = 0;
     if (!file.ReadLong(appId) || !file.ReadMemory(data, size))
       return false;
-    if (!uniqueIds_->AppendEntry(appId, data, size)) {
+    if (!entries->AppendEntry(appId, data, size)) {
       GeFree(data);
       return false;
     }
   }
-  if (count >= 1)
-    file.AddLookups(uniqueIds_->SettleEntries());
+  if (entries)
+    file.AddLookups(entries->SettleEntries());
   return file.SkipToEndChunk();
 }
 
 void BaseList2D::WriteUniqueIds(HyperFile& file)
 {
   file.WriteChunkStart(kChunkUniqueIds, kLevelUniqueIds);
-  file.WriteLong(uniqueIds_->GetCount());
-  for (const UniqueIDEntry& entry : *uniqueIds_) {
+  const UniqueIDArray& entries = *Extra().uniqueIds;
+  file.WriteLong(entries.GetCount());
+  for (const UniqueIDEntry& entry : entries) {
     file.WriteLong(entry.appId);
     file.WriteMemory(entry.data, entry.size);
   }
@@ -167,12 +187,12 @@ void BaseList2D::WriteUniqueIds(HyperFile& file)
 void BaseList2D::WriteChunks(HyperFile& file)
 {
   if (GetFirstTrack())
-    tracks_->WriteAsChunk(file, kChunkTracks);
+    GetTrackRoot()->WriteAsChunk(file, kChunkTracks);
   WriteChunk(file, kChunkNodeHeader, kLevelNodeHeader, [this](ChunkWriter& v) { return VisitHeader(v); });
-  if (uniqueIds_)
+  if (Extra().uniqueIds)
     WriteUniqueIds(file);
   GeListNode::WriteChunks(file);
-  keptChunks_.Write(file);
+  GetKeptChunks().Write(file);
 }
 
 Bool BaseList2D::ReadChunk(HyperFile& file, Long id, Long level)
@@ -185,15 +205,23 @@ Bool BaseList2D::ReadChunk(HyperFile& file, Long id, Long level)
   case kChunkUniqueIds:
     return ReadUniqueIds(file);
   case kChunkShaders:
-    return ReadRoot(shaders_, file);
+    return ReadRoot(&Extras::shaders, file);
   case kChunkTracks:
-    return ReadRoot(tracks_, file);
+    return ReadRoot(&Extras::tracks, file);
   default:
     return false;
   }
 }
 
-Bool BaseList2D::KeepChunk(HyperFile& file, Long id, Long level) { return keptChunks_.Read(file, id, level); }
+Bool BaseList2D::KeepChunk(HyperFile& file, Long id, Long level)
+{
+  if (!KeptChunks::Keeps(file, id))
+    return false;
+  if (Extras* extras = NeedExtras())
+    return extras->keptChunks.Read(file, id, level);
+  file.SetError(FILEERROR_MEMORY);
+  return false;
+}
 
 Bool BaseList2D::CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation)
 {
@@ -206,20 +234,25 @@ Bool BaseList2D::CopyTo(PrivateChunk& destination, ULong flags, TransArray* tran
   if (!data_.CopyTo(target->data_, flags, translation))
     return false;
   target->markerDrawn_ = target == this && markerDrawn_; // a copy is never the same node
-  if (!keptChunks_.CopyTo(target->keptChunks_))
-    return false;
   target->name_ = name_;
-  if (!link_.CopyLinkTo(&target->link_, translation) || watch.Failed() ||
-      !GeListNode::CopyTo(destination, flags, translation))
+  return link_.CopyLinkTo(&target->link_, translation) && !watch.Failed() &&
+         GeListNode::CopyTo(destination, flags, translation) && CopyExtras(*target, flags, translation);
+}
+
+Bool BaseList2D::CopyExtras(BaseList2D& target, ULong flags, TransArray* translation) const
+{
+  if (!extras_ && !target.extras_)
+    return true;
+  if (!target.NeedExtras() || !GetKeptChunks().CopyTo(target.extras_->keptChunks))
     return false;
-  if (!dynamicParameters_)
-    DeleteObj(target->dynamicParameters_);
-  else if (!target->NeedDynamicParameters() ||
-           !dynamicParameters_->CopyTo(*target->dynamicParameters_, flags, translation))
+  if (!Extra().dynamicParameters)
+    DeleteObj(target.extras_->dynamicParameters);
+  else if (!target.NeedDynamicParameters() ||
+           !extras_->dynamicParameters->CopyTo(*target.extras_->dynamicParameters, flags, translation))
     return false;
-  if (!(flags & kCopyNoBranches) && !CopyRoot(shaders_, *target, target->shaders_, flags, translation))
+  if (!(flags & kCopyNoBranches) && !CopyRoot(&Extras::shaders, target, flags, translation))
     return false;
-  return (flags & kCopyNoTracks) || CopyRoot(tracks_, *target, target->tracks_, flags, translation);
+  return (flags & kCopyNoTracks) || CopyRoot(&Extras::tracks, target, flags, translation);
 }
 
 void BaseList2D::RemoveFromList()
@@ -234,10 +267,10 @@ Bool BaseList2D::IsBare() const
   BaseContainer::Iterator first;
   Long id = 0;
   const GeData* value = nullptr;
-  const Bool hasParameters = data_.GetId() != -1 || data_.BrowseFirst(first, id, value) || dynamicParameters_;
+  const Bool hasParameters = data_.GetId() != -1 || data_.BrowseFirst(first, id, value) || Extra().dynamicParameters;
   const Bool hasLinks = link_.GetLinkGoal() || link_.GetName() || goal_.trunk;
-  return name_.GetLength() == 0 && !hasParameters && !hasLinks && !shaders_ && !tracks_ && !uniqueIds_ &&
-         keptChunks_.IsEmpty();
+  return name_.GetLength() == 0 && !hasParameters && !hasLinks && !GetShaderRoot() && !GetTrackRoot() &&
+         !Extra().uniqueIds && GetKeptChunks().IsEmpty();
 }
 
 BaseList2D* BaseList2D::GetLayer() const { return NodeCast<LayerObject>(link_.GetLink()); }
@@ -247,8 +280,8 @@ void BaseList2D::SetDocument(BaseDocument* document)
   if (document_ == document)
     return;
   document_ = document;
-  SetDocumentOfMembers(shaders_, document);
-  SetDocumentOfMembers(tracks_, document);
+  SetDocumentOfMembers(GetShaderRoot(), document);
+  SetDocumentOfMembers(GetTrackRoot(), document);
 }
 
 // Members that have the document already have it in all that they own.
@@ -279,9 +312,8 @@ Bool BaseList2D::AddUniqueID(Long appId, const void* data, LLong size)
   }
   if (size < 0 || (size > 0 && !data))
     return false;
-  if (!uniqueIds_)
-    uniqueIds_ = NewObj<UniqueIDArray>();
-  return uniqueIds_ && uniqueIds_->SetEntry(appId, data, size);
+  UniqueIDArray* entries = NeedExtra(&Extras::uniqueIds);
+  return entries && entries->SetEntry(appId, data, size);
 }
 
 Bool BaseList2D::FindUniqueID(Long appId, const void*& data, LLong& size) const
@@ -291,7 +323,8 @@ Bool BaseList2D::FindUniqueID(Long appId, const void*& data, LLong& size) const
     size = sizeof(NodeMarker);
     return true;
   }
-  const UniqueIDEntry* entry = uniqueIds_ ? uniqueIds_->Find(appId) : nullptr;
+  UniqueIDArray* entries = Extra().uniqueIds;
+  const UniqueIDEntry* entry = entries ? entries->Find(appId) : nullptr;
   if (!entry)
     return false;
   data = entry->data;
@@ -299,7 +332,7 @@ Bool BaseList2D::FindUniqueID(Long appId, const void*& data, LLong& size) const
   return true;
 }
 
-Long BaseList2D::GetUniqueIDCount() const { return (uniqueIds_ ? uniqueIds_->GetCount() : 0) + 1; }
+Long BaseList2D::GetUniqueIDCount() const { return (Extra().uniqueIds ? Extra().uniqueIds->GetCount() : 0) + 1; }
 
 Bool BaseList2D::GetUniqueIDByIndex(Long index, Long& appId, const void*& data, LLong& size) const
 {
@@ -310,25 +343,37 @@ Bool BaseList2D::GetUniqueIDByIndex(Long index, Long& appId, const void*& data, 
     return FindUniqueID(appId, data, size);
   }
   // A file may hold an entry with the marker's number too.
-  const UniqueIDEntry& entry = (*uniqueIds_)[index - 1];
+  const UniqueIDEntry& entry = (*Extra().uniqueIds)[index - 1];
   appId = entry.appId;
   data = entry.data;
   size = entry.size;
   return true;
 }
 
-BaseShader* BaseList2D::GetShaders() const { return shaders_ ? NodeCast<BaseShader>(shaders_->GetFirst()) : nullptr; }
+BaseShader* BaseList2D::GetShaders() const
+{
+  return GetShaderRoot() ? NodeCast<BaseShader>(GetShaderRoot()->GetFirst()) : nullptr;
+}
 
 Bool BaseList2D::InsertShader(BaseShader* shader, BaseShader* after)
 {
-  return NeedRoot(shaders_) && shaders_->InsertAfter(shader, after);
+  return NeedRoot(&Extras::shaders) && GetShaderRoot()->InsertAfter(shader, after);
 }
 
-Bool BaseList2D::InsertShaderLast(BaseShader* shader) { return NeedRoot(shaders_) && shaders_->InsertLast(shader); }
+Bool BaseList2D::InsertShaderLast(BaseShader* shader)
+{
+  return NeedRoot(&Extras::shaders) && GetShaderRoot()->InsertLast(shader);
+}
 
-CTrack* BaseList2D::GetFirstTrack() const { return tracks_ ? NodeCast<CTrack>(tracks_->GetFirst()) : nullptr; }
+CTrack* BaseList2D::GetFirstTrack() const
+{
+  return GetTrackRoot() ? NodeCast<CTrack>(GetTrackRoot()->GetFirst()) : nullptr;
+}
 
-Bool BaseList2D::InsertTrackLast(CTrack* track) { return NeedRoot(tracks_) && tracks_->InsertLast(track); }
+Bool BaseList2D::InsertTrackLast(CTrack* track)
+{
+  return NeedRoot(&Extras::tracks) && GetTrackRoot()->InsertLast(track);
+}
 
 CTrack* BaseList2D::FindTrack(const ParameterPath& path) const
 {
@@ -374,14 +419,21 @@ void BaseList4D::InsertAfter(BaseList4D* reference)
     reference->listHead_->InsertAfter(this, reference);
 }
 
+RootList2D* BaseList4D::GetChildRoot()
+{
+  if (!children_ && (children_ = AllocChildRoot()))
+    children_->SetOwner(this);
+  return children_;
+}
+
 Bool BaseList4D::InsertUnder(BaseList4D* parent)
 {
-  return parent && parent->children_ && parent->children_->InsertFirst(this);
+  return parent && parent->GetChildRoot() && parent->children_->InsertFirst(this);
 }
 
 Bool BaseList4D::InsertUnderLast(BaseList4D* parent)
 {
-  return parent && parent->children_ && parent->children_->InsertLast(this);
+  return parent && parent->GetChildRoot() && parent->children_->InsertLast(this);
 }
 
 } // namespace _torvane_

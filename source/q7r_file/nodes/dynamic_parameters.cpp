@@ -136,17 +136,19 @@ BaseContainer MakeDynamicSettings(Long type, const String& name)
 // The container, made if there is none; null when memory is short.
 BaseContainer* BaseList2D::NeedDynamicParameters()
 {
-  if (!dynamicParameters_)
-    dynamicParameters_ = NewObj<BaseContainer>();
-  return dynamicParameters_;
+  Extras* extras = NeedExtras();
+  if (extras && !extras->dynamicParameters)
+    extras->dynamicParameters = NewObj<BaseContainer>();
+  return extras ? extras->dynamicParameters : nullptr;
 }
 
 ParameterPath BaseList2D::AddDynamicParameter(const BaseContainer& settings)
 {
+  BaseContainer* parameters = NeedDynamicParameters();
   Long key = 1;
-  while (dynamicParameters_ && dynamicParameters_->FindIndex(key) >= 0)
+  while (parameters && parameters->FindIndex(key) >= 0)
     ++key;
-  if (!NeedDynamicParameters() || !dynamicParameters_->InsertData(key, GeData(settings)))
+  if (!parameters || !parameters->InsertData(key, GeData(settings)))
     return {};
   return {ParameterLevel{kDynamicParameters, kDataGroup, 0}, ParameterLevel{key, settings.GetId(), 0}};
 }
@@ -154,20 +156,20 @@ ParameterPath BaseList2D::AddDynamicParameter(const BaseContainer& settings)
 Bool BaseList2D::RemoveDynamicParameter(const ParameterPath& path)
 {
   Long key = KeyOf(path);
-  return key != 0 && dynamicParameters_ && dynamicParameters_->RemoveData(key);
+  return key != 0 && Extra().dynamicParameters && Extra().dynamicParameters->RemoveData(key);
 }
 
 const BaseContainer* BaseList2D::FindDynamicParameter(const ParameterPath& path) const
 {
   Long key = KeyOf(path);
-  return key != 0 && dynamicParameters_ ? dynamicParameters_->GetContainerInstance(key) : nullptr;
+  return key != 0 && Extra().dynamicParameters ? Extra().dynamicParameters->GetContainerInstance(key) : nullptr;
 }
 
 Bool BaseList2D::SetDynamicParameter(const ParameterPath& path, const BaseContainer& settings)
 {
   Long key = KeyOf(path);
-  return key != 0 && dynamicParameters_ && dynamicParameters_->FindIndex(key) >= 0 &&
-         dynamicParameters_->SetData(key, GeData(settings));
+  BaseContainer* parameters = Extra().dynamicParameters;
+  return key != 0 && parameters && parameters->FindIndex(key) >= 0 && parameters->SetData(key, GeData(settings));
 }
 
 } // namespace _torvane_

@@ -25,9 +25,14 @@ KeptChunks::Chunk* KeptChunks::Append(Long id)
   return chunk;
 }
 
+Bool KeptChunks::Keeps(const HyperFile& file, Long id)
+{
+  return !IsLibraryChunk(id) && file.GetFileVersion() >= kVersionCurrent;
+}
+
 Bool KeptChunks::Read(HyperFile& file, Long id, Long level)
 {
-  if (IsLibraryChunk(id) || file.GetFileVersion() < kVersionCurrent)
+  if (!Keeps(file, id))
     return false;
   Chunk* chunk = Append(id);
   if (!chunk) {

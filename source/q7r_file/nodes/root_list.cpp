@@ -94,8 +94,8 @@ void RootList2D::RemoveMember(BaseList2D* node)
 void RootList2D::FreeAll()
 {
   while (BaseList2D* member = GetFirst()) {
-    auto* parent = NodeCast<BaseList4D>(member);
-    RootList2D* children = parent ? parent->GetChildRoot() : nullptr;
+    const auto* parent = NodeCast<BaseList4D>(static_cast<const BaseList2D*>(member));
+    const RootList2D* children = parent ? parent->GetChildRoot() : nullptr;
     while (BaseList2D* child = children ? children->GetFirst() : nullptr) {
       child->Remove();
       child->SetListHead(nullptr);
@@ -218,7 +218,7 @@ Bool RootTag::ReadChunk(HyperFile& file, Long id, Long level)
   return ReadMember(file, tag, false);
 }
 
-void RootTag::OnEnter(BaseList2D& tag) { NodeCast<BaseTag>(&tag)->SetObject(tagOwner_); }
+void RootTag::OnEnter(BaseList2D& tag) { NodeCast<BaseTag>(&tag)->SetObject(NodeCast<BaseObject>(GetOwner())); }
 
 Bool RootMaterial::ReadChunk(HyperFile& file, Long id, Long level)
 {

@@ -18,13 +18,7 @@ constexpr Real kMirroredBelow = -0.9;
 
 } // namespace
 
-BaseObject::BaseObject(Long type) : BaseList4D(type), tags_(this)
-{
-  tags_.SetOwner(this);
-  children_ = AllocRootObject();
-  if (children_)
-    children_->SetOwner(this);
-}
+BaseObject::BaseObject(Long type) : BaseList4D(type) { tags_.SetOwner(this); }
 
 BaseObject::~BaseObject()
 {
@@ -217,7 +211,7 @@ Bool BaseObject::ReadTransform(HyperFile& file, Long level)
   ReadChunkBody(file, level, [this](ChunkReader& v) { return VisitTransform(v); });
   const Bool hasOrder = file.GetFileVersion() >= kVersionTransform && level >= 8;
   const Long order = hasOrder ? rotationOrder_ : kRotationOrderScene;
-  rotationMatrix_ = AnglesToMatrix(relRot_, order);
+  turnedIn_ = order;
   if (HasFrozenTransform()) {
     frozen_->matrix = AnglesToMatrix(frozen_->rot, order);
     frozen_->inverse = Invert(frozen_->matrix);
@@ -229,15 +223,7 @@ Bool BaseObject::ReadTransform(HyperFile& file, Long level)
   return true;
 }
 
-Bool BaseObject::ReadChildren(HyperFile& file)
-{
-  if (!children_)
-    children_ = AllocRootObject();
-  if (!children_)
-    return true;
-  children_->SetOwner(this);
-  return children_->ReadChunks(file, false);
-}
+RootList2D* BaseObject::AllocChildRoot() const { return AllocRootObject(); }
 
 Bool BaseObject::ReadObjectData(HyperFile& file, Long id, Long level)
 {
@@ -258,7 +244,7 @@ Bool BaseObject::ReadChunk(HyperFile& file, Long id, Long level)
     return true;
   switch (id) {
   case kChunkList:
-    return ReadChildren(file);
+    return !GetChildRoot() || children_->ReadChunks(file, false);
   case kChunkTags:
     return tags_.ReadChunks(file, false);
   case kChunkTransform:
@@ -365,7 +351,7 @@ Bool BaseObject::CopyTransform(BaseObject& destination) const
   destination.editorMode_ = editorMode_;
   destination.renderMode_ = renderMode_;
   destination.disabled_ = disabled_;
-  destination.rotationMatrix_ = rotationMatrix_;
+  destination.turnedIn_ = turnedIn_;
   destination.relPos_ = relPos_;
   destination.relRot_ = relRot_;
   destination.relScale_ = relScale_;
@@ -413,7 +399,9 @@ Bool BaseObject::CloneChildren(BaseObject& destination, ULong flags, TransArray*
     }
     last = clone;
   }
-  return !children_ || !destination.children_ || children_->CopyKeptChunks(*destination.children_);
+  if (!children_ || !(children_->HasContent() || destination.children_))
+    return true;
+  return destination.GetChildRoot() && children_->CopyKeptChunks(*destination.children_);
 }
 
 BaseObject* BaseObject::MakeEmpty() const

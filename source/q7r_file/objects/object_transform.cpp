@@ -66,7 +66,7 @@ Vector BaseObject::DerivedAbsScale() const { return MultiplyEach(relScale_, Froz
 
 Vector BaseObject::DerivedAbsRot() const
 {
-  return NearestAngles(relRot_, Multiply(Frozen().matrix, rotationMatrix_), rotationOrder_);
+  return NearestAngles(relRot_, Multiply(Frozen().matrix, GetRelRotation()), rotationOrder_);
 }
 
 // Without a frozen part they are the same anyway.
@@ -79,10 +79,16 @@ void BaseObject::TakeRelAsAbs()
   frozen_->absScale = relScale_;
 }
 
+// What the relative angles stand for. It isn't kept: most objects of a file are never asked for it.
+Matrix BaseObject::GetRelRotation() const
+{
+  return turnedIn_ == kNotTurned ? Matrix() : AnglesToMatrix(relRot_, turnedIn_);
+}
+
 // The rotation from the object to its parent, frozen part included, without scale and offset.
 Matrix BaseObject::GetRotation() const
 {
-  return (frozenFlags_ & kFrozenRot) ? Multiply(Frozen().matrix, rotationMatrix_) : rotationMatrix_;
+  return (frozenFlags_ & kFrozenRot) ? Multiply(Frozen().matrix, GetRelRotation()) : GetRelRotation();
 }
 
 Matrix BaseObject::GetLocalMatrix() const
@@ -132,7 +138,7 @@ Matrix BaseObject::GetRelativeMatrix() const
 
 Matrix BaseObject::GetRelativeNormalizedMatrix() const
 {
-  Matrix matrix = rotationMatrix_;
+  Matrix matrix = GetRelRotation();
   matrix.off = relPos_;
   return matrix;
 }
@@ -169,7 +175,7 @@ void BaseObject::SetRelRot(const Vector& value)
   if (value == relRot_ || IsProtected())
     return;
   relRot_ = value;
-  rotationMatrix_ = AnglesToMatrix(relRot_, rotationOrder_);
+  turnedIn_ = rotationOrder_;
   if (frozen_)
     frozen_->absRot = (frozenFlags_ & kFrozenRot) ? DerivedAbsRot() : relRot_;
 }
@@ -251,9 +257,8 @@ void BaseObject::SetRotationOrder(Long order)
 {
   if (order == rotationOrder_ || IsProtected())
     return;
-  rotationOrder_ = order;
-  relRot_ = MatrixToAngles(rotationMatrix_, order);
-  rotationMatrix_ = AnglesToMatrix(relRot_, order);
+  relRot_ = MatrixToAngles(GetRelRotation(), order);
+  rotationOrder_ = turnedIn_ = order;
   if (frozen_)
     frozen_->absRot = (frozenFlags_ & kFrozenRot) ? DerivedAbsRot() : relRot_;
 }
@@ -280,7 +285,7 @@ void BaseObject::SetRelativeMatrix(const Matrix& matrix)
   relPos_ = matrix.off;
   relRot_ = angles;
   relScale_ = scale;
-  rotationMatrix_ = relScale_ != Vector() ? AnglesToMatrix(relRot_, rotationOrder_) : Matrix();
+  turnedIn_ = relScale_ != Vector() ? rotationOrder_ : kNotTurned;
   TakeRelAsAbs();
   if (HasFrozenTransform()) {
     frozen_->absPos = DerivedAbsPos();

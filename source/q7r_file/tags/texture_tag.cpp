@@ -104,20 +104,22 @@ Real QuotientOrOne(Real a, Real b) { return b != 0.0 ? a / b : 1.0; }
 
 TextureTag::TextureTag() : BaseTag(kTagTexture) { data_.SetDefaults(DefaultsOf<kTextureDefaults>()); }
 
+TextureTag::~TextureTag() { DeleteObj(textureMatrix_); }
+
 Bool TextureTag::CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation)
 {
   auto* target = NodeCast<TextureTag>(&destination);
   if (!target)
     return false;
   target->matrixValid_ = false;
-  target->textureMatrix_ = Matrix();
   return BaseTag::CopyTo(destination, flags, translation);
 }
 
 Bool TextureTag::CopyTextureCache(TextureTag& destination, ULong, TransArray*)
 {
-  destination.matrixValid_ = matrixValid_;
-  destination.textureMatrix_ = textureMatrix_;
+  destination.matrixValid_ = matrixValid_ && destination.NeedMatrix();
+  if (destination.matrixValid_)
+    *destination.textureMatrix_ = *textureMatrix_;
   return true;
 }
 
@@ -186,19 +188,31 @@ void TextureTag::SetPlace(Long id, const Vector& value)
   matrixValid_ = false;
 }
 
+// Made if there is none; null when memory is short.
+Matrix* TextureTag::NeedMatrix()
+{
+  if (!textureMatrix_)
+    textureMatrix_ = NewObj<Matrix>();
+  return textureMatrix_;
+}
+
 const Matrix& TextureTag::TextureMatrix()
 {
+  static constexpr Matrix kNone;
+  if (!NeedMatrix())
+    return kNone;
   if (matrixValid_)
-    return textureMatrix_;
+    return *textureMatrix_;
   const Vector rotation = Rotation();
   const Vector size = Size();
-  textureMatrix_ = AnglesToMatrix(rotation, kRotationOrderScene);
-  textureMatrix_.v1 *= size.x;
-  textureMatrix_.v2 *= size.y;
-  textureMatrix_.v3 *= size.z;
-  textureMatrix_.off = Position();
+  Matrix& matrix = *textureMatrix_;
+  matrix = AnglesToMatrix(rotation, kRotationOrderScene);
+  matrix.v1 *= size.x;
+  matrix.v2 *= size.y;
+  matrix.v3 *= size.z;
+  matrix.off = Position();
   matrixValid_ = true;
-  return textureMatrix_;
+  return matrix;
 }
 
 void TextureTag::SetTextureMatrix(const Matrix& matrix)
