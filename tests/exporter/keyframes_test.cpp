@@ -65,13 +65,8 @@ TEST(Keyframes, CountFromCompositionTimeZero)
 
 TEST(Keyframes, AreThinnedByTheValuesBesideThem)
 {
-  struct Case
-  {
-    const char* what;
-    const char* percent; // the samples; six frames are read
-    const char* keys;
-  };
-  const Case cases[] = {
+  // percent: the samples; six frames are read
+  const std::tuple<const char*, const char*, const char*> cases[] = {
       {"a constant is no track", "50,50,50,50,50,50", "-"},
       {"a step keeps its two sides", "0,0,0,100,100,100", "0:0 0.08:0 0.12:1 0.2:1"},
       {"a pulse", "0,0,100,0,0,0", "0:0 0.04:0 0.08:1 0.12:0 0.2:0"},
@@ -83,10 +78,10 @@ TEST(Keyframes, AreThinnedByTheValuesBesideThem)
       {"ends that differ by next to nothing stay", "0,0,0,0,0,0.0000000001", "0:0 0.2:1e-12"},
       {"equal ends with something between stay", "0,0,0,100,0,0", "0:0 0.08:0 0.12:1 0.16:0 0.2:0"},
   };
-  for (const Case& c : cases) {
-    Exported exported(Composition(Layer(14, "L", "", R"("light":{"intensity":)" + Samples(c.percent) + "}"),
+  for (const auto& [what, percent, keys] : cases) {
+    Exported exported(Composition(Layer(14, "L", "", R"("light":{"intensity":)" + Samples(percent) + "}"),
                                   R"("ae":{"workArea":[0,5]})"));
-    EXPECT_EQ(Keys(exported.Object("L"), kIntensity), c.keys) << c.what;
+    EXPECT_EQ(Keys(exported.Object("L"), kIntensity), keys) << what;
   }
 }
 

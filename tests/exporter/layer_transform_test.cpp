@@ -21,13 +21,8 @@ std::string Child(const std::string& more) { return Solid("C", R"("p":{"k":[10,2
 
 TEST(LayerPlace, IsCountedFromTheCentreOfParentsThatHaveASize)
 {
-  struct Case
-  {
-    const char* what;
-    std::string parent;
-    Vector shift; // at top level and within a composition of 300 by 200 pixels alike
-  };
-  const Case cases[] = {
+  // shift: at top level and within a composition of 300 by 200 pixels alike
+  const std::tuple<const char*, std::string, Vector> cases[] = {
       {"a solid", Layer(1, "P", "", R"("ind":9,"sw":200,"sh":100,"sc":"#fff")"), {-100, 50, 0}},
       {"footage", Layer(2, "P", "", R"("ind":9,"refId":"still")"), {-4, 3, 0}},
       {"a null", Layer(3, "P", "", R"("ind":9)"), {-50, 50, 0}},
@@ -38,14 +33,14 @@ TEST(LayerPlace, IsCountedFromTheCentreOfParentsThatHaveASize)
       {"a 2D solid", R"({"ty":1,"nm":"P","ind":9,"sw":200,"sh":100,"sc":"#fff","ks":{}})", {}},
   };
   const std::string assets = R"({"id":"still","p":"a.png","w":8,"h":6},{"id":"deep","w":40,"h":20,"layers":[]})";
-  for (const Case& c : cases) {
-    const std::string layers = Child(R"("parent":9)") + "," + c.parent;
+  for (const auto& [what, parent, shift] : cases) {
+    const std::string layers = Child(R"("parent":9)") + "," + parent;
     Exported top(Composition(layers, R"("assets":[)" + assets + "]"));
-    ExpectNear(top.Object("C").GetRelPos(), Vector(10, -20, 30) + c.shift, c.what);
+    ExpectNear(top.Object("C").GetRelPos(), Vector(10, -20, 30) + shift, what);
     Exported nested(
         Composition(Layer(0, "N", "", R"("refId":"in")"),
                     R"("assets":[)" + assets + R"(,{"id":"in","w":300,"h":200,"layers":[)" + layers + "]}]"));
-    ExpectNear(nested.Object("C").GetRelPos(), Vector(10, -20, 30) + c.shift, std::string("nested: ") + c.what);
+    ExpectNear(nested.Object("C").GetRelPos(), Vector(10, -20, 30) + shift, std::string("nested: ") + what);
   }
   Exported alone(Composition(Layer(0, "N", "", R"("refId":"in")"),
                              R"("assets":[{"id":"in","w":300,"h":200,"layers":[)" + Child("") + "]}]"));
@@ -54,16 +49,9 @@ TEST(LayerPlace, IsCountedFromTheCentreOfParentsThatHaveASize)
 
 TEST(LayerPlace, KeysMoveWithAnchorScaleAndParent)
 {
-  struct Case
-  {
-    const char* what;
-    std::string ks;
-    const char* tracks;
-    const char* x; // the first two keys of the position
-    const char* scale;
-  };
+  // x: the first two keys of the position
   const std::string p = R"("p":{"k":[10,20,30]},)";
-  const Case cases[] = {
+  const std::tuple<const char*, std::string, const char*, const char*, const char*> cases[] = {
       // The offset of the centre is (50 - anchor) * scale; the parent of 200 by 100 pixels takes 100 off.
       {"the anchor", p + R"("a":)" + Ramp("[0,25,0]", "[100,25,0]"), "Position X:11", "0:-40 0.04:-50", "-"},
       {"the scale", p + R"("s":)" + Ramp("[100,100,100]", "[0,100,100]"), "Position X:11 Position X:11",
@@ -72,13 +60,13 @@ TEST(LayerPlace, KeysMoveWithAnchorScaleAndParent)
        "Position X:11", "0:-75 0.04:-74", "-"},
       {"the scale with one key", p + R"("s":{"k":[{"t":0,"s":[50,50,50]}]})", "", "-", "-"},
   };
-  for (const Case& c : cases) {
-    Exported exported(Composition(Solid("C", c.ks, R"("parent":9)") + "," +
+  for (const auto& [what, ks, tracks, x, scale] : cases) {
+    Exported exported(Composition(Solid("C", ks, R"("parent":9)") + "," +
                                   Layer(1, "P", "", R"("ind":9,"sw":200,"sh":100,"sc":"#fff")")));
     const BaseObject& object = exported.Object("C");
-    EXPECT_EQ(Tracks(object), c.tracks) << c.what;
-    EXPECT_EQ(Keys(object, kPosition, 0).substr(0, std::string(c.x).size()), c.x) << c.what;
-    EXPECT_EQ(Keys(object, kScale, 0).substr(0, std::string(c.scale).size()), c.scale) << c.what;
+    EXPECT_EQ(Tracks(object), tracks) << what;
+    EXPECT_EQ(Keys(object, kPosition, 0).substr(0, std::string(x).size()), x) << what;
+    EXPECT_EQ(Keys(object, kScale, 0).substr(0, std::string(scale).size()), scale) << what;
   }
 }
 

@@ -143,21 +143,20 @@ TEST_F(GltfViews, LightsShineAsBrightAsInTheScene)
 
 TEST_F(GltfViews, ConesStayInTheirRange)
 {
-  struct Case
-  {
-    double inner, outer, inside, outside;
-  };
-  for (const Case& c : {Case{1, 2, 0.5, 1}, Case{2, 2, 0.999, 1}, Case{0, 0, 0, 0.001}, Case{-1, 4, 0, kPi / 2},
-                        Case{kPi, kPi, 0.999 * kPi / 2, kPi / 2}}) {
+  for (const auto& [inner, outer, inside, outside] : {std::tuple<double, double, double, double>{1, 2, 0.5, 1},
+                                                      {2, 2, 0.999, 1},
+                                                      {0, 0, 0, 0.001},
+                                                      {-1, 4, 0, kPi / 2},
+                                                      {kPi, kPi, 0.999 * kPi / 2, kPi / 2}}) {
     document = NewDocument();
     BaseObject* light = AllocObject(kObjectLight);
     document->InsertObject(light);
     light->SetParameterById(kLightType, Long{1});
-    light->SetParameterById(kLightInnerAngle, c.inner);
-    light->SetParameterById(kLightOuterAngle, c.outer);
+    light->SetParameterById(kLightInnerAngle, inner);
+    light->SetParameterById(kLightOuterAngle, outer);
     const Converted scene = Convert();
     const Json& spot = scene.json["extensions"]["KHR_lights_punctual"]["lights"][0]["spot"];
-    ExpectNear({spot["innerConeAngle"], spot["outerConeAngle"]}, {c.inside, c.outside});
+    ExpectNear({spot["innerConeAngle"], spot["outerConeAngle"]}, {inside, outside});
   }
 }
 

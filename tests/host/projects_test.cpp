@@ -252,13 +252,7 @@ TEST(ProjectProperties, HaveUnitsAndDefaults)
   const host::Project read = Read(comp, {kSolid});
   ASSERT_EQ(1U, read.warnings.size()); // an untouched light among oblong pixels
   const Stage stage(Read(comp, {kSolid}));
-  struct Case
-  {
-    A_long layer;
-    AEGP_LayerStream stream;
-    Value expected;
-  };
-  const Case cases[] = {
+  const std::tuple<A_long, AEGP_LayerStream, Value> cases[] = {
       {0, AEGP_LayerStream_ZOOM, {kZoom}},
       {0, AEGP_LayerStream_FOCUS_DISTANCE, {kZoom}},
       {0, AEGP_LayerStream_POSITION, {1000, 500, -kZoom}},
@@ -283,9 +277,9 @@ TEST(ProjectProperties, HaveUnitsAndDefaults)
       {6, AEGP_LayerStream_SHADOW_DARKNESS, {140}},
       {6, AEGP_LayerStream_CASTS_SHADOWS, {1}},
   };
-  for (const Case& c : cases) {
-    SCOPED_TRACE(std::to_string(c.layer) + ", stream " + std::to_string(c.stream));
-    ExpectNear(c.expected, At(stage, c.stream, 0, c.layer));
+  for (const auto& [layer, stream, expected] : cases) {
+    SCOPED_TRACE(std::to_string(layer) + ", stream " + std::to_string(stream));
+    ExpectNear(expected, At(stage, stream, 0, layer));
   }
 }
 
@@ -304,17 +298,12 @@ double Curve(double ox, double oy, double ix, double iy, double u, double end = 
 TEST(ProjectKeyframes, EaseEachComponentByItsOwnSpeed)
 {
   constexpr double kNan = std::numeric_limits<double>::quiet_NaN();
-  struct Case
-  {
-    const char* name;
-    std::string from, to; // 2 seconds apart
-    double atHalf;        // at a quarter of the way in time
-  };
+  // to: 2 seconds apart; atHalf: at a quarter of the way in time
   const auto key = [](std::int64_t t, Way in, Way out, double value, const Ease& ease) {
     return PlainKey(t, in, out, {value}, {ease});
   };
   constexpr std::int64_t kEnd = 51200;
-  const Case cases[] = {
+  const std::tuple<const char*, std::string, std::string, double> cases[] = {
       {"linear, with rubbish in its slots", key(0, kLinear, kLinear, 10, {kNan, kNan, kNan, kNan}),
        key(kEnd, kLinear, kLinear, 50, {kNan, kNan, kNan, kNan}), 20},
       {"hold", key(0, kLinear, kHold, 10, {}), key(kEnd, kBezier, kLinear, 50, {5, 0.5, 0, 0}), 10},
@@ -330,14 +319,14 @@ TEST(ProjectKeyframes, EaseEachComponentByItsOwnSpeed)
        10 + Curve(0.5, 30 * 0.5 * 2, 0.75, 20 * 0.25 * 2, 0.25, 0)},
       {"nothing", key(0, kLinear, kBezier, 10, {0, 0, 0, 0.5}), key(kEnd, kBezier, kLinear, 10, {0, 0.25, 0, 0}), 10},
   };
-  for (const Case& c : cases) {
-    SCOPED_TRACE(c.name);
-    const Comp comp = WithProperty("ADBE Rotate Z", Body({.keys = {c.from, c.to}}));
-    ExpectNear({c.atHalf}, ValueOf(comp, AEGP_LayerStream_ROTATE_Z, 12.5));
+  for (const auto& [name, from, to, atHalf] : cases) {
+    SCOPED_TRACE(name);
+    const Comp comp = WithProperty("ADBE Rotate Z", Body({.keys = {from, to}}));
+    ExpectNear({atHalf}, ValueOf(comp, AEGP_LayerStream_ROTATE_Z, 12.5));
     // Reversed, from 4 s back to 2 s, the same values come the other way round.
     Layer reversed{.stretch = {-1, 1}, .start = {4, 1}};
-    const Comp back = WithProperty("ADBE Rotate Z", Body({.keys = {c.from, c.to}}), reversed);
-    ExpectNear({c.atHalf}, ValueOf(back, AEGP_LayerStream_ROTATE_Z, 100 - 12.5));
+    const Comp back = WithProperty("ADBE Rotate Z", Body({.keys = {from, to}}), reversed);
+    ExpectNear({atHalf}, ValueOf(back, AEGP_LayerStream_ROTATE_Z, 100 - 12.5));
   }
   // Components of a scale, each with its own; speeds are in stored units. The depth of a flat layer stands.
   const std::vector<std::string> keys = {

@@ -1,15 +1,4 @@
-#include <algorithm>
-#include <cstring>
-#include <random>
-#include <tuple>
-#include <vector>
-
-#include <gtest/gtest.h>
-
-#include "support/counting_memory.h"
-#include "torvane/memory/private_ge_mtools.h"
-
-using namespace _torvane_;
+#include "support/library.h"
 
 namespace
 {

@@ -1,18 +1,4 @@
-#include "torvane/values/base_container.h"
-
-#include <bit>
-#include <cmath>
-#include <limits>
-
-#include <gtest/gtest.h>
-
-#include "support/assertion_counter.h"
-#include "support/byte_writer.h"
-#include "support/counting_memory.h"
-#include "support/every_failed_allocation.h"
-#include "support/memory_file.h"
-
-using namespace _torvane_;
+#include "support/library.h"
 
 namespace
 {

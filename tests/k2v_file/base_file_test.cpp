@@ -1,12 +1,4 @@
-#include "torvane/bytes/base_file.h"
-
-#include <cmath>
-#include <functional>
-#include <limits>
-#include <memory>
-#include <set>
-
-#include <gtest/gtest.h>
+#include "support/library.h"
 
 #ifndef _WIN32
 #include <fcntl.h>
@@ -14,17 +6,8 @@
 #include <unistd.h>
 #endif
 
-#include "support/assertion_counter.h"
-#include "support/byte_writer.h"
-#include "support/counting_memory.h"
-#include "support/temp_folder.h"
-#include "torvane/bytes/file_stream.h"
-
 namespace
 {
-
-using namespace _torvane_;
-using Bytes = std::vector<UChar>;
 
 Bytes RandomBytes(std::size_t size, unsigned seed)
 {
@@ -318,14 +301,12 @@ TEST_F(BaseFileTest, ModesDecideWhatMayBeDone)
     Bool opensMissing, reads, writes;
     Long modeKept;
     const char* afterwards; // the content "abc" after an "X" was written where that works
-  } kCases[] = {
-      {kFileReadWriteAtEnd, true, false, true, 0, "abcX"},
-      {kFileRead, false, true, false, 1, "abc"},
-      {kFileWrite, true, false, true, 2, "X"},
-      {kFileReadWrite, true, true, true, 3, "Xbc"},
-      {kFileReadAlias, false, true, false, 1, "abc"},
-      {kFileReadShared, false, true, false, 1, "abc"},
-  };
+  } kCases[] = {{kFileReadWriteAtEnd, true, false, true, 0, "abcX"},
+                {kFileRead, false, true, false, 1, "abc"},
+                {kFileWrite, true, false, true, 2, "X"},
+                {kFileReadWrite, true, true, true, 3, "Xbc"},
+                {kFileReadAlias, false, true, false, 1, "abc"},
+                {kFileReadShared, false, true, false, 1, "abc"}};
   for (const auto& rule : kCases) {
     SCOPED_TRACE(rule.mode);
     BaseFile file;
@@ -389,9 +370,8 @@ TEST_F(BaseFileTest, WhatCannotBeOpenedIsAnOpenFailure)
   const LLong before = counting_memory::Get().bytes;
   EXPECT_TRUE(file.Open(name, kFileRead));
   EXPECT_LT(counting_memory::Get().bytes - before, 1000) << "a short file takes a short buffer";
-  counting_memory::FailAfter(1); // the copy of the name has its memory
-  EXPECT_FALSE(file.Open(name, kFileRead));
-  counting_memory::FailNever();
+  EXPECT_FALSE(counting_memory::WithoutMemory([&] { return file.Open(name, kFileRead); },
+                                              1)); // the copy of the name has its memory
   EXPECT_EQ(file.GetError(), FILEERROR_MEMORY);
 }
 
@@ -510,9 +490,8 @@ TEST_F(BaseFileTest, AMemoryTargetGrowsByDoubledBlocksAndLosesThemWithAnError)
   EXPECT_EQ(name.GetMemory(), 0);
 
   ASSERT_TRUE(file.Open(name, kFileWrite));
-  counting_memory::FailAfter(2); // the table and the first block
-  EXPECT_FALSE(file.WriteBytes(bytes.data(), 60000));
-  counting_memory::FailNever();
+  EXPECT_FALSE(counting_memory::WithoutMemory([&] { return file.WriteBytes(bytes.data(), 60000); },
+                                              2)); // the table and the first block
   EXPECT_EQ(file.GetError(), FILEERROR_MEMORY);
   EXPECT_EQ(name.GetMemory(), 0);
 }

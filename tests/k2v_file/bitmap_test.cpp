@@ -1,20 +1,6 @@
-#include "torvane/pictures/bitmap.h"
-
-#include <array>
-#include <tuple>
-
-#include <gtest/gtest.h>
-
-#include "k2v_file/hyper_file_bytes.h"
 #include "source/k2v_file/pictures/bmp_run_decoder.h"
-#include "support/assertion_counter.h"
-#include "support/counting_memory.h"
+#include "support/library.h"
 #include "support/pictures.h"
-#include "support/temp_folder.h"
-#include "torvane/values/base_container.h"
-
-using namespace _torvane_;
-using namespace hyper_file_bytes;
 
 namespace
 {

@@ -1,13 +1,5 @@
 #include "source/k2v_file/stream/chunk_visitor.h"
-
-#include <gtest/gtest.h>
-
-#include "k2v_file/hyper_file_bytes.h"
-#include "support/assertion_counter.h"
-#include "support/counting_memory.h"
-
-using namespace _torvane_;
-using namespace hyper_file_bytes;
+#include "support/library.h"
 
 namespace
 {

@@ -1,8 +1,4 @@
-#include <gtest/gtest.h>
-
-#include "torvane/math/crc.h"
-
-using namespace _torvane_;
+#include "support/library.h"
 
 namespace
 {

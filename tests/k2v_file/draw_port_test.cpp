@@ -1,16 +1,4 @@
-#include "torvane/pictures/draw_port.h"
-
-#include <memory>
-
-#include <gtest/gtest.h>
-
-#include "k2v_file/hyper_file_bytes.h"
-#include "support/assertion_counter.h"
-#include "support/counting_memory.h"
-#include "torvane/pictures/bitmap.h"
-
-using namespace _torvane_;
-using hyper_file_bytes::Bytes;
+#include "support/library.h"
 
 namespace
 {
@@ -35,23 +23,17 @@ class BitlessPort : public DrawPort_GREY8
 
 TEST(DrawPorts, FillRowsUpToFourBytes)
 {
-  struct Case
-  {
-    Long depth, width, height, bits;
-    LLong rowSize;
-    Long gotWidth, gotHeight;
-  };
-  const Case cases[] = {{kDepthColor, 3, 2, 24, 12, 3, 2}, {kDepthColor, 4, 1, 24, 12, 4, 1},
-                        {kDepthGrey, 5, 3, 8, 8, 5, 3},    {kDepthGrey, 8, 1, 8, 8, 8, 1},
-                        {kDepthColor, 0, -7, 24, 4, 1, 1}, {kDepthGrey, 1, 0, 8, 4, 1, 1}};
-  for (const Case& c : cases) {
-    const PortPtr port = NewPort(c.depth, c.width, c.height);
-    EXPECT_EQ(c.bits, port->GetBits());
-    EXPECT_EQ(c.depth, port->GetDepth());
-    EXPECT_EQ(c.rowSize, port->GetRowSize());
-    EXPECT_EQ(c.gotWidth, port->GetWidth());
-    EXPECT_EQ(c.gotHeight, port->GetHeight());
-    const Bytes pixels(port->GetPixels(), port->GetPixels() + c.rowSize * c.gotHeight);
+  const std::tuple<Long, Long, Long, Long, LLong, Long, Long> cases[] = {
+      {kDepthColor, 3, 2, 24, 12, 3, 2}, {kDepthColor, 4, 1, 24, 12, 4, 1}, {kDepthGrey, 5, 3, 8, 8, 5, 3},
+      {kDepthGrey, 8, 1, 8, 8, 8, 1},    {kDepthColor, 0, -7, 24, 4, 1, 1}, {kDepthGrey, 1, 0, 8, 4, 1, 1}};
+  for (const auto& [depth, width, height, bits, rowSize, gotWidth, gotHeight] : cases) {
+    const PortPtr port = NewPort(depth, width, height);
+    EXPECT_EQ(bits, port->GetBits());
+    EXPECT_EQ(depth, port->GetDepth());
+    EXPECT_EQ(rowSize, port->GetRowSize());
+    EXPECT_EQ(gotWidth, port->GetWidth());
+    EXPECT_EQ(gotHeight, port->GetHeight());
+    const Bytes pixels(port->GetPixels(), port->GetPixels() + rowSize * gotHeight);
     EXPECT_EQ(Bytes(pixels.size(), 0), pixels);
   }
   for (Long depth : {0, 1, 3, 5, 24})

@@ -1,15 +1,4 @@
-#include <functional>
-#include <string>
-#include <utility>
-#include <vector>
-
-#include <gtest/gtest.h>
-
-#include "support/counting_memory.h"
-#include "support/text.h"
-#include "torvane/text/filename.h"
-
-using namespace _torvane_;
+#include "support/library.h"
 
 namespace
 {
@@ -73,15 +62,13 @@ TEST(Filename, CutsAndComparesSuffixes)
   {
     const char *path, *clear, *complete, *set;
   };
-  const Row rows[] = {
-      {"a.txt", "a", "a", "a.q7r"},
-      {"a.sixsix", "a", "a", "a.q7r"},
-      {"a.seven77", "a.seven77", "a", "a.seven77.q7r"},
-      {"a.b/c", "a.b/c", "a.b/c", "a.b/c.q7r"},
-      {"a.b.c", "a.b", "a.b", "a.b.q7r"},
-      {".c", "", "", ".q7r"},
-      {"", "", "", ".q7r"},
-  };
+  const Row rows[] = {{"a.txt", "a", "a", "a.q7r"},
+                      {"a.sixsix", "a", "a", "a.q7r"},
+                      {"a.seven77", "a.seven77", "a", "a.seven77.q7r"},
+                      {"a.b/c", "a.b/c", "a.b/c", "a.b/c.q7r"},
+                      {"a.b.c", "a.b", "a.b", "a.b.q7r"},
+                      {".c", "", "", ".q7r"},
+                      {"", "", "", ".q7r"}};
   for (const Row& row : rows) {
     Filename clear = Path(row.path);
     Filename complete = clear;
@@ -173,9 +160,7 @@ TEST(Filename, LeavesWrittenBlocksToTheDescription)
   ASSERT_EQ(reader.GetMemory(), 3);
   const void* data = nullptr;
   LLong size = 0;
-  counting_memory::FailAfter(0);
-  EXPECT_FALSE(reader.GetMemoryContinuous(data, size));
-  counting_memory::FailNever();
+  EXPECT_FALSE(counting_memory::WithoutMemory([&] { return reader.GetMemoryContinuous(data, size); }));
   EXPECT_EQ(reader.GetMemory(), 3);
   ASSERT_TRUE(reader.GetMemoryContinuous(data, size));
   const UChar* joined = static_cast<const UChar*>(data);
@@ -225,9 +210,7 @@ TEST(MemoryBlockWriter, KeepsWhatFittedWhenMemoryRunsOut)
   for (LLong allowed = 0; allowed < 3; ++allowed) { // the table, the first block, the second block
     MemoryBlockWriter writer;
     std::vector<UChar> bytes(60000, 2);
-    counting_memory::FailAfter(allowed);
-    EXPECT_FALSE(writer.Write(bytes.data(), 60000));
-    counting_memory::FailNever();
+    EXPECT_FALSE(counting_memory::WithoutMemory([&] { return writer.Write(bytes.data(), 60000); }, allowed));
     EXPECT_EQ(writer.GetSize(), allowed < 2 ? 0 : 50000);
     EXPECT_FALSE(writer.Write(bytes.data(), -1));
     EXPECT_TRUE(writer.Write(nullptr, 0));

@@ -1,18 +1,5 @@
 // Array values, and the arrays of old files.
-#include <algorithm>
-#include <cmath>
-#include <limits>
-
-#include <gtest/gtest.h>
-
-#include "k2v_file/hyper_file_bytes.h"
-#include "support/assertion_counter.h"
-#include "support/counting_memory.h"
-#include "support/temp_folder.h"
-#include "torvane/stream/hyper_file.h"
-
-using namespace _torvane_;
-using namespace hyper_file_bytes;
+#include "support/library.h"
 
 namespace
 {
@@ -126,24 +113,19 @@ TEST(HyperFileArray, CleansNumbersThatAreNotFinite)
 TEST(HyperFileArray, RefusesACountOrLengthThatDoesNotMatch)
 {
   AssertionCounter quiet;
-  struct Row
-  {
-    ULong length; // as it stands in the file
-    LLong count;
-    Long error;
-  };
-  for (const Row& row : {Row{9, 3, -100},
-                         {9, 1, -100},
-                         {9, -2, -100},
-                         {0, 0, -100},
-                         {0xFFFFFFFF, 2, -100},
-                         {0xFFFFFFFD, 0x3FFFFFFF, FILEERROR_READ},
-                         {13, 3, FILEERROR_READ}}) {
-    SCOPED_TRACE(row.length);
-    MemoryReadFile read(ByteWriter().Header().U8(140).U32(row.length).U8(3).I32(1).I32(2).bytes);
+  // length: as it stands in the file
+  for (const auto& [length, count, error] : {std::tuple<ULong, LLong, Long>{9, 3, -100},
+                                             {9, 1, -100},
+                                             {9, -2, -100},
+                                             {0, 0, -100},
+                                             {0xFFFFFFFF, 2, -100},
+                                             {0xFFFFFFFD, 0x3FFFFFFF, FILEERROR_READ},
+                                             {13, 3, FILEERROR_READ}}) {
+    SCOPED_TRACE(length);
+    MemoryReadFile read(ByteWriter().Header().U8(140).U32(length).U8(3).I32(1).I32(2).bytes);
     Long memory[2] = {};
-    EXPECT_FALSE(read.file.ReadArray(memory, kArrayLong, 4, row.count));
-    EXPECT_EQ(read.file.GetError(), row.error);
+    EXPECT_FALSE(read.file.ReadArray(memory, kArrayLong, 4, count));
+    EXPECT_EQ(read.file.GetError(), error);
     EXPECT_EQ(read.file.GetProblem().position, 13);
   }
   for (Long type : {0, 8, -1}) {

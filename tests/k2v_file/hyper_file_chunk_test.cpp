@@ -1,19 +1,5 @@
 // Skipping, raw chunks and containers.
-#include <tuple>
-
-#include <gtest/gtest.h>
-
-#include "k2v_file/hyper_file_bytes.h"
-#include "support/assertion_counter.h"
-#include "support/counting_memory.h"
-#include "support/record_samples.h"
-#include "support/temp_folder.h"
-#include "torvane/links/alias.h"
-#include "torvane/stream/hyper_file.h"
-#include "torvane/values/base_container.h"
-
-using namespace _torvane_;
-using namespace hyper_file_bytes;
+#include "support/library.h"
 
 namespace
 {

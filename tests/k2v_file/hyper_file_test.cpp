@@ -1,22 +1,6 @@
-#include "torvane/stream/hyper_file.h"
-
-#include <cmath>
-#include <cstring>
-#include <limits>
 #include <thread>
-#include <tuple>
 
-#include <gtest/gtest.h>
-
-#include "k2v_file/hyper_file_bytes.h"
-#include "support/assertion_counter.h"
-#include "support/counting_memory.h"
-#include "support/temp_folder.h"
-#include "torvane/bytes/network_connection.h"
-#include "torvane/pictures/bitmap.h"
-
-using namespace _torvane_;
-using namespace hyper_file_bytes;
+#include "support/library.h"
 
 namespace
 {

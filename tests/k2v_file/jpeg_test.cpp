@@ -1,20 +1,8 @@
 #include <cstdio>
-
 #include <jpeglib.h>
 
-#include <gtest/gtest.h>
-
-#include "k2v_file/hyper_file_bytes.h"
-#include "support/assertion_counter.h"
-#include "support/counting_memory.h"
-#include "support/every_failed_allocation.h"
+#include "support/library.h"
 #include "support/pictures.h"
-#include "support/temp_folder.h"
-#include "torvane/pictures/bitmap_filters.h"
-#include "torvane/values/base_container.h"
-
-using namespace _torvane_;
-using hyper_file_bytes::Bytes;
 
 namespace
 {

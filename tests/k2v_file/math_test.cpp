@@ -1,13 +1,4 @@
-#include <cmath>
-#include <random>
-#include <tuple>
-#include <vector>
-
-#include <gtest/gtest.h>
-
-#include "torvane/math/ge_math.h"
-
-using namespace _torvane_;
+#include "support/library.h"
 
 namespace
 {
@@ -215,16 +206,14 @@ TEST(SmallMath, StaysWithinItsRanges)
 
 TEST(Colours, ConvertBetweenRgbAndHsv)
 {
-  const std::tuple<Vector, Vector> rows[] = {
-      {{1, 0, 0}, {0, 1, 1}},
-      {{1, 1, 0}, {1.0 / 6, 1, 1}},
-      {{0, 0.5, 0}, {1.0 / 3, 1, 0.5}},
-      {{0, 1, 1}, {0.5, 1, 1}},
-      {{0.5, 0.5, 1}, {2.0 / 3, 0.5, 1}},
-      {{1, 0, 1}, {5.0 / 6, 1, 1}},
-      {{0.25, 0.25, 0.25}, {0, 0, 0.25}},
-      {{0, 0, 0}, {0, 0, 0}},
-  };
+  const std::tuple<Vector, Vector> rows[] = {{{1, 0, 0}, {0, 1, 1}},
+                                             {{1, 1, 0}, {1.0 / 6, 1, 1}},
+                                             {{0, 0.5, 0}, {1.0 / 3, 1, 0.5}},
+                                             {{0, 1, 1}, {0.5, 1, 1}},
+                                             {{0.5, 0.5, 1}, {2.0 / 3, 0.5, 1}},
+                                             {{1, 0, 1}, {5.0 / 6, 1, 1}},
+                                             {{0.25, 0.25, 0.25}, {0, 0, 0.25}},
+                                             {{0, 0, 0}, {0, 0, 0}}};
   for (const auto& [rgb, hsv] : rows) {
     ExpectNear(RgbToHsv(rgb), hsv);
     ExpectNear(HsvToRgb(hsv), rgb);

@@ -1,23 +1,11 @@
-#include "torvane/bytes/network_connection.h"
-
 #include <chrono>
-#include <cstring>
 #include <numeric>
 #include <thread>
-#include <vector>
 
-#include <gtest/gtest.h>
-
-#include "support/assertion_counter.h"
-#include "support/counting_memory.h"
-#include "support/every_failed_allocation.h"
-#include "torvane/bytes/base_file.h"
+#include "support/library.h"
 
 namespace
 {
-
-using namespace _torvane_;
-using Bytes = std::vector<UChar>;
 
 constexpr LLong kBlock = 256000;
 constexpr LLong kUnseenEnd = 2147483647;

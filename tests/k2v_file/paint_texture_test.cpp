@@ -1,19 +1,5 @@
-#include "torvane/pictures/paint_texture.h"
-
-#include <random>
-#include <tuple>
-
-#include <gtest/gtest.h>
-
-#include "k2v_file/hyper_file_bytes.h"
 #include "source/k2v_file/pictures/run_coding.h"
-#include "support/assertion_counter.h"
-#include "support/counting_memory.h"
-#include "support/every_failed_allocation.h"
-#include "support/temp_folder.h"
-
-using namespace _torvane_;
-using namespace hyper_file_bytes;
+#include "support/library.h"
 
 namespace
 {
@@ -331,10 +317,8 @@ TEST(PaintTextures, TakeLittleMemoryForTheirRows)
       row.UChar(1).Memory(plane);
     const auto width = static_cast<Long>(plane.size() / 2 * 128);
     const Bytes file = AlphaFile(type, width, 1, components, row);
-    const LLong before = counting_memory::Get().bytes;
-    counting_memory::ResetPeak();
-    EXPECT_EQ(kMade, Load(file));
-    EXPECT_LE(counting_memory::Get().peakBytes - before, 100 * static_cast<LLong>(file.size())) << type;
+    const LLong peak = counting_memory::PeakOf([&] { EXPECT_EQ(kMade, Load(file)); });
+    EXPECT_LE(peak, 100 * static_cast<LLong>(file.size())) << type;
   }
 }
 

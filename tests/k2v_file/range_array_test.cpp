@@ -1,14 +1,4 @@
-#include <limits>
-#include <random>
-#include <utility>
-#include <vector>
-
-#include <gtest/gtest.h>
-
-#include "support/counting_memory.h"
-#include "torvane/memory/range_array.h"
-
-using namespace _torvane_;
+#include "support/library.h"
 
 namespace
 {

@@ -1,16 +1,5 @@
+#include "support/library.h"
 #include "torvane/stream/stream_walker.h"
-
-#include <string>
-#include <tuple>
-#include <vector>
-
-#include <gtest/gtest.h>
-
-#include "support/assertion_counter.h"
-#include "support/byte_writer.h"
-#include "support/text.h"
-
-using namespace _torvane_;
 
 namespace
 {

@@ -1,18 +1,4 @@
-#include <functional>
-#include <string>
-#include <tuple>
-#include <utility>
-#include <vector>
-
-#include <gtest/gtest.h>
-
-#include "support/counting_memory.h"
-#include "support/text.h"
-#include "torvane/hooks.h"
-#include "torvane/memory/memory.h"
-#include "torvane/text/ge_string.h"
-
-using namespace _torvane_;
+#include "support/library.h"
 
 namespace
 {

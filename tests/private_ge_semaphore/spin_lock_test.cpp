@@ -1,17 +1,11 @@
 // The lock of many readers or one writer, and the weight table that it guards, on several threads.
 #include <atomic>
 #include <thread>
-#include <vector>
 
-#include <gtest/gtest.h>
-
-#include "support/memory_file.h"
-#include "torvane/tags/joint_weight_table.h"
+#include "support/library.h"
 
 namespace
 {
-
-using namespace _torvane_;
 
 using Lock = ReadWriteSpinLock;
 

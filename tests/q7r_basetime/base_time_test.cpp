@@ -1,14 +1,4 @@
-#include <limits>
-#include <string>
-#include <tuple>
-#include <vector>
-
-#include <gtest/gtest.h>
-
-#include "support/assertion_record.h"
-#include "torvane/time/base_time.h"
-
-using namespace _torvane_;
+#include "support/library.h"
 
 namespace
 {

@@ -1,26 +1,13 @@
-#include <array>
-#include <cmath>
 #include <cstdlib>
 #include <ctime>
-#include <limits>
-#include <random>
-#include <set>
 #include <thread>
-#include <tuple>
-#include <vector>
 
-#include <gtest/gtest.h>
+#include "support/library.h"
 
 #ifndef _WIN32
 #include <sys/wait.h>
 #include <unistd.h>
 #endif
-
-#include "support/assertion_record.h"
-#include "torvane/time/date_time.h"
-#include "torvane/time/uuid.h"
-
-using namespace _torvane_;
 
 namespace
 {

@@ -1,20 +1,7 @@
-#include <map>
-#include <memory>
-#include <random>
-
-#include <gtest/gtest.h>
-
-#include "animation_bytes.h"
-#include "support/counting_memory.h"
-#include "support/every_failed_allocation.h"
-#include "torvane/animation/ccurve.h"
-#include "torvane/bytes/file_errors.h"
+#include "support/library.h"
 
 namespace
 {
-
-using namespace animation_test;
-using namespace _torvane_;
 
 CKey* Add(CCurve& curve, Real seconds, Real value, Long interpolation = kInterpolationSpline)
 {
@@ -75,23 +62,19 @@ TEST(Curve, FindsTheKeyAtBeforeAndBehindATime)
   CCurve curve;
   for (Real time : {1.0, 2.0, 4.0})
     Add(curve, time, 0);
-  struct Case
-  {
-    Real time;
-    Long exact, before, behind; // indices
-  };
-  for (const Case& c : {Case{0.5, -1, -1, 0},
-                        {1, 0, 0, 0},
-                        {1.5, -1, 0, 1},
-                        {2, 1, 1, 1},
-                        {3, -1, 1, 2},
-                        {4, 2, 2, 2},
-                        {5, -1, 2, -1}}) {
-    const std::pair<Long, Long> modes[] = {{kFindExact, c.exact}, {kFindBefore, c.before}, {kFindAfter, c.behind}};
+  // behind: indices
+  for (const auto& [time, exact, before, behind] : {std::tuple<Real, Long, Long, Long>{0.5, -1, -1, 0},
+                                                    {1, 0, 0, 0},
+                                                    {1.5, -1, 0, 1},
+                                                    {2, 1, 1, 1},
+                                                    {3, -1, 1, 2},
+                                                    {4, 2, 2, 2},
+                                                    {5, -1, 2, -1}}) {
+    const std::pair<Long, Long> modes[] = {{kFindExact, exact}, {kFindBefore, before}, {kFindAfter, behind}};
     for (auto [mode, expected] : modes) {
       Long index = 99;
-      EXPECT_EQ(curve.FindKey(BaseTime(c.time), &index, mode), curve.GetKey(expected)) << c.time << " " << mode;
-      EXPECT_EQ(index, expected) << c.time << " " << mode;
+      EXPECT_EQ(curve.FindKey(BaseTime(time), &index, mode), curve.GetKey(expected)) << time << " " << mode;
+      EXPECT_EQ(index, expected) << time << " " << mode;
     }
   }
 }
@@ -164,32 +147,28 @@ TEST(Curve, AKeyThatGetsAnotherTimeMovesToItsPlace)
 TEST(Curve, WritesNothingForNoKeys)
 {
   CCurve curve;
-  ByteWriter empty;
-  EXPECT_EQ(ToHex(WithoutMarkers(BytesOf(curve))), ToHex(Node(empty).bytes));
+  EXPECT_EQ(ToHex(WithoutMarkers(BytesOf(curve))), ToHex(Record("$Node")));
   Add(curve, 2, 7);
   EXPECT_TRUE(curve.DelKey(0));
-  EXPECT_EQ(ToHex(WithoutMarkers(BytesOf(curve))), ToHex(empty.bytes));
+  EXPECT_EQ(ToHex(WithoutMarkers(BytesOf(curve))), ToHex(Record("$Node")));
 }
 
 TEST(Curve, ReadsWhatStandsInItsChunk)
 {
   CCurve curve;
   Add(curve, 9, 9);
-  EXPECT_TRUE(ReadInto(curve, ByteWriter().Start(110419, 0).Start(110100, 0).End().End().bytes));
+  EXPECT_TRUE(ReadInto(curve, Record("[110419,0 [110100,0 ] ]")));
   EXPECT_EQ(curve.GetKeyCount(), 0);
-  EXPECT_TRUE(ReadInto(curve, ByteWriter().Start(110419, 0).End().bytes)); // an empty chunk
+  EXPECT_TRUE(ReadInto(curve, Record("[110419,0 ]"))); // an empty chunk
 
   // A key too late for the curve is not one of its keys, but is written back.
-  ByteWriter late;
-  Node(late).Start(110419, 0).Start(110100, 0);
-  Key(Key(late, 1, 5), 10001, 7).End().End();
-  EXPECT_TRUE(ReadInto(curve, late.bytes));
+  const Bytes late = Record("$Node [110419,0 [110100,0 [5352,0 $Node [110416,0 T1 T T R5 R R L1 L ] ] "
+                            "[5352,0 $Node [110416,0 T10001 T T R7 R R L1 L ] ] ] ]");
+  EXPECT_TRUE(ReadInto(curve, late));
   EXPECT_EQ(Keys(curve), "1:5");
-  EXPECT_EQ(ToHex(WithoutMarkers(BytesOf(curve))), ToHex(late.bytes));
+  EXPECT_EQ(ToHex(WithoutMarkers(BytesOf(curve))), ToHex(late));
 
-  ByteWriter wrong;
-  wrong.Header().Long(1).End();
-  MemoryReadFile memory(wrong.bytes);
+  MemoryReadFile memory(WithHeader(Record("L1 ]")));
   EXPECT_FALSE(curve.ReadChunk(memory.file, 110419, 0));
   EXPECT_EQ(memory.file.GetError(), FILEERROR_WRONG_VALUE);
 }
@@ -229,14 +208,8 @@ TEST(CurveValue, SolvesTheSplineForTheTime)
   {
     Real time, value;
   };
-  struct Case
-  {
-    const char* what;
-    Tangent right, left; // of the keys (0, 0) and (2, 1), which the curve runs between
-    Real time;
-    Real value;
-  };
-  const Case cases[] = {
+  // left: of the keys (0, 0) and (2, 1), which the curve runs between
+  const std::tuple<const char*, Tangent, Tangent, Real, Real> cases[] = {
       // Thirds of the interval: time runs evenly, and the value is 3u^2 - 2u^3.
       {"flat thirds", {2.0 / 3, 0}, {-2.0 / 3, 0}, 0.5, 0.15625},
       // Time 2(1 - (1-s)^3) reaches 1.75 at s = 1/2; the value there is (3 * 0.5 + 3 * 1 + 1) / 8.
@@ -246,11 +219,11 @@ TEST(CurveValue, SolvesTheSplineForTheTime)
       // Time 2(3s^2 - 2s^3) is 0.3125 at s = 1/4; the value there is 1 - (3/4)^3.
       {"a tangent without time lifts the value", {0, 1}, {0, 0}, 0.3125, 37.0 / 64},
   };
-  for (const Case& c : cases) {
+  for (const auto& [what, right, left, time, value] : cases) {
     CCurve curve;
-    Add(curve, 0, 0)->SetRight(BaseTime::Raw(c.right.time, 1), c.right.value);
-    Add(curve, 2, 1)->SetLeft(BaseTime::Raw(c.left.time, 1), c.left.value);
-    EXPECT_NEAR(curve.GetValue(c.time), c.value, 1e-9) << c.what;
+    Add(curve, 0, 0)->SetRight(BaseTime::Raw(right.time, 1), right.value);
+    Add(curve, 2, 1)->SetLeft(BaseTime::Raw(left.time, 1), left.value);
+    EXPECT_NEAR(curve.GetValue(time), value, 1e-9) << what;
   }
 }
 

@@ -2,21 +2,14 @@
 #include <filesystem>
 #include <fstream>
 #include <iterator>
-#include <random>
 
-#include <gtest/gtest.h>
-
-#include "support/counting_memory.h"
 #include "support/full_scene.h"
-#include "support/record_samples.h"
-#include "torvane/animation/ctrack.h"
-#include "torvane/objects/base_object.h"
+#include "support/library.h"
 #include "torvane/stream/prepared_record.h"
 
 namespace
 {
 
-using namespace _torvane_;
 using FileBytes = std::vector<std::uint8_t>;
 
 class GeneralWay

@@ -1,16 +1,7 @@
-#include <functional>
-#include <memory>
-
-#include <gtest/gtest.h>
-
-#include "animation_bytes.h"
-#include "torvane/animation/ckey.h"
+#include "support/library.h"
 
 namespace
 {
-
-using namespace animation_test;
-using namespace _torvane_;
 
 // A key whose every field differs from its default and from every other field.
 void Fill(CKey& key)
@@ -38,8 +29,7 @@ TEST(Key, ParametersReachFieldsAndBits)
   GeData value;
   const std::pair<Long, BaseTime> times[] = {{901, {3, 2}}, {911, {-1, 4}}, {912, {1, 8}}};
   for (const auto& [id, time] : times) {
-    EXPECT_TRUE(key.GetParameterById(id, value));
-    EXPECT_EQ(value.GetTime(), time) << id;
+    EXPECT_EQ(ParameterOf(key, id).GetTime(), time) << id;
     EXPECT_TRUE(key.SetParameterById(id, BaseTime(id, 1)));
   }
   EXPECT_TRUE(key.SetParameterById(913, 13.0) && key.SetParameterById(914, 14.0));
@@ -59,8 +49,7 @@ TEST(Key, ParametersReachFieldsAndBits)
     for (bool on : {true, false}) {
       EXPECT_TRUE(key.SetParameterById(id, on));
       EXPECT_EQ(key.GetNBit(-2), on ? mask : 0u) << id;
-      EXPECT_TRUE(key.GetParameterById(id, value));
-      EXPECT_EQ(value.GetBool(), on) << id;
+      EXPECT_EQ(ParameterOf(key, id).GetBool(), on) << id;
     }
   }
 }

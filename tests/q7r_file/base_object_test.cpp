@@ -1,22 +1,9 @@
 // The chunks of scene objects, their parameters and their copies.
-#include <string>
-
-#include <gtest/gtest.h>
-
-#include "q7r_file/node_bytes.h"
 #include "q7r_file/objects/opaque_object_data.h"
-#include "support/assertion_counter.h"
-#include "support/counting_memory.h"
-#include "support/record_samples.h"
-#include "torvane/document/base_document.h"
-#include "torvane/objects/base_object.h"
-#include "torvane/tags/base_tag.h"
-#include "torvane/values/ge_data.h"
+#include "support/library.h"
 
 namespace
 {
-
-using namespace _torvane_;
 
 constexpr Long kUnknownType = 1234567;
 
@@ -194,27 +181,23 @@ TEST(BaseObject, ALoadedContainerStaysWhatItWasWhenDataAreMade)
 
 TEST(BaseObject, PolygonChunksStandBesideTheTransformAndReachTheData)
 {
-  struct Row
-  {
-    Long type;
-    bool beside; // else inside the node data chunk
-  };
+  // beside: else inside the node data chunk
   const std::string own = "01 00 01 AE 27 00 00 00 03 02"; // chunk 110119
-  for (const Row& row : {Row{kObjectPolygon, true}, Row{kObjectJoint, false}}) {
-    BaseObject object(row.type);
+  for (const auto& [type, beside] : {std::tuple<Long, bool>{kObjectPolygon, true}, {kObjectJoint, false}}) {
+    BaseObject object(type);
     auto* data = NewObj<PolygonLikeData>();
     object.SetObjectData(data);
     EXPECT_EQ(object.GetDiskType(), kObjectPolygonLabel);
     const std::string hex = ToHex(BytesOf(object));
     const std::size_t place = hex.find(own);
     ASSERT_NE(place, std::string::npos);
-    EXPECT_EQ(place > hex.find("01 00 01 AD E4"), row.beside);
-    if (row.beside) {
+    EXPECT_EQ(place > hex.find("01 00 01 AD E4"), beside);
+    if (beside) {
       EXPECT_EQ(place + own.size(), hex.size());
     }
     ASSERT_TRUE(ReadInto(object, FromHex(own)));
-    EXPECT_EQ(data->readId, row.beside ? 110119 : 0);
-    EXPECT_EQ(data->readLevel, row.beside ? 3 : 0);
+    EXPECT_EQ(data->readId, beside ? 110119 : 0);
+    EXPECT_EQ(data->readLevel, beside ? 3 : 0);
   }
 }
 
@@ -328,8 +311,7 @@ TEST(BaseObject, TellsAndTakesItsParameters)
   for (Long id : {901, 902, 907, 913, 928}) {
     GeData value;
     ASSERT_TRUE(object.SetParameterById(id, GeData(static_cast<Long>(id % 5))));
-    ASSERT_TRUE(object.GetParameterById(id, value));
-    EXPECT_EQ(value.GetLong(), id % 5) << id;
+    EXPECT_EQ(ParameterOf(object, id).GetLong(), id % 5) << id;
   }
   for (Long id : {903, 904, 905, 908, 912, 917, 918, 919, 925, 926, 927}) {
     BaseObject one(kObjectNull);
@@ -337,21 +319,17 @@ TEST(BaseObject, TellsAndTakesItsParameters)
     ASSERT_TRUE(one.SetParameterById(id, GeData(Vector(0.1, 0.2, 0.3))));
     ASSERT_TRUE(one.SetParameter(ParameterPath({id, 0, 0}, {kVectorY, 0, 0}), GeData(0.7)));
     ASSERT_TRUE(one.SetParameter(ParameterPath({id, 0, 0}, {1003, 0, 0}), GeData(9.0))) << "no such component";
-    ASSERT_TRUE(one.GetParameterById(id, value));
-    EXPECT_EQ(value.GetVector(), Vector(0.1, 0.7, 0.3)) << id;
+    EXPECT_EQ(ParameterOf(one, id).GetVector(), Vector(0.1, 0.7, 0.3)) << id;
     ASSERT_TRUE(one.GetParameter(ParameterPath({id, 0, 0}, {kVectorZ, 0, 0}), value));
     EXPECT_EQ(value.GetReal(), 0.3) << id;
   }
   GeData value;
   object.SetParameterById(kObjectEnabled, GeData(false));
   EXPECT_EQ(object.GetDisabled(), 1);
-  object.GetParameterById(kObjectEnabled, value);
-  EXPECT_EQ(value.GetLong(), 0);
+  EXPECT_EQ(ParameterOf(object, kObjectEnabled).GetLong(), 0);
   object.SetParameterById(kObjectDisplayColor, GeData(Vector(2, -1, 0.5)));
-  object.GetParameterById(kObjectDisplayColor, value);
-  EXPECT_EQ(value.GetVector(), Vector(2, -1, 0.5)) << "as stored";
-  object.GetParameterById(kObjectDisplayColor, value);
-  EXPECT_EQ(value.GetVector(), Vector(1, 0, 0.5)) << "clamped by the first look";
+  EXPECT_EQ(ParameterOf(object, kObjectDisplayColor).GetVector(), Vector(2, -1, 0.5)) << "as stored";
+  EXPECT_EQ(ParameterOf(object, kObjectDisplayColor).GetVector(), Vector(1, 0, 0.5)) << "clamped by the first look";
   object.SetParameterById(4711, GeData(8));
   EXPECT_EQ(object.GetDataInstance().GetLong(4711), 8) << "all else lives in the container";
 }

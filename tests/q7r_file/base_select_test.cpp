@@ -1,25 +1,10 @@
 // Sets of element numbers: against a plain bit set, at their edges, and in a file.
-#include <algorithm>
 #include <bitset>
-#include <climits>
-#include <functional>
-#include <random>
-#include <string>
-#include <utility>
-#include <vector>
 
-#include <gtest/gtest.h>
-
-#include "q7r_file/node_bytes.h"
-#include "support/assertion_counter.h"
-#include "support/counting_memory.h"
-#include "support/record_samples.h"
-#include "torvane/tags/base_select.h"
+#include "support/library.h"
 
 namespace
 {
-
-using namespace _torvane_;
 
 using Segments = std::vector<std::pair<Long, Long>>;
 
@@ -216,14 +201,10 @@ TEST(BaseSelect, StaysAsItWasWhenMemoryIsShort)
       [&] { return set.CloneSelect() != nullptr; },
   };
   for (const auto& change : changes) {
-    counting_memory::FailAfter(0);
-    EXPECT_FALSE(change());
-    counting_memory::FailNever();
+    EXPECT_FALSE(counting_memory::WithoutMemory(change));
     EXPECT_EQ(SegmentsOf(set), (Segments{{5, 7}, {9, 9}}));
   }
-  counting_memory::FailAfter(1);
-  EXPECT_EQ(set.CloneSelect(), nullptr);
-  counting_memory::FailNever();
+  EXPECT_EQ(counting_memory::WithoutMemory([&] { return set.CloneSelect(); }, 1), nullptr);
 }
 
 TEST(BaseSelect, IsCopied)

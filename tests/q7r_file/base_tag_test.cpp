@@ -1,20 +1,8 @@
 // Plain tags and plug-in tags: their chunks, their copies, and which class the factory makes.
-#include <tuple>
-
-#include <gtest/gtest.h>
-
-#include "q7r_file/node_bytes.h"
-#include "support/counting_memory.h"
-#include "support/every_failed_allocation.h"
-#include "support/record_samples.h"
-#include "torvane/objects/base_object.h"
-#include "torvane/tags/base_tag.h"
-#include "torvane/values/ge_data.h"
+#include "support/library.h"
 
 namespace
 {
-
-using namespace _torvane_;
 
 const char* const kUnknownChunk = "[110064,6 L1234567 L0 STg B1 [7,1 L42 ] ]";
 
@@ -101,9 +89,7 @@ TEST(BaseTag, IsFoundOnItsObjectByItsRealType)
   EXPECT_EQ(plugin->GetPrev(), first);
   EXPECT_EQ(plugin->GetObject(), &object);
   plugin->SetNodeData(NewObj<AnsweringData>());
-  GeData value;
-  EXPECT_TRUE(plugin->GetParameterById(5, value));
-  EXPECT_EQ(value.GetLong(), 99) << "the behaviour object answers first";
+  EXPECT_EQ(ParameterOf(*plugin, 5).GetLong(), 99) << "the behaviour object answers first";
   plugin->SetParameterById(6, GeData(static_cast<Long>(3)));
   EXPECT_EQ(plugin->GetDataInstance().GetLong(6), 3);
 }

@@ -1,37 +1,10 @@
 // Cameras: the entries of a new one, and the parameters that are computed from them.
-#include <cmath>
-#include <string>
-#include <tuple>
-#include <vector>
-
-#include <gtest/gtest.h>
-
-#include "q7r_file/node_bytes.h"
-#include "support/counting_memory.h"
-#include "support/record_samples.h"
-#include "support/scene_bytes.h"
-#include "support/text.h"
-#include "torvane/memory/owned.h"
-#include "torvane/objects/base_object.h"
-#include "torvane/objects/camera_object_data.h"
-#include "torvane/tags/base_tag.h"
-#include "torvane/values/ge_data.h"
+#include "support/library.h"
 
 namespace
 {
 
-using namespace _torvane_;
-
-using ObjectPtr = Owned<BaseObject>;
-
 ObjectPtr NewCamera() { return ObjectPtr(AllocObject(kObjectCamera)); }
-
-GeData Get(BaseObject& camera, Long id)
-{
-  GeData value;
-  EXPECT_TRUE(camera.GetParameterById(id, value)) << id;
-  return value;
-}
 
 BaseContainer& Entries(const ObjectPtr& camera) { return camera->GetDataInstance(); }
 
@@ -49,15 +22,8 @@ TEST(Camera, IsNothingWithoutItsObject)
 
 TEST(Camera, NumbersItsPresetsFromOne)
 {
-  struct List
-  {
-    Long id, storedId;
-    Long start; // the position of a new camera's value
-    Real tolerance;
-    Bool outsideResult;
-    std::vector<Real> values;
-  };
-  const List lists[] = {
+  // start: the position of a new camera's value
+  const std::tuple<Long, Long, Long, Real, Bool, std::vector<Real>> lists[] = {
       {1131, 1006, 3, 0.001, true, {4.8, 9.6, 36.0, 22.0, 52.5}},
       {1132, 500, 3, 0.001, true, {15.0, 25.0, 36.0, 50.0, 80.0, 135.0, 300.0}},
       {1200, 1201, 19, 0.001, true, {1.0, 1.1, 1.2, 1.4, 1.6, 1.8, 2.0, 2.2, 2.5, 2.8, 3.2,  3.5,  4.0,  4.5,
@@ -71,27 +37,27 @@ TEST(Camera, NumbersItsPresetsFromOne)
         2.0, 4.0, 8.0, 15.0, 30.0}},
       {1232, 1231, 3, 0.001, true, {50, 100, 200, 400, 800, 1600, 3200, 6400}},
       {1310, 1311, 5, 0.001, false, {2000, 3000, 4500, 5500, 6500, 7500, 9000}}};
-  for (const List& list : lists) {
-    SCOPED_TRACE(list.id);
+  for (const auto& [id, storedId, start, tolerance, outsideResult, values] : lists) {
+    SCOPED_TRACE(id);
     const ObjectPtr camera = NewCamera();
     const Long before = Entries(camera).GetCount();
-    EXPECT_EQ(Get(*camera, list.id).GetLong(), list.start);
-    const Long count = static_cast<Long>(list.values.size());
+    EXPECT_EQ(ParameterOf(*camera, id).GetLong(), start);
+    const Long count = static_cast<Long>(values.size());
     for (Long position = 1; position <= count; ++position) {
-      EXPECT_TRUE(camera->GetObjectData()->SetParameterById(list.id, GeData(position)));
-      const Real value = list.values[static_cast<std::size_t>(position - 1)];
-      EXPECT_EQ(Entries(camera).GetReal(list.storedId), value);
-      for (Real offset : {0.0, 0.9 * list.tolerance, -0.9 * list.tolerance}) {
-        Entries(camera).SetReal(list.storedId, value + offset);
-        EXPECT_EQ(Get(*camera, list.id).GetLong(), position) << offset;
+      EXPECT_TRUE(camera->GetObjectData()->SetParameterById(id, GeData(position)));
+      const Real value = values[static_cast<std::size_t>(position - 1)];
+      EXPECT_EQ(Entries(camera).GetReal(storedId), value);
+      for (Real offset : {0.0, 0.9 * tolerance, -0.9 * tolerance}) {
+        Entries(camera).SetReal(storedId, value + offset);
+        EXPECT_EQ(ParameterOf(*camera, id).GetLong(), position) << offset;
       }
     }
-    Entries(camera).SetReal(list.storedId, list.values[0] - 1.1 * list.tolerance);
-    EXPECT_EQ(Get(*camera, list.id).GetLong(), 0);
-    Entries(camera).SetReal(list.storedId, 77.0);
+    Entries(camera).SetReal(storedId, values[0] - 1.1 * tolerance);
+    EXPECT_EQ(ParameterOf(*camera, id).GetLong(), 0);
+    Entries(camera).SetReal(storedId, 77.0);
     for (Long position : {-1, 0, count + 1, 1000}) {
-      EXPECT_EQ(camera->GetObjectData()->SetParameterById(list.id, GeData(position)), list.outsideResult);
-      EXPECT_EQ(Entries(camera).GetReal(list.storedId), 77.0);
+      EXPECT_EQ(camera->GetObjectData()->SetParameterById(id, GeData(position)), outsideResult);
+      EXPECT_EQ(Entries(camera).GetReal(storedId), 77.0);
     }
     EXPECT_EQ(Entries(camera).GetCount(), before);
   }
@@ -104,36 +70,31 @@ TEST(Camera, RelatesFieldsOfViewToTheFocalLength)
   BaseObject* camera = AllocObject(kObjectCamera);
   document->InsertObject(camera);
   BaseContainer& entries = camera->GetDataInstance();
-  struct Case
-  {
-    Long id;
-    Long lens;   // 5033 of the render settings
-    Real aspect; // 6006
-    Real factor;
-  };
-  constexpr Case kCases[] = {{1008, 1100, 2, 1}, {4600, 1100, 2, 0.5}, {4600, 1150, 2, 1}, {4600, 0, 0.25, 4}};
-  for (const Case& c : kCases) {
-    render->GetDataInstance().SetLong(5033, c.lens);
-    render->GetDataInstance().SetReal(6006, c.aspect);
+  // lens: 5033 of the render settings; aspect: 6006
+  constexpr std::tuple<Long, Long, Real, Real> kCases[] = {
+      {1008, 1100, 2, 1}, {4600, 1100, 2, 0.5}, {4600, 1150, 2, 1}, {4600, 0, 0.25, 4}};
+  for (const auto& [id, lens, aspect, factor] : kCases) {
+    render->GetDataInstance().SetLong(5033, lens);
+    render->GetDataInstance().SetReal(6006, aspect);
     entries.SetReal(500, 36);
-    EXPECT_DOUBLE_EQ(Get(*camera, c.id).GetReal(), 2 * std::atan(0.5 * c.factor)) << c.id;
+    EXPECT_DOUBLE_EQ(ParameterOf(*camera, id).GetReal(), 2 * std::atan(0.5 * factor)) << id;
     entries.SetReal(1006, 20);
-    EXPECT_TRUE(camera->SetParameterById(c.id, GeData(1.2)));
-    EXPECT_DOUBLE_EQ(entries.GetReal(500), 10 / std::tan(0.6) * c.factor) << c.id;
-    EXPECT_DOUBLE_EQ(Get(*camera, c.id).GetReal(), c.factor == 1 ? 1.2 : 2 * std::atan(std::tan(0.6))) << c.id;
+    EXPECT_TRUE(camera->SetParameterById(id, GeData(1.2)));
+    EXPECT_DOUBLE_EQ(entries.GetReal(500), 10 / std::tan(0.6) * factor) << id;
+    EXPECT_DOUBLE_EQ(ParameterOf(*camera, id).GetReal(), factor == 1 ? 1.2 : 2 * std::atan(std::tan(0.6))) << id;
     entries.SetReal(1006, 36);
     for (Real angle : {0.0, -1.0, std::nan("")}) {
-      EXPECT_TRUE(camera->GetObjectData()->SetParameterById(c.id, GeData(angle)));
-      EXPECT_DOUBLE_EQ(entries.GetReal(500), 10 / std::tan(0.6) * c.factor) << angle;
+      EXPECT_TRUE(camera->GetObjectData()->SetParameterById(id, GeData(angle)));
+      EXPECT_DOUBLE_EQ(entries.GetReal(500), 10 / std::tan(0.6) * factor) << angle;
     }
     for (Real length : {0.0, -36.0}) {
       entries.SetReal(500, length);
-      EXPECT_EQ(Get(*camera, c.id).GetType(), 0) << length;
+      EXPECT_EQ(ParameterOf(*camera, id).GetType(), 0) << length;
     }
   }
   // Outside a document the vertical field has no factor.
   const ObjectPtr alone = NewCamera();
-  EXPECT_DOUBLE_EQ(Get(*alone, 4600).GetReal(), 2 * std::atan(0.5));
+  EXPECT_DOUBLE_EQ(ParameterOf(*alone, 4600).GetReal(), 2 * std::atan(0.5));
   EXPECT_FALSE(entries.FindIndex(1008) >= 0 || entries.FindIndex(4600) >= 0);
 }
 
@@ -146,11 +107,11 @@ TEST(Camera, TellsItsFocalLengthOn36MillimetreFilm)
   for (const auto& [length, width, text] : kCases) {
     Entries(camera).SetReal(500, length);
     Entries(camera).SetReal(1006, width);
-    EXPECT_EQ(Get(*camera, 1133).GetString(), String(text));
+    EXPECT_EQ(ParameterOf(*camera, 1133).GetString(), String(text));
   }
   Entries(camera).SetReal(1006, 0);
   Entries(camera).SetReal(500, 1);
-  EXPECT_EQ(Get(*camera, 1133).GetString(), String(" inf mm"));
+  EXPECT_EQ(ParameterOf(*camera, 1133).GetString(), String(" inf mm"));
 }
 
 TEST(Camera, UsesATargetOnlyWhileItHasOne)
@@ -163,7 +124,7 @@ TEST(Camera, UsesATargetOnlyWhileItHasOne)
   BaseContainer& entries = camera->GetDataInstance();
   auto stored = [&] {
     camera->SetParameterById(1009, GeData(true));
-    const Bool read = Get(*camera, 1009).GetBool();
+    const Bool read = ParameterOf(*camera, 1009).GetBool();
     EXPECT_EQ(entries.GetBool(1009), read); // reading it without a target resets it
     return read;
   };
@@ -173,23 +134,16 @@ TEST(Camera, UsesATargetOnlyWhileItHasOne)
   tag->GetDataInstance().SetLink(kTargetLink, target);
   EXPECT_TRUE(stored());
   camera->SetParameterById(1009, GeData(false));
-  EXPECT_FALSE(Get(*camera, 1009).GetBool());
+  EXPECT_FALSE(ParameterOf(*camera, 1009).GetBool());
   DeleteObj(target);
   EXPECT_FALSE(stored());
 }
 
 TEST(Camera, ComputesTheFocusPairWhenAnInputIsSet)
 {
-  struct Case
-  {
-    const char* what;
-    Long projection, mode;
-    Real rule, base, plane;
-    Real nearValue, farValue;
-  };
   // Focal length 18 and aperture 36: s is twice the plane's distance d, 2000. One value is g c s / d; two are d - e and
   // d + e with e = s d / (b g (1 + s / b / g)), b = 2 c.
-  const Case cases[] = {
+  const std::tuple<const char*, Long, Long, Real, Real, Real, Real, Real> cases[] = {
       {"no rule", 0, 1, 0, 5, 1000, 800, 1200},
       {"part of a rule", 0, 0, 0.9, 5, 1000, 800, 1200},
       {"a parallel view", 4, 0, 1, 5, 1000, 800, 1200},
@@ -199,19 +153,19 @@ TEST(Camera, ComputesTheFocusPairWhenAnInputIsSet)
       {"two values, first rule", 0, 1, 1, 5, 1000, 1000 - 2e6 / 2300, 1000 + 2e6 / 2300},
       {"two values, another rule", 0, 3, 2, 5, 1000, 1000 - 2e6 / 2230, 1000 + 2e6 / 2230},
   };
-  for (const Case& c : cases) {
-    SCOPED_TRACE(c.what);
+  for (const auto& [what, projection, mode, rule, base, plane, nearValue, farValue] : cases) {
+    SCOPED_TRACE(what);
     const ObjectPtr camera = NewCamera();
     Entries(camera).SetReal(500, 18);
-    camera->SetParameterById(1001, GeData(c.projection));
-    camera->SetParameterById(4202, GeData(c.mode));
-    EXPECT_TRUE(camera->SetParameterById(4208, GeData(c.rule)));
-    EXPECT_TRUE(camera->SetParameterById(4205, GeData(c.plane)));
-    EXPECT_TRUE(camera->SetParameterById(4201, GeData(c.base)));
+    camera->SetParameterById(1001, GeData(projection));
+    camera->SetParameterById(4202, GeData(mode));
+    EXPECT_TRUE(camera->SetParameterById(4208, GeData(rule)));
+    EXPECT_TRUE(camera->SetParameterById(4205, GeData(plane)));
+    EXPECT_TRUE(camera->SetParameterById(4201, GeData(base)));
     EXPECT_EQ(Entries(camera).GetData(4208).GetType(), 19);
-    EXPECT_EQ(Entries(camera).GetReal(4201), c.base);
-    EXPECT_NEAR(Get(*camera, 4204).GetReal(), c.nearValue, 1e-9);
-    EXPECT_NEAR(Get(*camera, 4206).GetReal(), c.farValue, 1e-9);
+    EXPECT_EQ(Entries(camera).GetReal(4201), base);
+    EXPECT_NEAR(ParameterOf(*camera, 4204).GetReal(), nearValue, 1e-9);
+    EXPECT_NEAR(ParameterOf(*camera, 4206).GetReal(), farValue, 1e-9);
   }
   // Any of the three starts the calculation; the entries that it takes besides don't.
   for (Long id : {4201, 4205, 4208}) {
@@ -219,9 +173,9 @@ TEST(Camera, ComputesTheFocusPairWhenAnInputIsSet)
     Entries(camera).SetReal(4208, 1);
     camera->SetParameterById(500, GeData(18.0));
     camera->SetParameterById(1006, GeData(18.0));
-    EXPECT_EQ(Get(*camera, 4204).GetReal(), 800);
+    EXPECT_EQ(ParameterOf(*camera, 4204).GetReal(), 800);
     camera->SetParameterById(id, GeData(id == 4201 ? 6.5 : id == 4205 ? 1000.0 : 1.0));
-    EXPECT_NEAR(Get(*camera, 4204).GetReal(), 195, 1e-9) << id;
+    EXPECT_NEAR(ParameterOf(*camera, 4204).GetReal(), 195, 1e-9) << id;
   }
 }
 
@@ -234,8 +188,8 @@ TEST(Camera, KeepsWhatAFileHolds)
                                      "[110064,0 L5103 L0 SC R1 ] [110064,0 L5103 L0 SC [3,3 ] ]")));
   EXPECT_EQ(read->GetType(), kObjectCamera);
   EXPECT_EQ(Entries(read).GetCount(), 2);
-  EXPECT_DOUBLE_EQ(Get(*read, 1008).GetReal(), 2 * std::atan(0.25));
+  EXPECT_DOUBLE_EQ(ParameterOf(*read, 1008).GetReal(), 2 * std::atan(0.25));
   EXPECT_TRUE(read->Execute());
   const ObjectPtr clone(static_cast<BaseObject*>(read->MakeClone(0, nullptr)));
-  EXPECT_EQ(Get(*clone, 1132).GetLong(), 4);
+  EXPECT_EQ(ParameterOf(*clone, 1132).GetLong(), 4);
 }

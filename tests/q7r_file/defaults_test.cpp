@@ -1,14 +1,9 @@
 // The parameters of new nodes against the table of them, and what becomes of them when they change.
-#include <gtest/gtest.h>
-
-#include "support/counting_memory.h"
+#include "support/library.h"
 #include "support/text_table.h"
-#include "torvane/torvane.h"
 
 namespace
 {
-
-using namespace _torvane_;
 
 std::string Number(Real number)
 {

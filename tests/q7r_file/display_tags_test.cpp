@@ -1,25 +1,11 @@
 // The compositing, display and selection tags: what a new one holds, what old files hold, and what is copied.
-#include <algorithm>
 #include <chrono>
-#include <string>
 #include <thread>
-#include <tuple>
 
-#include <gtest/gtest.h>
-
-#include "q7r_file/node_bytes.h"
-#include "support/assertion_counter.h"
-#include "support/counting_memory.h"
-#include "support/record_samples.h"
-#include "torvane/tags/compositing_tag.h"
-#include "torvane/tags/display_tag.h"
-#include "torvane/tags/selection_tag.h"
-#include "torvane/values/ge_data.h"
+#include "support/library.h"
 
 namespace
 {
-
-using namespace _torvane_;
 
 // "1000=1 1016=0.5": the entries of these numbers, "-" where there is none.
 std::string Entries(const BaseContainer& data, std::initializer_list<Long> ids)
@@ -55,8 +41,7 @@ TEST(DisplayTag, AnswersElevenParametersFromItsOwnSettings)
   const BaseContainer& data = tag.GetDataInstance();
   for (const Long id : {1001, 1002, 1004, 1006, 1007, 1008, 1009, 1010, 1012, 1014, 1015}) {
     const bool real = id == 1004 || id == 1006;
-    GeData value;
-    ASSERT_TRUE(tag.GetParameterById(id, value)) << id;
+    const GeData value = ParameterOf(tag, id);
     EXPECT_EQ(value.GetType(), real ? kDataReal : kDataLong) << id;
     EXPECT_EQ(value.GetLong(), id < 1007 || id == 1015 ? 1 : 0) << id;
     EXPECT_TRUE(tag.SetParameterById(id, real ? GeData(id + 0.5) : GeData(id)));
@@ -67,12 +52,9 @@ TEST(DisplayTag, AnswersElevenParametersFromItsOwnSettings)
 
   auto* clone = static_cast<DisplayTag*>(tag.MakeClone(0, nullptr));
   for (const Long id : {1001, 1002, 1007, 1008, 1009, 1010, 1012, 1014, 1015}) {
-    GeData value;
-    clone->GetParameterById(id, value);
-    EXPECT_EQ(value.GetLong(), id);
+    EXPECT_EQ(ParameterOf(*clone, id).GetLong(), id);
   }
-  GeData real;
-  EXPECT_TRUE(clone->GetParameterById(1006, real) && real.GetReal() == 1006.5);
+  EXPECT_EQ(ParameterOf(*clone, 1006).GetReal(), 1006.5);
   DeleteObj(clone);
 }
 

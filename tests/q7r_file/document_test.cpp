@@ -1,25 +1,8 @@
 // Whole documents: the layout of the file, old modes and tools, partial loads, damage, merging and copying.
-#include <random>
-#include <tuple>
-
-#include <gtest/gtest.h>
-
-#include "q7r_file/node_bytes.h"
-#include "support/assertion_counter.h"
-#include "support/every_failed_allocation.h"
-#include "support/record_samples.h"
-#include "support/scene_bytes.h"
-#include "support/temp_folder.h"
-#include "support/text.h"
-#include "torvane/animation/ctrack.h"
-#include "torvane/materials/base_material.h"
-#include "torvane/tags/base_tag.h"
-#include "torvane/time/date_time.h"
+#include "support/library.h"
 
 namespace
 {
-
-using namespace _torvane_;
 
 BaseObject* AddObject(BaseDocument& document, const char* name, Long type = kObjectNull)
 {
@@ -98,9 +81,7 @@ TEST(DocumentFile, ASceneComesBackWhole)
   ExpectScene(*back);
   EXPECT_EQ(back->GetLoadedVersion(), 13000);
   EXPECT_EQ(back->GetRenderDataRoot()->GetCount(), 1);
-  GeData writer;
-  back->GetParameterById(kDocumentWriterText, writer);
-  EXPECT_EQ(Utf8(writer.GetString()), "TORVANE Saver V5 - Krokior (#1027408)");
+  EXPECT_EQ(Utf8(ParameterOf(*back, kDocumentWriterText).GetString()), "TORVANE Saver V5 - Krokior (#1027408)");
   EXPECT_EQ(back->GetNBit(-1), 0x3C0000u);
 }
 
@@ -231,19 +212,16 @@ TEST(Document, AnswersItsParameters)
 
   document->SetParameterById(kDocumentTool, GeData(200000089));
   document->SetParameterById(kDocumentFirstAxisLock + 2, GeData(false));
-  document->GetParameterById(kDocumentFirstAxisLock + 2, value);
-  EXPECT_EQ(value.GetLong(), 0);
+  EXPECT_EQ(ParameterOf(*document, kDocumentFirstAxisLock + 2).GetLong(), 0);
   document->SetParameterById(kDocumentTool, GeData(1)); // the row of all other tools
-  document->GetParameterById(kDocumentFirstAxisLock + 2, value);
-  EXPECT_EQ(value.GetLong(), 1);
+  EXPECT_EQ(ParameterOf(*document, kDocumentFirstAxisLock + 2).GetLong(), 1);
 
   document->SetParameterById(kDocumentInverseSwitch, GeData(false));
   EXPECT_TRUE(document->GetDataInstance().GetBool(100004828));
   document->GetParameter({{kDocumentColor, kDataVector, 0}, {kVectorY, 0, 0}}, value);
   EXPECT_EQ(value.GetReal(), 0.38);
   document->GetDataInstance().SetLong(2113, 0);
-  document->GetParameterById(kDocumentColor, value);
-  EXPECT_TRUE(value.GetVector() == Vector(0.8, 0.8, 0.8));
+  EXPECT_TRUE(ParameterOf(*document, kDocumentColor).GetVector() == Vector(0.8, 0.8, 0.8));
 }
 
 TEST(Document, TellsWhoMadeItAndWhen)

@@ -1,13 +1,8 @@
 // Whatever lacks memory fails or does all that it does with enough: nothing is left out without a word.
 #include <fstream>
 
-#include <gtest/gtest.h>
-
-#include "q7r_file/node_bytes.h"
-#include "support/every_failed_allocation.h"
 #include "support/full_scene.h"
-#include "support/temp_folder.h"
-#include "support/text.h"
+#include "support/library.h"
 
 namespace
 {

@@ -1,14 +1,7 @@
 // Photometric files in memory.
 #pragma once
 
-#include <algorithm>
-#include <memory>
-#include <string>
-#include <vector>
-
-#include "torvane/memory/owned.h"
-#include "torvane/objects/ies_light.h"
-#include "torvane/text/filename.h"
+#include "support/library.h"
 
 using IESPtr = _torvane_::Owned<_torvane_::IESLight>;
 

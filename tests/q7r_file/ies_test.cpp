@@ -1,22 +1,10 @@
 // Photometric files: lines, words and numbers, what the parser makes of them, and the light that a table gives in each
 // direction.
-#include <cmath>
-#include <limits>
-#include <map>
-#include <tuple>
-
-#include <gtest/gtest.h>
-
 #include "q7r_file/ies_files.h"
-#include "support/counting_memory.h"
-#include "support/every_failed_allocation.h"
-#include "support/temp_folder.h"
-#include "support/text.h"
+#include "support/library.h"
 
 namespace
 {
-
-using namespace _torvane_;
 
 constexpr double kTurn = 3.141592653589793 / 180.0;
 
@@ -230,10 +218,7 @@ TEST(IESFile, RefusesCountsOutOfRangeAndTablesThatEndEarly)
   }
   // The counts are looked at behind the opening: it must be there first.
   ExpectUnreadable(kHead + "1 -1 1 1 1 1 2 0 0 0 1 1");
-  counting_memory::ResetPeak();
-  const LLong before = counting_memory::Get().bytes;
-  ExpectUnreadable(kHead + "1 -1 1 1024 1024" + kOpening + "1 2 3");
-  EXPECT_LT(counting_memory::Get().peakBytes - before, 20000);
+  EXPECT_LT(counting_memory::PeakOf([] { ExpectUnreadable(kHead + "1 -1 1 1024 1024" + kOpening + "1 2 3"); }), 20000);
 }
 
 TEST(IESFile, MultipliesTheTableByItsFactors)
@@ -328,12 +313,8 @@ TEST(IESLight, SumsTheSameDirectionsEachTime)
 
 TEST(IESLight, FoldsHorizontalAnglesByTheSymmetryOfItsTable)
 {
-  struct Case
-  {
-    std::vector<double> angles, rows; // a row has one value all along
-    std::map<double, double> expected;
-  };
-  const Case cases[] = {
+  // rows: a row has one value all along
+  const std::tuple<std::vector<double>, std::vector<double>, std::map<double, double>> cases[] = {
       {{0}, {10}, {{0, 10}, {90, 10}, {200, 10}}},
       {{0, 44}, {10, 20}, {{0, 10}, {44, 10}, {200, 10}}},
       {{0, 90}, {10, 20}, {{0, 10}, {45, 15}, {90, 20}, {135, 15}, {180, 10}, {225, 15}, {270, 20}, {315, 15}}},
@@ -346,14 +327,14 @@ TEST(IESLight, FoldsHorizontalAnglesByTheSymmetryOfItsTable)
       {{0, 90, 180, 270, 360},
        {10, 20, 30, 40, 10},
        {{45, 15}, {225, 35}, {270, 40}, {315, 25}, {350, 40 - 80 / 3.0}}}};
-  for (const Case& c : cases) {
+  for (const auto& [angles, rows, expected] : cases) {
     std::vector<double> candela;
-    for (double row : c.rows)
+    for (double row : rows)
       candela.insert(candela.end(), 3, row);
-    const IESPtr light = Table({0, 90, 180}, c.angles, candela);
-    for (const auto& [angle, value] : c.expected)
+    const IESPtr light = Table({0, 90, 180}, angles, candela);
+    for (const auto& [angle, value] : expected)
       EXPECT_NEAR(light->SampleIESLight(Direction(60, angle)) * light->maxCandela, value, 1e-9)
-          << c.angles.size() << " angles up to " << c.angles.back() << ", at " << angle;
+          << angles.size() << " angles up to " << angles.back() << ", at " << angle;
   }
   // Exactly sideways.
   const IESPtr light = Table({0, 180}, {0, 90, 180, 270, 360}, {1, 1, 2, 2, 3, 3, 4, 4, 1, 1});

@@ -1,23 +1,9 @@
 // Materials: their channels, what becomes of types that the library doesn't know, shader
 // slots, and the links between tags, materials and shaders.
-#include <gtest/gtest.h>
-
-#include "q7r_file/node_bytes.h"
-#include "support/counting_memory.h"
-#include "support/every_failed_allocation.h"
-#include "support/record_samples.h"
-#include "support/scene_bytes.h"
-#include "support/temp_folder.h"
-#include "support/text.h"
-#include "torvane/materials/material.h"
-#include "torvane/shaders/base_shader.h"
-#include "torvane/tags/texture_tag.h"
-#include "torvane/values/ge_data.h"
+#include "support/library.h"
 
 namespace
 {
-
-using namespace _torvane_;
 
 constexpr Long kUnknownType = 1012345;
 std::string StatesOf(const Material& material)

@@ -1,16 +1,8 @@
 // What a file may ask for: at most 100 bytes of the library's memory for each of its bytes.
-#include <gtest/gtest.h>
-
-#include "support/byte_writer.h"
-#include "support/counting_memory.h"
-#include "support/record_samples.h"
-#include "support/scene_bytes.h"
-#include "torvane/tags/joint_weight_table.h"
+#include "support/library.h"
 
 namespace
 {
-
-using namespace _torvane_;
 
 constexpr double kMostPerByte = 100.0;
 
@@ -39,10 +31,7 @@ std::vector<std::uint8_t> FileOf(const Crowd& crowd, int count)
 
 LLong PeakOfLoad(const std::vector<std::uint8_t>& file)
 {
-  const LLong before = counting_memory::Get().bytes;
-  counting_memory::ResetPeak();
-  const DocumentPtr document = LoadFromBytes(file, LoadObjects | LoadMaterials);
-  return counting_memory::Get().peakBytes - before;
+  return counting_memory::PeakOf([&] { LoadFromBytes(file); });
 }
 
 std::vector<Crowd> Crowds()

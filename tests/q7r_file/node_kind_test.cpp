@@ -1,16 +1,8 @@
 // Classes of nodes: what a number of type promises and a class doesn't hold.
-#include <gtest/gtest.h>
-
-#include "q7r_file/node_bytes.h"
-#include "support/assertion_counter.h"
-#include "support/counting_memory.h"
-#include "support/scene_bytes.h"
-#include "torvane/torvane.h"
+#include "support/library.h"
 
 namespace
 {
-
-using namespace _torvane_;
 
 // A plug-in's tag of a type, with content that only the plug-in knows.
 Bytes PluginTagChunk(Long type)
@@ -44,8 +36,7 @@ TEST(NodeKind, ATagGetsNoDataThatAreMadeForObjects)
   BaseTag tag(kTagPlugin, kObjectCamera);
   tag.SetNodeData(NewObj<CameraObjectData>());
   GeData value;
-  EXPECT_TRUE(tag.GetParameterById(kCameraUseTarget, value));
-  EXPECT_FALSE(value.GetBool());
+  EXPECT_FALSE(ParameterOf(tag, kCameraUseTarget).GetBool());
 }
 
 TEST(NodeKind, ACopyOntoAnotherClassOfTheSameNumberFailsAndTouchesNothing)

@@ -1,22 +1,8 @@
 // Named nodes: their chunks in every form, their bits, identifiers, parameters and copies.
-#include <algorithm>
-#include <cstring>
-#include <functional>
-
-#include <gtest/gtest.h>
-
-#include "q7r_file/node_bytes.h"
-#include "support/assertion_counter.h"
-#include "support/counting_memory.h"
-#include "support/record_samples.h"
-#include "torvane/layers/layer_object.h"
-#include "torvane/nodes/base_list.h"
-#include "torvane/values/ge_data.h"
+#include "support/library.h"
 
 namespace
 {
-
-using namespace _torvane_;
 
 TEST(Node, BitOperationsTellWhatChanged)
 {

@@ -1,18 +1,10 @@
 // The transform model: what each setter stores and derives, and how matrices come apart.
 #include <numbers>
-#include <tuple>
 
-#include <gtest/gtest.h>
-
-#include "support/counting_memory.h"
-#include "torvane/objects/base_object.h"
-#include "torvane/tags/base_tag.h"
-#include "torvane/values/ge_data.h"
+#include "support/library.h"
 
 namespace
 {
-
-using namespace _torvane_;
 
 constexpr double kPiValue = std::numbers::pi;
 constexpr double kQuarter = kPiValue / 2;
@@ -223,7 +215,5 @@ TEST(ObjectTransform, GlobalParametersWorkInTheParentsSystem)
   ExpectNear(child->GetRelPos(), {1, 5, 3}, "one component");
   child->SetParameterById(kObjectGlobalRot, GeData(Vector(kQuarter + 0.25, 0, 0)));
   ExpectNear(child->GetRelRot(), {0.25, 0, 0}, "rotation");
-  GeData value;
-  ASSERT_TRUE(child->GetParameterById(kObjectGlobalRot, value));
-  ExpectNear(value.GetVector(), {kQuarter + 0.25, 0, 0}, "rotation parameter");
+  ExpectNear(ParameterOf(*child, kObjectGlobalRot).GetVector(), {kQuarter + 0.25, 0, 0}, "rotation parameter");
 }

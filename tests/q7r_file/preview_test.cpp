@@ -1,17 +1,6 @@
 // The preview pictures of documents and materials.
-#include <tuple>
-
-#include <gtest/gtest.h>
-
-#include "q7r_file/node_bytes.h"
-#include "support/assertion_counter.h"
-#include "support/counting_memory.h"
+#include "support/library.h"
 #include "support/pictures.h"
-#include "support/scene_bytes.h"
-#include "torvane/materials/material.h"
-#include "torvane/values/base_container.h"
-
-using namespace _torvane_;
 
 namespace
 {

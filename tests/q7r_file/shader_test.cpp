@@ -1,18 +1,8 @@
 // Shaders: their chunks, their children, types that the library doesn't know, and copies.
-#include <gtest/gtest.h>
-
-#include "q7r_file/node_bytes.h"
-#include "support/assertion_counter.h"
-#include "support/counting_memory.h"
-#include "support/record_samples.h"
-#include "support/text.h"
-#include "torvane/shaders/base_shader.h"
-#include "torvane/values/ge_data.h"
+#include "support/library.h"
 
 namespace
 {
-
-using namespace _torvane_;
 
 constexpr Long kUnknownType = 1012345;
 

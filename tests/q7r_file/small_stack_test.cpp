@@ -1,20 +1,11 @@
 // Nests on the stack of a small thread: what is too deep for it is an error and no crash.
 #ifndef _WIN32
-#include <functional>
-
 #include <pthread.h>
 
-#include <gtest/gtest.h>
-
-#include "support/assertion_counter.h"
-#include "support/record_samples.h"
-#include "support/scene_bytes.h"
-#include "torvane/objects/base_object.h"
+#include "support/library.h"
 
 namespace
 {
-
-using namespace _torvane_;
 
 void RunOnSmallStack(std::function<void()> work)
 {

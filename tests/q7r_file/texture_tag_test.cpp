@@ -1,24 +1,8 @@
 // The texture tag: its old chunk, what it computes, and its links through files, copies and merges.
-#include <cmath>
-#include <memory>
-#include <tuple>
-
-#include <gtest/gtest.h>
-
-#include "q7r_file/tag_bytes.h"
-#include "support/record_samples.h"
-#include "support/scene_bytes.h"
-#include "support/temp_folder.h"
-#include "support/text.h"
-#include "torvane/materials/material.h"
-#include "torvane/math/ge_math.h"
-#include "torvane/objects/base_object.h"
-#include "torvane/tags/texture_tag.h"
+#include "support/library.h"
 
 namespace
 {
-
-using namespace _torvane_;
 
 // "1000=0.5 1002=-": the numbers of these entries, with "-" where there is none.
 std::string Entries(const TextureTag& tag, std::initializer_list<Long> ids)
@@ -37,8 +21,7 @@ std::string Entries(const TextureTag& tag, std::initializer_list<Long> ids)
 
 Real RealOf(TextureTag& tag, Long id)
 {
-  GeData value;
-  EXPECT_TRUE(tag.GetParameterById(id, value));
+  const GeData value = ParameterOf(tag, id);
   return value.GetType() == kDataLong ? value.GetLong() : value.GetReal();
 }
 
@@ -119,15 +102,8 @@ TEST(TextureTag, ComputesTilesFromLengthsAndBack)
 
 TEST(TextureTag, FindsAndStoresListedAspects)
 {
-  struct Row
-  {
-    Long preset;
-    Long entry;
-    Real aspect;
-    Long position;
-    Real given; // by that position
-  };
-  const Row rows[] = {
+  // given: by that position
+  const std::tuple<Long, Long, Real, Long, Real> rows[] = {
       {10000, 1018, 1.0, 1, 1.0},
       {10000, 1018, 1.3333333333, 2, 1.3333333333333333},
       {10000, 1018, 1.7778, 3, 16.0 / 9},
@@ -145,16 +121,16 @@ TEST(TextureTag, FindsAndStoresListedAspects)
       {10001, 1020, 2.0, 7, 2.0},
       {10001, 1020, 0.0, 0, 0.0},
   };
-  for (const Row& row : rows) {
+  for (const auto& [preset, entry, aspect, position, given] : rows) {
     TextureTag tag;
-    tag.SetParameterById(row.entry, GeData(row.aspect));
-    EXPECT_EQ(RealOf(tag, row.preset), row.position) << row.aspect;
-    EXPECT_TRUE(tag.SetParameterById(row.preset, GeData(row.position)));
-    EXPECT_EQ(RealOf(tag, row.entry), row.given);
-    EXPECT_EQ(tag.GetDataInstance().GetLong(row.preset), row.position);
+    tag.SetParameterById(entry, GeData(aspect));
+    EXPECT_EQ(RealOf(tag, preset), position) << aspect;
+    EXPECT_TRUE(tag.SetParameterById(preset, GeData(position)));
+    EXPECT_EQ(RealOf(tag, entry), given);
+    EXPECT_EQ(tag.GetDataInstance().GetLong(preset), position);
     for (Long none : {9, 8, -1})
-      EXPECT_TRUE(tag.SetParameterById(row.preset, GeData(none)));
-    EXPECT_EQ(RealOf(tag, row.entry), row.given);
+      EXPECT_TRUE(tag.SetParameterById(preset, GeData(none)));
+    EXPECT_EQ(RealOf(tag, entry), given);
   }
 }
 

@@ -1,21 +1,8 @@
 // Texture coordinates: the packed form bit by bit, and every layout that files held.
-#include <bit>
-#include <limits>
-#include <memory>
-#include <tuple>
-
-#include <gtest/gtest.h>
-
-#include "q7r_file/tag_bytes.h"
-#include "support/counting_memory.h"
-#include "support/text.h"
-#include "torvane/tags/value_tags.h"
-#include "torvane/values/ge_data.h"
+#include "support/library.h"
 
 namespace
 {
-
-using namespace _torvane_;
 
 constexpr Real kSmallest = 1.0 / 32768.0; // what zero comes back as beside a third component
 
@@ -26,13 +13,6 @@ std::vector<ULong> Words(const UVWTag& tag)
   LLong size = 0;
   const auto* first = static_cast<const ULong*>(tag.GetEntryBytes(size));
   return {first, first + size / 4};
-}
-
-Long ParameterOf(UVWTag& tag)
-{
-  GeData value;
-  EXPECT_TRUE(tag.GetParameterById(1000, value));
-  return value.GetLong();
 }
 
 ByteWriter OldWords()
@@ -115,7 +95,7 @@ TEST(UVWTag, ReadsTheLayoutsOfEveryVersionAndLevel)
     const Bytes chunk = ByteWriter().Start(5671, level).Append(body).Long(77).End().bytes;
     ASSERT_TRUE(ReadInto(tag, chunk, version)) << version << '/' << level;
     EXPECT_EQ(Words(tag), words) << version << '/' << level;
-    EXPECT_EQ(ParameterOf(tag), parameter) << version << '/' << level;
+    EXPECT_EQ(ParameterOf(tag, 1000).GetLong(), parameter) << version << '/' << level;
   }
 }
 

@@ -1,19 +1,8 @@
 // Tags that hold arrays: their bytes, the layouts of older files, counts that lie, and their ways of copying.
-#include <memory>
-#include <tuple>
-
-#include <gtest/gtest.h>
-
-#include "q7r_file/tag_bytes.h"
-#include "support/counting_memory.h"
-#include "support/record_samples.h"
-#include "support/text.h"
-#include "torvane/tags/value_tags.h"
+#include "support/library.h"
 
 namespace
 {
-
-using namespace _torvane_;
 
 // All numbers that the entries are made of.
 template <class Number>
@@ -114,9 +103,7 @@ TEST(ValueTags, ReportMemoryThatIsShortAndKeepTheirEntries)
   for (const Layout& layout : kLayouts) {
     auto tag = layout.Make();
     const auto entries = Numbers<UChar>(*tag);
-    counting_memory::FailAfter(0);
-    EXPECT_FALSE(tag->ResizeTagArray(100));
-    counting_memory::FailNever();
+    EXPECT_FALSE(counting_memory::WithoutMemory([&] { return tag->ResizeTagArray(100); }));
     EXPECT_EQ(Numbers<UChar>(*tag), entries);
 
     AssertionCounter silence;
@@ -125,9 +112,7 @@ TEST(ValueTags, ReportMemoryThatIsShortAndKeepTheirEntries)
     Long id = 0;
     Long level = 0;
     ASSERT_TRUE(memory.file.ReadValueHeader(header) && memory.file.ReadChunkStart(id, level));
-    counting_memory::FailAfter(0);
-    EXPECT_FALSE(tag->ReadChunk(memory.file, id, level));
-    counting_memory::FailNever();
+    EXPECT_FALSE(counting_memory::WithoutMemory([&] { return tag->ReadChunk(memory.file, id, level); }));
     EXPECT_EQ(memory.file.GetError(), -7) << layout.type;
     EXPECT_TRUE(layout.type == kTagSegment || Numbers<UChar>(*tag) == entries) << layout.type;
   }

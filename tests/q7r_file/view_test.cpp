@@ -1,22 +1,8 @@
 // Views: panels with their draws, the settings of new ones, and the scene camera of a document.
-#include <algorithm>
-#include <string>
-
-#include <gtest/gtest.h>
-
-#include "q7r_file/node_bytes.h"
-#include "support/assertion_counter.h"
-#include "support/every_failed_allocation.h"
-#include "support/record_samples.h"
-#include "support/scene_bytes.h"
-#include "torvane/objects/base_object.h"
-#include "torvane/values/ge_data.h"
-#include "torvane/views/base_draw.h"
+#include "support/library.h"
 
 namespace
 {
-
-using namespace _torvane_;
 
 BaseDraw* DrawAt(ViewPanel& panel, Long index)
 {

@@ -1,23 +1,4 @@
-#include "torvane/links/alias.h"
-
-#include <algorithm>
-#include <cstring>
-#include <map>
-#include <memory>
-#include <optional>
-#include <random>
-#include <vector>
-
-#include <gtest/gtest.h>
-
-#include "support/assertion_counter.h"
-#include "support/byte_writer.h"
-#include "support/counting_memory.h"
-#include "support/every_failed_allocation.h"
-#include "support/memory_file.h"
-#include "torvane/values/base_container.h"
-
-using namespace _torvane_;
+#include "support/library.h"
 
 namespace
 {

@@ -1,19 +1,11 @@
 // The format document against what is read and written.
 #include <cctype>
 #include <fstream>
-#include <map>
-#include <string>
 
-#include <gtest/gtest.h>
-
-#include "support/record_samples.h"
-#include "support/scene_bytes.h"
-#include "torvane/objects/base_object.h"
+#include "support/library.h"
 
 namespace
 {
-
-using namespace _torvane_;
 
 constexpr Long kLevelUntold = -1;
 

@@ -25,6 +25,26 @@ void FailOnceAfter(_torvane_::LLong count);
 // True if an allocation failed before this call.
 bool FailNever();
 
+// The most bytes that were taken at once while `act` ran, beyond those that were there before.
+template <class Act>
+_torvane_::LLong PeakOf(Act&& act)
+{
+  ResetPeak();
+  const _torvane_::LLong before = Get().bytes;
+  act();
+  return Get().peakBytes - before;
+}
+
+// What `act` gives when the allocation behind `count` further ones fails, and all that follow.
+template <class Act>
+auto WithoutMemory(Act&& act, _torvane_::LLong count = 0)
+{
+  FailAfter(count);
+  auto result = act();
+  FailNever();
+  return result;
+}
+
 // Fails the running test, on leaving the scope, if blocks were left allocated since it was made.
 class BalanceCheck
 {

@@ -101,7 +101,7 @@ void PutValue(ByteWriter& w, const RecordValue& value, Long version)
     w.Long(integer());
     break;
   case 'U':
-    w.ULong(static_cast<std::uint32_t>(number()));
+    w.ULong(static_cast<std::uint32_t>(static_cast<std::int64_t>(number())));
     break;
   case 'C':
     w.UChar(static_cast<std::uint8_t>(number()));
@@ -181,7 +181,7 @@ std::vector<std::uint8_t> RecordBytes(const std::vector<RecordValue>& values, Lo
 
 std::vector<std::uint8_t> Record(const std::string& body, Long version)
 {
-  return RecordBytes(ParseRecord(body), version);
+  return RecordBytes(ParseRecord(body.find('$') == std::string::npos ? body : ExpandRecord(body)), version);
 }
 
 bool ChangeValue(RecordValue& value)

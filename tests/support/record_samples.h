@@ -8,6 +8,7 @@
 //   K7 a container with the Long 7 under 7; K without entries
 //   A3:5,6 an Array of type 3 with these elements  X0102 bytes as they stand
 //   [id,level and ] chunk start and end  3( ... ) three times
+//   $Node and its like: what records.txt says of the word
 // Behind the letter, = marks a value that isn't kept, # a count; behind the value stands @ and the number of the
 // parameter, or % and that of the entry, that it is.
 #pragma once
@@ -44,6 +45,8 @@ struct RecordValue
 const std::vector<RecordSample>& RecordSamples();
 const RecordSample& FindRecordSample(const std::string& name);
 
+// The text with what the words of the table that begin with $ stand for.
+std::string ExpandRecord(const std::string& body);
 std::vector<RecordValue> ParseRecord(const std::string& body);
 std::vector<std::uint8_t> RecordBytes(const std::vector<RecordValue>& values, _torvane_::Long version = 13000);
 std::vector<std::uint8_t> Record(const std::string& body, _torvane_::Long version = 13000);

@@ -12,6 +12,7 @@
 #include "torvane/render/render_data.h"
 #include "torvane/shaders/base_shader.h"
 #include "torvane/tags/base_tag.h"
+#include "torvane/tags/weight_tag_data.h"
 #include "torvane/views/base_draw.h"
 
 using namespace _torvane_;
@@ -36,6 +37,28 @@ GeListNode* Object()
 {
   return AllocObject(type);
 }
+// The exporter's client leaves weights the bytes that they are: here their data read them.
+class WeightTag : public BaseTag
+{
+ public:
+  WeightTag() : BaseTag(kTagPlugin, kTagWeight) { SetNodeData(NewObj<WeightTagData>()); }
+  Bool ReadChunk(HyperFile& file, Long id, Long level) override
+  {
+    Long number = 0;
+    return id != kChunkNodeData ? BaseTag::ReadChunk(file, id, level)
+                                : file.ReadLong(number) && file.ReadLong(number) && file.ReadString(name_) &&
+                                      GetNodeData()->ReadData(file, id, level) && file.SkipToEndChunk();
+  }
+};
+
+GeListNode* NewWeightTag()
+{
+  auto* tag = NewObj<WeightTag>();
+  if (tag && !tag->GetNodeData())
+    DeleteObj(tag);
+  return tag;
+}
+
 GeListNode* Document() { return BaseDocument::Alloc(); }
 
 const std::map<std::string, Maker> kMakers = {
@@ -69,33 +92,41 @@ const std::map<std::string, Maker> kMakers = {
     {"TextureTag", Tag<kTagTexture>},
     {"UVWTag", Tag<kTagUVW>},
     {"VertexMapTag", Tag<kTagVertexMap>},
+    {"WeightTag", NewWeightTag},
 };
 
-std::vector<RecordSample> ReadTable()
+struct Table
 {
-  std::vector<RecordSample> samples;
-  std::map<std::string, std::string> texts;
-  const auto expanded = [&](const std::string& words) {
+  Table();
+  std::string Expanded(const std::string& words) const
+  {
     std::string text;
     std::istringstream stream(words);
     for (std::string word; stream >> word;)
       text += (text.empty() ? "" : " ") + (word[0] == '$' ? texts.at(word) : word);
     return text;
-  };
+  }
+
+  std::vector<RecordSample> samples;
+  std::map<std::string, std::string> texts; // of words that begin with $
+};
+
+Table::Table()
+{
   for (const std::string& line : TextTable("support/records.txt")) {
     std::istringstream cells(line);
     std::string name, head, body, now;
     if (line[0] == '$') {
       cells >> name >> head;
       std::getline(cells, body);
-      texts[name] = expanded(body);
+      texts[name] = Expanded(body);
       continue;
     }
     std::getline(cells, name, '|');
     std::getline(cells, head, '|');
     std::getline(cells, body, '|');
     std::getline(cells, now);
-    RecordSample sample{name.substr(0, name.size() - 1), nullptr, 0, 0, expanded(body)};
+    RecordSample sample{name.substr(0, name.size() - 1), nullptr, 0, 0, Expanded(body)};
     std::istringstream words(head);
     std::string maker;
     char comma = 0;
@@ -113,19 +144,22 @@ std::vector<RecordSample> ReadTable()
     if (colon != std::string::npos)
       sample.nowLevel = std::stoi(now);
     if (!now.empty())
-      sample.now = expanded(colon == std::string::npos ? now : now.substr(colon + 1));
+      sample.now = Expanded(colon == std::string::npos ? now : now.substr(colon + 1));
     samples.push_back(sample);
   }
-  return samples;
+}
+
+const Table& TheTable()
+{
+  static const Table table;
+  return table;
 }
 
 } // namespace
 
-const std::vector<RecordSample>& RecordSamples()
-{
-  static const std::vector<RecordSample> samples = ReadTable();
-  return samples;
-}
+const std::vector<RecordSample>& RecordSamples() { return TheTable().samples; }
+
+std::string ExpandRecord(const std::string& body) { return TheTable().Expanded(body); }
 
 const RecordSample& FindRecordSample(const std::string& name)
 {

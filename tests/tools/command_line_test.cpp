@@ -4,7 +4,7 @@
 #include <algorithm>
 #include <random>
 
-#include "support/byte_writer.h"
+#include "support/record_samples.h"
 #include "support/run_q7r.h"
 
 namespace
@@ -78,13 +78,7 @@ TEST_F(CommandLine, RefusesCompositionsAndPathsWithOneLine)
 {
   const std::string good = Write("good.json", kComposition);
   const std::string out = folder_ / "out.q7r";
-  struct Case
-  {
-    const char* name;
-    std::string arguments;
-    std::vector<std::string> says;
-  };
-  const Case cases[] = {
+  const std::tuple<const char*, std::string, std::vector<std::string>> cases[] = {
       {"no file", Quoted(folder_ / "none.json") + " " + Quoted(out), {"none.json"}},
       {"an empty file", Quoted(Write("empty.json", "")) + " " + Quoted(out), {"empty.json"}},
       {"no JSON",
@@ -100,9 +94,9 @@ TEST_F(CommandLine, RefusesCompositionsAndPathsWithOneLine)
       {"a folder as the output", Quoted(good) + " " + Quoted(folder_ / "folder"), {"folder.q7r", "folder"}},
   };
   std::filesystem::create_directory(folder_ / "folder.q7r");
-  for (const Case& c : cases) {
-    SCOPED_TRACE(c.name);
-    ExpectRefusal(RunQ7r("export " + c.arguments), c.says);
+  for (const auto& [name, arguments, says] : cases) {
+    SCOPED_TRACE(name);
+    ExpectRefusal(RunQ7r("export " + arguments), says);
     EXPECT_FALSE(std::filesystem::exists(out));
   }
 }
@@ -222,50 +216,24 @@ TEST_F(CommandLine, TellsItsStatusInHelpAsInTheReadme)
 // What other programs put into a scene: an object, a tag, a value and chunks of kinds that nobody here knows.
 TEST_F(CommandLine, ResavesWhatItDoesNotKnowByteForByte)
 {
-  const Bytes objectData = ByteWriter()
-                               .Start(110064, 9)
-                               .Long(1012345)
-                               .Long(0)
-                               .String(u"Fog")
-                               .Real(0.25)
-                               .Start(9, 2)
-                               .String(u"deep")
-                               .End()
-                               .End()
-                               .bytes;
-  const Bytes tagData =
-      ByteWriter().Start(110064, 8).Long(1012346).Long(0).String(u"Mark").Memory("of another").LLong(1).End().bytes;
-  const Bytes value = ByteWriter().Long(1000077).Start(0, 4).Long(5).Vector(1, 2, 3).End().bytes;
-  const Bytes objectChunk = ByteWriter().Start(777001, 3).Bool(true).Start(5, 5).Long(6).End().End().bytes;
-  const Bytes documentChunk = ByteWriter().Start(777002, 1).String(u"of the document").SReal(2).End().bytes;
-  const Bytes header = ByteWriter()
-                           .Start(110050, 0)
-                           .Long(0)
-                           .Long(0)
-                           .Start(132, 1)
-                           .Long(1012345)
-                           .Long(40)
-                           .Append(value)
-                           .End()
-                           .UChar(0)
-                           .String(u"Fog")
-                           .End()
-                           .bytes;
-  ByteWriter w;
-  w.Header().Start(110059, 0).Append(documentChunk).Start(110107, 0).Start(110100, 0).Start(5154, 0).Append(header);
-  w.Append(objectChunk).Append(objectData).Start(110108, 0).Start(110100, 0).Start(5691, 0).Append(tagData);
-  w.End().End().End().End().End().End().End();
+  const std::string objectData = "[110064,9 L1012345 L SFog R0.25 [9,2 Sdeep ] ]";
+  const std::string tagData = "[110064,8 L1012346 L SMark M6F6620616E6F74686572 X110000000000000001 ]";
+  const std::string value = "L1000077 [0,4 L5 V1,2,3 ]";
+  const std::string objectChunk = "[777001,3 B1 [5,5 L6 ] ]";
+  const std::string documentChunk = "[777002,1 Sof-the-document X1D40000000 ]";
+  const Bytes strange = Record("[110059,0 " + documentChunk + " [110107,0 [110100,0 [5154,0 [110050,0 L L [132,1 " +
+                               "L1012345 L40 " + value + " ] C SFog ] " + objectChunk + " " + objectData +
+                               " [110108,0 [110100,0 [5691,0 " + tagData + " ] ] ] ] ] ] ]");
   const std::string once = folder_ / "once.q7r";
   const std::string twice = folder_ / "twice.q7r";
-  const RunResult first = RunQ7r("resave " + Quoted(Write("strange.q7r", w.bytes)) + " " + Quoted(once));
+  const RunResult first = RunQ7r("resave " + Quoted(Write("strange.q7r", ByteWriter().Header().Append(strange).bytes)) +
+                                 " " + Quoted(once));
   ASSERT_EQ(first.status, 0) << first.err;
   const RunResult second = RunQ7r("resave " + Quoted(once) + " " + Quoted(twice));
   ASSERT_EQ(second.status, 0) << second.err;
   EXPECT_EQ(RunQ7r("check " + Quoted(once)).status, 0);
-  for (const Bytes& part : {objectData, tagData, value, objectChunk, documentChunk}) {
-    EXPECT_TRUE(Contains(ReadWholeFile(once), part)) << static_cast<int>(part[4]);
-    EXPECT_TRUE(Contains(ReadWholeFile(twice), part)) << static_cast<int>(part[4]);
-  }
+  for (const std::string& part : {objectData, tagData, value, objectChunk, documentChunk})
+    EXPECT_TRUE(Contains(ReadWholeFile(once), Record(part)) && Contains(ReadWholeFile(twice), Record(part))) << part;
   EXPECT_EQ(ReadWholeFile(once).size(), ReadWholeFile(twice).size());
 }
 

@@ -6,6 +6,7 @@
 #include <nlohmann/json.hpp>
 
 #include "support/full_scene.h"
+#include "support/record_samples.h"
 #include "support/run_q7r.h"
 #include "torvane/objects/point_object.h"
 
@@ -14,6 +15,7 @@ namespace
 
 using namespace _torvane_;
 using full_scene::MakeFullScene;
+using Bytes = std::vector<std::uint8_t>;
 using Json = nlohmann::json;
 
 std::string Save(const TempFolder& folder, const std::string& name, BaseDocument& document)
@@ -226,15 +228,11 @@ TEST(Diff, ComparesKeptBytes)
 {
   const TempFolder folder;
   const auto write = [&](const char* name, int changed) {
-    const auto byte = [changed](int place) { return static_cast<std::int32_t>(place == changed); };
-    ByteWriter w;
-    w.Header().Start(110059, 0).Start(777002, 1).Long(byte(1)).End().Start(110107, 0).Start(110100, 0);
-    w.Start(5154, 0).Start(777001, 3).Long(byte(2)).End().Start(110064, 9).Long(1012345).Long(0).String(u"Fog");
-    w.Long(byte(3)).End().Start(110108, 0).Start(110100, 0).Start(5691, 0).Start(110064, 8).Long(1012346).Long(0);
-    w.String(u"Mark").Long(byte(4));
-    for (int i = 0; i < 8; ++i)
-      w.End();
-    WriteWholeFile(folder / name, w.bytes);
+    const auto byte = [changed](int place) { return std::string(place == changed ? "L1 " : "L0 "); };
+    const Bytes body = Record("[110059,0 [777002,1 " + byte(1) + "] [110107,0 [110100,0 [5154,0 [777001,3 " + byte(2) +
+                              "] [110064,9 L1012345 L SFog " + byte(3) + "] [110108,0 [110100,0 [5691,0 [110064,8 " +
+                              "L1012346 L SMark " + byte(4) + "] ] ] ] ] ] ] ]");
+    WriteWholeFile(folder / name, ByteWriter().Header().Append(body).bytes);
     return folder / name;
   };
   const std::string same = write("same.q7r", 0);
@@ -276,9 +274,7 @@ TEST(Check, WarnsOfWhatIsOdd)
   WriteWholeFile(folder / "a.png", {1});
   EXPECT_EQ(RunQ7r("check " + Quoted(odd)).out.find("a.png"), std::string::npos);
   // A link whose target another program left out.
-  ByteWriter w;
-  w.Header().Start(110059, 0).Start(110107, 0).Start(110100, 0).Start(5140, 0).Start(777001, 1);
-  w.Memory(std::string("alias2\0\0\0\0\0\0\0\7", 14)).End().End().End().End().End();
-  WriteWholeFile(folder / "link.q7r", w.bytes);
+  const Bytes linked = Record("[110059,0 [110107,0 [110100,0 [5140,0 [777001,1 k7 ] ] ] ] ]");
+  WriteWholeFile(folder / "link.q7r", ByteWriter().Header().Append(linked).bytes);
   EXPECT_NE(RunQ7r("check " + Quoted(folder / "link.q7r")).out.find("the link leads to nothing"), std::string::npos);
 }

@@ -47,19 +47,15 @@ TEST(IESVerb, TellsTheMakersLumens)
   const std::filesystem::path folder = TEST_SOURCE_DIR "/../shared/ies";
   if (!std::filesystem::exists(folder))
     GTEST_SKIP() << "makers' files are not beside this tree";
-  struct File
-  {
-    const char* name;
-    double lumens;
-    Long vertical, horizontal;
-  };
-  for (const File& file : {File{"luminaire-1", 9217.18, 74, 12}, File{"luminaire-3", 13359.57, 37, 25},
-                           File{"luminaire-5", 753.8, 37, 5}}) {
-    const Json json = Parsed(RunQ7r("ies --json " + Quoted((folder / (std::string(file.name) + ".ies")).string())));
-    EXPECT_NEAR(json["lumens"].get<double>(), file.lumens, 0.001 * file.lumens) << file.name;
-    EXPECT_EQ(json["verticalAngles"].size(), file.vertical);
-    EXPECT_EQ(json["candela"].size(), file.horizontal);
-    EXPECT_EQ(json["candela"][1].size(), file.vertical);
+  for (const auto& [name, lumens, vertical, horizontal] :
+       {std::tuple<const char*, double, Long, Long>{"luminaire-1", 9217.18, 74, 12},
+        {"luminaire-3", 13359.57, 37, 25},
+        {"luminaire-5", 753.8, 37, 5}}) {
+    const Json json = Parsed(RunQ7r("ies --json " + Quoted((folder / (std::string(name) + ".ies")).string())));
+    EXPECT_NEAR(json["lumens"].get<double>(), lumens, 0.001 * lumens) << name;
+    EXPECT_EQ(json["verticalAngles"].size(), vertical);
+    EXPECT_EQ(json["candela"].size(), horizontal);
+    EXPECT_EQ(json["candela"][1].size(), vertical);
   }
 }
 

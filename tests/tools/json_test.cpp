@@ -63,13 +63,7 @@ TEST(Json, FitsTheSchemaInEveryVerb)
   const std::string cut = WriteText(folder, "cut.q7r", std::string("QQ7RQ7R6\0\0\x32\xC8\0\x01\0\0", 16));
   const std::string ies =
       WriteText(folder, "disc.ies", "IESNA91\nTILT=NONE\n1 -1 2 2 1 1 1 -1 0 0  1 1 50  0 180 0 9 9\n");
-  struct Case
-  {
-    const char* form;
-    std::string arguments;
-    int status;
-  };
-  const Case cases[] = {
+  const std::tuple<const char*, std::string, int> cases[] = {
       {"info", "info " + Quoted(full), 0},
       {"tree", "tree " + Quoted(full), 0},
       {"tree", "tree --no-keys --depth 0 " + Quoted(full), 0},
@@ -90,17 +84,17 @@ TEST(Json, FitsTheSchemaInEveryVerb)
       {"error", "dance", 2},
       {"error", "tree --loud " + Quoted(full), 2},
   };
-  for (const Case& c : cases) {
-    SCOPED_TRACE(c.arguments);
-    const RunResult run = RunQ7r(c.arguments + " --json");
-    EXPECT_EQ(run.status, c.status);
+  for (const auto& [form, arguments, status] : cases) {
+    SCOPED_TRACE(arguments);
+    const RunResult run = RunQ7r(arguments + " --json");
+    EXPECT_EQ(run.status, status);
     EXPECT_EQ(run.err, "");
     std::istringstream lines(run.out);
     std::string text = run.out;
-    for (bool more = c.form != std::string("dump") || std::getline(lines, text); more;
-         more = c.form == std::string("dump") && std::getline(lines, text)) {
+    for (bool more = form != std::string("dump") || std::getline(lines, text); more;
+         more = form == std::string("dump") && std::getline(lines, text)) {
       const Json json = Parsed(text);
-      ASSERT_EQ(Schema().Fault(json, c.form), "");
+      ASSERT_EQ(Schema().Fault(json, form), "");
       ASSERT_EQ(json["schema"], 1);
       if (text.size() == run.out.size() && text.size() < 4000) {
         ASSERT_EQ(Schema().Fault(json), "");
