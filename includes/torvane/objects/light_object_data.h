@@ -15,6 +15,10 @@ class BaseObject;
 
 inline constexpr Long kLevelLight = 6;
 inline constexpr Long kMaxLightKnots = 40;
+constexpr Long ClampLightKnotCount(Long count)
+{
+  return count < 0 ? 0 : count > kMaxLightKnots ? kMaxLightKnots : count;
+}
 
 // A record of the list that kLightKnotCount counts.
 struct LightKnot

@@ -2,9 +2,9 @@
 // notice of lines.
 #include <cmath>
 #include <cstring>
-#include <initializer_list>
 #include <iterator>
 
+#include "q7r_file/objects/light/ies_words.h"
 #include "torvane/bytes/base_file.h"
 #include "torvane/objects/ies_light.h"
 
@@ -14,10 +14,7 @@ namespace _torvane_
 namespace
 {
 
-constexpr LLong kBufferSize = 1024;
-constexpr Long kMaxLine = 512;
-constexpr Long kMaxWord = 256;
-constexpr Long kMaxExponent = 9999;
+constexpr LLong kHeadSize = 1024;
 constexpr Real kFoot = 0.3048;
 constexpr Long kUnitFeet = 1;
 
@@ -62,54 +59,6 @@ Keyword FindKeyword(const char* word)
       return row.keyword;
   }
   return Keyword::kNone;
-}
-
-Bool IsBlank(char c) { return c == ' ' || c == '\t'; }
-Bool EndsWord(char c) { return c == '\0' || IsBlank(c) || c == ',' || c == '='; }
-Bool IsDigit(char c) { return c >= '0' && c <= '9'; }
-
-// The digits from `text` on are added to `value`; gives how many there are.
-Long TakeDigits(const char*& text, Real& value)
-{
-  Long count = 0;
-  for (; IsDigit(*text); ++text, ++count)
-    value = value * 10.0 + (*text - '0');
-  return count;
-}
-
-// [-] digits [. digits] [e [+-] digits], with a digit before or behind the point. All of `text` must be the number, and
-// it must be finite.
-Bool ParseNumber(const char* text, Real& value)
-{
-  const Bool negative = *text == '-';
-  if (negative)
-    ++text;
-  Real mantissa = 0.0;
-  Long digits = TakeDigits(text, mantissa);
-  if (*text == '.') {
-    ++text;
-    const Long places = TakeDigits(text, mantissa);
-    mantissa /= std::pow(10.0, places);
-    digits += places;
-  }
-  if (digits == 0)
-    return false;
-  if (*text == 'e' || *text == 'E') {
-    ++text;
-    const Bool down = *text == '-';
-    if (*text == '+' || *text == '-')
-      ++text;
-    Real exponent = 0.0;
-    if (TakeDigits(text, exponent) == 0)
-      return false;
-    exponent = exponent > kMaxExponent ? kMaxExponent : exponent;
-    if (mantissa != 0.0)
-      mantissa *= std::pow(10.0, down ? -exponent : exponent);
-  }
-  if (*text != '\0' || !std::isfinite(mantissa))
-    return false;
-  value = negative ? -mantissa : mantissa;
-  return true;
 }
 
 // Which of the three dimensions a component of the size is, and with which sign.
@@ -168,146 +117,30 @@ void SetShape(IESLight& light, Real x, Real l, Real h)
 class IESParser
 {
  public:
-  IESParser(BaseFile& file, IESLight& light, IESFactors factors) : file_(file), light_(light), factors_(factors) {}
+  IESParser(BaseFile& file, IESLight& light, IESFactors factors)
+      : file_(file), words_(file), light_(light), factors_(factors)
+  {}
 
   // Reads all of the file, or up to the end of the numbers.
   Bool Parse();
 
  private:
-  Bool NextByte(char& byte);
-  Bool NextLine();
-  Bool TakeWord();
-  String TakeText();
-  Bool TakeNumber(Real& value);
-  Bool TakeInteger(Long& value);
-  Bool TakeNumbers(std::initializer_list<Real*> values);
-  Bool DropNumbers(Long count);
-  Bool TakeTable(GeTempDynArray<Real>& table, Long count);
   Bool ParseTilt();
   Bool ParseIncludedTilt();
   Bool ParseNumbers();
 
   BaseFile& file_;
+  IESWords words_;
   IESLight& light_;
   IESFactors factors_;
-  char buffer_[kBufferSize];
-  LLong bufferCount_ = 0;
-  LLong bufferPosition_ = 0;
-  char line_[kMaxLine + 1];
-  Long linePosition_ = 0;
-  char word_[kMaxWord + 1];
 };
-
-Bool IESParser::NextByte(char& byte)
-{
-  if (bufferPosition_ == bufferCount_) {
-    bufferCount_ = file_.ReadBytes(buffer_, kBufferSize, true);
-    bufferPosition_ = 0;
-    if (bufferCount_ <= 0) {
-      bufferCount_ = 0;
-      return false;
-    }
-  }
-  byte = buffer_[bufferPosition_++];
-  return true;
-}
-
-// Empty lines are passed over; what goes beyond the longest line is a line of its own.
-Bool IESParser::NextLine()
-{
-  Long length = 0;
-  char byte = 0;
-  while (length < kMaxLine && NextByte(byte)) {
-    if (byte == '\n' && length > 0)
-      break;
-    if (byte != '\n' && byte != '\r')
-      line_[length++] = byte;
-  }
-  line_[length] = '\0';
-  linePosition_ = 0;
-  return length > 0;
-}
-
-// The next word of the line, with the separator behind it taken too. An empty word stands before a comma or an equals
-// sign that no word precedes. False at the end of the line.
-Bool IESParser::TakeWord()
-{
-  while (IsBlank(line_[linePosition_]))
-    ++linePosition_;
-  if (line_[linePosition_] == '\0')
-    return false;
-  Long length = 0;
-  for (; !EndsWord(line_[linePosition_]); ++linePosition_) {
-    if (length < kMaxWord)
-      word_[length++] = line_[linePosition_];
-  }
-  word_[length] = '\0';
-  if (line_[linePosition_] != '\0')
-    ++linePosition_;
-  return true;
-}
-
-String IESParser::TakeText()
-{
-  while (IsBlank(line_[linePosition_]))
-    ++linePosition_;
-  return String(line_ + linePosition_);
-}
-
-Bool IESParser::TakeNumber(Real& value)
-{
-  while (!TakeWord()) {
-    if (!NextLine())
-      return false;
-  }
-  return ParseNumber(word_, value);
-}
-
-Bool IESParser::TakeInteger(Long& value)
-{
-  constexpr Real kLargest = 2147483647.0;
-  Real number = 0.0;
-  if (!TakeNumber(number))
-    return false;
-  value = static_cast<Long>(number > kLargest ? kLargest : number < -kLargest ? -kLargest : number);
-  return true;
-}
-
-Bool IESParser::TakeNumbers(std::initializer_list<Real*> values)
-{
-  for (Real* value : values) {
-    if (!TakeNumber(*value))
-      return false;
-  }
-  return true;
-}
-
-Bool IESParser::DropNumbers(Long count)
-{
-  Real dropped = 0.0;
-  for (Long i = 0; i < count; ++i) {
-    if (!TakeNumber(dropped))
-      return false;
-  }
-  return true;
-}
-
-// No count is trusted for memory: the table grows as its numbers come.
-Bool IESParser::TakeTable(GeTempDynArray<Real>& table, Long count)
-{
-  Real value = 0.0;
-  for (Long i = 0; i < count; ++i) {
-    if (!TakeNumber(value) || !table.Append(value))
-      return false;
-  }
-  return true;
-}
 
 Bool IESParser::ParseIncludedTilt()
 {
   Long geometry = 0;
   Long count = 0;
-  return TakeInteger(geometry) && TakeInteger(count) && DropNumbers(count) && DropNumbers(count);
+  return words_.TakeInteger(geometry) && words_.TakeInteger(count) && words_.DropNumbers(count) &&
+         words_.DropNumbers(count);
 }
 
 Bool IESParser::ParseNumbers()
@@ -327,20 +160,22 @@ Bool IESParser::ParseNumbers()
   Real watts = 0.0;
   if (light_.tiltMode == kIESTiltInclude && !ParseIncludedTilt())
     return false;
-  if (!TakeInteger(lampCount) || !TakeNumbers({&lampLumens, &multiplier}) || !TakeInteger(verticalCount) ||
-      !TakeInteger(horizontalCount) || !TakeInteger(photometry) || !TakeInteger(unit) || !TakeNumbers({&x, &l, &h}))
+  if (!words_.TakeInteger(lampCount) || !words_.TakeNumbers({&lampLumens, &multiplier}) ||
+      !words_.TakeInteger(verticalCount) || !words_.TakeInteger(horizontalCount) || !words_.TakeInteger(photometry) ||
+      !words_.TakeInteger(unit) || !words_.TakeNumbers({&x, &l, &h}))
     return false;
   SetShape(light_, x, l, h);
   if (unit == kUnitFeet)
     light_.size *= kFoot;
-  if (!TakeNumbers({&ballast, &future, &watts}))
+  if (!words_.TakeNumbers({&ballast, &future, &watts}))
     return false;
   for (Long count : {verticalCount, horizontalCount}) {
     if (count < 0 || count > kMaxIESAngles)
       return false;
   }
-  if (!TakeTable(light_.verticalAngles, verticalCount) || !TakeTable(light_.horizontalAngles, horizontalCount) ||
-      !TakeTable(light_.candela, verticalCount * horizontalCount))
+  if (!words_.TakeTable(light_.verticalAngles, verticalCount) ||
+      !words_.TakeTable(light_.horizontalAngles, horizontalCount) ||
+      !words_.TakeTable(light_.candela, verticalCount * horizontalCount))
     return false;
   const Real factor = multiplier * ballast * (factors_ == IESFactors::kAll ? watts : 1.0);
   for (Real& value : light_.candela) {
@@ -355,9 +190,9 @@ Bool IESParser::ParseNumbers()
 // The word behind "TILT" tells whether tilt data are included. Data in a file of their own can't be had.
 Bool IESParser::ParseTilt()
 {
-  if (!TakeWord())
+  if (!words_.TakeWord())
     return false;
-  switch (FindKeyword(word_)) {
+  switch (FindKeyword(words_.GetWord())) {
   case Keyword::kTiltNone:
     light_.tiltMode = kIESTiltNone;
     return ParseNumbers();
@@ -371,10 +206,10 @@ Bool IESParser::ParseTilt()
 
 Bool IESParser::Parse()
 {
-  while (NextLine()) {
-    if (!TakeWord())
+  while (words_.NextLine()) {
+    if (!words_.TakeWord())
       continue;
-    switch (FindKeyword(word_)) {
+    switch (FindKeyword(words_.GetWord())) {
     case Keyword::kVersion1991:
       light_.fileVersion = kIESVersion1991;
       break;
@@ -382,19 +217,19 @@ Bool IESParser::Parse()
       light_.fileVersion = kIESVersion1995;
       break;
     case Keyword::kManufacturer:
-      light_.manufacturer = TakeText();
+      light_.manufacturer = words_.TakeText();
       break;
     case Keyword::kLuminaireCatalogue:
-      light_.luminaireCatalogue = TakeText();
+      light_.luminaireCatalogue = words_.TakeText();
       break;
     case Keyword::kLuminaire:
-      light_.luminaire = TakeText();
+      light_.luminaire = words_.TakeText();
       break;
     case Keyword::kLampCatalogue:
-      light_.lampCatalogue = TakeText();
+      light_.lampCatalogue = words_.TakeText();
       break;
     case Keyword::kLamp:
-      light_.lamp = TakeText();
+      light_.lamp = words_.TakeText();
       break;
     case Keyword::kTilt:
       return ParseTilt() && file_.GetError() == FILEERROR_NONE;
@@ -451,8 +286,8 @@ Long LoadIESFile(IESLight*& light, const Filename& name, IESFactors factors)
   IESLight* loaded = NewObj<IESLight>();
   if (!loaded)
     return kIESNoMemory;
-  char head[kBufferSize];
-  const LLong count = file.ReadBytes(head, kBufferSize, true);
+  char head[kHeadSize];
+  const LLong count = file.ReadBytes(head, kHeadSize, true);
   Long result = kIESUnreadable;
   if (file.GetError() == FILEERROR_NONE && !HoldsMark(head, count))
     result = kIESNotPhotometric;
