@@ -78,7 +78,7 @@ class CCurve : public BaseList2D
   Bool RebuildIndex() const;
   const BaseTime& TimeOf(Long index) const;
   Real ValueOf(Long index) const;
-  CKey* NodeAt(Long index) const { return static_cast<CKey*>(keys_[index]); }
+  CKey* NodeAt(Long index) const { return keys_[index]; }
   Bool SetNodeValues(Long place, const KeyValues& values, Bool isNew);
   Bool SetRowValues(Long place, const KeyValues& values, Bool isNew);
   void ForgetKey(const CKey& key);
@@ -90,7 +90,7 @@ class CCurve : public BaseList2D
   // The nodes in order, none while the keys are rows, and the list that owns the same keys in the same order. Nodes
   // beyond the range of times that a file held are in the list alone. Who asks for a node changes the form of what the
   // curve holds, but not what it holds.
-  mutable GeToolDynArray keys_;
+  mutable GeTempDynArray<CKey*> keys_;
   mutable KeyList keyRoot_;
 };
 

@@ -47,6 +47,9 @@ class DrawPort : public GeMemory
   void SetOwner(Bitmap* owner) { owner_ = owner; }
 
  protected:
+  // Those of any port, to be written to.
+  static UChar* PixelsOf(DrawPort& port) { return port.pixels_; }
+
   Long width_ = 0;
   Long height_ = 0;
   Long bits_;

@@ -16,14 +16,14 @@ constexpr LLong kColorBytes = 3;
 
 Bool IndependentDrawPort::CopyTo(DrawPort& destination) const
 {
-  auto& target = static_cast<IndependentDrawPort&>(destination);
-  if (!pixels_ || !target.pixels_)
+  UChar* target = PixelsOf(destination);
+  if (!pixels_ || !target)
     return false;
-  if (width_ != target.width_ || height_ != target.height_ || bits_ != target.bits_ || rowSize_ != target.rowSize_ ||
-      depth_ != target.depth_)
+  if (width_ != destination.GetWidth() || height_ != destination.GetHeight() || bits_ != destination.GetBits() ||
+      rowSize_ != destination.GetRowSize() || depth_ != destination.GetDepth())
     return false;
-  if (this != &target)
-    GeCopyMem(target.pixels_, pixels_, rowSize_ * height_);
+  if (this != &destination)
+    GeCopyMem(target, pixels_, rowSize_ * height_);
   return true;
 }
 
