@@ -12,6 +12,7 @@
 #include "torvane/tags/base_tag.h"
 #include "torvane/tags/texture_tag.h"
 #include "torvane/views/base_draw.h"
+#include "values.h"
 
 namespace q7r
 {
@@ -116,6 +117,16 @@ std::string SummaryOf(BaseList2D& node)
     return DocumentWords(*document);
   auto* draw = NodeCast<BaseDraw>(&node);
   return draw ? DrawWords(*draw) : std::string();
+}
+
+void TellRaw(ValueSink& sink, Long level, const void* data, LLong size)
+{
+  if (size == 0)
+    return;
+  sink.Key("raw");
+  sink.BeginObject(ValueSink::Layout::kLine);
+  TellBytes(sink, level, data, size);
+  sink.EndObject();
 }
 
 } // namespace q7r

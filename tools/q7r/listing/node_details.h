@@ -24,6 +24,9 @@ void TellLightLists(ValueSink& sink, _torvane_::BaseObject& object);
 // The measured distribution of a light ("ies"); nothing without one.
 void TellObjectIES(ValueSink& sink, _torvane_::BaseObject& object);
 
+// What a node of an unknown type keeps ("raw"); nothing where it keeps nothing.
+void TellRaw(ValueSink& sink, _torvane_::Long level, const void* data, _torvane_::LLong size);
+
 // "name" in quotes.
 std::string QuotedName(const _torvane_::BaseList2D& node);
 // "  (1, 2, 3)" without the spaces.

@@ -1,12 +1,11 @@
 // What a scene holds, told once for all listings: for programs, for people and for comparing.
 #pragma once
 
-#include <array>
 #include <string>
-#include <string_view>
 #include <utility>
 
 #include "node_index.h"
+#include "node_lists.h"
 #include "output/value_sink.h"
 #include "torvane/animation/ctrack.h"
 #include "torvane/document/base_document.h"
@@ -28,29 +27,6 @@ struct Scope
   bool identity = false; // markers and states of nodes
   int depth = -1;        // levels of children; -1: all
   std::string objects;   // a pattern for names: these objects alone, with all below them; empty: everything
-};
-
-// The lists that a node owns, with the names that listings give them.
-struct NodeList
-{
-  const char* name = nullptr;
-  const _torvane_::RootList2D* root = nullptr; // null: an empty list
-};
-
-class NodeLists
-{
- public:
-  explicit NodeLists(_torvane_::BaseList2D& node);
-
-  const NodeList* begin() const { return lists_.data(); }
-  const NodeList* end() const { return lists_.data() + count_; }
-
- private:
-  void Add(const char* name, const _torvane_::RootList2D* root, bool always);
-
-  static constexpr std::size_t kMost = 8;
-  std::array<NodeList, kMost> lists_;
-  std::size_t count_ = 0;
 };
 
 class SceneTeller
@@ -89,8 +65,5 @@ class SceneTeller
   NodeIndex index_;
   _torvane_::Matrix up_; // the global matrix of the object above
 };
-
-// True if a name fits a pattern: "*" for any text, "?" for one character, all else for itself.
-bool Fits(std::string_view name, std::string_view pattern);
 
 } // namespace q7r
