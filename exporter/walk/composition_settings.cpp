@@ -45,6 +45,14 @@ RenderData* ProvideRenderData(BaseDocument& document)
   return data;
 }
 
+void SetTimes(BaseDocument& document, const BaseTime& start, const BaseTime& lastFrame)
+{
+  document.SetParameterById(kDocumentMinTime, start);
+  document.SetParameterById(kDocumentLoopMin, start);
+  document.SetParameterById(kDocumentMaxTime, lastFrame);
+  document.SetParameterById(kDocumentLoopMax, lastFrame);
+}
+
 } // namespace
 
 bool ReadCompositionSettings(ExportContext& context, AEGP_CompH composition, AEGP_ItemH compositionItem, A_long& width,
@@ -61,8 +69,6 @@ bool ReadCompositionSettings(ExportContext& context, AEGP_CompH composition, AEG
   document.SetParameterById(kDocumentFps, context.framesPerSecond);
   host(&AEGP_CompSuite15::AEGP_GetCompWorkAreaStart, composition, &context.workAreaStart);
   const BaseTime start = ToBaseTime(context.workAreaStart);
-  document.SetParameterById(kDocumentMinTime, start);
-  document.SetParameterById(kDocumentLoopMin, start);
   host(&AEGP_CompSuite15::AEGP_GetCompWorkAreaDuration, composition, &context.workAreaDuration);
   host(&AEGP_CompSuite15::AEGP_GetCompFrameDuration, composition, &context.frameDuration);
   host(&AEGP_ItemSuite13::AEGP_GetItemDimensions, compositionItem, &width, &height);
@@ -72,9 +78,7 @@ bool ReadCompositionSettings(ExportContext& context, AEGP_CompH composition, AEG
   const Real filmAspect = height == 0 ? 0.0 : static_cast<Real>(width) / height * context.pixelAspect;
   context.frameCount = CountFrames(context.workAreaDuration, context.frameDuration, context.frameCount);
   const BaseTime end = AddUnreduced(start, ToBaseTime(context.workAreaDuration));
-  const BaseTime lastFrame = start + KeyTime(context, context.frameCount - 1);
-  document.SetParameterById(kDocumentMaxTime, lastFrame);
-  document.SetParameterById(kDocumentLoopMax, lastFrame);
+  SetTimes(document, start, start + KeyTime(context, context.frameCount - 1));
 
   RenderData* settings = ProvideRenderData(document);
   if (!settings)

@@ -114,6 +114,17 @@ std::size_t Output::AddBytes(const std::vector<std::uint8_t>& bytes)
   return AddView(bytes.data(), bytes.size(), ViewTarget::kNone);
 }
 
+void Output::AddAnimation(std::string& text, const Json& animation)
+{
+  if (animationChannels.Count() == 0)
+    return;
+  const std::string rest = animation.empty() ? "" : Dump(animation).substr(1); // with the brace that closes it
+  text.append(",\"animations\":[{\"channels\":[").append(animationChannels.Text()).append("],\"samplers\":[");
+  text.append(animationSamplers.Text()).append("]").append(rest.empty() ? "}" : "," + rest).append("]");
+  animationChannels.Release();
+  animationSamplers.Release();
+}
+
 std::string Output::Finish(const std::string& generator, const Json& scene, const Json& animation,
                            const std::string& bufferUri)
 {
@@ -141,13 +152,7 @@ std::string Output::Finish(const std::string& generator, const Json& scene, cons
   add("textures", textures);
   add("images", images);
   add("samplers", samplers);
-  if (animationChannels.Count() > 0) {
-    const std::string rest = animation.empty() ? "" : Dump(animation).substr(1); // with the brace that closes it
-    text.append(",\"animations\":[{\"channels\":[").append(animationChannels.Text()).append("],\"samplers\":[");
-    text.append(animationSamplers.Text()).append("]").append(rest.empty() ? "}" : "," + rest).append("]");
-    animationChannels.Release();
-    animationSamplers.Release();
-  }
+  AddAnimation(text, animation);
   add("accessors", accessors_);
   add("bufferViews", views_);
   if (bytes_.Size() > 0) {

@@ -61,6 +61,7 @@ class Output
  private:
   std::size_t AddView(const void* data, std::size_t size, ViewTarget target);
   std::size_t AddAccessor(std::size_t view, int componentType, std::size_t count, const char* type, const Json& bounds);
+  void AddAnimation(std::string& text, const Json& animation);
 
   Section accessors_;
   Section views_;

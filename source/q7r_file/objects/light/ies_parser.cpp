@@ -128,6 +128,8 @@ class IESParser
   Bool ParseTilt();
   Bool ParseIncludedTilt();
   Bool ParseNumbers();
+  Bool ParseTables(Long verticalCount, Long horizontalCount);
+  Bool Multiply(Real factor);
 
   BaseFile& file_;
   IESWords words_;
@@ -141,6 +143,28 @@ Bool IESParser::ParseIncludedTilt()
   Long count = 0;
   return words_.TakeInteger(geometry) && words_.TakeInteger(count) && words_.DropNumbers(count) &&
          words_.DropNumbers(count);
+}
+
+Bool IESParser::ParseTables(Long verticalCount, Long horizontalCount)
+{
+  for (Long count : {verticalCount, horizontalCount}) {
+    if (count < 0 || count > kMaxIESAngles)
+      return false;
+  }
+  return words_.TakeTable(light_.verticalAngles, verticalCount) &&
+         words_.TakeTable(light_.horizontalAngles, horizontalCount) &&
+         words_.TakeTable(light_.candela, verticalCount * horizontalCount);
+}
+
+// False when a product is no number any more.
+Bool IESParser::Multiply(Real factor)
+{
+  for (Real& value : light_.candela) {
+    value *= factor;
+    if (!std::isfinite(value))
+      return false;
+  }
+  return true;
 }
 
 Bool IESParser::ParseNumbers()
@@ -169,20 +193,9 @@ Bool IESParser::ParseNumbers()
     light_.size *= kFoot;
   if (!words_.TakeNumbers({&ballast, &future, &watts}))
     return false;
-  for (Long count : {verticalCount, horizontalCount}) {
-    if (count < 0 || count > kMaxIESAngles)
-      return false;
-  }
-  if (!words_.TakeTable(light_.verticalAngles, verticalCount) ||
-      !words_.TakeTable(light_.horizontalAngles, horizontalCount) ||
-      !words_.TakeTable(light_.candela, verticalCount * horizontalCount))
+  if (!ParseTables(verticalCount, horizontalCount) ||
+      !Multiply(multiplier * ballast * (factors_ == IESFactors::kAll ? watts : 1.0)))
     return false;
-  const Real factor = multiplier * ballast * (factors_ == IESFactors::kAll ? watts : 1.0);
-  for (Real& value : light_.candela) {
-    value *= factor;
-    if (!std::isfinite(value))
-      return false;
-  }
   light_.Normalise();
   return true;
 }
