@@ -351,44 +351,4 @@ TEST_F(GeDataTest, PassesOverAnOldMemoryValueAndRefusesOtherTypes)
   EXPECT_EQ(ReadAndWrite(ByteWriter().Long(kDataLink).Memory(""), 13000), "failed");
 }
 
-TEST_F(GeDataTest, FailsOnEveryCutOfAValueWithoutReadingPastIt)
-{
-  for (const Form& form : Forms()) {
-    std::vector<std::uint8_t> bytes = WriteToMemory([&](HyperFile& file) { form.value.Write(file); }, true);
-    if (form.value.GetType() >= kDataFirstCustom)
-      bytes.pop_back(); // a raw body ends with the file
-    for (std::size_t length = 13; length < bytes.size(); ++length) {
-      MemoryReadFile source({bytes.begin(), bytes.begin() + static_cast<std::ptrdiff_t>(length)});
-      GeData value;
-      if (form.value.GetType() < kDataFirstCustom)
-        EXPECT_FALSE(value.Read(source.file)) << form.value.GetType() << " cut at " << length;
-      else
-        value.Read(source.file);
-    }
-  }
-}
-
-TEST_F(GeDataTest, GivesNilOrAFailureWheneverMemoryRunsOut)
-{
-  std::vector<Form> forms = Forms();
-  BaseContainer all;
-  for (const Form& form : forms)
-    all.InsertData(all.GetCount(), form.value);
-  all.InsertData(100, GeData(all));
-  const GeData whole(all);
-  std::vector<std::uint8_t> bytes = WriteToMemory([&](HyperFile& file) { whole.Write(file); }, true);
-
-  const auto written = [](const auto& value) { return Written(*value); };
-  EveryFailedAllocation([&] { return Owned<GeData>(NewObj<GeData>(whole)); }, written);
-  EveryFailedAllocation(
-      [&] {
-        MemoryReadFile source(bytes);
-        Owned<GeData> value(NewObj<GeData>());
-        const bool done = value && source.opened && value->Read(source.file);
-        EXPECT_TRUE(done || !value || value->GetType() == kDataNil);
-        return done && source.file.HasMemory() ? std::move(value) : nullptr;
-      },
-      written);
-}
-
 } // namespace

@@ -308,11 +308,6 @@ TEST(BaseObject, MakesTheTypesOfItsTable)
 TEST(BaseObject, TellsAndTakesItsParameters)
 {
   BaseObject object(kObjectNull);
-  for (Long id : {901, 902, 907, 913, 928}) {
-    GeData value;
-    ASSERT_TRUE(object.SetParameterById(id, GeData(static_cast<Long>(id % 5))));
-    EXPECT_EQ(ParameterOf(object, id).GetLong(), id % 5) << id;
-  }
   for (Long id : {903, 904, 905, 908, 912, 917, 918, 919, 925, 926, 927}) {
     BaseObject one(kObjectNull);
     GeData value;
@@ -323,7 +318,6 @@ TEST(BaseObject, TellsAndTakesItsParameters)
     ASSERT_TRUE(one.GetParameter(ParameterPath({id, 0, 0}, {kVectorZ, 0, 0}), value));
     EXPECT_EQ(value.GetReal(), 0.3) << id;
   }
-  GeData value;
   object.SetParameterById(kObjectEnabled, GeData(false));
   EXPECT_EQ(object.GetDisabled(), 1);
   EXPECT_EQ(ParameterOf(object, kObjectEnabled).GetLong(), 0);

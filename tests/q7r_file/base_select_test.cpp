@@ -226,15 +226,6 @@ TEST(BaseSelect, IsCopied)
   EXPECT_EQ(target.SegmentArray(), nullptr);
 }
 
-TEST(BaseSelect, BringsTheSegmentsOfAFileIntoOrder)
-{
-  BaseSelect set;
-  EXPECT_TRUE(ReadFrom(set, Record("L7 L8 L9 L-4 L1 L7 L3 L2 L2 L9 L12 L8 L8 L-9 L-5 ]")));
-  EXPECT_EQ(SegmentsOf(set), (Segments{{0, 2}, {8, 12}}));
-  EXPECT_TRUE(ReadFrom(set, Record("L1 L3 L2 ]")));
-  EXPECT_EQ(set.SegmentArray(), nullptr);
-}
-
 TEST(BaseSelect, ReadsAMillionSingleNumbersInAFewAllocations)
 {
   constexpr Long kCount = 1000000;
