@@ -1,11 +1,7 @@
-#include <cmath>
-#include <tuple>
 
-#include <gtest/gtest.h>
 
 #include "export_fixture.h"
 #include "exporter/walk/camera.h"
-#include "torvane/views/base_draw.h"
 
 namespace
 {

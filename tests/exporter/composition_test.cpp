@@ -1,10 +1,6 @@
-#include <tuple>
 
-#include <gtest/gtest.h>
 
 #include "export_fixture.h"
-#include "torvane/layers/layer_object.h"
-#include "torvane/render/render_data.h"
 
 namespace
 {

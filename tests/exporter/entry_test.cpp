@@ -1,19 +1,13 @@
-#include <gtest/gtest.h>
 
-#include <algorithm>
 #include <filesystem>
 #include <fstream>
-#include <set>
 
 #include "export_fixture.h"
 #include "exporter/entry/dialog_scripts.h"
 #include "exporter/entry/message_table.h"
 #include "exporter/entry/plugin_state.h"
 #include "exporter/entry/scene_writer.h"
-#include "support/counting_memory.h"
-#include "support/every_failed_allocation.h"
 #include "support/full_scene.h"
-#include "support/temp_folder.h"
 
 namespace
 {

@@ -1,25 +1,14 @@
 // Exports compositions that are written down in the tests, through the standalone host.
 #pragma once
 
-#include <memory>
 #include <sstream>
-#include <string>
-#include <vector>
-
-#include <gtest/gtest.h>
 
 #include "exporter/walk/composition.h"
 #include "host/standalone_host.h"
-#include "torvane/animation/ctrack.h"
-#include "torvane/document/base_document.h"
-#include "torvane/math/ge_math.h"
-#include "torvane/memory/owned.h"
-#include "torvane/tags/base_tag.h"
+#include "support/library.h"
 
 namespace export_test
 {
-
-using namespace _torvane_;
 
 // A composition of 1000 by 500 pixels, 10 frames at 25 a second, named "Main". `more` is further keys.
 inline std::string Composition(const std::string& layers, const std::string& more = "")

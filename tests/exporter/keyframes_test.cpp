@@ -1,7 +1,4 @@
 // Sampled animation: which frames are read, what their keys are, and which of them are left.
-#include <tuple>
-
-#include <gtest/gtest.h>
 
 #include "export_fixture.h"
 #include "exporter/entry/plugin_state.h"

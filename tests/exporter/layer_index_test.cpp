@@ -1,17 +1,11 @@
-#include <gtest/gtest.h>
 
-#include <memory>
-#include <random>
-#include <vector>
 
 #include "exporter/walk/layer_index.h"
-#include "torvane/document/base_document.h"
-#include "torvane/memory/owned.h"
+#include "support/library.h"
 
 namespace
 {
 
-using namespace _torvane_;
 using exporter::FindLayerObject;
 using exporter::LayerIndex;
 

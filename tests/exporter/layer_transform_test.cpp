@@ -1,8 +1,4 @@
 // The place of a layer's object: anchors, parents, rotation, targets, and what all kinds of layer share.
-#include <algorithm>
-#include <tuple>
-
-#include <gtest/gtest.h>
 
 #include "export_fixture.h"
 

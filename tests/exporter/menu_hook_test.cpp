@@ -1,6 +1,5 @@
-#include <gtest/gtest.h>
-
 #include <cstring>
+#include <gtest/gtest.h>
 
 #include "exporter/entry/hooks.h"
 #include "exporter/entry/plugin_state.h"

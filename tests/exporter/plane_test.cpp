@@ -1,11 +1,6 @@
 #include <filesystem>
-#include <tuple>
-
-#include <gtest/gtest.h>
 
 #include "export_fixture.h"
-#include "torvane/materials/material.h"
-#include "torvane/shaders/base_shader.h"
 
 namespace
 {

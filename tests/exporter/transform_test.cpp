@@ -1,6 +1,5 @@
-#include <tuple>
-
 #include <gtest/gtest.h>
+#include <tuple>
 
 #include "exporter/walk/transform.h"
 

@@ -1,7 +1,5 @@
 // Cameras and lights, still and animated.
 #include "tests/gltf/converted_scene.h"
-#include "torvane/objects/ies_light.h"
-#include "torvane/objects/light_object_data.h"
 
 namespace
 {

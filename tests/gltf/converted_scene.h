@@ -1,33 +1,15 @@
 // Scenes composed for a conversion, and what comes out of it as JSON and numbers.
 #pragma once
 
-#include <bit>
-#include <cmath>
-#include <cstring>
-#include <string>
-#include <vector>
-
-#include <gtest/gtest.h>
 #include <nlohmann/json.hpp>
 
 #include "gltf/converter.h"
 #include "gltf/file/checker.h"
-#include "support/scene_bytes.h"
-#include "support/text.h"
-#include "torvane/animation/ctrack.h"
-#include "torvane/layers/layer_object.h"
-#include "torvane/materials/material.h"
-#include "torvane/objects/base_object.h"
-#include "torvane/objects/camera_object_data.h"
-#include "torvane/objects/light_parameters.h"
-#include "torvane/tags/base_tag.h"
-#include "torvane/tags/texture_tag.h"
-#include "torvane/values/ge_data.h"
+#include "support/library.h"
 
 namespace gltf_test
 {
 
-using namespace _torvane_;
 using Json = nlohmann::json;
 using gltf::Loss;
 

@@ -1,10 +1,5 @@
 // Polygons, splines and points of scenes from elsewhere.
-#include "support/temp_folder.h"
 #include "tests/gltf/converted_scene.h"
-#include "torvane/objects/point_object.h"
-#include "torvane/objects/spline_object.h"
-#include "torvane/tags/selection_tag.h"
-#include "torvane/tags/value_tags.h"
 
 namespace
 {

@@ -1,8 +1,5 @@
 // The tree, names, places and what is seen.
 #include "tests/gltf/converted_scene.h"
-#include "torvane/objects/camera_object_data.h"
-#include "torvane/objects/light_object_data.h"
-#include "torvane/values/custom_data.h"
 
 namespace
 {

@@ -1,8 +1,7 @@
 // Pages: what is in them, and the verb that makes them. What they show is looked at in a browser, by tests/browser.
-#include "gltf/page/page.h"
-
 #include <regex>
 
+#include "gltf/page/page.h"
 #include "support/run_q7r.h"
 #include "tests/gltf/converted_scene.h"
 

@@ -1,14 +1,10 @@
 // Planes, materials and their pictures.
-#include "support/temp_folder.h"
 #include "tests/gltf/converted_scene.h"
-#include "torvane/shaders/base_shader.h"
 
 namespace
 {
 
 using namespace gltf_test;
-
-using Bytes = std::vector<std::uint8_t>;
 
 // A PNG of no meaning but with all that is looked at: the check sums are zero.
 Bytes Png(std::uint8_t colorType, bool transparent = false, std::uint8_t width = 2)

@@ -1,14 +1,27 @@
 // Runs the built program as its users do.
 #pragma once
 
+#include <algorithm>
+#include <cmath>
 #include <cstdlib>
+#include <functional>
+#include <random>
+#include <set>
+#include <sstream>
 #include <string>
+#include <tuple>
+
+#include <gtest/gtest.h>
+#include <nlohmann/json.hpp>
 
 #include "support/temp_folder.h"
 
 #ifndef _WIN32
 #include <sys/wait.h>
 #endif
+
+using Bytes = std::vector<std::uint8_t>;
+using Json = nlohmann::json;
 
 struct RunResult
 {

@@ -1,16 +1,10 @@
 // The program as its users meet it: results, exit status, and one plain line for everything that goes wrong.
-#include <gtest/gtest.h>
-
-#include <algorithm>
-#include <random>
 
 #include "support/record_samples.h"
 #include "support/run_q7r.h"
 
 namespace
 {
-
-using Bytes = std::vector<std::uint8_t>;
 
 constexpr const char* kComposition = R"({"fr":25,"ip":0,"op":50,"w":1000,"h":500,"nm":"Main","layers":[
   {"ddd":1,"ty":13,"nm":"Eye","ks":{"p":{"k":[500,250,-800]}},"pe":{"k":800}},

@@ -1,22 +1,13 @@
 // q7r diff: sees every change, and nothing where there is none.
-#include <gtest/gtest.h>
-
-#include <functional>
-
-#include <nlohmann/json.hpp>
 
 #include "support/full_scene.h"
-#include "support/record_samples.h"
+#include "support/library.h"
 #include "support/run_q7r.h"
-#include "torvane/objects/point_object.h"
 
 namespace
 {
 
-using namespace _torvane_;
 using full_scene::MakeFullScene;
-using Bytes = std::vector<std::uint8_t>;
-using Json = nlohmann::json;
 
 std::string Save(const TempFolder& folder, const std::string& name, BaseDocument& document)
 {

@@ -1,8 +1,5 @@
 // Every call to the system that a verb makes fails in turn: then the verb has done its work, or it says why not and has
 // changed nothing. A signal in its place leaves nothing behind either.
-#include <gtest/gtest.h>
-
-#include <set>
 
 #include "support/run_q7r.h"
 
@@ -10,8 +7,6 @@
 
 namespace
 {
-
-using Bytes = std::vector<std::uint8_t>;
 
 constexpr const char* kComposition = R"({"fr":25,"ip":0,"op":5,"w":100,"h":50,"nm":"Main","layers":[
   {"ddd":1,"ty":1,"nm":"Wall","sw":100,"sh":50,"sc":"#ff8000","ks":{"p":{"k":[10,20,30]}}}]})";

@@ -1,22 +1,10 @@
 // Points, polygons, splines and selections as the program lists them, and through a resave.
-#include <climits>
 
-#include <gtest/gtest.h>
-#include <nlohmann/json.hpp>
-
-#include "support/byte_writer.h"
+#include "support/library.h"
 #include "support/run_q7r.h"
-#include "torvane/document/base_document.h"
-#include "torvane/objects/point_object_data.h"
-#include "torvane/objects/spline_object.h"
-#include "torvane/tags/selection_tag.h"
-#include "torvane/tags/value_tags.h"
 
 namespace
 {
-
-using namespace _torvane_;
-using Json = nlohmann::json;
 
 template <class Tag>
 Tag* AddTag(BaseObject& object, Long type, const char* name = "")

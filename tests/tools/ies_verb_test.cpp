@@ -1,21 +1,10 @@
 // The verb ies on makers' files and on files that it can't read; lights, cameras and views in tree.
-#include <cmath>
 
-#include <gtest/gtest.h>
-
-#include <nlohmann/json.hpp>
-
+#include "support/library.h"
 #include "support/run_q7r.h"
-#include "support/scene_bytes.h"
-#include "torvane/objects/base_object.h"
-#include "torvane/objects/light_object_data.h"
-#include "torvane/values/ge_data.h"
 
 namespace
 {
-
-using namespace _torvane_;
-using Json = nlohmann::json;
 
 const std::string kFile = "IESNA91\n[MANUFAC] Sun\n[LUMINAIRE] Disc \"A\"\nTILT=NONE\n"
                           "1 -1 2 2 1 1 1 -1 0 0  1 1 50  0 180  0  100 100\n";

@@ -1,9 +1,4 @@
 // What --json prints: all of it fits docs/json-schema.json, and says what it should.
-#include <gtest/gtest.h>
-
-#include <sstream>
-
-#include <nlohmann/json.hpp>
 
 #include "support/full_scene.h"
 #include "support/json_schema.h"
@@ -13,7 +8,6 @@ namespace
 {
 
 using namespace _torvane_;
-using Json = nlohmann::json;
 
 const JsonSchema& Schema()
 {

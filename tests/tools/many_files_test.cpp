@@ -1,7 +1,4 @@
 // Many files at a time, standard input and output, scenes that come out the same again, pictures and their paths.
-#include <gtest/gtest.h>
-
-#include <nlohmann/json.hpp>
 
 #include "support/run_q7r.h"
 
@@ -9,7 +6,6 @@ namespace
 {
 
 namespace fs = std::filesystem;
-using Bytes = std::vector<std::uint8_t>;
 
 constexpr const char* kShot = R"({"fr":25,"ip":0,"op":9,"w":90,"h":50,"nm":"Main","assets":[
   {"id":"a","u":"pictures/","p":"a.png","w":9,"h":9},{"id":"b","p":"gone.png","w":9,"h":9},

@@ -1,18 +1,10 @@
 // Materials in listings: for people with colour, channels and shaders, for programs with everything.
-#include <gtest/gtest.h>
 
-#include <nlohmann/json.hpp>
-
+#include "support/library.h"
 #include "support/run_q7r.h"
-#include "support/scene_bytes.h"
-#include "torvane/materials/material.h"
-#include "torvane/shaders/base_shader.h"
-#include "torvane/values/ge_data.h"
 
 namespace
 {
-
-using namespace _torvane_;
 
 constexpr Long kUnknownType = 1012345;
 

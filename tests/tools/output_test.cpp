@@ -1,25 +1,14 @@
 // Where the program's outputs go: odd names, links, devices, rights, limits; how long a listing becomes.
-#include <gtest/gtest.h>
 
-#include <nlohmann/json.hpp>
-#include <sstream>
 #include <thread>
 
-#include "support/byte_writer.h"
+#include "support/library.h"
 #include "support/run_q7r.h"
-#include "support/scene_bytes.h"
-#include "torvane/animation/ctrack.h"
-#include "torvane/materials/material.h"
-#include "torvane/objects/base_object.h"
-#include "torvane/render/render_data.h"
-#include "torvane/shaders/base_shader.h"
-#include "torvane/views/base_draw.h"
 
 namespace
 {
 
 namespace fs = std::filesystem;
-using Bytes = std::vector<std::uint8_t>;
 
 const std::string kComposition = R"({"fr":25,"ip":0,"op":50,"w":100,"h":50,"nm":"Main","layers":[
   {"ddd":1,"ty":1,"nm":"Wall","sw":100,"sh":50,"sc":"#ff8000","ks":{"p":{"k":[10,20,30]}}}]})";

@@ -1,5 +1,4 @@
 // Preview pictures, put into scenes and taken out of them by the program.
-#include <gtest/gtest.h>
 
 #include "support/byte_writer.h"
 #include "support/pictures.h"
@@ -9,8 +8,6 @@ using namespace _torvane_;
 
 namespace
 {
-
-using Bytes = std::vector<std::uint8_t>;
 
 // A scene whose file information holds a picture; `tail` follows inside the frame.
 Bytes SceneWith(const Bytes& picture, const Bytes& tail)

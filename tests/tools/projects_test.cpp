@@ -1,9 +1,5 @@
 // The verbs on After Effects projects: lists, extracted compositions that export to the same scene, footage that has
 // moved, samples, choices.
-#include <gtest/gtest.h>
-
-#include <algorithm>
-#include <nlohmann/json.hpp>
 
 #include "host/project_bytes.h"
 #include "support/run_q7r.h"

@@ -1,20 +1,10 @@
 // What the listing for programs gives beside names: numbers of links and layers, places in the world, whole tracks.
-#include <gtest/gtest.h>
 
-#include <nlohmann/json.hpp>
-
+#include "support/library.h"
 #include "support/run_q7r.h"
-#include "support/scene_bytes.h"
-#include "torvane/animation/ctrack.h"
-#include "torvane/layers/layer_object.h"
-#include "torvane/materials/material.h"
-#include "torvane/tags/texture_tag.h"
 
 namespace
 {
-
-using namespace _torvane_;
-using Json = nlohmann::json;
 
 TEST(SceneTree, TellsNodesOfOneNameApart)
 {
