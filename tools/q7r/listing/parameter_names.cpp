@@ -34,8 +34,11 @@ constexpr NumberWords kProjections[] = {{kProjectionPerspective, "perspective"},
                                         {3, "parallel, along an axis"},
                                         {6, "parallel, along an axis"},
                                         {0, nullptr}};
-constexpr NumberWords kLightTypes[] = {
-    {kLightPoint, "point"}, {kLightSpot, "spot"}, {kLightOther, "parallel"}, {kLightIES, "measured"}, {0, nullptr}};
+constexpr NumberWords kLightTypes[] = {{kLightPoint, "point"},
+                                       {kLightSpot, "spot"},
+                                       {kLightOther, "parallel or ambient"},
+                                       {kLightIES, "measured"},
+                                       {0, nullptr}};
 constexpr NumberWords kShadows[] = {{kLightShadowNone, "none"}, {kLightShadowOn, "on"}, {0, nullptr}};
 constexpr NumberWords kTextureProjections[] = {{kTextureProjectionUVW, "texture coordinates"}, {0, nullptr}};
 constexpr NumberWords kShapes[] = {
