@@ -38,6 +38,7 @@ class BaseDraw : public BaseList2D
   GeAliasLink& GetSceneCamera() { return sceneCamera_; }
   // The draw's own camera, made when it is first asked for; null when memory is short.
   BaseObject* GetEditorCamera();
+  Bool HasEditorCamera() const { return editorCamera_ != nullptr; }
 
  protected:
   GeListNode* MakeEmpty() const override { return NewObj<BaseDraw>(); }

@@ -15,6 +15,9 @@ namespace q7r
 std::string SummaryOf(_torvane_::BaseList2D& node);
 std::string ObjectWords(_torvane_::BaseObject& object);
 std::string MaterialWords(_torvane_::BaseList2D& material);
+// A draw's own camera. One that has none yet stays without, as a file may hold many such: it has the camera of `plain`,
+// a new draw.
+_torvane_::BaseObject& EditorCameraOf(_torvane_::BaseDraw& draw, _torvane_::BaseDraw& plain);
 std::string DrawWords(_torvane_::BaseDraw& draw);
 
 // The parameters of an object's own data, by id ("params"); an empty object where there are none.

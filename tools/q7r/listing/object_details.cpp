@@ -168,13 +168,20 @@ std::string ObjectWords(BaseObject& object)
   return LightDataOf(object) ? LightWords(object) : GeometryWords(object);
 }
 
-std::string DrawWords(BaseDraw& draw)
+BaseObject& EditorCameraOf(BaseDraw& draw, BaseDraw& plain)
 {
-  const BaseObject* editor = draw.GetEditorCamera();
+  BaseObject* editor = (draw.HasEditorCamera() ? draw : plain).GetEditorCamera();
   if (!editor)
     throw std::bad_alloc();
+  return *editor;
+}
+
+std::string DrawWords(BaseDraw& draw)
+{
+  BaseDraw plain;
+  const BaseObject& editor = EditorCameraOf(draw, plain);
   const BaseList2D* camera = TargetOf(draw.GetSceneCamera());
-  return ProjectionWords(editor->GetDataInstance().GetLong(kCameraProjection)) +
+  return ProjectionWords(editor.GetDataInstance().GetLong(kCameraProjection)) +
          (camera ? " through " + QuotedName(*camera) : std::string());
 }
 

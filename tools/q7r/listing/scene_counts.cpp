@@ -45,7 +45,8 @@ void CountNode(BaseList2D& node, SceneCounts& counts)
   } else if (auto* panel = NodeCast<ViewPanel>(&node)) {
     CountNodes(panel->GetDraws().GetFirst(), counts);
   } else if (auto* draw = NodeCast<BaseDraw>(&node)) {
-    CountTracks(*draw->GetEditorCamera(), counts); // not an object of the scene
+    if (draw->HasEditorCamera())
+      CountTracks(*draw->GetEditorCamera(), counts); // not an object of the scene
   }
 }
 

@@ -187,7 +187,8 @@ void SceneTeller::TellDraw(BaseDraw& draw)
     sink_.Key("sceneCameraIndex");
     index_.TellPath(sink_, draw.GetSceneCamera().GetLink());
   }
-  BaseObject& editor = *draw.GetEditorCamera();
+  BaseDraw plain;
+  BaseObject& editor = EditorCameraOf(draw, plain);
   sink_.Key("camera");
   sink_.BeginObject();
   TellTransform(sink_, editor.GetRelPos(), editor.GetRelScale(), editor.GetRelRot());
