@@ -140,6 +140,8 @@ TEST(Light, LosesABadDistributionOnly)
     EXPECT_EQ(GetIESLight(light.get()), nullptr);
     EXPECT_EQ(ParameterOf(*light, 1002).GetLong(), 93);
   }
+  const auto load = [] { EXPECT_EQ(ReadLight(WithMore("B1 L4 L0 L1 R0 L1024 L1024 R1"), 6), nullptr); };
+  EXPECT_LT(counting_memory::PeakOf(load), 100000) << "a table that the file doesn't hold";
 }
 
 TEST(Light, TakesADistributionWithItsEntriesInTheUnitOfTheDocument)
