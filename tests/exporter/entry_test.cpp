@@ -163,14 +163,7 @@ TEST_F(CommandHook, AsksBeforeItReplacesTheFileThatWasNamed)
 
 TEST_F(CommandHook, ForcesTheSuffixWithoutAskingForTheNewName)
 {
-  struct Case
-  {
-    const char* typed;
-    const char* existing;
-    int questions;
-    const char* written;
-  };
-  const Case cases[] = {
+  const std::tuple<const char*, const char*, int, const char*> cases[] = {
       {"plain", "plain.q7r", 0, "plain.q7r"},
       {"a.txt", "a.txt", 1, "a.q7r"},
       {"b.Q7R", "none", 0, "b.Q7R"},
@@ -178,14 +171,14 @@ TEST_F(CommandHook, ForcesTheSuffixWithoutAskingForTheNewName)
       {"d.suffix7", "none", 0, "d.suffix7.q7r"},
       {"\xC3\xA9t\xC3\xA9", "none", 0, "\xC3\xA9t\xC3\xA9.q7r"},
   };
-  for (const Case& c : cases) {
+  for (const auto& [typed, existing, asked, written] : cases) {
     int questions = 0;
     host_.OnAskOverwrite([&] { return ++questions, true; });
-    Touch(c.existing);
-    host::CommandResult result = Run(c.typed);
-    EXPECT_EQ(result.error, 0) << c.typed;
-    EXPECT_EQ(questions, c.questions) << c.typed;
-    EXPECT_TRUE(IsScene(c.written)) << c.typed;
+    Touch(existing);
+    host::CommandResult result = Run(typed);
+    EXPECT_EQ(result.error, 0) << typed;
+    EXPECT_EQ(questions, asked) << typed;
+    EXPECT_TRUE(IsScene(written)) << typed;
   }
 }
 

@@ -34,51 +34,42 @@ TEST(Filename, DropsOneSeparatorAndThenBlanksAtTheEnd)
 
 TEST(Filename, TakesPathsApartAndPutsThemTogether)
 {
-  struct Row
-  {
-    const char *path, *directory, *file;
-  };
-  for (const Row& row :
-       {Row{"a/b/c.d", "a/b", "c.d"}, Row{"c", "", "c"}, Row{"/c", "", "c"}, Row{"preset://a/b", "preset://a", "b"}}) {
-    EXPECT_EQ(Portable(Path(row.path).GetDirectory().GetString()), row.directory);
-    EXPECT_EQ(Portable(Path(row.path).GetFile().GetString()), row.file);
+  using Texts = std::tuple<const char*, const char*, const char*>;
+  for (const auto& [path, directory, file] :
+       {Texts{"a/b/c.d", "a/b", "c.d"}, {"c", "", "c"}, {"/c", "", "c"}, {"preset://a/b", "preset://a", "b"}}) {
+    EXPECT_EQ(Portable(Path(path).GetDirectory().GetString()), directory);
+    EXPECT_EQ(Portable(Path(path).GetFile().GetString()), file);
   }
-  struct Join
-  {
-    const char *left, *right, *result;
-  };
-  for (const Join& row : {Join{"a/b", "x/c.d", "a/b/c.d"}, Join{"", "x/c.d", "c.d"}, Join{"a", "c", "a/c"},
-                          Join{"preset://a", "c", "preset://a/c"}}) {
-    EXPECT_EQ(Portable((Path(row.left) + Path(row.right)).GetString()), row.result);
-    Filename grown = Path(row.left);
-    grown.Append(Path(row.right));
-    EXPECT_EQ(Portable(grown.GetString()), row.result);
+  for (const auto& [left, right, result] : {Texts{"a/b", "x/c.d", "a/b/c.d"},
+                                            {"", "x/c.d", "c.d"},
+                                            {"a", "c", "a/c"},
+                                            {"preset://a", "c", "preset://a/c"}}) {
+    EXPECT_EQ(Portable((Path(left) + Path(right)).GetString()), result);
+    Filename grown = Path(left);
+    grown.Append(Path(right));
+    EXPECT_EQ(Portable(grown.GetString()), result);
   }
 }
 
 TEST(Filename, CutsAndComparesSuffixes)
 {
-  struct Row
-  {
-    const char *path, *clear, *complete, *set;
-  };
-  const Row rows[] = {{"a.txt", "a", "a", "a.q7r"},
-                      {"a.sixsix", "a", "a", "a.q7r"},
-                      {"a.seven77", "a.seven77", "a", "a.seven77.q7r"},
-                      {"a.b/c", "a.b/c", "a.b/c", "a.b/c.q7r"},
-                      {"a.b.c", "a.b", "a.b", "a.b.q7r"},
-                      {".c", "", "", ".q7r"},
-                      {"", "", "", ".q7r"}};
-  for (const Row& row : rows) {
-    Filename clear = Path(row.path);
+  const std::array<const char*, 4> rows[] = {{"a.txt", "a", "a", "a.q7r"},
+                                             {"a.sixsix", "a", "a", "a.q7r"},
+                                             {"a.seven77", "a.seven77", "a", "a.seven77.q7r"},
+                                             {"a.b/c", "a.b/c", "a.b/c", "a.b/c.q7r"},
+                                             {"a.b.c", "a.b", "a.b", "a.b.q7r"},
+                                             {".c", "", "", ".q7r"},
+                                             {"", "", "", ".q7r"}};
+  for (const auto& [path, cleared, completely, withSuffix] : rows) {
+    Filename clear = Path(path);
     Filename complete = clear;
     Filename set = clear;
     clear.ClearSuffix();
     complete.ClearSuffixComplete();
     set.SetSuffix("q7r");
-    EXPECT_EQ(Portable(clear.GetString()), row.clear);
-    EXPECT_EQ(Portable(complete.GetString()), row.complete);
-    EXPECT_EQ(Portable(set.GetString()), row.set);
+    EXPECT_EQ(Portable(clear.GetString()), cleared);
+    EXPECT_EQ(Portable(complete.GetString()), completely);
+    EXPECT_EQ(Portable(set.GetString()), withSuffix);
   }
   EXPECT_TRUE(Path("a/b.Q7R").CheckSuffix("q7r"));
   EXPECT_TRUE(Path("a.longsuffix").CheckSuffix("LONGSUFFIX"));

@@ -109,22 +109,18 @@ TEST(Light, LeavesOtherParametersToTheObject)
 
 TEST(Light, TurnsTheOldSizeFactorIntoASizeOfAtLeast16)
 {
-  struct Row
-  {
-    double factor;
-    Long version, size;
-  };
-  const Row rows[] = {{0.0, 7000, 16}, {0.16, 7000, 16},        {0.5, 7000, 50}, {2.507, 7000, 250},
-                      {-3, 7000, 16},  {1e9, 9419, 2147483647}, {0.5, 9419, 50}, {0.5, 9420, -1}};
-  for (const Row& row : rows) {
-    const std::string body = FindRecordSample(row.version < 7500 ? "light 0 before 7500" : "light 0").body;
+  const std::tuple<double, Long, Long> rows[] = {{0.0, 7000, 16},    {0.16, 7000, 16}, {0.5, 7000, 50},
+                                                 {2.507, 7000, 250}, {-3, 7000, 16},   {1e9, 9419, 2147483647},
+                                                 {0.5, 9419, 50},    {0.5, 9420, -1}};
+  for (const auto& [oldFactor, version, size] : rows) {
+    const std::string body = FindRecordSample(version < 7500 ? "light 0 before 7500" : "light 0").body;
     const std::string middle = "R=64@90032";
     const std::size_t place = body.find(middle) + middle.size();
-    const std::string factor = " B0 R" + std::to_string(row.factor);
-    const ObjectPtr light = ReadLight(body.substr(0, place) + factor + body.substr(place), 1, row.version);
-    ASSERT_NE(light, nullptr) << row.version;
-    EXPECT_EQ(light->GetDataInstance().GetLong(100006, -1), row.size) << row.factor;
-    if (row.version < 7500) { // which tell strength and colour as one
+    const std::string factor = " B0 R" + std::to_string(oldFactor);
+    const ObjectPtr light = ReadLight(body.substr(0, place) + factor + body.substr(place), 1, version);
+    ASSERT_NE(light, nullptr) << version;
+    EXPECT_EQ(light->GetDataInstance().GetLong(100006, -1), size) << oldFactor;
+    if (version < 7500) { // which tell strength and colour as one
       EXPECT_EQ(ParameterOf(*light, 70027).GetReal(), 42.5);
       EXPECT_TRUE(ParameterOf(*light, 70028).GetVector() == Vector(42 / 42.5, 1, 41.75 / 42.5));
     }
@@ -146,31 +142,25 @@ TEST(Light, LosesABadDistributionOnly)
 
 TEST(Light, TakesADistributionWithItsEntriesInTheUnitOfTheDocument)
 {
-  struct Unit
-  {
-    Real scale;
-    Long code;
-    Real factor; // one metre in it
-  };
-  const Unit units[] = {{1, 0, 1},          {1, 1, 0.001},      {1, 2, 1},           {1, 3, 100},
-                        {1, 4, 1000},       {1, 5, 1e6},        {1, 6, 1e9},         {1, 7, 1 / 1609.344},
-                        {1, 8, 1 / 0.9144}, {1, 9, 1 / 0.3048}, {1, 10, 1 / 0.0254}, {2, 3, 50},
-                        {0, 3, 1},          {100, 3, 1}};
+  const std::tuple<Real, Long, Real> units[] = {
+      {1, 0, 1},   {1, 1, 0.001},        {1, 2, 1},          {1, 3, 100},        {1, 4, 1000},        {1, 5, 1e6},
+      {1, 6, 1e9}, {1, 7, 1 / 1609.344}, {1, 8, 1 / 0.9144}, {1, 9, 1 / 0.3048}, {1, 10, 1 / 0.0254}, {2, 3, 50},
+      {0, 3, 1},   {100, 3, 1}};
   const IESPtr parsed = MakeDistribution();
-  for (const Unit& unit : units) {
+  for (const auto& [number, code, metre] : units) {
     const DocumentPtr document = NewDocument();
     GeData value;
     ASSERT_TRUE(value.SetType(kCustomUnitScale));
     auto& scale = static_cast<UnitScaleData&>(*value.GetCustom());
-    scale.scale = unit.scale;
-    scale.unit = unit.code;
+    scale.scale = number;
+    scale.unit = code;
     document->GetDataInstance().SetData(2117, value);
     const ObjectPtr light = NewLight();
     ASSERT_TRUE(SetIESLight(light.get(), parsed.get(), document.get()));
     const BaseContainer& entries = light->GetDataInstance();
     for (Long i = 0; i < 3; ++i)
-      EXPECT_DOUBLE_EQ(entries.GetReal(100010 + i), (i + 1) * unit.factor) << unit.code;
-    EXPECT_DOUBLE_EQ(ParameterOf(*light, 90013).GetReal(), 0.5 * unit.factor);
+      EXPECT_DOUBLE_EQ(entries.GetReal(100010 + i), (i + 1) * metre) << code;
+    EXPECT_DOUBLE_EQ(ParameterOf(*light, 90013).GetReal(), 0.5 * metre);
   }
 }
 

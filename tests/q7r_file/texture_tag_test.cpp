@@ -29,21 +29,15 @@ Real RealOf(TextureTag& tag, Long id)
 
 TEST(TextureTag, TakesPlaceLinksAndAspectsFromItsOldChunk)
 {
-  struct Row
-  {
-    const char* sample;
-    Long version;
-    bool first, second; // links
-    const char* entries;
-  };
-  const Row rows[] = {{"old texture 6", 13000, true, true, "1018=1.5 1020=0.5 1200=0"},
-                      {"old texture 5", 11600, true, true, "1018=1.5 1020=0.5 1200=1"},
-                      {"old texture 4", 11600, true, true, "1018=1.333333333 1020=1 1200=1"},
-                      {"old texture 3", 13000, true, false, "1018=1.333333333 1020=1 1200=1"},
-                      {"old texture 2 before 11600", 7000, false, false, "1018=1.333333333 1020=1 1200=1"}};
-  for (const Row& row : rows) {
-    SCOPED_TRACE(row.sample);
-    const RecordSample& sample = FindRecordSample(row.sample);
+  const std::tuple<const char*, Long, bool, bool, const char*> rows[] = {
+      {"old texture 6", 13000, true, true, "1018=1.5 1020=0.5 1200=0"},
+      {"old texture 5", 11600, true, true, "1018=1.5 1020=0.5 1200=1"},
+      {"old texture 4", 11600, true, true, "1018=1.333333333 1020=1 1200=1"},
+      {"old texture 3", 13000, true, false, "1018=1.333333333 1020=1 1200=1"},
+      {"old texture 2 before 11600", 7000, false, false, "1018=1.333333333 1020=1 1200=1"}};
+  for (const auto& [name, version, hasFirst, hasSecond, entries] : rows) {
+    SCOPED_TRACE(name);
+    const RecordSample& sample = FindRecordSample(name);
     TextureTag tag;
     tag.TextureMatrix();
     BaseMaterial first(kMaterialStandard), second(kMaterialStandard);
@@ -51,21 +45,21 @@ TEST(TextureTag, TakesPlaceLinksAndAspectsFromItsOldChunk)
       tag.GetDataInstance().RemoveData(kTextureMaterial); // the entry is made anew
     {
       ByteWriter whole;
-      whole.Header("Q7R6", row.version).Start(110010, sample.level).Append(Record(sample.body)).End().End();
+      whole.Header("Q7R6", version).Start(110010, sample.level).Append(Record(sample.body)).End().End();
       for (const char* goal : {"05", "06"}) // headers that say no more than the id of the node's goal
         whole.Append(Record(std::string("[110050,0 L0 L0 K C1 M61676F616C3100000000000000") + goal + " S ] ]"));
       MemoryReadFile memory(whole.bytes);
       ASSERT_TRUE(tag.ReadChunkLoop(memory.file, true));
-      ASSERT_TRUE(row.version < 7500 ||
+      ASSERT_TRUE(version < 7500 ||
                   (first.ReadChunkLoop(memory.file, true) && second.ReadChunkLoop(memory.file, true)));
     }
     EXPECT_EQ(tag.Position(), Vector(1, 1.5, 0.75));
     EXPECT_EQ(tag.Size(), Vector(2, 2.5, 1.75));
     EXPECT_EQ(tag.Rotation(), Vector(3, 3.5, 2.75));
     EXPECT_EQ(tag.TextureMatrix().off, Vector(1, 1.5, 0.75));
-    EXPECT_EQ(tag.GetMaterial(), row.first ? &first : nullptr);
-    EXPECT_EQ(tag.GetDataInstance().GetLink(1017), row.second ? &second : nullptr);
-    EXPECT_EQ(Entries(tag, {1018, 1020, 1200}), row.entries);
+    EXPECT_EQ(tag.GetMaterial(), hasFirst ? &first : nullptr);
+    EXPECT_EQ(tag.GetDataInstance().GetLink(1017), hasSecond ? &second : nullptr);
+    EXPECT_EQ(Entries(tag, {1018, 1020, 1200}), entries);
   }
   TextureTag tag;
   const std::string four = FindRecordSample("old texture 4").body;
