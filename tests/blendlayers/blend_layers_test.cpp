@@ -152,33 +152,28 @@ TEST(BlendLayers, StartWithTheirDefaults)
 
 TEST(BlendLayers, BringValuesIntoTheirRanges)
 {
-  struct Case
-  {
-    Long type, id, sub;
-    double low, high;
-    bool free = false; // no range
-  };
-  const Case cases[] = {{1, 2001, 0, 0, 1},       {2, 2001, 0, 0, 1},       {3, 2000, 0, -1, 1},
-                        {3, 2001, 1, -1, 1},      {3, 2002, 2, 0.1, 10},    {4, 2000, 0, -180, 180},
-                        {4, 2001, 1, -1, 1},      {4, 2002, 2, -1, 1},      {5, 2000, 1, 1, 255},
-                        {5, 2001, 0, 0, 1},       {6, 2000, 0, 0, 6},       {7, 2000, 0, 0, 1000},
-                        {8, 2001, 1, 0, 1000},    {9, 2001, 0, -1, 1},      {9, 2002, 1, 0, 20},
-                        {9, 2003, 2, 0, 0, true}, {9, 2004, 3, 0, 0, true}, {10, 2000, 0, 0, 0, true}};
-  for (const Case& c : cases) {
-    SCOPED_TRACE(::testing::Message() << "type " << c.type << " sub " << c.sub);
+  constexpr double kFree = 1e300; // no range
+  const std::tuple<Long, Long, Long, double, double> cases[] = {
+      {1, 2001, 0, 0, 1},          {2, 2001, 0, 0, 1},          {3, 2000, 0, -1, 1}, {3, 2001, 1, -1, 1},
+      {3, 2002, 2, 0.1, 10},       {4, 2000, 0, -180, 180},     {4, 2001, 1, -1, 1}, {4, 2002, 2, -1, 1},
+      {5, 2000, 1, 1, 255},        {5, 2001, 0, 0, 1},          {6, 2000, 0, 0, 6},  {7, 2000, 0, 0, 1000},
+      {8, 2001, 1, 0, 1000},       {9, 2001, 0, -1, 1},         {9, 2002, 1, 0, 20}, {9, 2003, 2, -kFree, kFree},
+      {9, 2004, 3, -kFree, kFree}, {10, 2000, 0, -kFree, kFree}};
+  for (const auto& [type, id, sub, low, high] : cases) {
+    SCOPED_TRACE(::testing::Message() << "type " << type << " sub " << sub);
     Stack stack;
-    BlendLayer* layer = stack.Add(c.type, 7);
-    const Long path = 10000 + 7 * 20 + c.sub;
-    const double values[][2] = {{c.low, c.low}, {c.high, c.high}, {-5000, c.low}, {5000, c.high}};
-    for (const auto& [given, kept] : values) {
+    BlendLayer* layer = stack.Add(type, 7);
+    const Long path = 10000 + 7 * 20 + sub;
+    for (const double given : {low, high, -5000.0, 5000.0}) {
+      const double kept = std::clamp(given, low, high);
       EXPECT_TRUE(stack.Data().SetParameter(path, GeData(given)));
       GeData value;
       EXPECT_TRUE(stack.Data().GetParameter(path, value));
-      EXPECT_EQ(value.GetReal(), c.free ? given : kept);
-      EXPECT_EQ(RealOf(*layer, c.id), c.free ? given : kept);
+      EXPECT_EQ(value.GetReal(), kept);
+      EXPECT_EQ(RealOf(*layer, id), kept);
     }
-    EXPECT_TRUE(layer->SetLayerParameter(c.id, GeData(5000.0)));
-    EXPECT_EQ(RealOf(*layer, c.id), 5000);
+    EXPECT_TRUE(layer->SetLayerParameter(id, GeData(5000.0)));
+    EXPECT_EQ(RealOf(*layer, id), 5000);
   }
   Stack stack;
   BlendLayer* hsl = stack.Add(kBlendHSL, 0);

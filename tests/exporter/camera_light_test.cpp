@@ -1,5 +1,3 @@
-
-
 #include "export_fixture.h"
 #include "exporter/walk/camera.h"
 

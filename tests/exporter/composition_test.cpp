@@ -1,5 +1,3 @@
-
-
 #include "export_fixture.h"
 
 namespace
@@ -7,81 +5,42 @@ namespace
 
 using namespace export_test;
 
-void ExpectTime(const GeData& data, Real numerator, Real denominator, const char* what)
-{
-  EXPECT_EQ(data.GetTime().GetNumerator(), numerator) << what;
-  EXPECT_EQ(data.GetTime().GetDenominator(), denominator) << what;
-}
+GeData Setting(BaseList2D* node, Long id) { return ParameterOf(*node, id); }
 
-GeData Setting(BaseList2D* node, Long id)
+// "1/25", not reduced.
+std::string TimeOf(BaseList2D* node, Long id)
 {
-  GeData value;
-  node->GetParameterById(id, value);
-  return value;
+  const BaseTime time = Setting(node, id).GetTime();
+  return std::to_string(std::lround(time.GetNumerator())) + "/" + std::to_string(std::lround(time.GetDenominator()));
 }
 
 TEST(CompositionSettings, GoToTheDocumentAndTheRenderSettings)
 {
-  struct Fraction
-  {
-    Real numerator, denominator;
-  };
-  // end: of the render settings: not reduced
-  const std::tuple<const char*, const char*, Long, Fraction, Fraction, Fraction, Real, Real, Real> cases[] = {
+  // The end is that of the render settings.
+  const std::tuple<const char*, Long, std::string, std::string, std::string, Real, Real, Real> cases[] = {
       // 30 frames of 1001/30000 s, which come out as 29: start 10010/30000, last frame start + 28/30, end start +
       // 1001/1000.
-      {"29.97",
-       R"({"fr":29.97,"ip":0,"op":99,"w":720,"h":480,"layers":[],
-                    "ae":{"workArea":[10,40],"pixelAspect":[10,11]}})",
-       30,
-       {1001, 3000},
-       {1267, 1000},
-       {4004000, 3000000},
-       29.97,
-       10.0 / 11.0,
-       1.5 * (10.0 / 11.0)},
-      {"one frame at 29.97 counts none",
-       R"({"fr":29.97,"ip":0,"op":1,"w":720,"h":480,"layers":[]})",
-       30,
-       {0, 1},
-       {0, 1},
-       {1001, 30000},
-       29.97,
-       1,
-       1.5},
-      {"one frame at 25",
-       R"({"fr":25,"ip":3,"op":4,"w":100,"h":200,"layers":[]})",
-       25,
-       {3, 25},
-       {3, 25},
-       {100, 625},
-       25,
-       1,
-       0.5},
+      {R"({"fr":29.97,"ip":0,"op":99,"w":720,"h":480,"layers":[],"ae":{"workArea":[10,40],"pixelAspect":[10,11]}})", 30,
+       "1001/3000", "1267/1000", "4004000/3000000", 29.97, 10.0 / 11.0, 1.5 * (10.0 / 11.0)},
+      // One frame counts none.
+      {R"({"fr":29.97,"ip":0,"op":1,"w":720,"h":480,"layers":[]})", 30, "0/1", "0/1", "1001/30000", 29.97, 1, 1.5},
+      {R"({"fr":25,"ip":3,"op":4,"w":100,"h":200,"layers":[]})", 25, "3/25", "3/25", "100/625", 25, 1, 0.5},
       // The document's range begins at -600 s at the earliest; -5/30 s lies within.
-      {"before the start",
-       R"({"fr":30,"ip":-5,"op":10,"w":100,"h":100,"layers":[]})",
-       30,
-       {-1, 6},
-       {3, 10},
-       {4, 12},
-       30,
-       1,
-       1},
+      {R"({"fr":30,"ip":-5,"op":10,"w":100,"h":100,"layers":[]})", 30, "-1/6", "3/10", "4/12", 30, 1, 1},
   };
-  for (const auto& [what, json, fps, start, last, end, rate, pixelAspect, filmAspect] : cases) {
-    Exported exported(json);
+  for (const auto& [what, fps, start, last, end, rate, pixelAspect, filmAspect] : cases) {
+    Exported exported(what);
     EXPECT_TRUE(exported.succeeded) << what;
     BaseDocument* document = exported.document.get();
     EXPECT_EQ(Setting(document, kDocumentFps).GetLong(), fps) << what;
-    ExpectTime(Setting(document, kDocumentMinTime), start.numerator, start.denominator, what);
-    ExpectTime(Setting(document, kDocumentLoopMin), start.numerator, start.denominator, what);
-    ExpectTime(Setting(document, kDocumentMaxTime), last.numerator, last.denominator, what);
-    ExpectTime(Setting(document, kDocumentLoopMax), last.numerator, last.denominator, what);
+    for (const Long id : {kDocumentMinTime, kDocumentLoopMin})
+      EXPECT_EQ(TimeOf(document, id), start) << what;
+    for (const Long id : {kDocumentMaxTime, kDocumentLoopMax})
+      EXPECT_EQ(TimeOf(document, id), last) << what;
     BaseList2D* render = document->GetActiveRenderData();
     EXPECT_EQ(Setting(render, kRenderFrameRate).GetReal(), rate) << what;
-    ExpectTime(Setting(render, kRenderFrameFrom), start.numerator, start.denominator, what);
-    ExpectTime(Setting(render, kRenderFrameTo), end.numerator, end.denominator, what);
+    EXPECT_EQ(TimeOf(render, kRenderFrameFrom), start) << what;
+    EXPECT_EQ(TimeOf(render, kRenderFrameTo), end) << what;
     EXPECT_EQ(Setting(render, kRenderPixelAspect).GetReal(), pixelAspect) << what;
     EXPECT_EQ(Setting(render, kRenderFilmAspect).GetReal(), filmAspect) << what;
     EXPECT_EQ(Setting(render, kRenderFrameMode).GetLong(), 2) << what;

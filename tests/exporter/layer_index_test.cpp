@@ -1,5 +1,3 @@
-
-
 #include "exporter/walk/layer_index.h"
 #include "support/library.h"
 

@@ -48,18 +48,16 @@ TEST_F(GltfViews, CamerasHaveTheSceneCameraFirst)
 
 TEST_F(GltfViews, LensesWithoutMeasureAreBroughtIntoRange)
 {
-  struct Case
-  {
-    double focalLength, aperture, aspect, yfov;
-  };
-  for (const Case& c : {Case{0, 36, 2, kPi - 0.001}, Case{36, 0, 2, 0.001}, Case{1e-300, 36, 2, kPi - 0.001},
-                        Case{-5, 36, 2, 0.001}, Case{NAN, 36, 2, 0.001}, Case{36, 36, 0, 2 * std::atan(0.25)}}) {
+  const std::tuple<double, double, double, double> cases[] = {
+      {0, 36, 2, kPi - 0.001}, {36, 0, 2, 0.001},   {1e-300, 36, 2, kPi - 0.001},
+      {-5, 36, 2, 0.001},      {NAN, 36, 2, 0.001}, {36, 36, 0, 2 * std::atan(0.25)}};
+  for (const auto& [focalLength, aperture, aspect, yfov] : cases) {
     if (!document->GetFirstObject())
       Add(kObjectCamera, "camera");
-    document->GetFirstObject()->GetDataInstance().SetReal(kCameraFocalLength, c.focalLength);
-    document->GetFirstObject()->GetDataInstance().SetReal(kCameraApertureWidth, c.aperture);
-    document->GetActiveRenderData()->SetParameterById(kRenderFilmAspect, c.aspect);
-    EXPECT_NEAR(Convert().json["cameras"][0]["perspective"]["yfov"].get<double>(), c.yfov, 1e-9) << c.focalLength;
+    document->GetFirstObject()->GetDataInstance().SetReal(kCameraFocalLength, focalLength);
+    document->GetFirstObject()->GetDataInstance().SetReal(kCameraApertureWidth, aperture);
+    document->GetActiveRenderData()->SetParameterById(kRenderFilmAspect, aspect);
+    EXPECT_NEAR(Convert().json["cameras"][0]["perspective"]["yfov"].get<double>(), yfov, 1e-9) << focalLength;
   }
 }
 
@@ -103,16 +101,7 @@ TEST_F(GltfViews, FieldsOfViewMove)
 
 TEST_F(GltfViews, LightsShineAsBrightAsInTheScene)
 {
-  struct Case
-  {
-    const char* name;
-    Long type;
-    double brightness;
-    Vector color;
-    const char* kind;
-    double intensity;
-    std::vector<double> linear;
-  };
+  using Case = std::tuple<const char*, Long, double, Vector, const char*, double, std::vector<double>>;
   const double excess = std::pow(2.055 / 1.055, 2.4); // of a component of 2, linear
   const double near = kPi * 25;                       // half of 1000 pixels are 5 m
   const Case cases[] = {{"point", 0, 1, {1, 1, 1}, "point", near, {1, 1, 1}},
@@ -121,20 +110,20 @@ TEST_F(GltfViews, LightsShineAsBrightAsInTheScene)
                         {"area", 8, 1, {1, 1, 1}, "directional", kPi, {1, 1, 1}},
                         {"negative", 0, -1, {1, 1, 1}, "point", 0, {1, 1, 1}},
                         {"strong", 4, 1, {2, 1, -1}, "directional", kPi * excess, {1, 1 / excess, 0}}};
-  for (const Case& c : cases) {
-    BaseObject* light = Add(kObjectLight, c.name);
-    light->SetParameterById(kLightType, c.type);
-    light->SetParameterById(kLightBrightness, c.brightness);
-    light->SetParameterById(kLightColor, c.color);
+  for (const auto& [name, type, brightness, color, kind, intensity, linear] : cases) {
+    BaseObject* light = Add(kObjectLight, name);
+    light->SetParameterById(kLightType, type);
+    light->SetParameterById(kLightBrightness, brightness);
+    light->SetParameterById(kLightColor, color);
     light->SetParameterById(kLightShadow, Long{1});
   }
   const Converted scene = Convert();
-  for (const Case& c : cases) {
-    const Json& light = LightOf(scene, c.name);
-    EXPECT_EQ(light["type"], c.kind) << c.name;
-    EXPECT_NEAR(light["intensity"].get<double>(), c.intensity, 1e-6) << c.name;
-    ExpectNear(light["color"], c.linear, 1e-6);
-    EXPECT_EQ(light["extras"]["q7r"], Json({{"brightness", c.brightness}, {"shadow", 1}}));
+  for (const auto& [name, type, brightness, color, kind, intensity, linear] : cases) {
+    const Json& light = LightOf(scene, name);
+    EXPECT_EQ(light["type"], kind) << name;
+    EXPECT_NEAR(light["intensity"].get<double>(), intensity, 1e-6) << name;
+    ExpectNear(light["color"], linear, 1e-6);
+    EXPECT_EQ(light["extras"]["q7r"], Json({{"brightness", brightness}, {"shadow", 1}}));
   }
   EXPECT_EQ(scene.Lost(Loss::kNegativeBrightness), 1U);
 }

@@ -117,26 +117,20 @@ TEST_F(GltfNodes, HoldPlacesInMetresAndLeaveOutDefaults)
 
 TEST_F(GltfNodes, TakeTheUnitThatTheSceneSays)
 {
-  struct Case
-  {
-    Real scale;
-    Long unit;
-    double asked;
-    double metres;
-  };
+  using Unit = std::tuple<Real, Long, double, double>;
   Add(kObjectNull, "n")->SetRelPos({100, 0, 0});
-  for (const Case& c : {Case{1, 3, 0, 0.01}, Case{2.5, 4, 0, 0.0025}, Case{1, 10, 0, 0.0254}, Case{0, 3, 0, 0.01},
-                        Case{-1, 3, 0, 0.01}, Case{1, 3, 0.5, 0.5}}) {
+  for (const auto& [scale, code, asked, metres] : {Unit{1, 3, 0, 0.01}, Unit{2.5, 4, 0, 0.0025}, Unit{1, 10, 0, 0.0254},
+                                                   Unit{0, 3, 0, 0.01}, Unit{-1, 3, 0, 0.01}, Unit{1, 3, 0.5, 0.5}}) {
     GeData value;
     ASSERT_TRUE(value.SetType(kCustomUnitScale));
     auto& unit = static_cast<UnitScaleData&>(*value.GetCustom());
-    unit.scale = c.scale;
-    unit.unit = c.unit;
+    unit.scale = scale;
+    unit.unit = code;
     document->GetDataInstance().SetData(2117, value);
-    options.unit = c.asked;
+    options.unit = asked;
     const Converted scene = Convert();
-    EXPECT_NEAR(scene.Node("n")["translation"][0].get<double>(), 100 * c.metres, 1e-9);
-    EXPECT_EQ(scene.json["scenes"][0]["extras"]["q7r"]["unit"].get<double>(), c.metres);
+    EXPECT_NEAR(scene.Node("n")["translation"][0].get<double>(), 100 * metres, 1e-9);
+    EXPECT_EQ(scene.json["scenes"][0]["extras"]["q7r"]["unit"].get<double>(), metres);
   }
   document->GetDataInstance().RemoveData(2117);
   options.unit = 0;
