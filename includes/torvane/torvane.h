@@ -30,6 +30,7 @@
 #include "torvane/nodes/base_list.h"
 #include "torvane/nodes/kept_chunks.h"
 #include "torvane/nodes/node_kind.h"
+#include "torvane/nodes/node_sink.h"
 #include "torvane/nodes/private_chunk.h"
 #include "torvane/nodes/root_list.h"
 #include "torvane/nodes/type_name.h"

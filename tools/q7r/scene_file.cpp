@@ -176,10 +176,10 @@ std::string ProblemText(const std::string& path, const StreamWalker& walker)
   return SceneFailure(path, walker).what();
 }
 
-DocumentPtr LoadScene(const std::string& path)
+DocumentPtr LoadScene(const std::string& path, NodeSink* sink)
 {
   FileProblem problem;
-  DocumentPtr document(LoadDocument(ToFilename(path), LoadObjects | LoadMaterials, &problem));
+  DocumentPtr document(LoadDocument(ToFilename(path), LoadObjects | LoadMaterials, &problem, sink));
   if (!document)
     throw SceneFailure(path, problem);
   return document;

@@ -31,8 +31,8 @@ Failure SceneFailure(const std::string& path, const _torvane_::StreamWalker& wal
 std::string ProblemText(const std::string& path, const _torvane_::FileProblem& problem);
 std::string ProblemText(const std::string& path, const _torvane_::StreamWalker& walker);
 
-// Loads a scene file; throws Failure.
-DocumentPtr LoadScene(const std::string& path);
+// Loads a scene file, its objects and materials into the sink if there is one; throws Failure.
+DocumentPtr LoadScene(const std::string& path, _torvane_::NodeSink* sink = nullptr);
 
 // The bytes of a file, or of standard input. Throws std::filesystem::filesystem_error.
 std::uintmax_t InputSize(const std::string& path);

@@ -53,6 +53,7 @@ inline constexpr Long kInfoCreationDate = 2020;
 inline constexpr Long kInfoSaveDate = 2022;
 
 class BaseMaterial;
+class NodeSink;
 class ViewPanel;
 
 // Frame rate and time range of a document.
@@ -166,6 +167,9 @@ class BaseDocument : public BaseList2D
   const Bitmap& GetStoredPreview() const { return storedPreview_; }
   Long GetLoadFlags() const { return loadFlags_; }
   void SetLoadFlags(Long flags) { loadFlags_ = flags; }
+  // Who gets the objects and materials that are read, in the place of the document's lists; null: the lists.
+  NodeSink* GetNodeSink() const { return nodeSink_; }
+  void SetNodeSink(NodeSink* sink) { nodeSink_ = sink; }
   const BaseTime& GetTime() const { return time_; }
   Long GetMode() const { return mode_; }
   Long GetActiveTool() const { return tool_; }
@@ -216,6 +220,7 @@ class BaseDocument : public BaseList2D
   Bitmap preview_;
   Bitmap storedPreview_;
   Long loadFlags_ = LoadObjects | LoadMaterials;
+  NodeSink* nodeSink_ = nullptr; // not owned; while a file is read
   BaseTime time_;
   Long mode_ = 11;
   Long secondMode_ = 11;
@@ -235,8 +240,11 @@ class BaseDocument : public BaseList2D
 // A new document with its creation information; null when memory is short. The caller owns it.
 BaseDocument* CreateDocument();
 
-// Reads a scene file. Null on failure: there is no partial document. `problem` then tells why and where.
-BaseDocument* LoadDocument(const Filename& name, Long loadFlags, FileProblem* problem = nullptr);
+// Reads a scene file. Null on failure: there is no partial document. `problem` then tells why and where. With a `sink`
+// the document is without objects and materials, which go to the sink one by one, and without links: memory is then
+// taken for one object at a time.
+BaseDocument* LoadDocument(const Filename& name, Long loadFlags, FileProblem* problem = nullptr,
+                           NodeSink* sink = nullptr);
 
 // Writes a scene file under its final name. True if the file was opened; a write that fails later leaves a file that is
 // cut short, which `problem` tells (its code is 0 after a whole write). The flags have no effect.

@@ -12,6 +12,7 @@ namespace _torvane_
 class BaseObject;
 class BaseDocument;
 class BaseTag;
+class NodeSink;
 struct NodeType;
 
 class RootList2D : public PrivateChunk
@@ -73,20 +74,27 @@ class RootList2D : public PrivateChunk
   virtual Long GetMemberLabel(BaseList2D& member) const;
   // False: an empty list writes nothing at all, not even its outer chunk.
   virtual Bool IsWrittenWhenEmpty() const { return false; }
-  // Reads a new member through the chunk loop and appends it; a member that reads badly is deleted. True if appended.
+  // Reads a new member through the chunk loop and appends it, or hands it to the document's sink; a member that reads
+  // badly is deleted. True unless it did.
   // Some lists leave the list head of the members that they read unset.
   Bool ReadMember(HyperFile& file, BaseList2D* member, Bool setListHead);
+  // Whether a sink gets the members.
+  virtual Bool IsPassedOn() const { return false; }
   // Appends behind the last member; false for a node of another class.
   Bool Append(BaseList2D* node, Bool setListHead);
 
  private:
   Bool Takes(const BaseList2D& node) const;
   void Enter(BaseList2D& node, Bool setListHead);
+  void BeginList();
+  NodeSink* GetSink() const;
+  void TakeBack();
 
   GeTempPublicList2D<PrivateChunk> list_;
   KeptChunks keptChunks_;
   BaseList2D* owner_ = nullptr;
   BaseDocument* document_ = nullptr;
+  Bool hasPassedOn_ = false; // members that were read went to a sink
 };
 
 // Objects: of a document, and the children of each object. Labels are the members' disk types; any is taken on reading.
@@ -99,6 +107,9 @@ class RootObject : public RootList2D
   // Called while a list is read, for each label in it: a new object that the list then owns, or null for a label that
   // can't be made, which is passed over. A client may give objects of its own classes.
   virtual BaseObject* AllocMember(Long type);
+
+ protected:
+  Bool IsPassedOn() const override { return true; }
 };
 
 // Tags of an object, the list's owner.
@@ -120,6 +131,9 @@ class RootMaterial : public RootList2D
   Bool ReadChunk(HyperFile& file, Long id, Long level) override;
   // As that of RootObject, for the labels kMaterialStandard and kMaterialPlugin. A node that is no material is refused.
   virtual BaseList2D* AllocMember(Long type);
+
+ protected:
+  Bool IsPassedOn() const override { return true; }
 };
 
 // Render settings of a document, and the children of each.

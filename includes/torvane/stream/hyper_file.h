@@ -161,8 +161,10 @@ class HyperFile : public GeMemory
   }
   void SetExtraData(void* data) { extraData_ = data; }
   void* GetExtraData() const { return extraData_; }
-  // Carries the links of this file; null before Open.
+  // Carries the links of this file; null before Open and after IgnoreLinks.
   TransArray* GetTranslator() const { return translator_; }
+  // Links that are read from now on stay empty.
+  void IgnoreLinks();
   // The byte stream below, for readers that walk values by their tags.
   BaseFile& GetFile() { return file_; }
 

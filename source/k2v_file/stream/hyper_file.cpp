@@ -51,8 +51,7 @@ HyperFile::HyperFile(BaseDocument* document) : document_(document) {}
 
 HyperFile::~HyperFile()
 {
-  EndTranslation();
-  DeleteObj(translator_);
+  IgnoreLinks();
   GeFree(chunks_);
   file_.Close();
 }
@@ -61,6 +60,12 @@ void HyperFile::EndTranslation()
 {
   if (translator_)
     translator_->FinishTranslation(false);
+}
+
+void HyperFile::IgnoreLinks()
+{
+  EndTranslation();
+  DeleteObj(translator_);
 }
 
 Bool HyperFile::Open(ULong ident, const Filename& name, Long mode, Bool errorDialog)
@@ -76,8 +81,7 @@ Bool HyperFile::Open(ULong ident, const Filename& name, Long mode, Bool errorDia
   mode_ = mode;
   if (mode != kHyperFileRead && mode != kHyperFileWrite)
     return Fail(FILEERROR_INVALID, 0);
-  EndTranslation();
-  DeleteObj(translator_);
+  IgnoreLinks();
   translator_ = NewObj<TransArray>();
   if (!translator_)
     return Fail(FILEERROR_MEMORY, 0);

@@ -302,6 +302,8 @@ Bool ReadDocument(BaseDocument& document, HyperFile& file, const Filename& name,
   document.SetLoadFlags(loadFlags);
   if (!file.Open(kSceneIdent, name, kHyperFileRead))
     return false;
+  if (document.GetNodeSink())
+    file.IgnoreLinks();
   if ((loadFlags & LoadRequireCurrent) && file.GetFileVersion() < kVersionRequired)
     return file.Fail(FILEERROR_OLD_VERSION, file.GetPosition());
   if (!document.ReadChunks(file, true)) {
@@ -316,7 +318,7 @@ Bool ReadDocument(BaseDocument& document, HyperFile& file, const Filename& name,
 
 } // namespace
 
-BaseDocument* LoadDocument(const Filename& name, Long loadFlags, FileProblem* problem)
+BaseDocument* LoadDocument(const Filename& name, Long loadFlags, FileProblem* problem, NodeSink* sink)
 {
   if (problem)
     *problem = {FILEERROR_MEMORY};
@@ -325,7 +327,9 @@ BaseDocument* LoadDocument(const Filename& name, Long loadFlags, FileProblem* pr
   if (!document)
     return nullptr;
   HyperFile file(document);
+  document->SetNodeSink(sink);
   Bool read = ReadDocument(*document, file, name, loadFlags);
+  document->SetNodeSink(nullptr);
   if (problem)
     *problem = file.GetProblem();
   file.Close();

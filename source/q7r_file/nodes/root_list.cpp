@@ -3,9 +3,11 @@
 #include "k2v_file/stream/chunk_visitor.h"
 #include "q7r_file/types/node_types.h"
 #include "torvane/animation/ctrack.h"
+#include "torvane/document/base_document.h"
 #include "torvane/layers/layer_object.h"
 #include "torvane/materials/base_material.h"
 #include "torvane/memory/assertion.h"
+#include "torvane/nodes/node_sink.h"
 #include "torvane/objects/base_object.h"
 #include "torvane/render/render_data.h"
 #include "torvane/shaders/base_shader.h"
@@ -137,7 +139,7 @@ Bool RootList2D::EntersChunk(Long id)
 {
   if (id != kChunkList)
     return false;
-  FreeAll();
+  BeginList();
   return true;
 }
 
@@ -149,9 +151,30 @@ Bool RootList2D::ReadChunk(HyperFile& file, Long id, Long level)
     return true;
   if (id != kChunkList)
     return false;
-  FreeAll();
+  BeginList();
   ReadChunkLoop(file, true);
   return true;
+}
+
+// What a file holds takes the place of the present members.
+void RootList2D::BeginList()
+{
+  if (hasPassedOn_)
+    TakeBack();
+  hasPassedOn_ = false;
+  FreeAll();
+}
+
+NodeSink* RootList2D::GetSink() const
+{
+  const BaseDocument* document = IsPassedOn() ? GetDocument() : nullptr;
+  return document ? document->GetNodeSink() : nullptr;
+}
+
+void RootList2D::TakeBack()
+{
+  if (NodeSink* sink = GetSink())
+    sink->TakeBack();
 }
 
 Bool RootList2D::ReadMember(HyperFile& file, BaseList2D* member, Bool setListHead)
@@ -161,9 +184,16 @@ Bool RootList2D::ReadMember(HyperFile& file, BaseList2D* member, Bool setListHea
   member->SetDocument(GetDocument());
   if (!Takes(*member) || !member->ReadChunkLoop(file, true)) {
     DeleteObj(member);
+    TakeBack(); // its children
     return false;
   }
-  return Append(member, setListHead);
+  NodeSink* sink = GetSink();
+  if (!sink)
+    return Append(member, setListHead);
+  sink->Take(*member);
+  hasPassedOn_ = true;
+  DeleteObj(member);
+  return true;
 }
 
 Bool RootList2D::CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation)

@@ -2,9 +2,11 @@
 
 #include "k2v_file/stream/chunk_visitor.h"
 #include "q7r_file/nodes/node_data_chunk.h"
+#include "torvane/document/base_document.h"
 #include "torvane/hooks.h"
 #include "torvane/math/crc.h"
 #include "torvane/memory/assertion.h"
+#include "torvane/nodes/node_sink.h"
 #include "torvane/tags/base_tag.h"
 
 namespace _torvane_
@@ -180,6 +182,8 @@ void BaseObject::VisitLegacyList(Visitor& v, RootObject*& list)
     }
     list->SetOwner(this);
     v.Note(list->ReadChunks(v.File(), true));
+    if (NodeSink* sink = GetDocument() ? GetDocument()->GetNodeSink() : nullptr)
+      sink->TakeBack(); // these are no objects of the scene
   } else {
     v.ConstantBool(false);
   }

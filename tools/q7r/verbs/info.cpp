@@ -77,7 +77,7 @@ void TellInfo(ValueSink& sink, BaseDocument& document, const SceneCounts& counts
   TellTypes(sink, "objectTypes", counts.objects);
   sink.Member("tags", Sum(counts.tags));
   TellTypes(sink, "tagTypes", counts.tags);
-  sink.Member("materials", document.GetMaterialRoot()->GetCount());
+  sink.Member("materials", counts.materials);
   sink.Member("layers", document.GetLayerRoot()->GetCount());
   sink.Member("renderSettings", document.GetRenderDataRoot()->GetCount());
   sink.Member("views", document.GetViewPanelRoot()->GetCount());
@@ -113,7 +113,7 @@ void PrintInfo(BaseDocument& document, const SceneCounts& counts, std::uintmax_t
   Row("range", range);
   Row("objects", std::to_string(Sum(counts.objects)) + TypesText(counts.objects));
   Row("tags", std::to_string(Sum(counts.tags)) + TypesText(counts.tags));
-  Row("materials", std::to_string(document.GetMaterialRoot()->GetCount()));
+  Row("materials", std::to_string(counts.materials));
   Row("layers", std::to_string(document.GetLayerRoot()->GetCount()));
   Row("render settings", std::to_string(document.GetRenderDataRoot()->GetCount()));
   Row("views", std::to_string(document.GetViewPanelRoot()->GetCount()));
@@ -123,8 +123,8 @@ void PrintInfo(BaseDocument& document, const SceneCounts& counts, std::uintmax_t
 
 int Info(const std::string& file, const Options& options)
 {
-  DocumentPtr document = LoadScene(file);
-  const SceneCounts counts = CountScene(*document);
+  SceneCounts counts;
+  const DocumentPtr document = CountFile(file, counts);
   const std::uintmax_t size = InputSize(file);
   if (options.json)
     PrintJson([&](ValueSink& json) { TellInfo(json, *document, counts, size); });
