@@ -33,15 +33,15 @@ TEST(Crc, MatchesItsCheckValue)
   EXPECT_EQ(Crc64().GetCrc(), 0u);
 }
 
-// Long data are taken in slices: at every place and length they must come to what single bytes come to.
+// Long data are taken in slices and blocks: at every place and length they must come to what single bytes come to.
 TEST(Crc, TakesLongDataAsItTakesSingleBytes)
 {
-  UChar data[80];
+  UChar data[400];
   for (ULong i = 0; i < sizeof data; ++i)
     data[i] = static_cast<UChar>(i * 151 + 7);
   for (LLong start = 0; start < 3; ++start) {
     Crc32 bytes;
-    for (LLong size = 0; size < 77; bytes.UpdateByte(data[start + size++])) {
+    for (LLong size = 0; size < 397; bytes.UpdateByte(data[start + size++])) {
       Crc32 whole;
       whole.Update(data + start, size);
       EXPECT_EQ(whole.GetCrc(), bytes.GetCrc()) << start << ", " << size;

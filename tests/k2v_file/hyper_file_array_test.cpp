@@ -110,6 +110,36 @@ TEST(HyperFileArray, CleansNumbersThatAreNotFinite)
   EXPECT_TRUE(doubles[0] == 0 && doubles[1] == 0 && doubles[2] == 1 && floats[0] == 0 && floats[1] == 3);
 }
 
+// Elements that stand close are taken in blocks, those further apart one by one.
+TEST(HyperFileArray, TakesBlocksAsItTakesSingleElements)
+{
+  constexpr LLong kCount = 613;
+  std::mt19937 random(7);
+  for (const Long type : {kArrayByte, kArrayWord, kArrayLong, kArrayLLong, kArraySReal, kArrayLReal}) {
+    SCOPED_TRACE(type);
+    const auto size = static_cast<std::size_t>(kSizes[type]);
+    Bytes close(kCount * size);
+    Bytes apart(kCount * size * 2, 0xAA);
+    for (std::size_t i = 0; i < close.size(); ++i) {
+      const bool high = i % size + 2 >= size && i / size % 3 == 0; // of an infinity or a number that is none
+      close[i] = high ? std::uint8_t{0xFF} : static_cast<std::uint8_t>(random());
+      apart[i / size * size * 2 + i % size] = close[i];
+    }
+    auto write = [&](const Bytes& from, LLong stride) {
+      return WriteToMemory([&](HyperFile& file) { file.WriteArray(from.data(), type, stride, kCount); });
+    };
+    Bytes written = write(close, kSizes[type]);
+    EXPECT_TRUE(written == write(apart, 2 * kSizes[type]));
+    std::copy(close.begin(), close.end(), written.begin() + 6); // unclean in the file too
+    MemoryReadFile first(WithHeader(written));
+    MemoryReadFile second(WithHeader(written));
+    ASSERT_TRUE(first.file.ReadArray(close.data(), type, kSizes[type], kCount));
+    ASSERT_TRUE(second.file.ReadArray(apart.data(), type, 2 * kSizes[type], kCount));
+    for (std::size_t i = 0; i < close.size(); ++i)
+      ASSERT_EQ(close[i], apart[i / size * size * 2 + i % size]) << i;
+  }
+}
+
 TEST(HyperFileArray, RefusesACountOrLengthThatDoesNotMatch)
 {
   AssertionCounter quiet;

@@ -211,8 +211,9 @@ class BaseFile : public GeMemory
   // error: the caller then takes ReadBytes or WriteBytes. What was used is told by the Commit operation.
   const UChar* ReadWindow(LLong count) const { return readLeft_ >= count ? cursor_ : nullptr; }
   UChar* WriteWindow(LLong count) { return writeLeft_ >= count ? cursor_ : nullptr; }
-  // The most that ReadWindow gives now.
+  // The most that they give now.
   LLong GetReadLeft() const { return readLeft_; }
+  LLong GetWriteLeft() const { return writeLeft_; }
   void CommitRead(LLong count)
   {
     cursor_ += count;

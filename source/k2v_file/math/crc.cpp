@@ -1,5 +1,14 @@
 #include "torvane/math/crc.h"
 
+#include <utility>
+
+#if defined(__x86_64__) && defined(__GNUC__)
+#include <immintrin.h>
+#define HAS_CARRYLESS_PRODUCTS __builtin_cpu_supports("pclmul")
+#else
+#define HAS_CARRYLESS_PRODUCTS false
+#endif
+
 namespace _torvane_
 {
 
@@ -65,12 +74,73 @@ inline ULong RunWord(ULong value, const UChar* bytes)
          kTables.crc32[behind + 1][word >> 16 & 255] ^ kTables.crc32[behind][word >> 24];
 }
 
+// ---- Long blocks by carry-less products: a sum is the rest of a division of polynomials over two elements, so that 16
+// bytes may stand for all before them if they are multiplied by the rest that the distance leaves.
+
+constexpr LLong kFold = 64; // bytes at a time, in four lanes
+
+// The rest of x to the power of `exponent`, as the products of reflected numbers need it: reflected, one place up.
+constexpr ULLong RestOfPower(int exponent)
+{
+  ULong rest = 0x80000000; // 1, reflected
+  for (int i = 0; i < exponent; ++i)
+    rest = rest & 1 ? rest >> 1 ^ kPolynomial32 : rest >> 1;
+  return ULLong{rest} << 1;
+}
+
+#if defined(__x86_64__) && defined(__GNUC__)
+
+__attribute__((target("pclmul"))) inline __m128i Fold(__m128i lane, __m128i factors, __m128i next)
+{
+  return _mm_xor_si128(
+      next, _mm_xor_si128(_mm_clmulepi64_si128(lane, factors, 0x00), _mm_clmulepi64_si128(lane, factors, 0x11)));
+}
+
+inline __m128i LoadLane(const UChar* bytes) { return _mm_loadu_si128(reinterpret_cast<const __m128i*>(bytes)); }
+
+// Takes `size` bytes, a multiple of kFold that isn't 0.
+__attribute__((target("pclmul"))) ULong RunFolds(ULong value, const UChar* bytes, LLong size)
+{
+  constexpr auto factorsOf = [](int bits) {
+    return std::pair{static_cast<long long>(RestOfPower(bits - 32)), static_cast<long long>(RestOfPower(bits + 32))};
+  };
+  constexpr auto kFar = factorsOf(8 * kFold);
+  constexpr auto kNear = factorsOf(128);
+  const __m128i far = _mm_set_epi64x(kFar.first, kFar.second);
+  const __m128i near = _mm_set_epi64x(kNear.first, kNear.second);
+  __m128i lanes[4];
+  for (int i = 0; i < 4; ++i)
+    lanes[i] = LoadLane(bytes + 16 * i);
+  lanes[0] = _mm_xor_si128(lanes[0], _mm_cvtsi32_si128(static_cast<int>(value)));
+  for (bytes += kFold, size -= kFold; size > 0; bytes += kFold, size -= kFold) {
+    for (int i = 0; i < 4; ++i)
+      lanes[i] = Fold(lanes[i], far, LoadLane(bytes + 16 * i));
+  }
+  for (int i = 1; i < 4; ++i)
+    lanes[i] = Fold(lanes[i - 1], near, lanes[i]);
+  UChar rest[16];
+  _mm_storeu_si128(reinterpret_cast<__m128i*>(rest), lanes[3]);
+  return Run(ULong{0}, rest, sizeof rest);
+}
+
+#else
+
+ULong RunFolds(ULong value, const UChar* bytes, LLong size) { return Run(value, bytes, size); }
+
+#endif
+
 } // namespace
 
 void Crc32::Update(const void* data, LLong size) noexcept
 {
   const UChar* bytes = static_cast<const UChar*>(data);
   ULong value = value_;
+  if (size >= kFold && HAS_CARRYLESS_PRODUCTS) {
+    const LLong folded = size / kFold * kFold;
+    value = RunFolds(value, bytes, folded);
+    bytes += folded;
+    size -= folded;
+  }
   for (; size >= kSlice; size -= kSlice, bytes += kSlice)
     value = RunWord<12>(value, bytes) ^ RunWord<8>(0, bytes + 4) ^ RunWord<4>(0, bytes + 8) ^ RunWord<0>(0, bytes + 12);
   value_ = Run(value, bytes, size);

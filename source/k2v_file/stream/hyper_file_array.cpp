@@ -9,10 +9,19 @@ namespace _torvane_
 namespace
 {
 
-constexpr LLong kPieceSize = 65536;
+constexpr LLong kPieceSize = 65536;     // converted on the way
+constexpr LLong kInPlacePiece = 524288; // more than the buffer of a file, so that it is passed by
 constexpr LLong kLargestArray = UINT32_MAX - 1;
 
 Bool IsFloatType(Long type) { return type == kArraySReal || type == kArrayLReal; }
+
+// How many elements to convert at once: those that the file's buffer has, or has room for, so that none is copied there
+// and back; one that lies across its end; without a buffer as many as the own one holds.
+LLong PieceOf(LLong count, LLong size, LLong left)
+{
+  const LLong piece = left >= size ? left / size : left > 0 ? 1 : kPieceSize / size;
+  return piece < count ? piece : count;
+}
 
 Long PlainType(Long type) { return type == kArrayReal ? static_cast<Long>(kArrayLReal) : type; }
 
@@ -35,7 +44,7 @@ Bool HyperFile::WriteArray(const void* data, Long type, LLong stride, LLong coun
   const UChar* memory = static_cast<const UChar*>(data);
   while (count > 0) {
     UChar buffer[kPieceSize];
-    LLong now = LimitToTick(count < kPieceSize / size ? count : kPieceSize / size);
+    const LLong now = LimitToTick(PieceOf(count, size, file_.GetWriteLeft()));
     UChar* place = TakeRoom(buffer, now * size);
     pack(place, memory, stride, now);
     if (!FinishRoom(place, buffer, now * size))
@@ -86,7 +95,8 @@ Bool HyperFile::ReadElements(void* data, Long type, Long storedType, LLong strid
   Bool inPlace = GetElementSize(type) == size && stride == size;
   while (count > 0) {
     UChar buffer[kPieceSize];
-    LLong now = LimitToTick(count < kPieceSize / size ? count : kPieceSize / size);
+    const LLong inPlacePiece = kInPlacePiece / size < count ? kInPlacePiece / size : count;
+    const LLong now = LimitToTick(inPlace ? inPlacePiece : PieceOf(count, size, file_.GetReadLeft()));
     const UChar* place = TakeBytes(inPlace ? memory : buffer, now * size);
     if (!place)
       return FailFromFile(start);
