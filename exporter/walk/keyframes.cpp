@@ -71,6 +71,7 @@ std::array<Real, 3> ValueConverter::Convert(const AEGP_StreamVal2& value, const 
 SampledTrack::SampledTrack(BaseObject* object, const ParameterPath& path, const String& name, Content content)
     : object_(object),
       track_(CTrack::Alloc(object, path, name)),
+      curve_(track_ ? track_->GetCurve(1, 1) : nullptr),
       content_(content),
       comparesData_(track_ && track_->GetKind() != kTrackValue)
 {}
@@ -85,8 +86,8 @@ bool SampledTrack::IsSame(Real a, Real b) const
 
 void SampledTrack::Reserve(Long count)
 {
-  if (CCurve* curve = track_ ? track_->GetCurve(1, 1) : nullptr)
-    curve->Reserve(std::min(count, kMostReserved));
+  if (curve_)
+    curve_->Reserve(std::min(count, kMostReserved));
 }
 
 void SampledTrack::Add(const BaseTime& time, Real value)
@@ -111,30 +112,31 @@ void SampledTrack::Add(const BaseTime& time, Real value)
 
 void SampledTrack::AddSampledKey(const BaseTime& time, Real value)
 {
-  CCurve* curve = track_->GetCurve(1, 1);
-  if (!curve)
+  constexpr ULong kSwitches = kKeyMaskAutomatic | kKeyMaskClamp;
+  if (!curve_)
     return;
+  if (content_ == Content::kValue) {
+    curve_->SetKeyValue(time, value == 0.0 ? 0.0 : value, kSwitches); // as CKey::SetValue: -0.0 leaves the 0.0
+    return;
+  }
   KeyValues key;
-  key.time = time;
-  key.switches = kKeyMaskAutomatic | kKeyMaskClamp;
-  if (content_ == Content::kValue && key.value != value) // as CKey::SetValue: -0.0 leaves the 0.0 of a new key
-    key.value = value;
   Long place = 0;
-  if (curve->SetKeyValues(key, &place) && content_ == Content::kData)
-    curve->GetKey(place)->SetGeData(curve, static_cast<Long>(value));
+  key.time = time;
+  key.switches = kSwitches;
+  if (curve_->SetKeyValues(key, &place))
+    curve_->GetKey(place)->SetGeData(curve_, static_cast<Long>(value));
 }
 
 bool SampledTrack::IsConstant()
 {
-  CCurve* curve = track_->GetCurve(1, 1);
-  if (!curve || curve->GetKeyCount() != 2)
-    return !curve || curve->GetKeyCount() < 2;
+  if (!curve_ || curve_->GetKeyCount() != 2)
+    return !curve_ || curve_->GetKeyCount() < 2;
   if (comparesData_)
-    return curve->GetKey(0)->GetGeData().IsEqual(curve->GetKey(1)->GetGeData());
+    return curve_->GetKey(0)->GetGeData().IsEqual(curve_->GetKey(1)->GetGeData());
   KeyValues first;
   KeyValues last;
-  curve->GetKeyValues(0, first);
-  curve->GetKeyValues(1, last);
+  curve_->GetKeyValues(0, first);
+  curve_->GetKeyValues(1, last);
   return first.value == last.value;
 }
 
@@ -147,7 +149,7 @@ void SampledTrack::Finish()
   if (IsConstant())
     track_.reset();
   else
-    track_->GetCurve(1, 1)->Trim();
+    curve_->Trim();
   Insert();
 }
 

@@ -48,6 +48,7 @@ class SampledTrack
 
   _torvane_::BaseObject* object_;
   _torvane_::Owned<_torvane_::CTrack> track_;
+  _torvane_::CCurve* curve_; // of the track; null if there is none
   Content content_;
   bool comparesData_ = false;
   bool isEmpty_ = true;

@@ -23,18 +23,6 @@ Vector AnchorOffset(const Vector& anchor, const TransformRules& rules, const Vec
   return {(rules.width * 0.5 - anchor.x) * scale.x, (anchor.y - rules.height * 0.5) * scale.y, -anchor.z * scale.z};
 }
 
-// The axes of the sample; the offset is undefined.
-Matrix SampleFrame(const LayerSample& sample, const TransformRules& rules, const Vector& position)
-{
-  const Vector& o = sample.orientation;
-  Matrix frame = RotationMatrix(o.x, o.y, o.z);
-  if (rules.lookAtTarget) {
-    Vector up = position + Vector(0.0, 1.0, 0.0);
-    frame = Multiply(LookAtMatrix(position, FlipY(sample.anchor), up), frame);
-  }
-  return Multiply(frame, RotationMatrix(sample.rotateX, sample.rotateY, sample.rotateZ));
-}
-
 // By the bits: -0.0 is not 0.0.
 template <class T>
 bool IsSame(const T& a, const T& b)
@@ -42,7 +30,7 @@ bool IsSame(const T& a, const T& b)
   return std::memcmp(&a, &b, sizeof a) == 0; // NOLINT(bugprone-suspicious-memory-comparison)
 }
 
-// True if SampleFrame gives the same for both.
+// True if the axes of both are the same.
 bool HasSameFrame(const LayerSample& a, const LayerSample& b, const TransformRules& rules)
 {
   const bool sameLook = !rules.lookAtTarget || (IsSame(a.position, b.position) && IsSame(a.anchor, b.anchor));
@@ -50,34 +38,58 @@ bool HasSameFrame(const LayerSample& a, const LayerSample& b, const TransformRul
          IsSame(a.rotateY, b.rotateY) && IsSame(a.rotateZ, b.rotateZ);
 }
 
-// Position and scale of a sample with these axes.
-SceneTransform Place(const LayerSample& sample, const TransformRules& rules, const Matrix& frame)
+} // namespace
+
+const Matrix& TransformConverter::Turn::Of(Real x, Real y, Real z)
 {
-  SceneTransform result;
-  const Vector plain = FlipY(sample.position);
-  if (rules.useScale)
-    result.scale = sample.scale * 0.01;
-  const Vector offset = rules.useAnchor ? AnchorOffset(sample.anchor, rules, result.scale) : Vector();
-  result.position = plain + offset;
-  if (rules.useRotation)
-    result.position =
-        plain + Normalize(frame.v1) * offset.x + Normalize(frame.v2) * offset.y + Normalize(frame.v3) * offset.z;
-  result.position += rules.parentShift;
-  return result;
+  const Vector wanted(x, y, z);
+  if (!IsSame(wanted, degrees)) {
+    degrees = wanted;
+    matrix = RotationMatrix(x, y, z);
+  }
+  return matrix;
 }
 
-} // namespace
+// Takes the axes of the sample, at length 1, and their angles.
+void TransformConverter::TakeAxes(const LayerSample& sample)
+{
+  const Vector& o = sample.orientation;
+  Matrix frame = orientation_.Of(o.x, o.y, o.z);
+  if (rules_.lookAtTarget) {
+    const Vector position = FlipY(sample.position);
+    frame = Multiply(LookAtMatrix(position, FlipY(sample.anchor), position + Vector(0.0, 1.0, 0.0)), frame);
+  }
+  frame = Multiply(frame, rotation_.Of(sample.rotateX, sample.rotateY, sample.rotateZ));
+  axes_.v1 = Normalize(frame.v1);
+  axes_.v2 = Normalize(frame.v2);
+  axes_.v3 = Normalize(frame.v3);
+  angles_ = AxesToAngles(axes_.v1, axes_.v2, axes_.v3, kExportRotationOrder);
+}
+
+// Takes position and scale of the sample.
+void TransformConverter::Place(const LayerSample& sample)
+{
+  const Vector plain = FlipY(sample.position);
+  if (rules_.useScale)
+    result_.scale = sample.scale * 0.01;
+  const Vector offset = rules_.useAnchor ? AnchorOffset(sample.anchor, rules_, result_.scale) : Vector();
+  result_.position = plain + offset;
+  if (rules_.useRotation)
+    result_.position = plain + axes_.v1 * offset.x + axes_.v2 * offset.y + axes_.v3 * offset.z;
+  result_.position += rules_.parentShift;
+}
 
 const SceneTransform& TransformConverter::Convert(const LayerSample& sample)
 {
-  if (rules_.useRotation && (isFirst_ || !HasSameFrame(sample, last_, rules_))) {
-    frame_ = SampleFrame(sample, rules_, FlipY(sample.position));
-    angles_ = MatrixToAngles(frame_, kExportRotationOrder);
-  }
+  if (isSettled_ && IsSame(sample, last_))
+    return result_;
+  if (rules_.useRotation && (isFirst_ || !HasSameFrame(sample, last_, rules_)))
+    TakeAxes(sample);
+  Place(sample);
   const Vector previous = result_.rotation;
-  result_ = Place(sample, rules_, frame_);
   if (rules_.useRotation)
     result_.rotation = isFirst_ ? angles_ : ClosestAngles(previous, angles_, kExportRotationOrder);
+  isSettled_ = !isFirst_ && IsSame(previous, result_.rotation);
   last_ = sample;
   isFirst_ = false;
   return result_;

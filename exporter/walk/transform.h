@@ -67,8 +67,9 @@ struct SceneTransform
 // rotation that lie closest to it, so that keys don't jump by whole turns.
 SceneTransform ConvertTransform(const LayerSample& sample, const TransformRules& rules, const Vector* previousRotation);
 
-// Converts the samples of one object one after the other, each with the rotation before it. A rotation that stands
-// still isn't computed again; which of its angles are closest is, since that may differ in the last digit.
+// Converts the samples of one object one after the other, each with the rotation before it. What stands still isn't
+// computed again: a sample that is the one before, its axes, either of the two products that they are made of. Which of
+// a rotation's angles are closest is asked until it gives the same again, since it may differ in the last digit.
 class TransformConverter
 {
  public:
@@ -77,11 +78,26 @@ class TransformConverter
   const SceneTransform& Convert(const LayerSample& sample);
 
  private:
+  // A rotation about the host's axes.
+  struct Turn
+  {
+    const Matrix& Of(Real x, Real y, Real z); // degrees
+
+    Vector degrees = Vector();
+    Matrix matrix; // of these
+  };
+
+  void TakeAxes(const LayerSample& sample);
+  void Place(const LayerSample& sample);
+
   const TransformRules& rules_;
   bool isFirst_ = true;
+  bool isSettled_ = false; // the last sample again would give the last result again
   LayerSample last_;
-  Matrix frame_; // the axes of the last sample and their angles
-  Vector angles_ = Vector();
+  Turn orientation_;
+  Turn rotation_;
+  Matrix axes_;              // of the last sample, at length 1
+  Vector angles_ = Vector(); // of the axes
   SceneTransform result_;
 };
 

@@ -72,7 +72,7 @@ const CKey* CCurve::PeekKey(Long index, CKey& scratch) const
     return nullptr;
   if (!HasRows())
     return NodeAt(index);
-  scratch.FromRow(keyRoot_.GetRows()[index], keyRoot_.GetRows().GetTangents(index));
+  scratch.FromPlain(keyRoot_.GetRows().Get(index));
   return &scratch;
 }
 
@@ -84,7 +84,7 @@ Bool CCurve::GetKeyValues(Long index, KeyValues& values) const
     const KeyRow& row = keyRoot_.GetRows()[index];
     const KeyRowTangents tangents = keyRoot_.GetRows().GetTangents(index);
     values = {row.time,           tangents.leftTime,   tangents.rightTime, row.value,
-              tangents.leftValue, tangents.rightValue, row.interpolation,  row.nbits[1]};
+              tangents.leftValue, tangents.rightValue, row.interpolation,  row.switches};
   } else {
     const CKey& key = *NodeAt(index);
     values = {key.GetTime(),      key.GetLeftTime(),   key.GetRightTime(),     key.GetValue(),
@@ -108,23 +108,30 @@ Bool CCurve::SetKeyValues(const KeyValues& values, Long* index)
   return true;
 }
 
+Bool CCurve::SetKeyValue(const BaseTime& time, Real value, ULong switches)
+{
+  KeyRows& rows = keyRoot_.GetRows();
+  const Long count = rows.GetCount();
+  const Bool isLast = count > 0 && rows[count - 1].time < time && keyRoot_.IsEmpty();
+  if (isLast && IsKeyTime(time))
+    return rows.Append({time, value, kInterpolationSpline, switches});
+  KeyValues values;
+  values.time = time;
+  values.value = value;
+  values.switches = switches;
+  return SetKeyValues(values);
+}
+
 Bool CCurve::SetRowValues(Long place, const KeyValues& values, Bool isNew)
 {
   KeyRows& rows = keyRoot_.GetRows();
-  KeyRow row;
-  if (!isNew)
-    row = rows[place];
-  row.time = values.time;
-  row.value = values.value;
-  row.interpolation = values.interpolation;
-  row.nbits[1] = values.switches;
-  const KeyRowTangents tangents = {values.leftTime, values.rightTime, values.leftValue, values.rightValue};
+  PlainKey key = {{values.time, values.value, values.interpolation, values.switches},
+                  {values.leftTime, values.rightTime, values.leftValue, values.rightValue},
+                  {}};
   if (isNew)
-    return rows.Insert(place, row, tangents);
-  if (!rows.SetTangents(place, tangents))
-    return false;
-  rows[place] = row;
-  return true;
+    return rows.Insert(place, key);
+  key.node = rows.Get(place).node;
+  return rows.Set(place, key);
 }
 
 Bool CCurve::SetNodeValues(Long place, const KeyValues& values, Bool isNew)

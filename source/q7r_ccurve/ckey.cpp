@@ -224,34 +224,32 @@ Bool CKey::IsEqual(const CKey& other) const
          interpolation_ == other.interpolation_ && keyData_.IsEqual(other.keyData_);
 }
 
-Bool CKey::ToRow(KeyRow& row, KeyRowTangents& tangents) const
+Bool CKey::ToPlain(PlainKey& key) const
 {
   if (!IsBare() || keyData_.GetRawType() != kDataNil || nbits_[3] != 0 || !IsKeyTime(time_))
     return false;
-  row.time = time_;
-  row.value = value_;
-  row.marker = marker_;
-  row.markerDrawn = markerDrawn_;
-  row.info = info_;
-  for (Long i = 0; i < 3; ++i)
-    row.nbits[i] = nbits_[i];
-  row.interpolation = interpolation_;
-  tangents = {leftTime_, rightTime_, leftValue_, rightValue_};
+  key.row = {time_, value_, interpolation_, nbits_[1]};
+  key.tangents = {leftTime_, rightTime_, leftValue_, rightValue_};
+  key.node = {{}, info_, {nbits_[0], nbits_[2]}, markerDrawn_ ? 1U : 0U};
+  if (markerDrawn_)
+    key.node.marker = marker_;
   return true;
 }
 
-void CKey::FromRow(const KeyRow& row, const KeyRowTangents& tangents)
+void CKey::FromPlain(const PlainKey& key)
 {
+  const auto& [row, tangents, node] = key;
   time_ = row.time;
   value_ = row.value;
-  marker_ = row.marker;
-  markerDrawn_ = row.markerDrawn;
-  info_ = row.info;
-  for (Long i = 0; i < 3; ++i)
-    nbits_[i] = row.nbits[i];
   interpolation_ = row.interpolation;
   SetLeft(tangents.leftTime, tangents.leftValue);
   SetRight(tangents.rightTime, tangents.rightValue);
+  marker_ = node.marker;
+  markerDrawn_ = node.markerDrawn != 0;
+  info_ = node.info;
+  nbits_[0] = node.nbits[0];
+  nbits_[1] = row.switches;
+  nbits_[2] = node.nbits[1];
 }
 
 } // namespace _torvane_

@@ -37,14 +37,13 @@ Bool KeyList::TakeRecords(HyperFile& file)
     return false;
   LLong begun = PreparedRecord::kHeadSize;
   while (const UChar* place = file.NextRecord(record->GetRecord(), begun)) {
-    KeyRow row;
-    KeyRowTangents tangents;
-    record->Take(place, begun, row, tangents);
-    if (!IsKeyTime(row.time))
+    PlainKey key;
+    record->Take(place, begun, key);
+    if (!IsKeyTime(key.row.time))
       break;
     if (begun > 0 && !rows_.ReserveMore(file.CountRecords(record->GetRecord(), begun)))
       break;
-    if (!rows_.Insert(rows_.GetCount(), row, tangents))
+    if (!rows_.Insert(rows_.GetCount(), key))
       break;
     file.PassRecord(record->GetRecord(), begun);
     begun = 0;
@@ -61,9 +60,8 @@ Bool KeyList::ReadKey(HyperFile& file)
   key->SetDocument(GetDocument());
   // The file's sticky error stops whatever follows a key that reads badly; the key itself stays.
   key->ReadChunkLoop(file, true);
-  KeyRow row;
-  KeyRowTangents tangents;
-  if (IsEmpty() && key->ToRow(row, tangents) && rows_.Insert(rows_.GetCount(), row, tangents)) {
+  PlainKey plain;
+  if (IsEmpty() && key->ToPlain(plain) && rows_.Insert(rows_.GetCount(), plain)) {
     DeleteObj(key);
     return true;
   }
@@ -78,20 +76,22 @@ void KeyList::WriteMembers(HyperFile& file)
 {
   const KeyRecord* record = GetRowCount() > 0 ? KeyRecord::Get() : nullptr;
   for (Long i = 0; i < GetRowCount(); ++i) {
-    KeyRow& row = rows_[i];
-    if (!row.markerDrawn) {
-      row.marker = NodeMarker();
-      CreateUuid(row.marker.bytes);
-      row.markerDrawn = true;
+    PlainKey plain = rows_.Get(i);
+    if (plain.node.markerDrawn == 0) {
+      CreateUuid(plain.node.marker.bytes);
+      plain.node.markerDrawn = 1;
+      if (!rows_.Set(i, plain)) {
+        file.SetError(FILEERROR_MEMORY);
+        return;
+      }
     }
-    const KeyRowTangents tangents = rows_.GetTangents(i);
     UChar spare[PreparedRecord::kLargest];
     if (UChar* place = record ? file.BeginRecord(record->GetRecord(), spare) : nullptr) {
-      record->Put(place, row, tangents);
+      record->Put(place, plain);
       file.EndRecord(record->GetRecord(), place, spare);
     } else {
       CKey key;
-      key.FromRow(row, tangents);
+      key.FromPlain(plain);
       key.WriteAsChunk(file, kLabelKey);
     }
   }
@@ -120,7 +120,7 @@ Bool KeyList::MakeNodes()
       }
       return false;
     }
-    key->FromRow(rows_[i], rows_.GetTangents(i));
+    key->FromPlain(rows_.Get(i));
     Append(key, true);
   }
   rows_.Flush();

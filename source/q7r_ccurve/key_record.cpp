@@ -20,8 +20,9 @@ constexpr UChar kMarkerMark = 0xA0;
 
 } // namespace
 
-void KeyRecord::Put(UChar* place, const KeyRow& row, const KeyRowTangents& tangents) const
+void KeyRecord::Put(UChar* place, const PlainKey& key) const
 {
+  const auto& [row, tangents, node] = key;
   const Real reals[kReals] = {row.time.GetNumerator(),
                               row.time.GetDenominator(),
                               tangents.leftTime.GetNumerator(),
@@ -31,16 +32,16 @@ void KeyRecord::Put(UChar* place, const KeyRow& row, const KeyRowTangents& tange
                               row.value,
                               tangents.leftValue,
                               tangents.rightValue};
-  const ULong longs[kLongs] = {static_cast<ULong>(row.interpolation), row.info, row.nbits[0], row.nbits[1],
-                               row.nbits[2]};
+  const ULong longs[kLongs] = {static_cast<ULong>(row.interpolation), node.info, node.nbits[0], row.switches,
+                               node.nbits[1]};
   for (Long i = 0; i < kReals; ++i)
     bytes::PutBig(place + reals_[i], bytes::CleanBits(reals[i]));
   for (Long i = 0; i < kLongs; ++i)
     bytes::PutBig(place + longs_[i], longs[i]);
-  std::memcpy(place + marker_, row.marker.bytes, sizeof row.marker.bytes);
+  std::memcpy(place + marker_, node.marker.bytes, sizeof node.marker.bytes);
 }
 
-void KeyRecord::Take(const UChar* place, LLong begun, KeyRow& row, KeyRowTangents& tangents) const
+void KeyRecord::Take(const UChar* place, LLong begun, PlainKey& key) const
 {
   Real reals[kReals];
   ULong longs[kLongs];
@@ -48,18 +49,11 @@ void KeyRecord::Take(const UChar* place, LLong begun, KeyRow& row, KeyRowTangent
     reals[i] = bytes::CleanReal(bytes::GetBig<ULLong>(place + (reals_[i] - begun)));
   for (Long i = 0; i < kLongs; ++i)
     longs[i] = bytes::GetBig<ULong>(place + (longs_[i] - begun));
-  row.time = BaseTime::Raw(reals[0], reals[1]);
-  tangents.leftTime = BaseTime::Raw(reals[2], reals[3]);
-  tangents.rightTime = BaseTime::Raw(reals[4], reals[5]);
-  row.value = reals[6];
-  tangents.leftValue = reals[7];
-  tangents.rightValue = reals[8];
-  row.interpolation = static_cast<Long>(longs[0]);
-  row.info = longs[1];
-  for (Long i = 0; i < 3; ++i)
-    row.nbits[i] = longs[2 + i];
-  std::memcpy(row.marker.bytes, place + (marker_ - begun), sizeof row.marker.bytes);
-  row.markerDrawn = true;
+  auto& [row, tangents, node] = key;
+  row = {BaseTime::Raw(reals[0], reals[1]), reals[6], static_cast<Long>(longs[0]), longs[3]};
+  tangents = {BaseTime::Raw(reals[2], reals[3]), BaseTime::Raw(reals[4], reals[5]), reals[7], reals[8]};
+  node = {{}, longs[1], {longs[2], longs[4]}, 1};
+  std::memcpy(node.marker.bytes, place + (marker_ - begun), sizeof node.marker.bytes);
 }
 
 // A key with a mark in each field, written in the general way.
@@ -80,12 +74,11 @@ Bool KeyRecord::Learn()
     byte = static_cast<UChar>(kMarkerMark + (&byte - marker.bytes));
   std::memcpy(bytes + marker_, marker.bytes, sizeof marker.bytes);
 
-  KeyRow row;
-  KeyRowTangents tangents;
-  Take(bytes, 0, row, tangents);
+  PlainKey key;
+  Take(bytes, 0, key);
   CKey sample;
   CKey copy;
-  sample.FromRow(row, tangents);
+  sample.FromPlain(key);
   if (!record_.Learn(sample, copy, kLabelKey))
     return false;
   Bool found = true;

@@ -15,8 +15,8 @@ class KeyRecord
 
   const PreparedRecord& GetRecord() const { return record_; }
   // The fields into the bytes of a record, and out of those behind its first `begun` ones, which hold none.
-  void Put(UChar* place, const KeyRow& row, const KeyRowTangents& tangents) const;
-  void Take(const UChar* place, LLong begun, KeyRow& row, KeyRowTangents& tangents) const;
+  void Put(UChar* place, const PlainKey& key) const;
+  void Take(const UChar* place, LLong begun, PlainKey& key) const;
 
  private:
   static constexpr Long kReals = 9;

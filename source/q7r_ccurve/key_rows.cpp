@@ -1,4 +1,5 @@
-#include <cstring>
+#include <bit>
+#include <iterator>
 
 #include "torvane/animation/key_list.h"
 
@@ -8,35 +9,63 @@ namespace _torvane_
 namespace
 {
 
-// By the bits: what isn't kept must come back as it was.
-Bool HasTangents(const KeyRowTangents& tangents)
+// Whether it is anything else than a new part: by the bits, since what isn't kept must come back as it was.
+template <class Part>
+Bool HasContent(const Part& part)
 {
-  const KeyRowTangents none;
-  return std::memcmp(&tangents, &none, sizeof none) != 0; // NOLINT(bugprone-suspicious-memory-comparison)
+  struct Words
+  {
+    ULong each[sizeof(Part) / sizeof(ULong)];
+  };
+  static_assert(sizeof(Words) == sizeof(Part));
+  constexpr Words kNone = std::bit_cast<Words>(Part());
+  const auto words = std::bit_cast<Words>(part);
+  ULong difference = 0;
+  for (std::size_t i = 0; i < std::size(words.each); ++i)
+    difference |= words.each[i] ^ kNone.each[i];
+  return difference != 0;
 }
 
 } // namespace
 
-Bool KeyRows::SetTangents(Long index, const KeyRowTangents& tangents)
+// Makes the parts of all rows if this one needs room. False when memory is short.
+template <class Part>
+Bool KeyRows::Need(GeTempDynArray<Part>& parts, const Part& part)
 {
-  if (tangents_.GetCount() == 0) {
-    if (!HasTangents(tangents))
-      return true;
-    if (!tangents_.SetCount(rows_.GetCount()))
-      return false;
-    for (KeyRowTangents& each : tangents_)
-      each = KeyRowTangents();
-  }
-  tangents_[index] = tangents;
+  if (parts.GetCount() > 0 || rows_.GetCount() == 0 || !HasContent(part))
+    return true;
+  if (!parts.Reserve(rows_.GetCapacity()) || !parts.SetCount(rows_.GetCount()))
+    return false;
+  for (Part& each : parts)
+    each = Part();
   return true;
 }
 
-Bool KeyRows::Insert(Long index, const KeyRow& row, const KeyRowTangents& tangents)
+Bool KeyRows::Set(Long index, const PlainKey& key)
 {
-  if (!(index == rows_.GetCount() ? rows_.Append(row) : rows_.Insert(index, row)))
+  if (!Need(tangents_, key.tangents) || !Need(nodes_, key.node))
     return false;
-  if (tangents_.GetCount() > 0 ? tangents_.Insert(index, tangents) : SetTangents(index, tangents))
+  rows_[index] = key.row;
+  if (tangents_.GetCount() > 0)
+    tangents_[index] = key.tangents;
+  if (nodes_.GetCount() > 0)
+    nodes_[index] = key.node;
+  return true;
+}
+
+Bool KeyRows::Insert(Long index, const PlainKey& key)
+{
+  if (!(index == rows_.GetCount() ? rows_.Append(key.row) : rows_.Insert(index, key.row)))
+    return false;
+  const Long count = rows_.GetCount();
+  // Parts that other rows have get one more; parts that only this row has are made for all.
+  if ((tangents_.GetCount() == 0 || tangents_.Insert(index, key.tangents)) &&
+      (nodes_.GetCount() == 0 || nodes_.Insert(index, key.node)) && Set(index, key))
     return true;
+  if (tangents_.GetCount() == count)
+    tangents_.Remove(index);
+  if (nodes_.GetCount() == count)
+    nodes_.Remove(index);
   rows_.Remove(index);
   return false;
 }
@@ -49,22 +78,23 @@ Bool KeyRows::ReserveMore(LLong count)
   if (present + count <= rows_.GetCapacity())
     return true;
   const LLong wanted = present + (count > present / 2 ? count : present / 2);
-  return wanted <= kMost && rows_.Reserve(static_cast<Long>(wanted));
+  return wanted <= kMost && rows_.Reserve(static_cast<Long>(wanted)) &&
+         (nodes_.GetCount() == 0 || nodes_.Reserve(static_cast<Long>(wanted)));
 }
 
 Bool KeyRows::CopyTo(KeyRows& destination, ULong flags) const
 {
   destination.Flush();
-  if (!destination.rows_.Reserve(rows_.GetCount()) || !tangents_.CopyTo(destination.tangents_)) {
+  if (!rows_.CopyTo(destination.rows_) || !tangents_.CopyTo(destination.tangents_) ||
+      !nodes_.CopyTo(destination.nodes_)) {
     destination.Flush();
     return false;
   }
-  for (const KeyRow& row : rows_) {
-    KeyRow copy = row;
-    copy.markerDrawn = false; // a copy is never the same node
+  for (KeyRowNode& node : destination.nodes_) {
+    node.marker = NodeMarker(); // a copy is never the same node
+    node.markerDrawn = 0;
     if (flags & kCopyNoInfo)
-      copy.info = 0;
-    destination.rows_.Append(copy);
+      node.info = 0;
   }
   return true;
 }
@@ -74,12 +104,22 @@ void KeyRows::Remove(Long index)
   rows_.Remove(index);
   if (tangents_.GetCount() > 0)
     tangents_.Remove(index);
+  if (nodes_.GetCount() > 0)
+    nodes_.Remove(index);
 }
 
 void KeyRows::Flush()
 {
   rows_.Flush();
   tangents_.Flush();
+  nodes_.Flush();
+}
+
+void KeyRows::Trim()
+{
+  rows_.Trim();
+  tangents_.Trim();
+  nodes_.Trim();
 }
 
 } // namespace _torvane_

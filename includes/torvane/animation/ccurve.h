@@ -20,7 +20,7 @@ struct KeyTangents
   Real rightValue = 0.0;
 };
 
-// A curve holds its keys as rows of about 64 bytes until somebody asks for one as a CKey; then all of them become
+// A curve holds its keys as rows of 32 to 64 bytes until somebody asks for one as a CKey; then all of them become
 // nodes, of some hundred bytes each, and stay nodes. A pointer to a CKey is good until that key is deleted. Whoever has
 // many keys to make or to look at takes SetKeyValues and GetKeyValues, which need no nodes.
 class CCurve : public BaseList2D
@@ -54,6 +54,8 @@ class CCurve : public BaseList2D
   // Puts a key with these values at its time, in place of one that stands there. False, with nothing changed, for a
   // time beyond 10000 seconds either way and when memory is short. `index`, if given, is the key's place, or -1.
   Bool SetKeyValues(const KeyValues& values, Long* index = nullptr);
+  // The same for a key without tangents that mostly comes behind all others, as those of samples do.
+  Bool SetKeyValue(const BaseTime& time, Real value, ULong switches);
   // Removes and frees a key; false out of range.
   Bool DelKey(Long index);
   // Makes room for `count` more keys, so that they aren't moved as they come; a curve whose keys are nodes needs none.

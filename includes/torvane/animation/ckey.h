@@ -8,8 +8,7 @@ namespace _torvane_
 {
 
 class CCurve;
-struct KeyRow;
-struct KeyRowTangents;
+struct PlainKey;
 
 // How a curve runs from one key to the next.
 inline constexpr Long kInterpolationSpline = 1;
@@ -82,9 +81,9 @@ class CKey : public BaseList2D
 
   // The key as a row of its curve; false for a key that has more than a row holds, or a time at which a curve takes no
   // keys.
-  Bool ToRow(KeyRow& row, KeyRowTangents& tangents) const;
+  Bool ToPlain(PlainKey& key) const;
   // Takes all that a row holds. For a key that stands in no curve.
-  void FromRow(const KeyRow& row, const KeyRowTangents& tangents);
+  void FromPlain(const PlainKey& key);
 
  private:
   friend class CCurve; // sets the time of a key that it moves

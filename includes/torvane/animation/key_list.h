@@ -20,19 +20,16 @@ struct KeyValues
   ULong switches = 0; // node bits 32 to 63, as GetNBit(-2) gives them: kKeyMaskAutomatic and the like
 };
 
-// All that a plain key has but for its tangents. A plain key is one without a name, parameters, data, links or anything
-// else that most keys lack (BaseList2D::IsBare), and with the last word of its node bits 0.
+// What every plain key has. A plain key is one without a name, parameters, data, links or anything else that most keys
+// lack (BaseList2D::IsBare), and with the last word of its node bits 0.
 struct KeyRow
 {
   BaseTime time;
   Real value = 0.0;
-  NodeMarker marker = {};
-  ULong info = 0;
-  ULong nbits[3] = {0, 0, 0};
   Long interpolation = kInterpolationSpline;
-  Bool markerDrawn = false;
+  ULong switches = 0; // node bits 32 to 63
 };
-static_assert(sizeof(KeyRow) <= 64);
+static_assert(sizeof(KeyRow) <= 32);
 
 struct KeyRowTangents
 {
@@ -42,34 +39,60 @@ struct KeyRowTangents
   Real rightValue = 0.0;
 };
 
-// Rows in the order of the list. Tangents take room only when a key of the list has any.
+// What a key has as a node: nothing that a new one needs before it is written.
+struct KeyRowNode
+{
+  NodeMarker marker = {};
+  ULong info = 0;
+  ULong nbits[2] = {0, 0}; // node bits 0 to 31 and 64 to 95
+  ULong markerDrawn = 0;   // 1 once there is a marker
+};
+static_assert(sizeof(KeyRow) + sizeof(KeyRowNode) <= 64);
+
+// All of a plain key.
+struct PlainKey
+{
+  KeyRow row;
+  KeyRowTangents tangents;
+  KeyRowNode node;
+};
+
+// Rows in the order of the list. Tangents, and what keys have as nodes, take room only when a key of the list has any.
 class KeyRows
 {
  public:
   Long GetCount() const { return rows_.GetCount(); }
-  KeyRow& operator[](Long index) { return rows_[index]; }
   const KeyRow& operator[](Long index) const { return rows_[index]; }
-  KeyRowTangents GetTangents(Long index) const
-  {
-    return tangents_.GetCount() > 0 ? tangents_[index] : KeyRowTangents();
-  }
+  PlainKey Get(Long index) const { return {rows_[index], At(tangents_, index), At(nodes_, index)}; }
+  KeyRowTangents GetTangents(Long index) const { return At(tangents_, index); }
   // These are false, with nothing changed, when memory is short.
-  Bool SetTangents(Long index, const KeyRowTangents& tangents);
-  Bool Insert(Long index, const KeyRow& row, const KeyRowTangents& tangents);
+  Bool Set(Long index, const PlainKey& key);
+  Bool Insert(Long index, const PlainKey& key);
+  Bool Append(const KeyRow& row)
+  {
+    const Bool isBare = tangents_.GetCount() == 0 && nodes_.GetCount() == 0;
+    return isBare ? rows_.Append(row) : Insert(GetCount(), {row, {}, {}});
+  }
   // Makes room for `count` more.
   Bool ReserveMore(LLong count);
   Bool CopyTo(KeyRows& destination, ULong flags) const; // with the markers still to be drawn
   void Remove(Long index);
   void Flush();
-  void Trim()
-  {
-    rows_.Trim();
-    tangents_.Trim();
-  }
+  void Trim();
 
  private:
+  // Parts that keys rarely have: as many as rows, or none.
+  template <class Part>
+  static Part At(const GeTempDynArray<Part>& parts, Long index)
+  {
+    return parts.GetCount() > 0 ? parts[index] : Part();
+  }
+  template <class Part>
+  Bool Need(GeTempDynArray<Part>& parts, const Part& part);
+
   GeTempDynArray<KeyRow> rows_;
-  GeTempDynArray<KeyRowTangents> tangents_; // as many as rows, or none
+  GeTempDynArray<KeyRowTangents> tangents_;
+  GeTempDynArray<KeyRowNode> nodes_;
 };
 
 class KeyList : public RootCKey

@@ -32,6 +32,8 @@ Matrix MatrixRotateZ(Real angle) noexcept;
 Matrix AnglesToMatrix(const Vector& angles, Long order) noexcept;
 // The angles of the frame, whose scale does not count. Finite also when an axis has no length.
 Vector MatrixToAngles(const Matrix& matrix, Long order) noexcept;
+// The same for axes that have length 1 already.
+Vector AxesToAngles(const Vector& v1, const Vector& v2, const Vector& v3, Long order) noexcept;
 // Of the two triples that mean the rotation of `angles`, each moved by whole turns next to `reference`, the one that
 // is nearer by the sum of its three distances; the first on a tie.
 Vector ClosestAngles(const Vector& reference, const Vector& angles, Long order) noexcept;

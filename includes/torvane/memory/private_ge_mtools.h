@@ -169,8 +169,9 @@ namespace detail
 // Makes room for one element more in a block that holds `count` of them: the first capacity, then the increment more,
 // or twice as much when there is none. False, and nothing changed, if there is no memory or no larger capacity.
 Bool GrowArray(void*& block, Long& capacity, Long count, Long first, Long increment, LLong elementSize) noexcept;
-// Moves the elements into a new zeroed block of exactly this capacity, which is at least `count`.
-Bool SetArrayCapacity(void*& block, Long& capacity, Long count, Long newCapacity, LLong elementSize) noexcept;
+// Moves the elements into a block of exactly this capacity, which is at least their count; what lies behind them is
+// undefined.
+Bool SetArrayCapacity(void*& block, Long& capacity, Long newCapacity, LLong elementSize) noexcept;
 } // namespace detail
 
 // Plain structs by value, copied byte by byte and never constructed or destroyed.
@@ -223,13 +224,13 @@ class GeTempDynArray : public GeMemory
   // Room for `capacity` elements in all, exactly.
   Bool Reserve(Long capacity) noexcept
   {
-    return capacity <= capacity_ || detail::SetArrayCapacity(block_, capacity_, count_, capacity, kElementSize);
+    return capacity <= capacity_ || detail::SetArrayCapacity(block_, capacity_, capacity, kElementSize);
   }
   // Gives back most of the room that no element takes. What there is stays when memory is short.
   void Trim() noexcept
   {
     if (count_ > 0 && capacity_ - count_ > count_ / 16)
-      static_cast<void>(detail::SetArrayCapacity(block_, capacity_, count_, count_, kElementSize));
+      static_cast<void>(detail::SetArrayCapacity(block_, capacity_, count_, kElementSize));
   }
   // Cuts the array, or lengthens it with elements of zero bytes.
   Bool SetCount(Long count) noexcept;

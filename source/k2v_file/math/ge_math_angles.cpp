@@ -85,7 +85,8 @@ constexpr Matrix (*kMatrixOfOrder[])(const Turns&) = {MatrixOfOrder0, MatrixOfOr
 // ---- Matrix to angles: a, b and c are the axes at length 1. Each order repairs the one angle that is left in gimbal
 // lock in its own way; scenes depend on that.
 
-Bool IsLocked(Real angle) { return std::fabs(std::cos(angle)) <= kGimbalLock; }
+// Most angles are too far from a right one to ask for their cosine.
+Bool IsLocked(Real angle) { return std::fabs(angle) > 1.5 && std::fabs(std::cos(angle)) <= kGimbalLock; }
 
 Vector AnglesOfOrder0(const Vector& a, const Vector& b, const Vector& c)
 {
@@ -214,8 +215,13 @@ Matrix AnglesToMatrix(const Vector& angles, Long order) noexcept
 
 Vector MatrixToAngles(const Matrix& matrix, Long order) noexcept
 {
+  return AxesToAngles(Normalize(matrix.v1), Normalize(matrix.v2), Normalize(matrix.v3), order);
+}
+
+Vector AxesToAngles(const Vector& v1, const Vector& v2, const Vector& v3, Long order) noexcept
+{
   AnglesFunction angles = IsAxisOrder(order) ? kAnglesOfOrder[order] : AnglesOfSceneOrder;
-  return angles(Normalize(matrix.v1), Normalize(matrix.v2), Normalize(matrix.v3));
+  return angles(v1, v2, v3);
 }
 
 Vector ClosestAngles(const Vector& reference, const Vector& angles, Long order) noexcept

@@ -120,16 +120,15 @@ Bool detail::GrowArray(void*& block, Long& capacity, Long count, Long first, Lon
   LLong grown = capacity == 0 ? first : increment != 0 ? LLong{capacity} + increment : LLong{capacity} * 2;
   if (grown <= count || grown > kMost)
     return false;
-  return SetArrayCapacity(block, capacity, count, static_cast<Long>(grown), elementSize);
+  return SetArrayCapacity(block, capacity, static_cast<Long>(grown), elementSize);
 }
 
-Bool detail::SetArrayCapacity(void*& block, Long& capacity, Long count, Long newCapacity, LLong elementSize) noexcept
+// What lies behind the elements is never looked at before it is written.
+Bool detail::SetArrayCapacity(void*& block, Long& capacity, Long newCapacity, LLong elementSize) noexcept
 {
-  void* moved = GeAlloc(newCapacity * elementSize);
+  void* moved = GeRealloc(block, newCapacity * elementSize);
   if (!moved)
     return false;
-  GeCopyMem(moved, block, count * elementSize);
-  GeFree(block);
   block = moved;
   capacity = newCapacity;
   return true;

@@ -147,7 +147,7 @@ void GeRangeArray::RemoveAt(Long place) noexcept
   std::memmove(at, at + 1, static_cast<std::size_t>(count_ - place) * sizeof(GeRange));
   // Without memory for the smaller block the larger one serves on.
   if (capacity_ > kFirstCapacity && count_ <= capacity_ / 2)
-    detail::SetArrayCapacity(block_, capacity_, count_, capacity_ / 2, sizeof(GeRange));
+    detail::SetArrayCapacity(block_, capacity_, capacity_ / 2, sizeof(GeRange));
 }
 
 // ---- The paged form
