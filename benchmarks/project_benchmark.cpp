@@ -73,25 +73,17 @@ void Open(benchmark::State& state, const std::string& bytes, const char* suffix)
   const ScratchFile scratch;
   const std::string path = scratch.Path() + suffix;
   std::ofstream(path, std::ios::binary) << bytes;
-  std::size_t layers = 0;
-  Seconds best(1e9);
-  ResetPeakMemory();
-  const std::int64_t before = PresentMemory();
-  RunBest(state, [&] {
-    const Seconds time = TimeOf([&] {
+  const Run run = RunFresh(state, [&] {
+    return Measure([&] {
       const std::unique_ptr<host::ProjectFile> file = host::OpenProjectFile(path);
       const std::size_t compositions = file->Compositions().size();
-      layers = file->Read(compositions - 1).layers.size();
+      if (file->Read(compositions - 1).layers.empty())
+        throw std::runtime_error("nothing was read");
     });
-    best = std::min(best, time);
-    return time;
   });
   std::filesystem::remove(path);
-  if (layers == 0)
-    state.SkipWithError("nothing was read");
   state.counters["MB"] = static_cast<double>(bytes.size()) * 1e-6;
-  state.counters["50 MB"] = best.count() / (static_cast<double>(bytes.size()) / 50e6);
-  state.counters["peak MB"] = static_cast<double>(PeakMemory() - before) * 1e-6;
+  state.counters["50 MB"] = run.time.count() / (static_cast<double>(bytes.size()) / 50e6);
 }
 
 void OpenProject(benchmark::State& state)

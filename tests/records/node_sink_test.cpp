@@ -114,7 +114,7 @@ TEST(NodeSink, HearsOfAListThatIsReplaced)
   const std::string once = "[110100,0 [5140,0 [110100,0 [110100,0 [5140,0 ] ] ] ] ]";
   const std::string empty = "[110100,0 ]";
   const std::tuple<std::string, bool> rows[] = {
-      {once, true}, {once + once, false}, {once + empty, false}, {empty + once, true}};
+      {once, true}, {once + " " + once, false}, {once + " " + empty, false}, {empty + " " + once, true}};
   for (const auto& [lists, isExact] : rows) {
     const auto values = ParseRecord("[110059,0 [110107,0 " + lists + " ] ]");
     ByteWriter file;
