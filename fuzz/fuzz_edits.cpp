@@ -54,6 +54,7 @@ class Choices
 };
 
 constexpr std::size_t kMostObjects = 200;
+constexpr LLong kMostMerged = 1 << 18; // bytes: every merge of a document into itself doubles it
 constexpr Long kMostKeys = 40;
 
 constexpr Long kObjectTypes[] = {kObjectNull,  kObjectPolygon, kObjectSpline, kObjectLight, kObjectCamera,
@@ -589,7 +590,7 @@ void Editor::MergeItself()
   name.SetMemoryWrite(&description);
   const void* data = nullptr;
   LLong size = 0;
-  if (!SaveDocument(document_, name, 0) || !name.GetMemoryContinuous(data, size))
+  if (!SaveDocument(document_, name, 0) || !name.GetMemoryContinuous(data, size) || size > kMostMerged)
     return;
   Filename again;
   again.SetMemoryRead(data, size);
