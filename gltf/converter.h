@@ -10,6 +10,7 @@
 
 #include "gltf/account.h"
 #include "gltf/file/byte_buffer.h"
+#include "gltf/file/long_text.h"
 
 namespace _torvane_
 {
@@ -45,7 +46,7 @@ struct Options
 // A converted document. The JSON refers to the bytes, which may be none.
 struct Model
 {
-  std::string json;
+  LongText json;
   ByteBuffer bytes;
   Account account;
 };

@@ -23,12 +23,12 @@ std::uint64_t Padded(std::uint64_t size) { return (size + 3) / 4 * 4; }
 std::size_t GlbSize(const Model& model)
 {
   const std::uint64_t bytes = Padded(model.bytes.Size());
-  return kHeader + kChunkHeader + Padded(model.json.size()) + (bytes > 0 ? kChunkHeader + bytes : 0);
+  return kHeader + kChunkHeader + Padded(model.json.Size()) + (bytes > 0 ? kChunkHeader + bytes : 0);
 }
 
 void WriteGlb(const Model& model, const Sink& take)
 {
-  const std::uint64_t json = Padded(model.json.size());
+  const std::uint64_t json = Padded(model.json.Size());
   const std::uint64_t bytes = Padded(model.bytes.Size());
   const std::uint64_t whole = GlbSize(model);
   if (whole > std::numeric_limits<std::uint32_t>::max())
@@ -48,8 +48,9 @@ void WriteGlb(const Model& model, const Sink& take)
   word(kMagic);
   header(kVersion, whole);
   header(json, kJsonChunk);
-  text(model.json);
-  text(std::string(json - model.json.size(), ' '));
+  for (const std::string& piece : model.json.Pieces())
+    text(piece);
+  text(std::string(json - model.json.Size(), ' '));
   if (bytes == 0)
     return;
   header(bytes, kBytesChunk);

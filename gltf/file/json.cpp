@@ -23,7 +23,7 @@ Json ToJson(const Quaternion& q) { return {q.x + 0.0, q.y + 0.0, q.z + 0.0, q.w 
 std::size_t Section::Add(const Json& element)
 {
   if (count_ > 0)
-    text_ += ',';
+    text_ += ",";
   text_ += Dump(element);
   return count_++;
 }

@@ -6,6 +6,7 @@
 
 #include <nlohmann/json.hpp>
 
+#include "gltf/file/long_text.h"
 #include "gltf/scene/frames.h"
 
 namespace gltf
@@ -28,11 +29,10 @@ class Section
   // The element's index.
   std::size_t Add(const Json& element);
   std::size_t Count() const { return count_; }
-  const std::string& Text() const { return text_; } // joined by commas
-  void Release() { std::string().swap(text_); }
+  LongText& Text() { return text_; } // joined by commas
 
  private:
-  std::string text_;
+  LongText text_;
   std::size_t count_ = 0;
 };
 

@@ -45,6 +45,16 @@ Json BoundsOf(const std::vector<float>& values, std::size_t width)
   return {{"min", std::move(low)}, {"max", std::move(high)}};
 }
 
+// An array of the file, between texts, if it has an element.
+void AddSection(LongText& text, const char* before, Section& section, const char* behind)
+{
+  if (section.Count() == 0)
+    return;
+  text += before;
+  text.Take(section.Text());
+  text += behind;
+}
+
 } // namespace
 
 float Output::ToSingle(Real number)
@@ -114,56 +124,41 @@ std::size_t Output::AddBytes(const std::vector<std::uint8_t>& bytes)
   return AddView(bytes.data(), bytes.size(), ViewTarget::kNone);
 }
 
-void Output::AddAnimation(std::string& text, const Json& animation)
+void Output::AddAnimation(LongText& text, const Json& animation)
 {
   if (animationChannels.Count() == 0)
     return;
-  const std::string rest = animation.empty() ? "" : Dump(animation).substr(1); // with the brace that closes it
-  text.append(",\"animations\":[{\"channels\":[").append(animationChannels.Text()).append("],\"samplers\":[");
-  text.append(animationSamplers.Text()).append("]").append(rest.empty() ? "}" : "," + rest).append("]");
-  animationChannels.Release();
-  animationSamplers.Release();
+  AddSection(text, ",\"animations\":[{\"channels\":[", animationChannels, "]");
+  AddSection(text, ",\"samplers\":[", animationSamplers, "]");
+  text += (animation.empty() ? "}" : "," + Dump(animation).substr(1)) + "]"; // with the brace that closes it
 }
 
-std::string Output::Finish(const std::string& generator, const Json& scene, const Json& animation,
-                           const std::string& bufferUri)
+LongText Output::Finish(const std::string& generator, const Json& scene, const Json& animation,
+                        const std::string& bufferUri)
 {
-  constexpr std::size_t kRest = 4096; // more than what isn't in a section takes
-  const std::string sceneText = Dump(scene);
-  std::size_t size = kRest + sceneText.size();
-  for (const Section* section : {&nodes, &cameras, &lights, &meshes, &materials, &textures, &images, &samplers,
-                                 &animationSamplers, &animationChannels, &accessors_, &views_})
-    size += section->Text().size();
-  std::string text;
-  text.reserve(size); // a text that grows is there twice, now and then
+  LongText text;
   text += "{\"asset\":" + Dump({{"version", "2.0"}, {"generator", generator}});
   if (!extensions_.empty())
     text += ",\"extensionsUsed\":" + Dump(extensions_);
-  text += ",\"scene\":0,\"scenes\":[" + sceneText + "]";
-  auto add = [&text](const char* name, Section& section) {
-    if (section.Count() > 0)
-      text.append(",\"").append(name).append("\":[").append(section.Text()).append("]");
-    section.Release();
-  };
-  add("nodes", nodes);
-  add("cameras", cameras);
-  add("meshes", meshes);
-  add("materials", materials);
-  add("textures", textures);
-  add("images", images);
-  add("samplers", samplers);
+  text += ",\"scene\":0,\"scenes\":[" + Dump(scene) + "]";
+  AddSection(text, ",\"nodes\":[", nodes, "]");
+  AddSection(text, ",\"cameras\":[", cameras, "]");
+  AddSection(text, ",\"meshes\":[", meshes, "]");
+  AddSection(text, ",\"materials\":[", materials, "]");
+  AddSection(text, ",\"textures\":[", textures, "]");
+  AddSection(text, ",\"images\":[", images, "]");
+  AddSection(text, ",\"samplers\":[", samplers, "]");
   AddAnimation(text, animation);
-  add("accessors", accessors_);
-  add("bufferViews", views_);
+  AddSection(text, ",\"accessors\":[", accessors_, "]");
+  AddSection(text, ",\"bufferViews\":[", views_, "]");
   if (bytes_.Size() > 0) {
     Json buffer = {{"byteLength", bytes_.Size()}};
     if (!bufferUri.empty())
       buffer["uri"] = bufferUri;
     text += ",\"buffers\":[" + Dump(buffer) + "]";
   }
-  if (lights.Count() > 0)
-    text.append(",\"extensions\":{\"KHR_lights_punctual\":{\"lights\":[").append(lights.Text()).append("]}}");
-  text += '}';
+  AddSection(text, ",\"extensions\":{\"KHR_lights_punctual\":{\"lights\":[", lights, "]}}");
+  text += "}";
   return text;
 }
 

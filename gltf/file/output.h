@@ -55,13 +55,12 @@ class Output
   ByteBuffer TakeBytes() { return std::move(bytes_); }
   // The whole JSON. `generator` names the program, `scene` is the one scene, `animation` what the animation has beside
   // samplers and channels; `bufferUri` is empty where the bytes lie in the same file. The sections are empty then.
-  std::string Finish(const std::string& generator, const Json& scene, const Json& animation,
-                     const std::string& bufferUri);
+  LongText Finish(const std::string& generator, const Json& scene, const Json& animation, const std::string& bufferUri);
 
  private:
   std::size_t AddView(const void* data, std::size_t size, ViewTarget target);
   std::size_t AddAccessor(std::size_t view, int componentType, std::size_t count, const char* type, const Json& bounds);
-  void AddAnimation(std::string& text, const Json& animation);
+  void AddAnimation(LongText& text, const Json& animation);
 
   Section accessors_;
   Section views_;

@@ -28,7 +28,7 @@ class Converted
  public:
   Converted(BaseDocument& document, const gltf::Options& options) : model_(gltf::Convert(document, options))
   {
-    json = Json::parse(model_.json);
+    json = Json::parse(model_.json.Joined());
     if (options.bufferName.empty()) {
       EXPECT_EQ(gltf::CheckGlb(gltf::ToGlb(model_)), "");
     }

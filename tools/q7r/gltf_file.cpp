@@ -38,11 +38,11 @@ std::string TextOf(const fs::path& path)
 void WriteMain(const gltf::Model& model, const std::string& title, GltfForm form, const gltf::Sink& write)
 {
   if (form == GltfForm::kPage)
-    gltf::WritePage(model, title, write);
-  else if (form == GltfForm::kGlb)
-    gltf::WriteGlb(model, write);
-  else
-    write(reinterpret_cast<const std::uint8_t*>(model.json.data()), model.json.size());
+    return gltf::WritePage(model, title, write);
+  if (form == GltfForm::kGlb)
+    return gltf::WriteGlb(model, write);
+  for (const std::string& piece : model.json.Pieces())
+    write(reinterpret_cast<const std::uint8_t*>(piece.data()), piece.size());
 }
 
 // A file that `fill` hands its bytes to, piece by piece.
