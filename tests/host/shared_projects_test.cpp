@@ -63,6 +63,8 @@ std::size_t ExpectKeyframes(const host::Json& keyframes, const host::Property& p
   return keyframes.size();
 }
 
+constexpr int kTowardsPoint = 4014; // as scripts are told that a camera or light looks at its point of interest
+
 std::size_t ExpectLayer(const host::Json& answer, const host::Layer& layer, const host::Composition& composition)
 {
   const double rate = static_cast<double>(composition.frameDuration.scale) / composition.frameDuration.value;
@@ -70,6 +72,9 @@ std::size_t ExpectLayer(const host::Json& answer, const host::Layer& layer, cons
   EXPECT_EQ(answer["name"], name);
   EXPECT_EQ(answer["enabled"], (layer.flags & AEGP_LayerFlag_VIDEO_ACTIVE) != 0);
   EXPECT_EQ(answer.value("nullLayer", false), (layer.flags & AEGP_LayerFlag_NULL_LAYER) != 0);
+  EXPECT_EQ(answer["autoOrient"] == kTowardsPoint, (layer.flags & AEGP_LayerFlag_LOOK_AT_POI) != 0);
+  const bool isAlways3D = layer.type == AEGP_ObjectType_CAMERA || layer.type == AEGP_ObjectType_LIGHT;
+  EXPECT_EQ(answer.value("threeDLayer", isAlways3D), layer.is3D);
   EXPECT_NEAR(answer["outPoint"].get<double>() * rate, layer.span->out, 1e-6);
   EXPECT_NEAR(answer["stretch"].get<double>() / 100, layer.span->stretch, 1e-12);
   const auto& layers = composition.layers;
@@ -113,6 +118,7 @@ TEST(SharedProjects, AgreeWithAfterEffectsPropertyByProperty)
       EXPECT_NEAR(item["frameRate"], found->frameRate, 1e-12);
       EXPECT_NEAR(item["duration"], found->seconds, 1e-12);
       const host::Project read = project->Read(static_cast<std::size_t>(found - list.begin()));
+      EXPECT_EQ(item["pixelAspect"], static_cast<double>(read.root->pixelAspect.num) / read.root->pixelAspect.den);
       const A_Time area = read.root->workAreaDuration;
       EXPECT_NEAR(item["workAreaDuration"], static_cast<double>(area.value) / area.scale, 1e-12);
       for (const host::Json& layer : item.value("layers", host::Json::array())) {
