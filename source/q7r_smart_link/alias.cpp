@@ -90,6 +90,12 @@ Bool CheckMemory(HyperFile& file, Bool done)
 
 // ---------------------------------------------------------------------------------------------------------------
 
+GeAliasXLink::~GeAliasXLink()
+{
+  Detach();
+  DeleteObj(name);
+}
+
 void GeAliasXLink::Attach(AliasTrunk& target)
 {
   Detach();
@@ -144,10 +150,21 @@ void GoalIterator::Leave()
 
 // ---------------------------------------------------------------------------------------------------------------
 
-GeAliasLink::~GeAliasLink()
+GeAliasLink::~GeAliasLink() { DeleteObj(xlink_); }
+
+// Made if there is none; null when memory is short.
+GeAliasXLink* GeAliasLink::NeedXLink()
 {
-  DeleteObj(xlink_);
-  DeleteObj(name_);
+  if (!xlink_)
+    xlink_ = NewObj<GeAliasXLink>();
+  return xlink_;
+}
+
+// Gives back what holds nothing any more.
+void GeAliasLink::DropXLink()
+{
+  if (xlink_ && !xlink_->trunk && !xlink_->owner && !xlink_->name)
+    DeleteObj(xlink_);
 }
 
 void GeAliasLink::SetLink(GeListNode* node) { SetLinkGoal(node ? &node->GetGoal() : nullptr); }
@@ -159,9 +176,7 @@ Bool GeAliasLink::SetLinkGoal(GeAliasGoal* goal)
     return true;
   }
   AliasTrunk* trunk = goal->NeedTrunk();
-  if (trunk && !xlink_)
-    xlink_ = NewObj<GeAliasXLink>(owner_);
-  if (!trunk || !xlink_) {
+  if (!trunk || !NeedXLink()) {
     ClearLink();
     return false;
   }
@@ -183,20 +198,27 @@ GeAliasID GeAliasLink::GetTargetId() const
   return goal ? goal->GetGoalId() : 0;
 }
 
-void GeAliasLink::ClearLink() { DeleteObj(xlink_); }
+void GeAliasLink::ClearLink()
+{
+  if (xlink_)
+    xlink_->Detach();
+  DropXLink();
+}
 
 void GeAliasLink::SetLinkOwner(void* owner)
 {
-  owner_ = owner;
-  if (xlink_)
+  if (owner ? NeedXLink() : xlink_)
     xlink_->owner = owner;
+  DropXLink();
 }
 
 void GeAliasLink::SetName(const String& name)
 {
   String* copy = name.Content() ? NewObj<String>(name) : nullptr;
-  DeleteObj(name_);
-  name_ = copy;
+  if (copy ? NeedXLink() : xlink_)
+    std::swap(xlink_->name, copy);
+  DeleteObj(copy);
+  DropXLink();
 }
 
 GeAliasLink* GeAliasLink::CloneLink(TransArray* translation) const
@@ -211,16 +233,18 @@ Bool GeAliasLink::CopyLinkTo(GeAliasLink* destination, TransArray* translation) 
     return true;
   Bool done = translation ? translation->RegisterLink(GetTargetId(), *destination, GetLinkGoal())
                           : destination->SetLinkGoal(GetLinkGoal());
-  Bool named = name_ && name_->Content();
-  destination->SetName(named ? *name_ : String());
-  return done && (!named || (destination->name_ && destination->name_->Content()));
+  const String* name = GetName();
+  const Bool named = name && name->Content();
+  destination->SetName(named ? *name : String());
+  return done && (!named || (destination->GetName() && destination->GetName()->Content()));
 }
 
 Bool GeAliasLink::WriteLink(HyperFile& file) const
 {
   UChar record[kRecordSize];
   PutRecord(record, kLinkMark, GetTargetId());
-  Long room = name_ ? name_->GetCStringLen() : 0;
+  const String* name = GetName();
+  const Long room = name ? name->GetCStringLen() : 0;
   if (room <= 0)
     return file.WriteMemory(record, kRecordSize);
 
@@ -228,7 +252,7 @@ Bool GeAliasLink::WriteLink(HyperFile& file) const
   const Owned<UChar> block(static_cast<UChar*>(GeAllocNC(kNameOffset + room + 1)));
   if (!block)
     return CheckMemory(file, false);
-  const Long length = name_->GetCString(reinterpret_cast<char*>(block.get()) + kNameOffset, room + 1);
+  const Long length = name->GetCString(reinterpret_cast<char*>(block.get()) + kNameOffset, room + 1);
   std::memcpy(block.get(), record, kRecordSize);
   bytes::PutBig(block.get() + kRecordSize, static_cast<ULong>(length));
   return file.WriteMemory(block.get(), kNameOffset + length);
@@ -242,12 +266,14 @@ Bool GeAliasLink::ReadName(const UChar* bytes, LLong size)
   LLong length = bytes::GetBig<ULong>(bytes);
   if (length > size - kNameLengthSize)
     length = size - kNameLengthSize;
-  if (!name_)
-    name_ = NewObj<String>();
-  if (!name_)
+  if (!NeedXLink())
     return false;
-  name_->SetCString(reinterpret_cast<const char*>(bytes + kNameLengthSize), static_cast<Long>(length));
-  return length == 0 || name_->Content();
+  if (!xlink_->name)
+    xlink_->name = NewObj<String>();
+  if (!xlink_->name)
+    return false;
+  xlink_->name->SetCString(reinterpret_cast<const char*>(bytes + kNameLengthSize), static_cast<Long>(length));
+  return length == 0 || xlink_->name->Content();
 }
 
 Bool GeAliasLink::ReadLink(HyperFile& file)

@@ -28,9 +28,9 @@ ULLong Mix(ULLong value)
 // What is known of one id. The two links lie in the entry itself, so that a registration takes no memory for them.
 struct TransEntry
 {
-  GeAliasGoal placeholder;       // the target of links whose goal hasn't turned up
-  GeAliasXLink current{nullptr}; // stands on the goal that links of this id are to have
-  GeAliasXLink origin{nullptr};  // in a copy, stands on the goal that the source links have
+  GeAliasGoal placeholder; // the target of links whose goal hasn't turned up
+  GeAliasXLink current;    // stands on the goal that links of this id are to have
+  GeAliasXLink origin;     // in a copy, stands on the goal that the source links have
 };
 
 // The entries follow.

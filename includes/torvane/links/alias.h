@@ -25,12 +25,12 @@ struct TransEntry;
 // at 1, so that the same run writes the same bytes.
 using GeAliasID = ULLong;
 
-// One link's place in the list of its trunk.
+// What a link that isn't empty has: its place in the list of a trunk, and what travels with it.
 class GeAliasXLink : public GeTempPublicNode2D<GeAliasXLink>
 {
  public:
-  explicit GeAliasXLink(void* linkOwner) : owner(linkOwner) {}
-  ~GeAliasXLink() override { Detach(); }
+  GeAliasXLink() = default;
+  ~GeAliasXLink() override;
 
   // Leaves its present trunk and enters another one at the end.
   void Attach(AliasTrunk& target);
@@ -39,11 +39,12 @@ class GeAliasXLink : public GeTempPublicNode2D<GeAliasXLink>
   // The goal at the other end, or null.
   GeAliasGoal* GetGoal() const;
 
-  AliasTrunk* trunk = nullptr; // null when the target has gone
-  void* owner;                 // what the link's owner gave
+  AliasTrunk* trunk = nullptr; // null without a target, and when it has gone
+  void* owner = nullptr;       // what the link's owner gave
+  String* name = nullptr;      // owned; null without a label
 };
 
-// A reference to a node; empty at the start.
+// A reference to a node; empty at the start. It may be moved in memory by its bytes.
 class GeAliasLink
 {
  public:
@@ -60,11 +61,12 @@ class GeAliasLink
   GeAliasGoal* GetLinkGoal() const;
   // Empties the link; its name stays.
   void ClearLink();
-  // The value that FirstLinkOfGoal gives for this link. Holds for later and for present attachment.
+  // The value that FirstLinkOfGoal gives for this link. Holds for later and for present attachment. Without memory it
+  // is lost: an AllocationWatch tells.
   void SetLinkOwner(void* owner);
 
   // The label that travels with the link, or null.
-  const String* GetName() const { return name_; }
+  const String* GetName() const { return xlink_ ? xlink_->name : nullptr; }
   // Sets the label; an empty text removes it.
   void SetName(const String& name);
 
@@ -89,10 +91,10 @@ class GeAliasLink
  private:
   GeAliasID GetTargetId() const;
   Bool ReadName(const UChar* bytes, LLong size);
+  GeAliasXLink* NeedXLink();
+  void DropXLink();
 
-  String* name_ = nullptr;        // owned
-  GeAliasXLink* xlink_ = nullptr; // owned
-  void* owner_ = nullptr;
+  GeAliasXLink* xlink_ = nullptr; // owned; null for a link without a target, a label and an owner
 };
 
 // Walks the links of a goal. It may outlive any of them, and the goal too: a link that goes while the iterator stands

@@ -14,8 +14,21 @@ namespace _torvane_
 // ---------------------------------------------------------------------------------------------------------------
 // Lists
 
-// A link of a doubly linked list; the base of everything that a list can hold. Both links are null outside a list.
-class GeToolNode2D : public GeMemory
+class GeToolList2D;
+class GeToolNode2D;
+
+// The neighbours of a node, or an end of a list. Only an end has no link on its outer side.
+class GeToolLinks
+{
+  friend class GeToolList2D;
+  friend class GeToolNode2D;
+
+  GeToolLinks* next_ = nullptr;
+  GeToolLinks* prev_ = nullptr;
+};
+
+// A place in a doubly linked list; the base of everything that a list can hold. Both links are null outside a list.
+class GeToolNode2D : public GeMemory, private GeToolLinks
 {
  public:
   GeToolNode2D() noexcept = default;
@@ -24,9 +37,9 @@ class GeToolNode2D : public GeMemory
   // Leaves its list.
   virtual ~GeToolNode2D() { Remove(); }
 
-  // The neighbours; null at the ends and outside a list. (Only a sentinel has no link on its outer side.)
-  GeToolNode2D* GetNext() const noexcept { return next_ && next_->next_ ? next_ : nullptr; }
-  GeToolNode2D* GetPrev() const noexcept { return prev_ && prev_->prev_ ? prev_ : nullptr; }
+  // The neighbours; null at the ends and outside a list.
+  GeToolNode2D* GetNext() const noexcept { return next_ && next_->next_ ? static_cast<GeToolNode2D*>(next_) : nullptr; }
+  GeToolNode2D* GetPrev() const noexcept { return prev_ && prev_->prev_ ? static_cast<GeToolNode2D*>(prev_) : nullptr; }
   Bool IsInList() const noexcept { return next_ && prev_; }
 
   // Leaves its list, if it is in one.
@@ -54,16 +67,13 @@ class GeToolNode2D : public GeMemory
  private:
   friend class GeToolList2D;
 
-  void Link(GeToolNode2D* before, GeToolNode2D* behind) noexcept
+  void Link(GeToolLinks* before, GeToolLinks* behind) noexcept
   {
     prev_ = before;
     next_ = behind;
     before->next_ = this;
     behind->prev_ = this;
   }
-
-  GeToolNode2D* next_ = nullptr;
-  GeToolNode2D* prev_ = nullptr;
 };
 
 // A list of nodes, which it does not own: nodes that are left in it at its end are just unlinked.
@@ -81,8 +91,8 @@ class GeToolList2D
 
   Bool IsEmpty() const noexcept { return head_.next_ == &tail_; }
   // Null in an empty list.
-  GeToolNode2D* GetFirst() const noexcept { return head_.GetNext(); }
-  GeToolNode2D* GetLast() const noexcept { return tail_.GetPrev(); }
+  GeToolNode2D* GetFirst() const noexcept { return IsEmpty() ? nullptr : static_cast<GeToolNode2D*>(head_.next_); }
+  GeToolNode2D* GetLast() const noexcept { return IsEmpty() ? nullptr : static_cast<GeToolNode2D*>(tail_.prev_); }
   // Counts by walking the list.
   Long GetCount() const noexcept
   {
@@ -92,8 +102,16 @@ class GeToolList2D
     return count;
   }
 
-  void InsertFirst(GeToolNode2D* node) noexcept { node->InsertAfter(&head_); }
-  void InsertLast(GeToolNode2D* node) noexcept { node->InsertBefore(&tail_); }
+  void InsertFirst(GeToolNode2D* node) noexcept
+  {
+    node->Remove();
+    node->Link(&head_, head_.next_);
+  }
+  void InsertLast(GeToolNode2D* node) noexcept
+  {
+    node->Remove();
+    node->Link(tail_.prev_, &tail_);
+  }
   // Unlinks every node.
   void RemoveAll() noexcept
   {
@@ -102,8 +120,8 @@ class GeToolList2D
   }
 
  private:
-  GeToolNode2D head_;
-  GeToolNode2D tail_;
+  GeToolLinks head_;
+  GeToolLinks tail_;
 };
 
 // A node whose neighbours are of type T, a class derived from this one.

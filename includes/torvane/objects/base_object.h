@@ -168,6 +168,14 @@ class BaseObject : public BaseList4D
     Long unused = 0; // no padding: parts are compared byte by byte
   };
 
+  // Read from old files only; owned.
+  struct LegacyLists
+  {
+    ~LegacyLists();
+
+    RootObject* lists[2] = {};
+  };
+
   RawChunkBody raw_; // of the chunk kChunkNodeData, when there is no object data
   Vector relPos_;
   Vector relRot_;
@@ -176,14 +184,13 @@ class BaseObject : public BaseList4D
   DisplayPart* display_ = nullptr; // owned; made with the first value that isn't the default
   ULong frozenFlags_ = 0;
   Long rotationOrder_ = kRotationOrderScene;
-  Long turnedIn_ = kNotTurned; // the order in which `relRot_` turns the object; kNotTurned: it doesn't
   RootTag tags_;
   Long editorMode_ = kObjectModeUndefined;
   Long renderMode_ = kObjectModeUndefined;
   Long disabled_ = 0;
-  RootObject* legacyListA_ = nullptr; // read from old files only; owned
-  RootObject* legacyListB_ = nullptr;
-  NodeData* objectData_ = nullptr; // owned
+  Long turnedIn_ = kNotTurned;         // the order in which `relRot_` turns the object; kNotTurned: it doesn't
+  LegacyLists* legacyLists_ = nullptr; // owned; made when an old file has one
+  NodeData* objectData_ = nullptr;     // owned
 
   // Of this object's type too; the object data are copied later.
   BaseObject* MakeEmpty() const override;
@@ -228,7 +235,7 @@ class BaseObject : public BaseList4D
   template <class Visitor>
   void VisitMirroring(Visitor& v);
   template <class Visitor>
-  void VisitLegacyList(Visitor& v, RootObject*& list);
+  void VisitLegacyList(Visitor& v, Long number);
   Bool ReadTransform(HyperFile& file, Long level);
   Bool ReadObjectData(HyperFile& file, Long id, Long level);
   void StoreModelCheckSum();

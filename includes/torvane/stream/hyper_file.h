@@ -217,6 +217,7 @@ class HyperFile : public GeMemory
   Bool ReadLMatrix(Matrix& value);
   Bool ReadSMatrix(Matrix& value);
   Bool ReadString(String& value);
+  Bool SkipString();
   Bool ReadFilename(Filename& value);
   // A new block that the caller owns and its size; size 0 gives a null block and true.
   Bool ReadMemory(void*& data, LLong& size);

@@ -63,10 +63,10 @@ class BaseTag : public BaseList2D
 
   Bool CopyPluginData(BaseTag& destination, ULong flags, TransArray* translation);
 
-  RawChunkBody raw_; // of the chunk kChunkNodeData of a plug-in tag, when there is no behaviour object
-  Long pluginId_ = -1;
+  RawChunkBody raw_;             // of the chunk kChunkNodeData of a plug-in tag, when there is no behaviour object
   NodeData* nodeData_ = nullptr; // owned
   BaseObject* object_ = nullptr; // the object that holds the tag; not owned
+  Long pluginId_ = -1;
 };
 
 // A new tag of a type, of the class that stands for it; null when memory is short. The caller owns it. The label

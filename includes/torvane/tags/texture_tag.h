@@ -86,8 +86,8 @@ class TextureTag : public BaseTag
   void ReadOldAspects(ChunkReader& v);
   Bool ReadLinkEntry(HyperFile& file, Long id);
 
-  Matrix* textureMatrix_ = nullptr; // owned; null until it is first asked for
   Bool matrixValid_ = false;
+  Matrix* textureMatrix_ = nullptr; // owned; null until it is first asked for
 };
 
 } // namespace _torvane_

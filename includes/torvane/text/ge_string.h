@@ -2,6 +2,7 @@
 #pragma once
 
 #include <compare>
+#include <cstddef>
 
 #include "torvane/types.h"
 
@@ -35,6 +36,16 @@ class String
   explicit String(const UniChar* text, Long count = -1) noexcept;
   String(Long count, UniChar fill) noexcept;
   ~String();
+
+  // A constant text, which isn't copied until the string changes: characters without a terminator.
+  template <std::size_t size>
+  [[nodiscard]] static String Constant(const UniChar (&text)[size]) noexcept
+  {
+    String string;
+    string.block_ = const_cast<UniChar*>(text); // never written to: there is no capacity
+    string.length_ = static_cast<Long>(size);
+    return string;
+  }
 
   String& operator=(const String& other) noexcept;
   String& operator=(String&& other) noexcept;
@@ -140,7 +151,7 @@ class String
     CharRef& operator=(const CharRef& other) noexcept { return *this = static_cast<UniChar>(other); }
     CharRef& operator=(UniChar character) noexcept
     {
-      if (index_ >= 0)
+      if (index_ >= 0 && string_.Reserve(string_.length_, true))
         string_.block_[index_] = character;
       return *this;
     }
@@ -174,7 +185,7 @@ class String
   Bool OpenGap(Long position, Long count) noexcept;
   void Release() noexcept;
 
-  Long capacity_ = 0;
+  Long capacity_ = 0; // 0 with a block: that of a constant
   Long length_ = 0;
   UniChar* block_ = nullptr;
 };

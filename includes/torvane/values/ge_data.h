@@ -136,7 +136,7 @@ class GeData
     String* string;
     Filename* filename;
     BaseContainer* container;
-    GeAliasLink* link;
+    UChar link[sizeof(void*)]; // a GeAliasLink
     void* block;
     UnknownRecord* unknown;
     CustomData* custom;
@@ -153,6 +153,7 @@ class GeData
     return type_ < 0 || type_ > kDataLLong || ((kInline >> type_) & 1U) == 0;
   }
   struct Kind; // a row of the table of kinds
+  GeAliasLink* LinkInPayload() const;
 
   template <class T, class... Args>
   Bool Own(Long type, T* Payload::*member, Args&&... args);

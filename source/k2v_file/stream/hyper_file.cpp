@@ -330,11 +330,20 @@ Bool HyperFile::PutReals(UChar tag, const void* values, Bool asFloats)
 template <LLong Count>
 Bool HyperFile::GetReals(UChar tag, void* values, Bool asFloats)
 {
-  LLong start = file_.GetPosition();
+  const LLong size = Count * (asFloats ? 4 : 8);
+  const UChar* place = error_ == FILEERROR_NONE ? file_.ReadWindow(1 + size) : nullptr;
+  if (place && place[0] == tag) {
+    ++place;
+    file_.CommitRead(1 + size);
+    UnpackReals<Count>(place, values, asFloats);
+    TickRead();
+    return true;
+  }
+  const LLong start = file_.GetPosition();
+  UChar raw[Count * 8];
   if (!ExpectTag(tag))
     return false;
-  UChar raw[Count * 8];
-  const UChar* place = TakeBytes(raw, Count * (asFloats ? 4 : 8));
+  place = TakeBytes(raw, size);
   if (!place)
     return FailFromFile(start);
   UnpackReals<Count>(place, values, asFloats);

@@ -49,8 +49,13 @@ Bool HyperFile::ReadChunkStart(Long& id, Long& level)
 Bool HyperFile::ReadChunkHead(Long& id, Long& level)
 {
   --chunkDepth_;
-  if (!ReadPlainLong(id) || !ReadPlainLong(level))
+  if (const UChar* place = file_.ReadWindow(8)) {
+    id = static_cast<Long>(bytes::GetBig<ULong>(place));
+    level = static_cast<Long>(bytes::GetBig<ULong>(place + 4));
+    file_.CommitRead(8);
+  } else if (!ReadPlainLong(id) || !ReadPlainLong(level)) {
     return false;
+  }
   ++chunkDepth_;
   if (chunkDepth_ <= 0)
     return true;
@@ -135,6 +140,13 @@ Bool HyperFile::SkipToEndChunk()
 {
   if (error_ != FILEERROR_NONE)
     return false;
+  // Mostly there is nothing to skip.
+  const UChar* next = file_.ReadWindow(1);
+  if (next && next[0] == kTagChunkEnd) {
+    file_.CommitRead(1);
+    --chunkDepth_;
+    return true;
+  }
   LLong depth = 0;
   do {
     UChar tag = 0;

@@ -70,6 +70,17 @@ LLong GetNumberElement(const UChar* next, Long& id, GeData& number)
   return type == kDataLong ? kLongElementSize : kRealElementSize;
 }
 
+// How many of the first bytes are the same.
+LLong CountSame(const UChar* a, const UChar* b, LLong count)
+{
+  LLong same = 0;
+  for (; same + 8 <= count && std::memcmp(a + same, b + same, 8) == 0; same += 8) {
+  }
+  while (same < count && a[same] == b[same])
+    ++same;
+  return same;
+}
+
 // The general way.
 Bool WriteElement(HyperFile& file, Long id, const GeData& value) { return file.WriteLong(id) && value.Write(file); }
 
@@ -220,7 +231,7 @@ Bool HyperFile::ReadContainerChunk(ContainerIndex& target, Bool flush, Long expe
     return false;
   // Most elements are numbers: these are taken straight out of the buffer, as long as it holds the longest of them.
   const Bool numbersInBuffer = flush && !singlePrecision_;
-  const UChar* first = file_.ReadWindow(1);
+  const UChar* first = container.IsShared() ? nullptr : file_.ReadWindow(1);
   if (expected > 0 && first && first[0] == kTagLong && !container.Reserve(expected))
     return Fail(FILEERROR_MEMORY, start);
   while (error_ == FILEERROR_NONE) {
@@ -266,28 +277,35 @@ Bool HyperFile::ReadShared(BaseContainer& container)
   const BaseContainer::Defaults& defaults = *container.defaults_;
   container.Flush();
   container.Share(defaults);
+  const Long size = defaults.count > 0 ? defaults.ends[defaults.count - 1] : 0;
   Bool read = true;
-  Long count = 0;
-  Long before = 0;
-  for (const auto* place = defaults.first; place && read; place = place->next, ++count) {
-    const Long size = defaults.ends[count] - before;
-    const UChar* next = size > 0 ? file_.ReadWindow(size) : nullptr;
-    if (next && std::memcmp(next, defaults.bytes + before, static_cast<std::size_t>(size)) == 0) {
-      file_.CommitRead(size);
-      TickMany(kReadElementTicks);
-    } else if (next && next[0] == kTagLong && static_cast<Long>(bytes::GetBig<ULong>(next + 1)) == place->id &&
-               container.TakesChange()) {
-      auto* own = container.NewOwn(place->id);
-      if (!own)
-        return Fail(FILEERROR_MEMORY, file_.GetPosition());
-      container.Link(own);
-      file_.CommitRead(kElementType);
-      read = own->value.Read(*this);
-    } else {
+  Long count = 0;   // elements that were dealt with
+  Long before = 0;  // their bytes
+  LLong passed = 0; // elements that were passed over
+  for (const auto* place = defaults.first; place && read;) {
+    const LLong left = std::min<LLong>(size - before, file_.GetReadLeft());
+    const UChar* next = file_.ReadWindow(left);
+    const LLong same = before + (next ? CountSame(next, defaults.bytes + before, left) : 0);
+    const Long first = before;
+    for (; place && defaults.ends[count] > before && defaults.ends[count] <= same; place = place->next, ++passed)
+      before = defaults.ends[count++];
+    file_.CommitRead(before - first);
+    if (!place)
       break;
-    }
-    before = defaults.ends[count];
+    next = file_.ReadWindow(kElementType);
+    if (!next || next[0] != kTagLong || static_cast<Long>(bytes::GetBig<ULong>(next + 1)) != place->id ||
+        !container.TakesChange())
+      break;
+    auto* own = container.NewOwn(place->id);
+    if (!own)
+      return Fail(FILEERROR_MEMORY, file_.GetPosition());
+    container.Link(own);
+    file_.CommitRead(kElementType);
+    read = own->value.Read(*this);
+    before = defaults.ends[count++];
+    place = place->next;
   }
+  TickMany(kReadElementTicks * passed);
   container.dirty_ = static_cast<UWord>(container.dirty_ - (defaults.count - count));
   if (count < defaults.count && !container.TakeFirst(count))
     return Fail(FILEERROR_MEMORY, file_.GetPosition());

@@ -14,6 +14,7 @@ constexpr LLong kTextPiece = 512;          // characters that are converted at a
 constexpr LLong kFirstStep = 65536;        // first allocation for a block whose size can't be checked
 constexpr LLong kLargestShort = INT32_MAX; // larger memory blocks have a 64-bit length
 constexpr LLong kSmallBlock = 64;
+constexpr LLong kBlockHead = 5; // a tag, and a 32-bit length
 
 void PackText(UChar* place, const UniChar* text, LLong count)
 {
@@ -43,6 +44,12 @@ Bool HyperFile::PutBlockHead(UChar tag, ULong length)
 
 Bool HyperFile::GetBlockHead(UChar tag, LLong& length)
 {
+  const UChar* place = error_ == FILEERROR_NONE ? file_.ReadWindow(kBlockHead) : nullptr;
+  if (place && place[0] == tag) {
+    length = bytes::GetBig<ULong>(place + 1);
+    file_.CommitRead(kBlockHead);
+    return true;
+  }
   Long stored = 0;
   if (!ExpectTag(tag) || !ReadPlainLong(stored))
     return false;
@@ -107,6 +114,15 @@ Bool HyperFile::WriteFilename(const Filename& value) { return PutText(kTagFilena
 
 Bool HyperFile::ReadString(String& value) { return GetText(kTagString, value); }
 
+Bool HyperFile::SkipString()
+{
+  LLong length = 0;
+  if (!GetBlockHead(kTagString, length) || !Drop(length, file_.GetPosition()))
+    return false;
+  TickRead();
+  return true;
+}
+
 Bool HyperFile::ReadFilename(Filename& value)
 {
   String text;
@@ -165,14 +181,13 @@ Bool HyperFile::WriteMemory(const void* data, LLong size)
   LLong start = file_.GetPosition();
   if (size < 0 || (size > 0 && !data))
     return Fail(FILEERROR_INVALID, start);
-  constexpr LLong kHead = 5;
   // Small blocks, as those of links and goals, go into the buffer in one go.
-  UChar* place = size > 0 && size <= kSmallBlock ? file_.WriteWindow(kHead + size) : nullptr;
+  UChar* place = size > 0 && size <= kSmallBlock ? file_.WriteWindow(kBlockHead + size) : nullptr;
   if (place) {
     place[0] = kTagMemory;
     bytes::PutBig(place + 1, static_cast<ULong>(size));
-    GeCopyMem(place + kHead, data, size);
-    file_.CommitWrite(kHead + size);
+    GeCopyMem(place + kBlockHead, data, size);
+    file_.CommitWrite(kBlockHead + size);
     TickWrite();
     return true;
   }
@@ -187,6 +202,12 @@ Bool HyperFile::WriteMemory(const void* data, LLong size)
 // The length of a Memory value of either tag.
 Bool HyperFile::GetMemoryLength(LLong& length)
 {
+  const UChar* next = error_ == FILEERROR_NONE ? file_.ReadWindow(kBlockHead) : nullptr;
+  if (next && next[0] == kTagMemory) {
+    length = bytes::GetBig<ULong>(next + 1);
+    file_.CommitRead(kBlockHead);
+    return true;
+  }
   LLong start = file_.GetPosition();
   UChar tag = 0;
   if (!ReadValueHeader(tag))
@@ -223,6 +244,13 @@ Bool HyperFile::ReadMemoryInto(void* buffer, LLong capacity, LLong& size)
   if (length < 0)
     return Fail(FILEERROR_WRONG_VALUE, start);
   LLong wanted = length < capacity ? length : capacity;
+  if (const UChar* place = length <= capacity ? file_.ReadWindow(length) : nullptr) {
+    GeCopyMem(buffer, place, length);
+    file_.CommitRead(length);
+    size = length;
+    TickRead();
+    return true;
+  }
   if (wanted > 0 && file_.ReadBytes(buffer, wanted) != wanted)
     return FailFromFile(start);
   if (length > wanted && !Drop(length - wanted, start))

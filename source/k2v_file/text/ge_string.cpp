@@ -89,7 +89,7 @@ String& String::operator=(String&& other) noexcept
 
 void String::Release() noexcept
 {
-  if (!gShutdown.load(std::memory_order_relaxed))
+  if (capacity_ > 0 && !gShutdown.load(std::memory_order_relaxed))
     GeFree(block_);
   block_ = nullptr;
   capacity_ = length_ = 0;
@@ -204,7 +204,7 @@ String String::Concat(const String& other) const noexcept
 
 void String::Delete(Long position, Long count) noexcept
 {
-  if (position < 0 || count <= 0 || position >= length_)
+  if (position < 0 || count <= 0 || position >= length_ || !Reserve(length_, true))
     return;
   Long rest = length_ - position;
   Long removed = count < rest ? count : rest;

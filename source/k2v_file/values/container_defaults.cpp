@@ -1,7 +1,5 @@
 #include "k2v_file/values/container_defaults.h"
 
-#include "torvane/links/alias.h"
-
 namespace _torvane_
 {
 
@@ -46,7 +44,8 @@ void BaseContainer::BuildDefault(GeData& value, const ContainerDefault& row, voi
   case DefaultForm::kFilename:
     return hold(kDataFilename, &Payload::filename, Empty<Filename>());
   case DefaultForm::kLink:
-    return hold(kDataLink, &Payload::link, Empty<GeAliasLink>());
+    value.SetType(kDataLink);
+    return;
   case DefaultForm::kContainer:
     return hold(kDataContainer, &Payload::container,
                 row.container ? const_cast<BaseContainer*>(&row.container()) : Empty<BaseContainer>());

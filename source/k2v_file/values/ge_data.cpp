@@ -94,7 +94,7 @@ GeData::GeData(const BaseContainer& value)
 
 GeData::GeData(const GeAliasLink& value)
 {
-  Keep(Own(kDataLink, &Payload::link) && value.CopyLinkTo(payload_.link, nullptr));
+  Keep(Make(Kind::Of(kDataLink), kDataLink) && value.CopyLinkTo(LinkInPayload(), nullptr));
 }
 
 GeData::GeData(Long type, const CustomData& source)
@@ -275,9 +275,11 @@ const Filename& GeData::GetFilename() const
   return Get(kDataFilename, &Payload::filename, kNoName);
 }
 
-GeAliasLink* GeData::GetAliasLink() const { return type_ == kDataLink ? payload_.link : nullptr; }
+GeAliasLink* GeData::LinkInPayload() const { return &Kind::LinkOf(const_cast<Payload&>(payload_)); }
 
-GeListNode* GeData::GetLink() const { return type_ == kDataLink ? payload_.link->GetLink() : nullptr; }
+GeAliasLink* GeData::GetAliasLink() const { return type_ == kDataLink ? LinkInPayload() : nullptr; }
+
+GeListNode* GeData::GetLink() const { return type_ == kDataLink ? LinkInPayload()->GetLink() : nullptr; }
 
 CustomData* GeData::GetCustomDataType(Long type) const
 {

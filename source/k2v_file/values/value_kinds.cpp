@@ -1,6 +1,7 @@
 #include "k2v_file/values/value_kinds.h"
 
 #include <iterator>
+#include <new>
 
 #include "k2v_file/stream/chunk_visitor.h"
 #include "torvane/links/alias.h"
@@ -67,7 +68,6 @@ Bool ArePayloadsEqual(const String&, const String&) { return false; }
 Bool ArePayloadsEqual(const UnknownRecord&, const UnknownRecord&) { return false; }
 Bool ArePayloadsEqual(const Filename& a, const Filename& b) { return a.IsEqual(b); }
 Bool ArePayloadsEqual(const BaseContainer& a, const BaseContainer& b) { return a.IsEqual(b); }
-Bool ArePayloadsEqual(const GeAliasLink& a, const GeAliasLink& b) { return a.IsEqual(b); }
 
 // What no file holds as a value.
 Bool ReadValue(HyperFile&, void*&) { return true; }
@@ -121,6 +121,30 @@ struct GeData::Kind::Owned
   {
     return {type, storedAs, isCopiedInPlace, Make, Free, Copy, IsEqual, Read, Write};
   }
+};
+
+GeAliasLink& GeData::Kind::LinkOf(Payload& payload)
+{
+  static_assert(sizeof(GeAliasLink) == sizeof payload.link);
+  return *std::launder(reinterpret_cast<GeAliasLink*>(payload.link));
+}
+
+struct GeData::Kind::Link
+{
+  static const GeAliasLink& In(const Payload& payload) { return LinkOf(const_cast<Payload&>(payload)); }
+  static Bool Make(Payload& payload, Long)
+  {
+    ::new (static_cast<void*>(payload.link)) GeAliasLink;
+    return true;
+  }
+  static void Free(Payload& payload) { LinkOf(payload).~GeAliasLink(); }
+  static Bool Copy(Payload& to, const Payload& from, ULong flags, TransArray* translation)
+  {
+    return CopyPayload(LinkOf(to), In(from), flags, translation);
+  }
+  static Bool IsEqual(const Payload& a, const Payload& b) { return In(a).IsEqual(In(b)); }
+  static Bool Read(HyperFile& file, Payload& payload) { return ReadValue(file, LinkOf(payload)); }
+  static Bool Write(HyperFile& file, const Payload& payload) { return WriteValue(file, In(payload)); }
 };
 
 // Nil, and types that don't exist, which keep their number alone.
@@ -199,7 +223,7 @@ constexpr GeData::Kind GeData::Kind::kRows[] = {
     Owned<String, &Payload::string>::Row(kDataString, true),
     Owned<Filename, &Payload::filename>::Row(kDataFilename, true),
     Owned<BaseContainer, &Payload::container>::Row(kDataContainer, false),
-    Owned<GeAliasLink, &Payload::link>::Row(kDataLink, false),
+    {kDataLink, StoredAs::kValue, false, Link::Make, Link::Free, Link::Copy, Link::IsEqual, Link::Read, Link::Write},
     {kDataRawBlock, StoredAs::kNever, false, Block::Make, Block::Free, Block::Copy, Nothing::AreNotEqual, Nothing::Read,
      Nothing::Write},
     Owned<UnknownRecord, &Payload::unknown>::Row(kDataUnknown, false, StoredAs::kNever),

@@ -34,11 +34,15 @@ struct GeData::Kind
   // what doesn't exist for all others.
   static const Kind& Of(Long type);
 
+  // A link lies in the payload itself.
+  static GeAliasLink& LinkOf(Payload& payload);
+
  private:
   template <class T, auto member>
   struct Inline;
   template <class T, auto member>
   struct Owned;
+  struct Link;
   struct Nothing;
   struct Block;
   struct Custom;

@@ -21,6 +21,16 @@ Bool VisitNodeDataHead(Visitor& v, Long& type, String& name)
   return v.Good();
 }
 
+// The same for a node that may have a name already, which then stays.
+inline Bool ReadNodeDataHead(ChunkReader& v, Long& type, String& name)
+{
+  if (!name.Content())
+    return VisitNodeDataHead(v, type, name);
+  v.Long(type);
+  v.ConstantLong(0);
+  return v.Note(v.Good() && v.File().SkipString());
+}
+
 // Where a node keeps the content of the chunk: a NodeData, which the node owns, or else the bytes.
 struct NodeDataSlot
 {

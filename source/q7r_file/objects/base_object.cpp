@@ -26,11 +26,16 @@ BaseObject::~BaseObject()
 {
   DeleteObj(frozen_);
   DeleteObj(display_);
-  DeleteObj(legacyListA_);
-  DeleteObj(legacyListB_);
+  DeleteObj(legacyLists_);
   DeleteObj(objectData_);
   RemoveFromList();
   tags_.FreeAll();
+}
+
+BaseObject::LegacyLists::~LegacyLists()
+{
+  for (RootObject*& list : lists)
+    DeleteObj(list);
 }
 
 Bool BaseObject::IsInstanceOf(Long type) const { return type == GetType() || BaseList4D::IsInstanceOf(type); }
@@ -45,8 +50,8 @@ void BaseObject::SetDocument(BaseDocument* document)
     return;
   BaseList4D::SetDocument(document);
   SetDocumentOfMembers(&tags_, document);
-  for (RootObject* list : {legacyListA_, legacyListB_})
-    SetDocumentOfMembers(list, document);
+  for (Long i = 0; legacyLists_ && i < 2; ++i)
+    SetDocumentOfMembers(legacyLists_->lists[i], document);
 }
 
 BaseTag* BaseObject::GetFirstTag() const { return NodeCast<BaseTag>(tags_.GetFirst()); }
@@ -159,22 +164,25 @@ void BaseObject::VisitDisplay(Visitor& v)
     }
   }
   if (holds(5)) {
-    VisitLegacyList(v, legacyListA_);
-    VisitLegacyList(v, legacyListB_);
+    VisitLegacyList(v, 0);
+    VisitLegacyList(v, 1);
   }
 }
 
 // A list of objects that old files may hold here. It is never written.
 template <class Visitor>
-void BaseObject::VisitLegacyList(Visitor& v, RootObject*& list)
+void BaseObject::VisitLegacyList(Visitor& v, Long number)
 {
   if constexpr (Visitor::kReading) {
     Bool present = false;
     v.Bool(present);
     if (!present)
       return;
-    if (!list)
-      list = AllocRootObject();
+    if (!legacyLists_)
+      legacyLists_ = NewObj<LegacyLists>();
+    RootObject* list = legacyLists_ ? legacyLists_->lists[number] : nullptr;
+    if (legacyLists_ && !list)
+      list = legacyLists_->lists[number] = AllocRootObject();
     if (!list) {
       v.File().SetError(FILEERROR_MEMORY);
       v.Note(false);
@@ -232,13 +240,10 @@ RootList2D* BaseObject::AllocChildRoot() const { return AllocRootObject(); }
 Bool BaseObject::ReadObjectData(HyperFile& file, Long id, Long level)
 {
   Long type = 0;
-  String name;
   ChunkReader reader(file, level);
-  if (!VisitNodeDataHead(reader, type, name))
+  if (!ReadNodeDataHead(reader, type, name_))
     return false;
   SetType(type);
-  if (!name_.Content())
-    name_ = name;
   return ReadNodeDataBody(file, id, level, type, {*this, objectData_, raw_});
 }
 

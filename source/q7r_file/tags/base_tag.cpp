@@ -53,12 +53,9 @@ Bool BaseTag::ReadChunk(HyperFile& file, Long id, Long level)
     return true;
   if (id != kChunkNodeData)
     return false;
-  String name;
   ChunkReader reader(file, level);
-  if (!VisitNodeDataHead(reader, pluginId_, name))
+  if (!ReadNodeDataHead(reader, pluginId_, name_))
     return false;
-  if (!name_.Content())
-    name_ = name;
   return ReadNodeDataBody(file, id, level, pluginId_, {*this, nodeData_, raw_});
 }
 

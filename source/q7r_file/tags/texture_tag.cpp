@@ -34,6 +34,8 @@ constexpr ContainerDefault kTextureDefaults[] = {
     {1202, DefaultForm::kReal, 0.0},
 };
 
+constexpr UniChar kNewName[] = {'T', 'e', 'x', 't', 'u', 'r', 'e'};
+
 // An aspect: the number that is looked for, and the one that is stored. They are not always the same.
 struct Aspect
 {
@@ -234,7 +236,7 @@ Bool TextureTag::ReadChunk(HyperFile& file, Long id, Long level)
 {
   if (BaseTag::ReadChunk(file, id, level)) {
     if (id == kChunkNodeHeader && !name_.Content())
-      name_ = "Texture";
+      name_ = String::Constant(kNewName);
     return true;
   }
   return id == kChunkOldTexture && (level < 0 || ReadOldChunk(file, level)) && file.SkipToEndChunk();
