@@ -1,6 +1,5 @@
 #include "torvane/time/base_time.h"
 
-#include <numeric>
 #include <utility>
 
 #include "q7r_basetime/basetime_log.h"
@@ -17,6 +16,13 @@ constexpr Real kTicksPerSecond = 1000.0;
 constexpr Real kTiny = 0.001;                // a number below this counts as 0
 constexpr Real kIntegerLimit = 2147483520.0; // below this the division runs in integers
 constexpr Real kLargeLimit = 1e18;
+
+ULong GreatestDivisor(ULong a, ULong b)
+{
+  while (b != 0)
+    a = std::exchange(b, a % b);
+  return a;
+}
 
 Real Rounded(Real value) { return std::floor(std::fabs(value) + 0.5); }
 
@@ -62,7 +68,7 @@ void BaseTime::Reduce() noexcept
     ReduceLarge();
     return;
   }
-  ULong divisor = std::gcd(static_cast<ULong>(x), static_cast<ULong>(y));
+  ULong divisor = GreatestDivisor(static_cast<ULong>(x), static_cast<ULong>(y));
   if (static_cast<ULong>(y) == 0) {
     *this = BaseTime();
   } else if (divisor > 1) {

@@ -78,8 +78,8 @@ class RootList2D : public PrivateChunk
   // badly is deleted. True unless it did.
   // Some lists leave the list head of the members that they read unset.
   Bool ReadMember(HyperFile& file, BaseList2D* member, Bool setListHead);
-  // Whether a sink gets the members.
-  virtual Bool IsPassedOn() const { return false; }
+  // Whether a sink got members that were read; null for a list that keeps its members in any case.
+  virtual Bool* PassedOn() { return nullptr; }
   // Appends behind the last member; false for a node of another class.
   Bool Append(BaseList2D* node, Bool setListHead);
 
@@ -87,14 +87,13 @@ class RootList2D : public PrivateChunk
   Bool Takes(const BaseList2D& node) const;
   void Enter(BaseList2D& node, Bool setListHead);
   void BeginList();
-  NodeSink* GetSink() const;
+  NodeSink* GetSink();
   void TakeBack();
 
   GeTempPublicList2D<PrivateChunk> list_;
   KeptChunks keptChunks_;
   BaseList2D* owner_ = nullptr;
   BaseDocument* document_ = nullptr;
-  Bool hasPassedOn_ = false; // members that were read went to a sink
 };
 
 // Objects: of a document, and the children of each object. Labels are the members' disk types; any is taken on reading.
@@ -109,7 +108,10 @@ class RootObject : public RootList2D
   virtual BaseObject* AllocMember(Long type);
 
  protected:
-  Bool IsPassedOn() const override { return true; }
+  Bool* PassedOn() override { return &passedOn_; }
+
+ private:
+  Bool passedOn_ = false;
 };
 
 // Tags of an object, the list's owner.
@@ -133,7 +135,10 @@ class RootMaterial : public RootList2D
   virtual BaseList2D* AllocMember(Long type);
 
  protected:
-  Bool IsPassedOn() const override { return true; }
+  Bool* PassedOn() override { return &passedOn_; }
+
+ private:
+  Bool passedOn_ = false;
 };
 
 // Render settings of a document, and the children of each.

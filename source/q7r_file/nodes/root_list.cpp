@@ -159,15 +159,16 @@ Bool RootList2D::ReadChunk(HyperFile& file, Long id, Long level)
 // What a file holds takes the place of the present members.
 void RootList2D::BeginList()
 {
-  if (hasPassedOn_)
+  if (Bool* passedOn = PassedOn(); passedOn && *passedOn) {
     TakeBack();
-  hasPassedOn_ = false;
+    *passedOn = false;
+  }
   FreeAll();
 }
 
-NodeSink* RootList2D::GetSink() const
+NodeSink* RootList2D::GetSink()
 {
-  const BaseDocument* document = IsPassedOn() ? GetDocument() : nullptr;
+  const BaseDocument* document = PassedOn() ? GetDocument() : nullptr;
   return document ? document->GetNodeSink() : nullptr;
 }
 
@@ -191,7 +192,7 @@ Bool RootList2D::ReadMember(HyperFile& file, BaseList2D* member, Bool setListHea
   if (!sink)
     return Append(member, setListHead);
   sink->Take(*member);
-  hasPassedOn_ = true;
+  *PassedOn() = true;
   DeleteObj(member);
   return true;
 }
