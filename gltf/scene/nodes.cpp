@@ -36,12 +36,13 @@ bool IsIdentity(const Quaternion& q) { return q.x == 0.0 && q.y == 0.0 && q.z ==
 
 std::string UniqueNames::Take(const std::string& name)
 {
-  if (name.empty() || taken_.insert(name).second)
+  const std::hash<std::string> hashOf;
+  if (name.empty() || taken_.insert(hashOf(name)).second)
     return name;
   int& number = next_.try_emplace(name, 2).first->second;
   for (;; ++number) {
     std::string other = name + "." + std::to_string(number);
-    if (taken_.insert(other).second)
+    if (taken_.insert(hashOf(other)).second)
       return other;
   }
 }

@@ -20,7 +20,7 @@ class UniqueNames
   std::string Take(const std::string& name); // an empty one stays so
 
  private:
-  std::unordered_set<std::string> taken_;
+  std::unordered_set<std::size_t> taken_;     // by their hashes: who meets the hash of another name gives way too
   std::unordered_map<std::string, int> next_; // the number to try for a name that is taken
 };
 

@@ -50,9 +50,6 @@ bool StandsForLayer(const BaseObject& object) { return object.GetDataInstance().
 SceneTree::SceneTree(BaseDocument& document)
 {
   AddAll(document.GetFirstObject());
-  places_.reserve(objects_.size());
-  for (std::size_t i = 0; i < objects_.size(); ++i)
-    places_.emplace(objects_[i].object, i);
   sceneCamera_ = FindSceneCamera(document);
 }
 
@@ -107,6 +104,13 @@ bool SceneTree::IsHidden(const SceneObject& entry) const
 
 std::size_t SceneTree::Find(const GeListNode* node) const
 {
+  if (!node)
+    return kNone;
+  if (places_.empty()) {
+    places_.reserve(objects_.size());
+    for (std::size_t i = 0; i < objects_.size(); ++i)
+      places_.emplace(objects_[i].object, i);
+  }
   const auto found = places_.find(node);
   return found == places_.end() ? kNone : found->second;
 }
@@ -116,14 +120,16 @@ std::size_t SceneTree::FindSceneCamera(BaseDocument& document) const
   const auto* panels = document.GetViewPanelRoot();
   auto* panel = panels ? NodeCast<ViewPanel>(panels->GetFirst()) : nullptr;
   auto* draw = panel ? NodeCast<BaseDraw>(panel->GetDraws().GetFirst()) : nullptr;
-  const std::size_t linked = draw ? Find(draw->GetSceneCamera().GetLink()) : kNone;
-  if (linked != kNone && objects_[linked].object->GetType() == kObjectCamera)
-    return linked;
+  const GeListNode* linked = draw ? draw->GetSceneCamera().GetLink() : nullptr;
+  std::size_t first = kNone;
   for (std::size_t i = 0; i < objects_.size(); ++i) {
-    if (objects_[i].object->GetType() == kObjectCamera)
+    if (objects_[i].object->GetType() != kObjectCamera)
+      continue;
+    if (objects_[i].object == linked)
       return i;
+    first = std::min(first, i);
   }
-  return kNone;
+  return first;
 }
 
 SceneSettings::SceneSettings(BaseDocument& document)

@@ -44,7 +44,7 @@ class SceneTree
   std::size_t FindSceneCamera(_torvane_::BaseDocument& document) const;
 
   std::vector<SceneObject> objects_;
-  std::unordered_map<const _torvane_::GeListNode*, std::size_t> places_;
+  mutable std::unordered_map<const _torvane_::GeListNode*, std::size_t> places_; // empty until it is first asked for
   std::size_t sceneCamera_ = kNone;
 };
 
