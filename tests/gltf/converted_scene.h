@@ -1,16 +1,14 @@
 // Scenes composed for a conversion, and what comes out of it as JSON and numbers.
 #pragma once
 
-#include <nlohmann/json.hpp>
-
 #include "gltf/converter.h"
 #include "gltf/file/checker.h"
 #include "support/library.h"
+#include "support/run_q7r.h"
 
 namespace gltf_test
 {
 
-using Json = nlohmann::json;
 using gltf::Loss;
 
 inline constexpr double kQuarter = 1.5707963267948966;
