@@ -2,6 +2,7 @@
 // node's name, and then the values of its NodeData or the bytes that were kept for want of one.
 #pragma once
 
+#include "k2v_file/stream/chunk_visitor.h"
 #include "torvane/nodes/private_chunk.h"
 #include "torvane/stream/raw_chunk_body.h"
 
