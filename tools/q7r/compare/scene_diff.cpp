@@ -203,13 +203,13 @@ void SceneDiff::CompareTracks(CTrack& a, CTrack& b, const std::string& path)
 // By their times: both curves have their keys in ascending order.
 void SceneDiff::CompareCurves(const CCurve* curveA, const CCurve* curveB, const std::string& path)
 {
-  const Long countA = curveA ? curveA->GetKeyCount() : 0;
-  const Long countB = curveB ? curveB->GetKeyCount() : 0;
   CKey scratchA;
   CKey scratchB;
-  for (Long a = 0, b = 0; a < countA || b < countB;) {
-    const CKey* keyA = a < countA ? curveA->PeekKey(a, scratchA) : nullptr;
-    const CKey* keyB = b < countB ? curveB->PeekKey(b, scratchB) : nullptr;
+  for (Long a = 0, b = 0;;) {
+    const CKey* keyA = curveA ? curveA->PeekKey(a, scratchA) : nullptr;
+    const CKey* keyB = curveB ? curveB->PeekKey(b, scratchB) : nullptr;
+    if (!keyA && !keyB)
+      return;
     const bool isOne = keyA && keyB && comparison_.AreEqual(keyA->GetTime().Get(), keyB->GetTime().Get());
     const bool isOfA = keyA && (isOne || !keyB || keyA->GetTime().Get() < keyB->GetTime().Get());
     const bool isOfB = isOne || !isOfA;
