@@ -5,8 +5,6 @@
 namespace
 {
 
-using Reports = std::vector<std::string>;
-
 // A custom value with its stack.
 class Stack
 {
@@ -83,13 +81,11 @@ TEST(BlendLayers, ReadFoldersByTheLevelOfTheirOwnList)
 
 TEST(BlendLayers, RefuseDamagedStacks)
 {
-  const counting_memory::BalanceCheck balance;
-  const AssertionRecord record;
   Stack stack;
   EXPECT_FALSE(ReadStack(stack, Record("L1 L3 " + Head(11, 1) + "B1 L2")));
-  ASSERT_GE(record.Reports().size(), 2U);
-  EXPECT_EQ(record.Reports()[0], "blendlayers:41");
-  EXPECT_EQ(record.Reports()[1], "blendlayers:152");
+  const Reports reports = TakeReports();
+  ASSERT_GE(reports.size(), 2U);
+  EXPECT_TRUE(reports[0] == "blendlayers:41" && reports[1] == "blendlayers:152");
   EXPECT_EQ(stack.value.GetType(), kDataNil);
 
   // A Colorize layer without a gradient: the values behind it are read, but the list has failed.
@@ -144,10 +140,9 @@ TEST(BlendLayers, StartWithTheirDefaults)
   GeData vector;
   EXPECT_TRUE(stack.Layers().GetLayer(9)->GetLayerParameter(2003, vector));
   EXPECT_TRUE(vector.GetVector() == Vector(1, 1, 1));
-  const AssertionRecord record;
   EXPECT_EQ(stack.Layers().AppendLayer(0), nullptr);
   EXPECT_EQ(CBlendLayers::AllocObject(), nullptr);
-  EXPECT_EQ(record.Reports(), (Reports{"blendlayers:41", "blendlayers:16"}));
+  EXPECT_EQ(TakeReports(), (Reports{"blendlayers:41", "blendlayers:16"}));
 }
 
 TEST(BlendLayers, BringValuesIntoTheirRanges)
@@ -220,15 +215,13 @@ TEST(BlendLayers, RouteAParameterToItsLayer)
   EXPECT_EQ(static_cast<GradientData*>(value.GetCustom())->GetSettings().GetLong(1000), 6);
   EXPECT_TRUE(stack.Data().SetParameter({{10081}, {1000}}, GeData(2)) && stack.Data().SetParameter(10081, value));
   EXPECT_TRUE(stack.Data().GetParameter({{10081}, {1000}}, value) && value.GetLong() == 6);
-  const AssertionRecord record;
   EXPECT_FALSE(stack.Data().GetParameter({{10081}, {10500}}, value));
   EXPECT_FALSE(stack.Data().SetParameter({{10081}, {10500}}, GeData(1.0)));
-  EXPECT_EQ(record.Reports(), (Reports{"blendlayers:1235", "blendlayers:1259"}));
+  EXPECT_EQ(TakeReports(), (Reports{"blendlayers:1235", "blendlayers:1259"}));
 }
 
 TEST(BlendLayers, MoveWithinAndBetweenFolders)
 {
-  const counting_memory::BalanceCheck balance;
   Stack stack;
   CBlendLayers& layers = stack.Layers();
   BlendLayer* first = stack.Add(kBlendBC, 1);
@@ -283,7 +276,6 @@ TEST(BlendLayers, FindAndSelectDepthFirst)
 
 TEST(BlendLayers, CopyAndCompareEverySetting)
 {
-  const counting_memory::BalanceCheck balance;
   Stack stack;
   ASSERT_TRUE(ReadStack(stack, AllLayers(3).Long(2).bytes));
   const GeData copy(stack.value);
@@ -319,7 +311,6 @@ TEST(BlendLayers, CopyAndCompareEverySetting)
 // What a reader would refuse isn't written.
 TEST(BlendLayers, AreRefusedInASaveWhenTheyNestTooDeepToBeReadAgain)
 {
-  AssertionCounter quiet;
   Stack stack;
   CBlendLayers* layers = &stack.Layers();
   for (Long lists = 1; lists <= HyperFile::kMaxLoopDepth + 1; ++lists) {
@@ -343,7 +334,6 @@ TEST(BlendLayers, AreRefusedInASaveWhenTheyNestTooDeepToBeReadAgain)
 
 TEST(BlendLayers, NameAndReleaseTheirShader)
 {
-  const counting_memory::BalanceCheck balance;
   BaseShader owner;
   BaseShader* shader = MakeShader(5833);
   shader->SetName("Stone");
@@ -385,7 +375,6 @@ TEST(BlendLayers, NameAndReleaseTheirShader)
 
 TEST(BlendLayers, LetAShaderLiveThatHoldsTheirStack)
 {
-  const counting_memory::BalanceCheck balance;
   BaseShader owner;
   BaseShader* outer = MakeShader(1011128);
   BaseShader* inner = MakeShader(1011128);

@@ -294,7 +294,6 @@ TEST(Failures, ARefusedSuiteLeavesAsAnExceptionAndEverythingIsGivenBack)
   const TempFolder folder;
   const fs::path file = folder / "refused.q7r";
   for (auto [name, version] : suites) {
-    counting_memory::BalanceCheck balance;
     host::StandaloneHost host(host::LoadCompositionText(kEverything, "test.json", "/footage"));
     ASSERT_EQ(host.Start(EntryPointFunc), 0);
     host.SetOutputPath(file.string());

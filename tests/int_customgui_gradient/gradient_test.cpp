@@ -141,7 +141,6 @@ TEST(Gradient, GivesAndTakesItsPartsByPath)
 
 TEST(Gradient, CopiesAndComparesAllThatItHolds)
 {
-  const counting_memory::BalanceCheck balance;
   GradientData gradient, other;
   AddKnots(gradient, {{0.5, 0.25, kWhite}});
   EXPECT_TRUE(GradientsDiffer(gradient, other));
@@ -153,11 +152,10 @@ TEST(Gradient, CopiesAndComparesAllThatItHolds)
   EXPECT_TRUE(GradientsDiffer(gradient, other));
   EXPECT_TRUE(GradientsDiffer(*GradientData().NeedAlpha(), GradientData()));
 
-  const AssertionRecord record;
   other.GetSettings() = gradient.GetSettings();
   EXPECT_TRUE(other.PrepareGradient());
   EXPECT_TRUE(CopyGradient(GradientData(), other));
-  EXPECT_EQ(record.Reports(), std::vector<std::string>{"int_customgui_gradient:107"});
+  EXPECT_EQ(TakeReports(), Reports{"int_customgui_gradient:107"});
   EXPECT_EQ(other.GetAlpha(), nullptr);
   EXPECT_EQ(other.GetKnotCount(), 0);
 }
@@ -268,7 +266,6 @@ TEST(Gradient, MirrorsItsKnotsAndTheirBiases)
 
 TEST(Gradient, TakesItsOwnTransparencyAsTheWhole)
 {
-  const counting_memory::BalanceCheck balance;
   GradientData gradient;
   AddKnots(gradient, {{0.5, 0, kBlack}});
   AddKnots(*gradient.NeedAlpha(), {{0.25, 0, kWhite}});

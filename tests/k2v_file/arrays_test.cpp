@@ -15,7 +15,6 @@ void Fill(LongArray& array, Long count)
 
 TEST(DynArray, GrowsByItsIncrementOrTwofold)
 {
-  counting_memory::BalanceCheck balance;
   for (const auto& [first, increment, count, capacity] :
        {std::tuple<Long, Long, Long, Long>{4, 0, 1, 4}, std::tuple<Long, Long, Long, Long>{4, 0, 5, 8},
         std::tuple<Long, Long, Long, Long>{4, 0, 9, 16}, std::tuple<Long, Long, Long, Long>{4, 3, 5, 7},
@@ -75,7 +74,6 @@ TEST(DynArray, MovesInFrontOfTheElementAtTheTarget)
 
 TEST(DynArray, StaysAsItWasWhenMemoryRunsOut)
 {
-  counting_memory::BalanceCheck balance;
   LongArray array(4);
   LongArray copy;
   Fill(array, 4);
@@ -102,7 +100,6 @@ Long CompareLongs(const void* a, const void* b)
 
 TEST(ToolDynArray, HandlesPointersByIdentityAndByOrder)
 {
-  counting_memory::BalanceCheck balance;
   Long numbers[] = {30, 10, 20, 10};
   GeToolDynArray array(2);
   EXPECT_EQ(array.Pop(), nullptr);
@@ -188,7 +185,6 @@ struct Entry
 
 TEST(SortSearchArray, KeepsElementsInTheOrderOfTheirKeys)
 {
-  counting_memory::BalanceCheck balance;
   GeTempDynSortSearchArray<Entry, ULong, GeMemberOrder<&Entry::key>> array(2);
   EXPECT_EQ(array.Find(5), nullptr);
   const ULong large = 0xF0000000u; // keys without a sign
@@ -235,7 +231,6 @@ std::vector<int> Numbers(const GeTempPublicList2D<Node>& list)
 
 TEST(List, KeepsBothDirectionsInStepThroughEveryChange)
 {
-  counting_memory::BalanceCheck balance;
   Node a(1);
   Node b(2);
   Node outside(3);

@@ -75,8 +75,6 @@ class BaseFileTest : public testing::Test
     return name;
   }
 
-  counting_memory::BalanceCheck balance;
-  AssertionCounter assertions;
   TempFolder folder;
   std::unique_ptr<UChar[]> memory;
   std::unique_ptr<VectorStream> stream;
@@ -290,7 +288,7 @@ TEST_F(BaseFileTest, AReadToTheEndIsNoErrorAndOnePastItEndsTheFile)
     EXPECT_EQ(file.GetPosition(), 20000);
     EXPECT_TRUE(file.Open(NameOf(target, bytes), kFileRead)) << "opening starts afresh";
   }
-  EXPECT_EQ(assertions.Take(), 0);
+  EXPECT_EQ(CountReports(), 0);
 }
 
 TEST_F(BaseFileTest, ModesDecideWhatMayBeDone)
@@ -324,7 +322,7 @@ TEST_F(BaseFileTest, ModesDecideWhatMayBeDone)
     ASSERT_TRUE(file.Open(name, rule.mode));
     EXPECT_EQ(file.ReadBytes(&byte, 1) == 1, rule.reads);
     EXPECT_EQ(file.GetError(), rule.reads ? FILEERROR_NONE : FILEERROR_INVALID);
-    EXPECT_EQ(assertions.Take(), rule.reads ? 0 : 1);
+    EXPECT_EQ(CountReports(), rule.reads ? 0 : 1);
     ASSERT_TRUE(file.Open(name, rule.mode));
     file.GetLength();
     EXPECT_EQ(file.GetError(), rule.reads ? FILEERROR_NONE : FILEERROR_INVALID);
@@ -334,7 +332,7 @@ TEST_F(BaseFileTest, ModesDecideWhatMayBeDone)
     BaseFile file;
     EXPECT_FALSE(file.Open(NameOf("disk", {'a'}), mode));
     EXPECT_EQ(file.GetError(), FILEERROR_INVALID);
-    EXPECT_EQ(assertions.Take(), 1);
+    EXPECT_EQ(CountReports(), 1);
   }
 }
 
@@ -405,7 +403,7 @@ TEST_F(BaseFileTest, MisuseIsInvalidAndSomeOfItIsReported)
     ASSERT_TRUE(file.Open(NameOf(misuse.target, {'a', 'b', 'c'}), kFileRead) && file.ReadUChar(byte));
     misuse.act(file);
     EXPECT_EQ(file.GetError(), FILEERROR_INVALID);
-    EXPECT_EQ(assertions.Take(), misuse.reports);
+    EXPECT_EQ(CountReports(), misuse.reports);
     EXPECT_TRUE(file.Seek(0, kSeekRelative)) << "staying where one is works in any state";
   }
 }

@@ -56,7 +56,6 @@ TEST(Pictures, HaveSizesUpToTheLimit)
 
 TEST(Pictures, HoldPixelsOrBytesNotBoth)
 {
-  const counting_memory::BalanceCheck balance;
   Bitmap bitmap;
   std::uint8_t untouched[3] = {7, 7, 7};
   bitmap.GetLine(0, 0, 1, untouched, 3);
@@ -77,7 +76,6 @@ TEST(Pictures, HoldPixelsOrBytesNotBoth)
 
 TEST(Pictures, CopyWhatTheyHold)
 {
-  const counting_memory::BalanceCheck balance;
   Bitmap pixels, encoded, empty, copy;
   Fill(pixels, kSmall);
   encoded.SetEncoded("abc", 3);
@@ -178,8 +176,6 @@ TEST(BmpFiles, GiveACodeForEachFault)
       {"runs behind the end", With(With(With(good, 30, 2), 2, 0x7FFFFFFF), 34, 0x7FFFFFFF), IMAGERESULT_FILE},
       {"runs behind a wrong offset", With(With(good, 30, 1), 10, 0x7FFFFFFF), IMAGERESULT_FILE},
   };
-  const counting_memory::BalanceCheck balance;
-  AssertionCounter quiet;
   for (const auto& c : cases) {
     SCOPED_TRACE(c.name);
     Bitmap bitmap;
@@ -193,7 +189,6 @@ TEST(BmpFiles, GiveACodeForEachFault)
 
 TEST(BmpFiles, KeepTheRowsBeforeACut)
 {
-  const counting_memory::BalanceCheck balance;
   const Bytes whole = FromHex(kSmallBmp);
   for (std::size_t size = 1; size < whole.size(); ++size) {
     SCOPED_TRACE(size);

@@ -85,7 +85,6 @@ bool Read(HyperFile& file, Long level, Sample& sample)
 
 TEST(ChunkVisitor, WritesAndReadsARecordByOneList)
 {
-  counting_memory::BalanceCheck balance;
   Sample sample;
   sample.number = 5;
   sample.flag = true;
@@ -136,7 +135,6 @@ TEST(ChunkVisitor, DropsValuesThatOnlyOldFilesHold)
 
 TEST(ChunkVisitor, StopsAtTheFirstFailureAndKeepsWhatItDidNotReach)
 {
-  AssertionCounter quiet;
   MemoryReadFile read(ByteWriter().Header().Long(5).Bool(true).Real(1).Bool(true).End().bytes);
   Sample found;
   found.wideFlag = 9;

@@ -103,7 +103,6 @@ TEST(Filename, WritesPointersThatItReadsBack)
 
 TEST(Filename, SharesReadMemoryWithItsCopies)
 {
-  counting_memory::BalanceCheck balance;
   const char bytes[] = "bytes";
   Filename copy;
   {
@@ -130,7 +129,6 @@ TEST(Filename, SharesReadMemoryWithItsCopies)
 
 TEST(Filename, LeavesWrittenBlocksToTheDescription)
 {
-  counting_memory::BalanceCheck balance;
   MemoryDescription description;
   EXPECT_EQ(description.flags, kMemoryOwnsBlock);
   description.flags = kMemoryMayRead;
@@ -168,7 +166,6 @@ TEST(Filename, LeavesWrittenBlocksToTheDescription)
 
 TEST(MemoryBlockWriter, DoublesItsBlocksWithinTheirLimits)
 {
-  counting_memory::BalanceCheck balance;
   MemoryBlockWriter writer;
   EXPECT_EQ(writer.GetBlockCount(), 0);
   const std::vector<UChar> chunk(9999, 1);
@@ -197,7 +194,6 @@ TEST(MemoryBlockWriter, DoublesItsBlocksWithinTheirLimits)
 
 TEST(MemoryBlockWriter, KeepsWhatFittedWhenMemoryRunsOut)
 {
-  counting_memory::BalanceCheck balance;
   for (LLong allowed = 0; allowed < 3; ++allowed) { // the table, the first block, the second block
     MemoryBlockWriter writer;
     std::vector<UChar> bytes(60000, 2);
@@ -212,7 +208,6 @@ TEST(MemoryBlockWriter, KeepsWhatFittedWhenMemoryRunsOut)
 
 TEST(MemoryBlockWriter, KeepsTheOrderOfBytesAcrossBlocks)
 {
-  counting_memory::BalanceCheck balance;
   MemoryBlockWriter writer;
   for (UChar i = 0; i < 250; ++i) {
     const std::vector<UChar> part(997, i);

@@ -3,13 +3,6 @@
 namespace
 {
 
-class GeDataTest : public testing::Test
-{
- protected:
-  counting_memory::BalanceCheck balance_;
-  AssertionCounter reports_;
-};
-
 GeData Custom(Long type)
 {
   GeData value;
@@ -77,7 +70,7 @@ std::vector<Form> Forms()
   };
 }
 
-TEST_F(GeDataTest, WritesEachKindAsItsTypeAndValueAndReadsItBack)
+TEST(GeData, WritesEachKindAsItsTypeAndValueAndReadsItBack)
 {
   for (const Form& form : Forms()) {
     SCOPED_TRACE(form.value.GetType());
@@ -95,7 +88,7 @@ TEST_F(GeDataTest, WritesEachKindAsItsTypeAndValueAndReadsItBack)
   }
 }
 
-TEST_F(GeDataTest, GivesEveryListedCustomTypeItsLevel)
+TEST(GeData, GivesEveryListedCustomTypeItsLevel)
 {
   const std::pair<Long, Long> levels[] = {{1000481, 1},   {1000997, 0},   {1009060, 3},   {1009290, 2},
                                           {1009369, 0},   {1009398, 0},   {1011131, 2},   {1011153, 7},
@@ -108,7 +101,7 @@ TEST_F(GeDataTest, GivesEveryListedCustomTypeItsLevel)
   EXPECT_EQ(value.GetType(), kDataNil);
 }
 
-TEST_F(GeDataTest, TurnsOldTypesIntoCurrentOnesAndReportsTypesThatDoNotExist)
+TEST(GeData, TurnsOldTypesIntoCurrentOnesAndReportsTypesThatDoNotExist)
 {
   const std::pair<Long, Long> types[] = {{3, 23}, {7, 130}, {12, 130}, {400006001, 15}, {25, 25}, {256, 256}, {0, 0}};
   GeData value;
@@ -116,16 +109,16 @@ TEST_F(GeDataTest, TurnsOldTypesIntoCurrentOnesAndReportsTypesThatDoNotExist)
     EXPECT_TRUE(value.SetType(asked));
     EXPECT_EQ(value.GetType(), given);
   }
-  EXPECT_EQ(reports_.Take(), 0);
+  EXPECT_EQ(CountReports(), 0);
   value.SetType(42);
   EXPECT_EQ(value.GetType(), 42);
-  EXPECT_EQ(reports_.Take(), 1);
+  EXPECT_EQ(CountReports(), 1);
   EXPECT_EQ(GeData(value).GetType(), 42);
   value.SetType(kDataMatrix);
   EXPECT_EQ(value.GetMatrix(), Matrix());
 }
 
-TEST_F(GeDataTest, GivesANeutralValueAndReportsItWhenAskedForAnotherType)
+TEST(GeData, GivesANeutralValueAndReportsItWhenAskedForAnotherType)
 {
   const GeData text(String("a"));
   EXPECT_EQ(text.GetLong(), 0);
@@ -138,14 +131,14 @@ TEST_F(GeDataTest, GivesANeutralValueAndReportsItWhenAskedForAnotherType)
   EXPECT_FALSE(text.GetFilename().Content());
   EXPECT_EQ(text.GetContainer(), nullptr);
   EXPECT_FALSE(GeData(1).GetString().Content());
-  EXPECT_EQ(reports_.Take(), 10);
+  EXPECT_EQ(CountReports(), 10);
   EXPECT_EQ(GeData().GetLong(), 0);
   EXPECT_FALSE(GeData().GetString().Content());
   EXPECT_EQ(GeData(5).GetReal(), 5.0);
-  EXPECT_EQ(reports_.Take(), 0);
+  EXPECT_EQ(CountReports(), 0);
 }
 
-TEST_F(GeDataTest, TruncatesARealTowardsZeroAndKeepsItWithinALong)
+TEST(GeData, TruncatesARealTowardsZeroAndKeepsItWithinALong)
 {
   const Real infinity = std::numeric_limits<Real>::infinity();
   const std::pair<Real, Long> cases[] = {{2.9, 2},
@@ -160,7 +153,7 @@ TEST_F(GeDataTest, TruncatesARealTowardsZeroAndKeepsItWithinALong)
     EXPECT_EQ(GeData(real).GetLong(), whole) << real;
 }
 
-TEST_F(GeDataTest, ComparesByTypeAndValueWithItsOldExceptions)
+TEST(GeData, ComparesByTypeAndValueWithItsOldExceptions)
 {
   EXPECT_TRUE(GeData().IsEqual(GeData()));
   EXPECT_TRUE(GeData(2).IsEqual(GeData(2.0)));
@@ -183,7 +176,7 @@ TEST_F(GeDataTest, ComparesByTypeAndValueWithItsOldExceptions)
   EXPECT_FALSE(GeData(toA).IsEqual(GeData(toB)));
 }
 
-TEST_F(GeDataTest, StoresACopyInTheObjectOfTheSameKindButReplacesContainers)
+TEST(GeData, StoresACopyInTheObjectOfTheSameKindButReplacesContainers)
 {
   GeData vector(Vector(1, 2, 3));
   const Vector* place = &vector.GetVector();
@@ -202,17 +195,17 @@ TEST_F(GeDataTest, StoresACopyInTheObjectOfTheSameKindButReplacesContainers)
   EXPECT_EQ(container.GetLong(), 1);
 }
 
-TEST_F(GeDataTest, ReportsALinkThatIsCopiedWithoutATranslation)
+TEST(GeData, ReportsALinkThatIsCopiedWithoutATranslation)
 {
   GeAliasGoal goal;
   GeAliasLink link;
   link.SetLinkGoal(&goal);
   GeData source(link), copy;
   EXPECT_TRUE(copy.CopyFrom(source, 0, nullptr));
-  EXPECT_EQ(reports_.Take(), 1);
+  EXPECT_EQ(CountReports(), 1);
   EXPECT_EQ(copy.GetAliasLink()->GetLinkGoal(), &goal);
   EXPECT_EQ(GeData(source).GetAliasLink()->GetLinkGoal(), &goal);
-  EXPECT_EQ(reports_.Take(), 0);
+  EXPECT_EQ(CountReports(), 0);
 }
 
 // Reads one value out of a file of that version; gives what it writes back, or "failed".
@@ -230,7 +223,7 @@ std::string ReadAndWrite(ByteWriter body, Long version)
   return Written(value);
 }
 
-TEST_F(GeDataTest, KeepsAnUnknownCustomValueByteForByte)
+TEST(GeData, KeepsAnUnknownCustomValueByteForByte)
 {
   ByteWriter body;
   body.Long(1000486).Start(0, 6).String(u"x").Start(5, 0).U8(140).U32(3).U8(1).U8(9).U8(8).End().Real(2.5).End();
@@ -247,7 +240,7 @@ TEST_F(GeDataTest, KeepsAnUnknownCustomValueByteForByte)
   EXPECT_EQ(Written(copy), ToHex(body.bytes));
 }
 
-TEST_F(GeDataTest, DropsOtherUnknownValuesOfOldFilesButTheirFrame)
+TEST(GeData, DropsOtherUnknownValuesOfOldFilesButTheirFrame)
 {
   ByteWriter body, empty;
   body.Long(1000487).Start(0, 6).Real(2.5).End();
@@ -257,7 +250,7 @@ TEST_F(GeDataTest, DropsOtherUnknownValuesOfOldFilesButTheirFrame)
   EXPECT_EQ(ReadAndWrite(empty, 13000), ToHex(empty.bytes));
 }
 
-TEST_F(GeDataTest, KeepsTheBytesAndTheLevelOfAnOpaqueCustomValueInEveryVersion)
+TEST(GeData, KeepsTheBytesAndTheLevelOfAnOpaqueCustomValueInEveryVersion)
 {
   for (Long type : {1011153, kCustomUnitScale}) {
     ByteWriter body;
@@ -271,7 +264,7 @@ TEST_F(GeDataTest, KeepsTheBytesAndTheLevelOfAnOpaqueCustomValueInEveryVersion)
   EXPECT_EQ(ReadAndWrite(newer, 13000), ToHex(known.bytes));
 }
 
-TEST_F(GeDataTest, TakesTheUnitScaleOfASinglePrecisionFile)
+TEST(GeData, TakesTheUnitScaleOfASinglePrecisionFile)
 {
   ByteWriter bytes;
   bytes.Header("Q7R6", 13000, 1).Long(kCustomUnitScale).Start(0, 0).Real(0.25).Long(4).End();
@@ -320,7 +313,7 @@ ByteWriter KeptBody(Long type, std::int32_t version, std::uint8_t precision, boo
 static_assert(!std::is_constructible_v<GeData, const char*> && !std::is_constructible_v<GeData, GeData*> &&
               std::is_constructible_v<GeData, void*>);
 
-TEST_F(GeDataTest, KeepsBodiesInTheFormThatCurrentFilesHave)
+TEST(GeData, KeepsBodiesInTheFormThatCurrentFilesHave)
 {
   for (auto [version, precision] : {std::pair{13000, 1}, {13000, 0}, {11924, 0}, {11924, 1}, {11903, 0}, {11903, 1}}) {
     for (Long type : {1011153, 1000486}) {
@@ -340,7 +333,7 @@ TEST_F(GeDataTest, KeepsBodiesInTheFormThatCurrentFilesHave)
   }
 }
 
-TEST_F(GeDataTest, PassesOverAnOldMemoryValueAndRefusesOtherTypes)
+TEST(GeData, PassesOverAnOldMemoryValueAndRefusesOtherTypes)
 {
   ByteWriter memory;
   memory.Long(128).Memory("12345");

@@ -62,7 +62,6 @@ TEST(HyperFileArray, WritesAndReadsEachTypeInItsBytesAtAnyStride)
 
 TEST(HyperFileArray, ConvertsFloatsAndDoublesAndNothingElse)
 {
-  AssertionCounter quiet;
   for (std::uint8_t stored = 0; stored <= 8; ++stored) {
     for (Long wanted = 0; wanted <= 8; ++wanted) {
       Long plain = wanted == 7 ? 6 : wanted;
@@ -142,7 +141,6 @@ TEST(HyperFileArray, TakesBlocksAsItTakesSingleElements)
 
 TEST(HyperFileArray, RefusesACountOrLengthThatDoesNotMatch)
 {
-  AssertionCounter quiet;
   // length: as it stands in the file
   for (const auto& [length, count, error] : {std::tuple<ULong, LLong, Long>{9, 3, -100},
                                              {9, 1, -100},
@@ -253,7 +251,6 @@ TEST(HyperFileArray, CountsEveryElementForTheProgressHooks)
 
 TEST(HyperFileLegacyArray, ReadsEachKindInBothPrecisions)
 {
-  counting_memory::BalanceCheck balance;
   for (std::uint8_t precision : FromHex("00 01")) {
     ByteWriter writer;
     writer.Header("Q7R6", 6500, precision);
@@ -293,8 +290,6 @@ TEST(HyperFileLegacyArray, ReadsEachKindInBothPrecisions)
 
 TEST(HyperFileLegacyArray, TakesNoMemoryForALengthThatTheFileCannotHold)
 {
-  AssertionCounter quiet;
-  counting_memory::BalanceCheck balance;
   for (std::uint8_t tag : FromHex("85 86 87 89")) {
     MemoryReadFile read(ByteWriter().Header("Q7R6", 6500).U8(tag).U32(0xFFFFFFF0).I64(0).bytes);
     Vector* points = nullptr;

@@ -67,7 +67,6 @@ TEST(HyperFileSkip, PassesOverEveryValueInMemoryAndOnDisk)
 
 TEST(HyperFileSkip, CountsSomeOldArraysByAnotherElementSize)
 {
-  AssertionCounter quiet;
   for (const auto& [version, precision, tag, length, body] :
        {std::tuple<std::int32_t, std::uint8_t, std::uint8_t, std::uint32_t, std::size_t>{11924, 0, 133, 25, 50},
         std::tuple<std::int32_t, std::uint8_t, std::uint8_t, std::uint32_t, std::size_t>{11925, 0, 133, 25, 25},
@@ -89,7 +88,6 @@ TEST(HyperFileSkip, CountsSomeOldArraysByAnotherElementSize)
 
 TEST(HyperFileSkip, TellsAChunkThatDoesNotEnd)
 {
-  AssertionCounter quiet;
   const std::tuple<Bytes, Long, Long> rows[] = {
       {ByteWriter().Long(1).bytes, FILEERROR_NONE, FILEERROR_NONE}, // ends between values: no error
       {ByteWriter().Start(1, 1).End().bytes, FILEERROR_NONE, FILEERROR_NONE},
@@ -130,7 +128,6 @@ TEST(HyperFileSkip, HasNoLimitOfDepth)
 
 TEST(HyperFileRawChunk, ComesBackByteForByte)
 {
-  counting_memory::BalanceCheck balance;
   for (bool withoutEnd : {false, true}) {
     for (bool empty : {false, true}) {
       ByteWriter body;
@@ -158,8 +155,6 @@ TEST(HyperFileRawChunk, ComesBackByteForByte)
 
 TEST(HyperFileRawChunk, FailsWithoutALeakWhereverItIsCut)
 {
-  AssertionCounter quiet;
-  counting_memory::BalanceCheck balance;
   Bytes whole = ByteWriter().Header().Long(1).Memory("abc").End().bytes;
   for (std::size_t size = 13; size < whole.size(); ++size) {
     MemoryReadFile read(Bytes(whole.begin(), whole.begin() + static_cast<std::ptrdiff_t>(size)));
@@ -173,7 +168,6 @@ TEST(HyperFileRawChunk, FailsWithoutALeakWhereverItIsCut)
 
 TEST(HyperFileContainer, WritesEveryKindThatCanBeReadAgain)
 {
-  counting_memory::BalanceCheck balance;
   BaseContainer container(9);
   container.SetLong(1, -7);
   container.SetPointer(3, &container);
@@ -211,7 +205,6 @@ TEST(HyperFileContainer, ReplacesElementsUnlessItIsFlushed)
 
 TEST(HyperFileContainer, RefusesWhatIsNoContainer)
 {
-  AssertionCounter quiet;
   for (const auto& [bytes, good, error] :
        {std::tuple<Bytes, bool, Long>{ByteWriter().Start(132, 0).Long(5).End().bytes, true, FILEERROR_NONE},
         std::tuple<Bytes, bool, Long>{ByteWriter().Start(133, 1).Long(5).End().bytes, false, FILEERROR_WRONG_VALUE},
@@ -232,8 +225,6 @@ TEST(HyperFileContainer, RefusesWhatIsNoContainer)
 
 TEST(HyperFileContainer, LimitsTheDepthOfNesting)
 {
-  AssertionCounter quiet;
-  counting_memory::BalanceCheck balance;
   for (int depth : {HyperFile::kMaxLoopDepth, HyperFile::kMaxLoopDepth + 1, 100000}) {
     for (bool legacy : {false, true}) {
       ByteWriter writer;
@@ -258,8 +249,6 @@ TEST(HyperFileContainer, LimitsTheDepthOfNesting)
 
 TEST(HyperFileContainer, ReadsTheOldFormOfEveryKind)
 {
-  counting_memory::BalanceCheck balance;
-  AssertionCounter log;
   auto compose = [](std::int32_t endId) {
     ByteWriter writer;
     writer.Header("Q7R6", 7000).U8(132).U32(12345).Long(9);
@@ -277,7 +266,7 @@ TEST(HyperFileContainer, ReadsTheOldFormOfEveryKind)
     container.SetContainer(9, former);
     Long next = 0;
     ASSERT_TRUE(read.file.ReadContainer(container, flush) && read.file.ReadLong(next) && next == 77);
-    EXPECT_EQ(log.Take(), 1);
+    EXPECT_EQ(CountReports(), 1);
     EXPECT_EQ(container.GetId(), 9);
     EXPECT_EQ(container.GetCount(), flush ? 10 : 9);
     EXPECT_EQ(container.GetLong(1), flush ? -7 : 11);

@@ -76,7 +76,6 @@ Bytes FirstTable(const Bytes& bytes)
 
 TEST(JpegFiles, ComeBackNearlyTheSame)
 {
-  const counting_memory::BalanceCheck balance;
   for (int width : {1, 7, 16, 33, 2000}) {
     Bitmap bitmap;
     const PlainPicture grey = SmoothPicture(width, 9, 1);
@@ -218,7 +217,6 @@ TEST(JpegFiles, GiveACodeForEachFault)
       {"another format", Bytes{'B', 'M', 0, 0, 0, 0}, IMAGERESULT_MEMORY},
       {"no frame", Bytes{0xFF, 0xD8, 0xFF, 0xD9}, IMAGERESULT_MEMORY},
   };
-  const counting_memory::BalanceCheck balance;
   counting_memory::ResetPeak();
   const LLong before = counting_memory::Get().peakBytes;
   for (const auto& c : cases) {
@@ -235,8 +233,6 @@ TEST(JpegFiles, GiveACodeForEachFault)
 
 TEST(JpegFiles, SurviveCutsAndDamageEverywhere)
 {
-  const counting_memory::BalanceCheck balance;
-  AssertionCounter quiet;
   std::mt19937 random(7);
   for (const MakeOptions& options : {MakeOptions{}, MakeOptions{.progressive = true}}) {
     const Bytes whole = MakeJpeg(24, 24, options);
@@ -262,8 +258,6 @@ TEST(JpegFiles, SurviveCutsAndDamageEverywhere)
 
 TEST(PictureFiles, FailCleanlyWhenMemoryOrDiskIsShort)
 {
-  const counting_memory::BalanceCheck balance;
-  AssertionCounter quiet;
   Bitmap source;
   Fill(source, SmoothPicture(200, 100, 3));
   for (Long format : {kImageFormatBmp, kImageFormatJpeg}) {

@@ -56,8 +56,6 @@ class NetworkTest : public testing::Test
     });
   }
 
-  counting_memory::BalanceCheck balance;
-  AssertionCounter assertions;
   NetworkConnection near, far;
   Filename nearName;
 };
@@ -220,7 +218,7 @@ TEST_F(NetworkTest, OnlyReadingAndWritingAloneAreAllowed)
   UChar byte = 0;
   ASSERT_TRUE(file.Open(nearName, kFileWrite));
   EXPECT_EQ(file.ReadBytes(&byte, 1), 0);
-  EXPECT_EQ(assertions.Take(), 1);
+  EXPECT_EQ(CountReports(), 1);
   ASSERT_TRUE(file.Open(nearName, kFileRead));
   EXPECT_FALSE(file.WriteBytes(&byte, 1));
 }

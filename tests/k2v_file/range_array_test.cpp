@@ -27,7 +27,6 @@ TYPED_TEST_SUITE(RangeSet, Forms, );
 
 TYPED_TEST(RangeSet, MergesAndSplitsRanges)
 {
-  counting_memory::BalanceCheck balance;
   TypeParam set;
   for (Long n : {1, 2, 3, 4, 9, 8, 6, 7})
     ASSERT_TRUE(set.AddIndex(n));
@@ -66,7 +65,6 @@ TYPED_TEST(RangeSet, ReachesTheEndsOfTheNumbers)
 // Dense phases merge and split, sparse ones fill and empty many pages.
 TYPED_TEST(RangeSet, AgreesWithAPlainBitSet)
 {
-  counting_memory::BalanceCheck balance;
   constexpr Long kNumbers = 6000;
   std::mt19937 random(11);
   TypeParam set;
@@ -100,7 +98,6 @@ TYPED_TEST(RangeSet, AgreesWithAPlainBitSet)
 
 TYPED_TEST(RangeSet, StaysAsItWasWhenMemoryRunsOut)
 {
-  counting_memory::BalanceCheck balance;
   TypeParam set;
   counting_memory::FailAfter(0);
   EXPECT_FALSE(set.AddIndex(3));
@@ -149,7 +146,6 @@ TEST(RangeArray, DoublesAndHalvesItsBlock)
 // The ranges 0, 4, 8, ... with one more in front of the n-th.
 TEST(PagedRangeArray, SplitsAFullPageAtAnyPlace)
 {
-  counting_memory::BalanceCheck balance;
   for (Long n = 0; n <= GePagedRangeArray::kPageEntries; ++n) {
     GePagedRangeArray set;
     Ranges expected;
@@ -165,7 +161,6 @@ TEST(PagedRangeArray, SplitsAFullPageAtAnyPlace)
 
 TEST(PagedRangeArray, GivesEmptyPagesBack)
 {
-  counting_memory::BalanceCheck balance;
   GePagedRangeArray set;
   for (Long n = 0; n < 3 * GePagedRangeArray::kPageEntries; ++n)
     ASSERT_TRUE(set.AddIndex(2 * n));

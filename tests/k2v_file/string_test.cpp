@@ -7,7 +7,6 @@ String Repeat(Long count) { return String(count, u'x'); }
 
 TEST(String, KeepsCapacityAtMultiplesOf16AndReusesTheBlock)
 {
-  counting_memory::BalanceCheck balance;
   String text;
   EXPECT_EQ(text.GetCapacity(), 0);
   EXPECT_EQ(text.Data(), nullptr);
@@ -46,7 +45,6 @@ TEST(String, KeepsCapacityAtMultiplesOf16AndReusesTheBlock)
 
 TEST(String, CopiesAndMovesItsCharacters)
 {
-  counting_memory::BalanceCheck balance;
   String first("first");
   String copy = first;
   String moved = std::move(copy);
@@ -133,7 +131,6 @@ TEST(String, FindsTheFirstAndTheLastPlace)
 
 TEST(String, EditsWithinItsBounds)
 {
-  counting_memory::BalanceCheck balance;
   const std::tuple<std::function<void(String&)>, const char*> rows[] = {
       {[](String& s) { s.Delete(1, 2); }, "adef"},
       {[](String& s) { s.Delete(4, 9); }, "abcd"},
@@ -181,7 +178,6 @@ TEST(String, PutsTheTerminatorAtTheLastPlaceOfAFullBuffer)
 
 TEST(StringEncoding, WritesEachCharacterInTheFormOfItsEncoding)
 {
-  counting_memory::BalanceCheck balance;
   const String text = FromUnits(u"A\u00E9\u20AC\u4E2D");
   const std::tuple<StringEncoding, std::string> rows[] = {
       {STRINGENCODING_DEFAULT, "A\xE9\x80_"},
@@ -299,7 +295,6 @@ TEST(String, FormatsNumbers)
 
 TEST(String, StaysEmptyWhenMemoryRunsOut)
 {
-  counting_memory::BalanceCheck balance;
   const String source(40, u's');
   const std::vector<std::function<void(String&)>> acts = {
       [&](String& s) { s = source; },
@@ -329,7 +324,6 @@ TEST(String, StaysEmptyWhenMemoryRunsOut)
 
 TEST(String, KeepsItsBlockAfterShutdown)
 {
-  counting_memory::BalanceCheck balance;
   const void* kept = nullptr;
   {
     String text("static");

@@ -14,7 +14,6 @@ void ExpectFields(const BaseTime& time, Real numerator, Real denominator)
 
 TEST(BaseTime, RoundsSignsAndReducesFractions)
 {
-  AssertionRecord log;
   const std::tuple<Real, Real, Real, Real> rows[] = {
       {0, 25, 0, 1},
       {30, 25, 6, 5},
@@ -39,10 +38,10 @@ TEST(BaseTime, RoundsSignsAndReducesFractions)
     SCOPED_TRACE(testing::Message() << n << " / " << d);
     ExpectFields(BaseTime(n, d), numerator, denominator);
   }
-  EXPECT_TRUE(log.Reports().empty());
+  EXPECT_TRUE(TakeReports().empty());
   ExpectFields(BaseTime(3, 0.4), 3, 1);
   ExpectFields(BaseTime(3, kNan), 3, 1);
-  EXPECT_EQ(log.Reports(), (std::vector<std::string>{"q7r_basetime:95", "q7r_basetime:95"}));
+  EXPECT_EQ(TakeReports(), (Reports{"q7r_basetime:95", "q7r_basetime:95"}));
 }
 
 TEST(BaseTime, TakesSecondsToTheThousandth)
@@ -58,7 +57,6 @@ TEST(BaseTime, TakesSecondsToTheThousandth)
 
 TEST(BaseTime, CountsFrames)
 {
-  AssertionRecord log;
   EXPECT_EQ(BaseTime(30, 25).GetFrame(25), 30);
   EXPECT_EQ(BaseTime(1, 2).GetFrame(25), 12);
   EXPECT_EQ(BaseTime(-1, 2).GetFrame(25), -12); // towards zero
@@ -77,13 +75,13 @@ TEST(BaseTime, CountsFrames)
   time = BaseTime(7, 4);
   time.Quantize(2.9); // floor(7 * 2.9) / 4 at whole 2
   ExpectFields(time, 5, 2);
-  EXPECT_TRUE(log.Reports().empty());
+  EXPECT_TRUE(TakeReports().empty());
   time = BaseTime(7, 4);
   time.Quantize(0.5);
   ExpectFields(time, 1, 1);
   time.SetDenominator(0.5);
   ExpectFields(time, 1, 1);
-  EXPECT_EQ(log.Reports().size(), 2u);
+  EXPECT_EQ(TakeReports().size(), 2u);
   time = BaseTime::Raw(7, 0);
   time.Quantize(25);
   ExpectFields(time, 0, 1);

@@ -43,7 +43,6 @@ TEST(Curve, TakesKeysWithinTenThousandSeconds)
 
 TEST(Curve, AKeyAtATakenTimeResetsTheOneThere)
 {
-  counting_memory::BalanceCheck balance;
   CCurve curve;
   CKey* first = Add(curve, 1, 5, kInterpolationStep);
   Add(curve, 2, 6);
@@ -82,7 +81,6 @@ TEST(Curve, FindsTheKeyAtBeforeAndBehindATime)
 // The index and the list that owns the keys stay in step: the file is written from the list.
 TEST(Curve, AnyOrderOfInsertionsAndDeletionsKeepsTheOrderOfTime)
 {
-  counting_memory::BalanceCheck balance;
   std::mt19937 random(7);
   std::map<Long, Real> model;
   CCurve curve;
@@ -115,7 +113,6 @@ TEST(Curve, AnyOrderOfInsertionsAndDeletionsKeepsTheOrderOfTime)
 
 TEST(Curve, AKeyThatGetsAnotherTimeMovesToItsPlace)
 {
-  counting_memory::BalanceCheck balance;
   CCurve curve;
   for (Long time : {1, 2, 3})
     curve.AddKey(BaseTime(time, 1))->SetValue(&curve, time);

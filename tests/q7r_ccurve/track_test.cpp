@@ -34,7 +34,6 @@ TEST(Track, WritesReadsAndClonesItsCurvesBySlot)
                                                                               {"curves 2 and 8", {{2, 0}, {8, 6}}},
                                                                               {"curve 9 comes last", {{9, 8}}},
                                                                               {"curve 10 comes before it", {{10, 7}}}};
-  counting_memory::BalanceCheck balance;
   for (const auto& [what, curves] : cases) {
     SCOPED_TRACE(what);
     BaseList2D node(1);

@@ -97,7 +97,6 @@ void Operate(BaseSelect& set, Bits& bits, const BaseSelect& other, const Bits& o
 
 TEST(BaseSelect, AgreesWithAPlainBitSetOverManyOperations)
 {
-  counting_memory::BalanceCheck balance;
   std::mt19937 random(20240607);
   BaseSelect sets[2];
   Bits bits[2];
@@ -183,7 +182,6 @@ TEST(BaseSelect, WalksAlongWithAscendingLookups)
 
 TEST(BaseSelect, StaysAsItWasWhenMemoryIsShort)
 {
-  counting_memory::BalanceCheck balance;
   BaseSelect set;
   Fill(set, {{5, 7}, {9, 9}});
   BaseSelect other;
@@ -209,7 +207,6 @@ TEST(BaseSelect, StaysAsItWasWhenMemoryIsShort)
 
 TEST(BaseSelect, IsCopied)
 {
-  counting_memory::BalanceCheck balance;
   BaseSelect set;
   Fill(set, {{5, 7}, {9, 9}});
   BaseSelect target;

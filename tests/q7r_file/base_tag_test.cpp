@@ -39,7 +39,6 @@ TEST(BaseTag, SkipsChunksThatItDoesNotKnowAndKeepsItsOwnName)
 
 TEST(BaseTag, CopiesOntoATagOfTheSameTypeOnly)
 {
-  counting_memory::BalanceCheck balance;
   BaseTag source(kTagTarget);
   source.SetName(String("aim"));
   source.GetDataInstance().SetLong(1234, 5);

@@ -181,7 +181,6 @@ TEST(Camera, ComputesTheFocusPairWhenAnInputIsSet)
 
 TEST(Camera, KeepsWhatAFileHolds)
 {
-  const counting_memory::BalanceCheck balance;
   // The container of a file replaces the defaults, and the computed parameters work on it.
   const ObjectPtr read(NewObj<BaseObject>(kObjectGeneric));
   ASSERT_TRUE(ReadInto(*read, Record("[110050,0 L0 L0 [132,1 L-1 L500 L19 R50 L1006 L19 R25 ] C0 SC ] "

@@ -100,7 +100,6 @@ TEST(Defaults, AreThese)
 // A node that changes must not change its fellows, nor what comes later; nor may a copy.
 TEST(Defaults, AreSharedUntilTheyChange)
 {
-  const counting_memory::BalanceCheck balance;
   for (const Defaults& row : kDefaults) {
     SCOPED_TRACE(row.name);
     const std::string text = row.Text();

@@ -74,7 +74,6 @@ TEST(DocumentFile, BeginsAndEndsAsEveryReaderExpects)
 
 TEST(DocumentFile, ASceneComesBackWhole)
 {
-  counting_memory::BalanceCheck balance;
   DocumentPtr document = MakeScene();
   DocumentPtr back = LoadFromBytes(SaveToBytes(*document));
   ASSERT_NE(back, nullptr);
@@ -89,8 +88,6 @@ TEST(DocumentFile, EveryCutGivesNullAndLeaksNothing)
 {
   DocumentPtr document = MakeScene();
   Bytes whole = SaveToBytes(*document);
-  AssertionCounter quiet;
-  counting_memory::BalanceCheck balance;
   for (std::size_t size = 0; size < whole.size(); ++size) {
     FileProblem problem;
     ASSERT_EQ(LoadFromBytes(Bytes(whole.begin(), whole.begin() + static_cast<long>(size)), 3, &problem), nullptr)
@@ -106,8 +103,6 @@ TEST(DocumentFile, NoChangedByteCrashesTheReader)
 {
   DocumentPtr document = MakeScene();
   const Bytes whole = SaveToBytes(*document);
-  AssertionCounter quiet;
-  counting_memory::BalanceCheck balance;
   std::mt19937 random(7);
   for (int round = 0; round < 3000; ++round) {
     Bytes damaged = whole;
@@ -131,7 +126,6 @@ TEST(DocumentFile, RefusesWhatIsNoSceneFile)
        ByteWriter().Header("Q7R6", 12599).Start(110059, 0).End().bytes, LoadObjects | LoadRequireCurrent,
        FILEERROR_OLD_VERSION},
   };
-  AssertionCounter quiet;
   for (const auto& [name, bytes, flags, code] : cases) {
     SCOPED_TRACE(name);
     FileProblem problem;
@@ -251,7 +245,6 @@ TEST(Document, TellsWhoMadeItAndWhen)
 
 TEST(Document, CopiesWithLinksInsideTheCopy)
 {
-  counting_memory::BalanceCheck balance;
   DocumentPtr document = MakeScene();
   DocumentPtr copy(static_cast<BaseDocument*>(document->MakeClone(0, nullptr)));
   ASSERT_NE(copy, nullptr);
@@ -261,7 +254,6 @@ TEST(Document, CopiesWithLinksInsideTheCopy)
 
 TEST(Document, MergesBehindNothingButAboveWhatIsThere)
 {
-  counting_memory::BalanceCheck balance;
   TempFolder folder;
   DocumentPtr source = MakeScene();
   AddObject(*source, "Second");
@@ -296,7 +288,6 @@ TEST(Document, MergesBehindNothingButAboveWhatIsThere)
 
 TEST(Document, WhatIsSavedCanBeLoadedAndWhatNestsTooDeepIsRefused)
 {
-  counting_memory::BalanceCheck balance;
   const auto depthOf = [](BaseDocument& document) {
     int depth = 0;
     for (BaseObject* object = document.GetFirstObject(); object; object = object->GetDown())
@@ -360,7 +351,6 @@ TEST(Document, NestingWithoutEndIsAnErrorAndNoCrash)
   w.Header().Start(110059, 0).Start(110107, 0);
   for (int i = 0; i < 100000; ++i)
     w.Start(110100, 0).Start(5154, 0).Start(110100, 0);
-  AssertionCounter quiet;
   FileProblem problem;
   EXPECT_EQ(LoadFromBytes(w.bytes, 3, &problem), nullptr);
   EXPECT_EQ(problem.code, FILEERROR_TOO_DEEP);

@@ -42,7 +42,6 @@ BaseArrayTag* AddTag(BaseObject& object, Long type, Long count)
 
 TEST(PolygonObject, KeepsItsSelectionsAndNgonsBehindTheTransform)
 {
-  counting_memory::BalanceCheck balance;
   BaseObject* object = AllocObject(kObjectPolygon);
   EXPECT_EQ(BytesOf(*GetPolygonData(*object)), Bytes());
   EXPECT_TRUE(ReadInto(*object, AllPolygonChunks()));
@@ -67,7 +66,6 @@ TEST(PolygonObject, KeepsItsSelectionsAndNgonsBehindTheTransform)
 
 TEST(PolygonObject, StaysInStepWithStrangeChunks)
 {
-  AssertionCounter quiet;
   // points: selected
   const std::tuple<const char*, const char*, bool, Long, Long> rows[] = {
       {"nothing inside", "[110117,0 ]", true, 1, 2},
@@ -85,7 +83,6 @@ TEST(PolygonObject, StaysInStepWithStrangeChunks)
       {"edges of another kind", "[110133,1 L1 L2 U4 L4 ]", false, 1, 1},
   };
   for (const auto& [what, chunk, read, points, ngons] : rows) {
-    counting_memory::BalanceCheck balance;
     BaseObject* object = AllocObject(kObjectPolygon);
     ASSERT_TRUE(ReadInto(*object, AllPolygonChunks()));
     EXPECT_EQ(ReadInto(*object, Record(chunk + std::string(" [1234,0 ]"))), read) << what;
@@ -139,7 +136,6 @@ TEST(PolygonObject, ResizesAllTagsInStep)
 
 TEST(PolygonObject, TakesAnotherNumberOfNgonsWithTheirEdges)
 {
-  counting_memory::BalanceCheck balance;
   NgonData ngons;
   const ULong edges[] = {5, 6, 7};
   EXPECT_TRUE(ngons.Resize(3) && ngons.SetEdges(0, edges, 3) && ngons.SetEdges(2, edges, 1));
@@ -154,7 +150,6 @@ TEST(PolygonObject, TakesAnotherNumberOfNgonsWithTheirEdges)
 
 TEST(Geometry, SurvivesLittleMemory)
 {
-  AssertionCounter quiet;
   EveryFailedAllocation([] {
     const Owned<BaseObject> object(AllocObject(kObjectPolygon));
     return object && ResizePolygons(*object, 4, 2, 3) && AddUVWTag(*object) && ResizePolygons(*object, 5, 3, 9);
@@ -167,7 +162,6 @@ TEST(Geometry, SurvivesLittleMemory)
 
 TEST(SplineObject, HasTangentsAsItsTypeAsks)
 {
-  counting_memory::BalanceCheck balance;
   EXPECT_EQ(AllocSpline(kMaxSplinePoints + 1, 0), nullptr);
   SplineObject* spline = AllocSpline(0, 1);
   ASSERT_NE(GetTangentTag(*spline), nullptr);
@@ -218,7 +212,6 @@ TEST(SplineObject, ResizesPointsTangentsAndSegments)
 
 TEST(SplineObject, KeepsItsSelectionsInItsOwnChunkOnce)
 {
-  counting_memory::BalanceCheck balance;
   const Bytes chunks = Record(Selection("110117", "4") + Selection("110118", "6"));
   SplineObject* spline = AllocSpline(2, 0);
   EXPECT_TRUE(ReadInto(*spline, chunks));
@@ -244,7 +237,6 @@ TEST(SplineObject, KeepsItsSelectionsInItsOwnChunkOnce)
 
 TEST(PointObject, ComesBackFromAFileUnderItsLabel)
 {
-  counting_memory::BalanceCheck balance;
   BaseObject* object = AllocObject(kObjectPointBased);
   static_cast<PointObjectData*>(object->GetObjectData())->GetHiddenPoints().SelectAdd(3);
   const Bytes chunks = Record(Selection("110118", "3"));

@@ -257,7 +257,6 @@ TEST(IESFile, LooksForItsMarkInTheFirst1024Bytes)
 
 TEST(IESFile, ToldFailuresLeaveTheTargetAlone)
 {
-  const counting_memory::BalanceCheck balance;
   const TempFolder folder;
   IESLight* light = nullptr;
   EXPECT_EQ(LoadIESFile(light, Filename((folder / "none.ies").c_str())), -1);

@@ -21,7 +21,6 @@ std::string Written(const JointWeightTable& table)
 // The error of a read, 0 if all bytes were taken.
 Long ReadTable(JointWeightTable& table, const Bytes& bytes, std::int32_t version = 13000)
 {
-  AssertionCounter silence;
   MemoryReadFile memory(ByteWriter().Header("Q7R6", version).Append(bytes).bytes);
   const bool read = table.Read(memory.file);
   EXPECT_EQ(read, memory.file.GetError() == 0);
@@ -135,7 +134,6 @@ TEST(JointWeightTable, AgreesWithAPlainMapWhateverIsWritten)
 
 TEST(JointWeightTable, StaysAsItWasWhenMemoryIsShort)
 {
-  counting_memory::BalanceCheck balance;
   JointWeightTable table;
   for (Long point = 0; point < 32; point += 2)
     ASSERT_TRUE(table.WritePointWeight(point, 1.0)); // the first capacity is used up

@@ -80,7 +80,6 @@ TEST(Material, PassesOverOldChannelChunks)
 
 TEST(Material, OfAnUnknownTypeComesBackByteForByte)
 {
-  const counting_memory::BalanceCheck balance;
   DocumentPtr document = NewDocument();
   auto* material = static_cast<BaseMaterial*>(document->GetMaterialRoot()->AllocMember(kMaterialPlugin));
   // The level and content that its program gave the chunk.
@@ -135,7 +134,6 @@ TEST(Material, IsMadeAndClonedByItsType)
 
 TEST(Material, BindsShadersToItsSlots)
 {
-  const counting_memory::BalanceCheck balance;
   Material material;
   BaseShader* first = material.BindChannelBitmap(8000, Filename("a.png"));
   ASSERT_NE(first, nullptr);
@@ -174,7 +172,6 @@ TEST(Material, SurvivesTheLackOfMemoryAtEveryStep)
 
 namespace
 {
-
 // Two objects, each with a texture tag on a material whose first slot is bound to a shader, crosswise: the first object
 // has the second material.
 DocumentPtr MakeLinkedScene(const char* prefix)
@@ -222,7 +219,6 @@ void ExpectLinks(BaseDocument& document, int objects)
 
 TEST(MaterialLinks, SurviveFileCopyAndMerge)
 {
-  const counting_memory::BalanceCheck balance;
   DocumentPtr document = MakeLinkedScene("a");
   ExpectLinks(*document, 2);
   ASSERT_NE(Reloaded(document), nullptr);

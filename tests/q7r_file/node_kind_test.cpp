@@ -14,7 +14,6 @@ Bytes PluginTagChunk(Long type)
 
 TEST(NodeKind, ATagGetsNoDataThatAreMadeForObjects)
 {
-  counting_memory::BalanceCheck balance;
   for (Long type : {kObjectPolygon, kObjectLight, kObjectCamera, kObjectPlane}) {
     SCOPED_TRACE(type);
     BaseObject object(kObjectNull);
@@ -41,7 +40,6 @@ TEST(NodeKind, ATagGetsNoDataThatAreMadeForObjects)
 
 TEST(NodeKind, ACopyOntoAnotherClassOfTheSameNumberFailsAndTouchesNothing)
 {
-  counting_memory::BalanceCheck balance;
   TextureTag texture;
   DisplayTag display;
   SelectionTag selection(kTagPointSelection);
@@ -68,7 +66,6 @@ TEST(NodeKind, ACopyOntoAnotherClassOfTheSameNumberFailsAndTouchesNothing)
 
 TEST(NodeKind, AListTakesItsOwnClassAlone)
 {
-  AssertionCounter reports;
   BaseDocument* document = CreateDocument();
   ASSERT_NE(document, nullptr);
   BaseObject* object = AllocObject(kObjectNull);
@@ -83,7 +80,7 @@ TEST(NodeKind, AListTakesItsOwnClassAlone)
     EXPECT_EQ(list->GetCount(), count);
   }
   EXPECT_FALSE(document->GetObjectRoot()->InsertLast(&tag));
-  EXPECT_EQ(reports.Take(), 2 * 5 + 1);
+  EXPECT_EQ(CountReports(), 2 * 5 + 1);
   EXPECT_EQ(tag.GetDocument(), nullptr);
   DeleteObj(object);
   BaseDocument::Free(document);
@@ -91,7 +88,6 @@ TEST(NodeKind, AListTakesItsOwnClassAlone)
 
 TEST(NodeKind, WhatLeavesItsListForgetsWhereItStood)
 {
-  counting_memory::BalanceCheck balance;
   BaseDocument* document = CreateDocument();
   BaseObject* parent = AllocObject(kObjectNull);
   BaseObject* child = AllocObject(kObjectNull);

@@ -113,7 +113,6 @@ TEST(ObjectTransform, FrozenFlagsFollowTheFrozenValues)
 
 TEST(ObjectTransform, MatricesPassThroughParentsAndFrozenParts)
 {
-  counting_memory::BalanceCheck balance;
   BaseObject parent(kObjectNull);
   BaseObject* child = NewObj<FrozenObject>();
   child->InsertUnder(&parent);

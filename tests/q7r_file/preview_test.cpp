@@ -23,7 +23,6 @@ ByteWriter SceneWith(const Bytes& picture, bool announced = true)
 
 TEST(DocumentPreview, IsWrittenAsJpegAndReadAsPixels)
 {
-  const counting_memory::BalanceCheck balance;
   const DocumentPtr document = NewDocument();
   Fill(document->GetPreview(), SmoothPicture(20, 10, 3));
   const Bytes jpeg = SaveToMemory(document->GetPreview(), kImageFormatJpeg);
@@ -45,8 +44,6 @@ TEST(DocumentPreview, IsWrittenAsJpegAndReadAsPixels)
 
 TEST(DocumentPreview, FailsTheLoadWhenItCannotBeDecoded)
 {
-  const counting_memory::BalanceCheck balance;
-  AssertionCounter quiet;
   Bitmap bitmap;
   Fill(bitmap, SmoothPicture(20, 10, 3));
   const Bytes jpeg = SaveToMemory(bitmap, kImageFormatJpeg);

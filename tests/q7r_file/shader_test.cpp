@@ -62,8 +62,6 @@ TEST(Shader, ReadsChildrenBehindThoseThatItHas)
 
 TEST(Shader, TakesNoChildrenFromADamagedList)
 {
-  const counting_memory::BalanceCheck balance;
-  AssertionCounter silent;
   BaseShader shader;
   EXPECT_FALSE(ReadInto(shader, Record("[110100,0 [5707,0 [110064,0 L2 L0 SS ] ] [5707,0 L1 ] ]")));
   EXPECT_EQ(shader.GetDown(), nullptr);
@@ -71,7 +69,6 @@ TEST(Shader, TakesNoChildrenFromADamagedList)
 
 TEST(Shader, ClonesItsChildrenUnlessToldOtherwise)
 {
-  const counting_memory::BalanceCheck balance;
   BaseShader shader(kUnknownType);
   BaseShader* first = AddChild(shader, 1);
   BaseShader* second = AddChild(shader, 2);

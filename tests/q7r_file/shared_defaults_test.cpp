@@ -3,7 +3,6 @@
 
 #include <gtest/gtest.h>
 
-#include "support/assertion_counter.h"
 #include "support/counting_memory.h"
 #include "support/every_failed_allocation.h"
 #include "support/memory_file.h"
@@ -24,9 +23,6 @@ class SharedDefaults : public testing::Test
 {
  protected:
   ~SharedDefaults() override { PreparedRecord::SetEnabled(true); }
-
-  counting_memory::BalanceCheck balance_;
-  AssertionCounter reports_;
 };
 
 // Elements of its own, equal to those of the other.

@@ -64,7 +64,6 @@ const Nest kNests[] = {
 
 TEST(SmallStack, TakesShallowNestsAndRefusesDeepOnes)
 {
-  AssertionCounter quiet;
   for (const Nest& nest : kNests) {
     const std::vector<std::uint8_t> shallow = FileOf(nest, 50);
     const std::vector<std::uint8_t> deep = FileOf(nest, 20000);
@@ -80,7 +79,6 @@ TEST(SmallStack, TakesShallowNestsAndRefusesDeepOnes)
 
 TEST(SmallStack, SavesAndCopiesADeepDocumentOrRefusesTo)
 {
-  AssertionCounter quiet;
   const DocumentPtr document = NewDocument();
   BaseObject* parent = AllocObject(kObjectNull);
   document->InsertObject(parent);

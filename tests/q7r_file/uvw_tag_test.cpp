@@ -89,7 +89,6 @@ TEST(UVWTag, ReadsTheLayoutsOfEveryVersionAndLevel)
       {13000, 7, newer, quad, 1},
   };
   for (const auto& [version, level, body, words, parameter] : rows) {
-    counting_memory::BalanceCheck balance;
     UVWTag tag;
     tag.ResizeTagArray(4);
     const Bytes chunk = ByteWriter().Start(5671, level).Append(body).Long(77).End().bytes;
@@ -107,7 +106,6 @@ TEST(UVWTag, FailsOnBadArraysWithTheMemoryError)
                        ByteWriter().Long(1).ArrayHead(5, 32).Append(Bytes(32)).Bool(true).bytes,
                        ByteWriter().Long(1).ArrayHead(3, 32).Append(Bytes(32)).bytes};
   for (std::size_t i = 0; i < 9; ++i) { // the last one at the higher level alone: below it ends there
-    AssertionCounter silence;
     UVWTag tag;
     ByteWriter whole;
     whole.Header().Start(5671, i % 2 == 0 ? 3 : 1).Append(bad[i / 2]).End().End();

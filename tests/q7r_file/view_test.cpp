@@ -32,7 +32,6 @@ TEST(View, ADrawHasACameraOfItsOwn)
 
 TEST(View, MakesFourDrawsWithThePerspectiveFirst)
 {
-  const counting_memory::BalanceCheck balance;
   struct Made
   {
     Long projection;
@@ -75,7 +74,6 @@ TEST(View, MakesFourDrawsWithThePerspectiveFirst)
 
 TEST(View, WritesAndReadsAPanel)
 {
-  const counting_memory::BalanceCheck balance;
   ViewPanel panel;
   const std::string list = ToHex(Record("[110124,0"));
   EXPECT_EQ(ToHex(BytesOf(panel)).find(list), std::string::npos); // no list
@@ -96,11 +94,9 @@ TEST(View, WritesAndReadsAPanel)
                                           {"[110100,0 [110305,0 ] [99,0 ] ] L4 ", 1, true},
                                           {"[98,0 L1 ] ", 1, true},
                                           {"L1 ", 1, false}}) {
-    AssertionCounter quiet;
     EXPECT_EQ(ReadInto(again, Record("[110124,0 " + std::string(body) + "] [7,7 ]")), read);
     EXPECT_EQ(again.GetDraws().GetCount(), draws);
   }
-  AssertionCounter silent;
   MemoryReadFile memory(ByteWriter().Header().Long(1).bytes);
   EXPECT_FALSE(again.ReadChunk(memory.file, 110124, 0));
   EXPECT_EQ(memory.file.GetError(), -100);

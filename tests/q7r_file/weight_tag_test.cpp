@@ -67,7 +67,6 @@ TEST(WeightTag, InvertsTheMatricesThatItReads)
 TEST(WeightTag, RefusesAnotherChunkInTheRestPosesPlaceAndStaysInStep)
 {
   Rig rig;
-  AssertionCounter silence;
   MemoryReadFile memory(ByteWriter().Header().Append(Record(kOneJoint + "[1021282,1 L1 ]")).End().bytes);
   EXPECT_FALSE(rig.data->ReadData(memory.file, kChunkNodeData, 6));
   EXPECT_TRUE(memory.file.SkipToEndChunk() && memory.file.GetFile().GetRemaining() == 0);
@@ -168,7 +167,6 @@ TEST(WeightTag, AnswersTheSecondLinkOfTheOneSelectedJoint)
 
 TEST(WeightTag, CopiesItsJointsWithTheirLinks)
 {
-  counting_memory::BalanceCheck balance;
   Rig rig;
   auto* joint = NewObj<BaseObject>(kObjectJoint);
   joint->InsertUnder(&rig.object);

@@ -5,7 +5,6 @@
 
 #include <gtest/gtest.h>
 
-#include "support/assertion_counter.h"
 #include "support/record_samples.h"
 #include "support/scene_bytes.h"
 #include "support/scene_corpus.h"
@@ -88,7 +87,6 @@ bool GetsTheSame(const FileBytes& bytes)
 
 TEST(NodeSink, GetsWhatAWholeLoadGives)
 {
-  const AssertionCounter quiet;
   std::mt19937 random(5);
   int exact = 0;
   int files = 0;
@@ -110,7 +108,6 @@ TEST(NodeSink, GetsWhatAWholeLoadGives)
 // What stood in a list that another one replaces is no part of the scene.
 TEST(NodeSink, HearsOfAListThatIsReplaced)
 {
-  const AssertionCounter quiet;
   const std::string once = "[110100,0 [5140,0 [110100,0 [110100,0 [5140,0 ] ] ] ] ]";
   const std::string empty = "[110100,0 ]";
   const std::tuple<std::string, bool> rows[] = {

@@ -88,7 +88,6 @@ void CheckParameters(GeListNode& node, const std::vector<RecordValue>& values)
 TEST(Records, AreKeptCopiedAndWrittenInTheCurrentForm)
 {
   ASSERT_GT(RecordSamples().size(), 150U);
-  const counting_memory::BalanceCheck balance;
   for (const RecordSample& sample : RecordSamples()) {
     SCOPED_TRACE(sample.name);
     const auto values = ParseRecord(sample.body);
@@ -196,8 +195,6 @@ TEST(Records, LeadTheirLinksToWhatIsReadBehindThem)
 
 TEST(Records, AreRefusedWhereverTheyAreCut)
 {
-  AssertionCounter silence;
-  const counting_memory::BalanceCheck balance;
   for (const RecordSample& sample : RecordSamples()) {
     const Bytes chunk = Chunk(sample.chunk, sample.level, ParseRecord(sample.body), sample.version);
     for (std::size_t cut = 0; cut < chunk.size(); ++cut) {
@@ -223,7 +220,6 @@ TEST(Records, ReadPastWhatTheyDoNotKnow)
 
 TEST(Records, TakeNoMemoryForCountsThatTheFileDoesNotHold)
 {
-  AssertionCounter silence;
   for (const RecordSample& sample : RecordSamples()) {
     auto values = ParseRecord(sample.body);
     for (RecordValue& value : values) {
@@ -243,7 +239,6 @@ TEST(Records, TakeNoMemoryForCountsThatTheFileDoesNotHold)
 
 TEST(Records, AreReadAndCopiedWholeOrNotAtAllWhenAnAllocationFails)
 {
-  AssertionCounter silence;
   for (const RecordSample& sample : RecordSamples()) {
     SCOPED_TRACE(sample.name);
     const Bytes chunk = Chunk(sample.chunk, sample.level, ParseRecord(sample.body), sample.version);

@@ -5,7 +5,6 @@
 
 #include <gtest/gtest.h>
 
-#include "support/assertion_counter.h"
 #include "support/counting_memory.h"
 
 // Runs `operation` with its first allocation failing alone, then its second, and so on to the last, and again with all
@@ -14,7 +13,6 @@
 template <class Operation, class Describe>
 void EveryFailedAllocation(Operation&& operation, Describe&& describe)
 {
-  AssertionCounter quiet;
   auto whole = operation();
   ASSERT_TRUE(static_cast<bool>(whole)) << "with enough memory";
   const auto wanted = describe(whole);

@@ -21,14 +21,13 @@
 
 #include <gtest/gtest.h>
 
-#include "support/assertion_counter.h"
-#include "support/assertion_record.h"
 #include "support/byte_writer.h"
 #include "support/counting_memory.h"
 #include "support/every_failed_allocation.h"
 #include "support/memory_file.h"
 #include "support/node_bytes.h"
 #include "support/record_samples.h"
+#include "support/reports.h"
 #include "support/scene_bytes.h"
 #include "support/temp_folder.h"
 #include "support/text.h"

@@ -5,7 +5,6 @@
 #include <string>
 #include <vector>
 
-#include "support/assertion_counter.h"
 #include "support/byte_writer.h"
 #include "support/memory_file.h"
 #include "torvane/tags/base_tag.h"
@@ -54,7 +53,6 @@ inline bool ReadInto(_torvane_::PrivateChunk& node, const Bytes& chunks, std::in
 // The error after an attempt to read `chunks`; 0 if all was read.
 inline _torvane_::Long ReadError(_torvane_::PrivateChunk& node, const Bytes& chunks, std::int32_t version = 13000)
 {
-  AssertionCounter silence;
   MemoryReadFile memory(ByteWriter().Append(WithHeader(chunks, version)).End().bytes);
   const bool read = node.ReadChunkLoop(memory.file, true);
   EXPECT_EQ(read, memory.file.GetError() == 0);
