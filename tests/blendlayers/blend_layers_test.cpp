@@ -138,8 +138,7 @@ TEST(BlendLayers, StartWithTheirDefaults)
     EXPECT_FALSE(layer->GetLayerParameter(2007, value) || layer->SetLayerParameter(2007, GeData(1)));
   }
   GeData vector;
-  EXPECT_TRUE(stack.Layers().GetLayer(9)->GetLayerParameter(2003, vector));
-  EXPECT_TRUE(vector.GetVector() == Vector(1, 1, 1));
+  EXPECT_TRUE(stack.Layers().GetLayer(9)->GetLayerParameter(2003, vector) && vector.GetVector() == Vector(1, 1, 1));
   EXPECT_EQ(stack.Layers().AppendLayer(0), nullptr);
   EXPECT_EQ(CBlendLayers::AllocObject(), nullptr);
   EXPECT_EQ(TakeReports(), (Reports{"blendlayers:41", "blendlayers:16"}));
@@ -210,8 +209,7 @@ TEST(BlendLayers, RouteAParameterToItsLayer)
   EXPECT_TRUE(stack.Data().SetParameter(10064, GeData(Vector(1, 2, 3))));
 
   // Parts of a gradient, and the whole.
-  EXPECT_TRUE(stack.Data().SetParameter({{10081}, {1000}}, GeData(6)));
-  EXPECT_TRUE(stack.Data().GetParameter(10081, value));
+  EXPECT_TRUE(stack.Data().SetParameter({{10081}, {1000}}, GeData(6)) && stack.Data().GetParameter(10081, value));
   EXPECT_EQ(static_cast<GradientData*>(value.GetCustom())->GetSettings().GetLong(1000), 6);
   EXPECT_TRUE(stack.Data().SetParameter({{10081}, {1000}}, GeData(2)) && stack.Data().SetParameter(10081, value));
   EXPECT_TRUE(stack.Data().GetParameter({{10081}, {1000}}, value) && value.GetLong() == 6);
@@ -292,8 +290,7 @@ TEST(BlendLayers, CopyAndCompareEverySetting)
       EXPECT_FALSE(layer.LayersDiffer(other));
       EXPECT_TRUE(layer.SetLayerParameter(id, GeData(value.GetReal() == 0 ? 1 : 0)));
       EXPECT_TRUE(layer.LayersDiffer(other) && !copy.IsEqual(stack.value)) << i << ' ' << id;
-      EXPECT_TRUE(layer.LayersEqualIgnoringFlags(other, 0));
-      EXPECT_TRUE(layer.SetLayerParameter(id, value));
+      EXPECT_TRUE(layer.LayersEqualIgnoringFlags(other, 0) && layer.SetLayerParameter(id, value));
     }
     EXPECT_FALSE(layer.CopyLayerTo(*stack.Layers().GetLayer((i + 1) % 10), nullptr));
   }

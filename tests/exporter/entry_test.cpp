@@ -49,8 +49,7 @@ TEST(Entry, DoesNothingWithoutACommand)
   host::StandaloneHost host(host::LoadCompositionText(Composition(""), "test.json", "/"));
   host.WithholdCommand();
   EXPECT_EQ(host.Start(EntryPointFunc), 0);
-  EXPECT_TRUE(host.MenuEntries().empty());
-  EXPECT_TRUE(host.Reports().empty());
+  EXPECT_TRUE(host.MenuEntries().empty() && host.Reports().empty());
   EXPECT_EQ(host.CallCount(), 1u);
 }
 
@@ -105,9 +104,7 @@ TEST_F(CommandHook, WritesTheSceneFile)
 {
   host::CommandResult result = Run("scene.q7r");
   EXPECT_EQ(result.error, 0);
-  EXPECT_TRUE(result.isHandled);
-  EXPECT_TRUE(IsScene("scene.q7r"));
-  EXPECT_TRUE(host_.Reports().empty());
+  EXPECT_TRUE(result.isHandled && IsScene("scene.q7r") && host_.Reports().empty());
   EXPECT_EQ(host_.Balance(), host::HostBalance());
 }
 
@@ -140,8 +137,7 @@ TEST_F(CommandHook, KeepsTheTextOfACancelledDialogLocked)
 {
   host::CommandResult result = Run("");
   EXPECT_EQ(result.error, 0);
-  EXPECT_TRUE(result.isHandled);
-  EXPECT_TRUE(host_.Reports().empty());
+  EXPECT_TRUE(result.isHandled && host_.Reports().empty());
   EXPECT_EQ(host_.Balance(), (host::HostBalance{.memoryHandles = 1, .memoryLocks = 1}));
 }
 
@@ -185,8 +181,7 @@ TEST_F(CommandHook, GivesTwoForAFileThatCannotBeOpened)
 {
   host::CommandResult result = Run("missing/scene.q7r");
   EXPECT_EQ(result.error, 2);
-  EXPECT_TRUE(result.isHandled);
-  EXPECT_TRUE(host_.Reports().empty());
+  EXPECT_TRUE(result.isHandled && host_.Reports().empty());
   EXPECT_EQ(host_.Balance(), (host::HostBalance{.memoryHandles = 1, .memoryLocks = 1}));
 }
 

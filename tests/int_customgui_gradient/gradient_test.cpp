@@ -118,8 +118,7 @@ TEST(Gradient, GivesAndTakesItsPartsByPath)
     EXPECT_TRUE(gradient.SetParameter(c.path, GeData(c.value + 1)) && gradient.GetParameter(c.path, value));
     EXPECT_EQ(value.GetReal(), c.value + 1) << c.path[0].id;
   }
-  EXPECT_TRUE(gradient.GetParameter(10300, value));
-  EXPECT_TRUE(value.GetVector() == Vector(1, 3, 3));
+  EXPECT_TRUE(gradient.GetParameter(10300, value) && value.GetVector() == Vector(1, 3, 3));
   const GeData before(kCustomGradient, gradient);
   for (const ParameterPath& path : refused) {
     ULong flags = 0;
@@ -143,18 +142,15 @@ TEST(Gradient, CopiesAndComparesAllThatItHolds)
 {
   GradientData gradient, other;
   AddKnots(gradient, {{0.5, 0.25, kWhite}});
-  EXPECT_TRUE(GradientsDiffer(gradient, other));
-  EXPECT_TRUE(CopyGradient(gradient, other) && !GradientsDiffer(gradient, other));
+  EXPECT_TRUE(GradientsDiffer(gradient, other) && CopyGradient(gradient, other) && !GradientsDiffer(gradient, other));
   gradient.NeedAlpha();
   EXPECT_TRUE(GradientsDiffer(gradient, other) && GradientsDiffer(other, gradient));
   EXPECT_TRUE(CopyGradient(gradient, other) && !GradientsDiffer(gradient, other) && other.GetAlpha()->IsAlpha());
   AddKnots(*gradient.GetAlpha(), {{0, 0, kBlack}});
-  EXPECT_TRUE(GradientsDiffer(gradient, other));
-  EXPECT_TRUE(GradientsDiffer(*GradientData().NeedAlpha(), GradientData()));
+  EXPECT_TRUE(GradientsDiffer(gradient, other) && GradientsDiffer(*GradientData().NeedAlpha(), GradientData()));
 
   other.GetSettings() = gradient.GetSettings();
-  EXPECT_TRUE(other.PrepareGradient());
-  EXPECT_TRUE(CopyGradient(GradientData(), other));
+  EXPECT_TRUE(other.PrepareGradient() && CopyGradient(GradientData(), other));
   EXPECT_EQ(TakeReports(), Reports{"int_customgui_gradient:107"});
   EXPECT_EQ(other.GetAlpha(), nullptr);
   EXPECT_EQ(other.GetKnotCount(), 0);
@@ -176,8 +172,7 @@ TEST(Gradient, PreparesItsKnotsInOrderOfPosition)
   const ULong order[] = {1, 3, 2, 0};
   for (Long i = 0; i < 4; ++i)
     EXPECT_EQ(gradient.GetKnotCache()[i].index, order[i]);
-  EXPECT_TRUE(gradient.GetCacheFlag());
-  EXPECT_TRUE(gradient.GetAlpha()->GetKnotCache()->color == Vector(0.25, 0.25, 0.25));
+  EXPECT_TRUE(gradient.GetCacheFlag() && gradient.GetAlpha()->GetKnotCache()->color == Vector(0.25, 0.25, 0.25));
 
   // Enough knots for several rounds of the sort.
   GradientData many;

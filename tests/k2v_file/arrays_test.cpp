@@ -39,12 +39,10 @@ TEST(DynArray, EditsWithinItsBounds)
 {
   LongArray array(2);
   Fill(array, 3);
-  EXPECT_TRUE(array.Insert(99, 8));
-  EXPECT_TRUE(array.Insert(-5, 9));
+  EXPECT_TRUE(array.Insert(99, 8) && array.Insert(-5, 9));
   EXPECT_EQ(Values(array), (std::vector<Long>{9, 0, 1, 2, 8}));
   EXPECT_TRUE(array.Append(array[0])); // from the block that may be replaced
-  EXPECT_FALSE(array.Remove(6));
-  EXPECT_FALSE(array.Remove(-1));
+  EXPECT_FALSE(array.Remove(6) || array.Remove(-1));
   EXPECT_TRUE(array.Remove(0));
   array.Swap(0, 4);
   array.Swap(0, 5);
@@ -78,15 +76,11 @@ TEST(DynArray, StaysAsItWasWhenMemoryRunsOut)
   LongArray copy;
   Fill(array, 4);
   counting_memory::FailAfter(0);
-  EXPECT_FALSE(array.Append(5));
-  EXPECT_FALSE(array.Insert(0, 5));
-  EXPECT_FALSE(array.SetCount(5));
-  EXPECT_FALSE(array.CopyTo(copy));
+  EXPECT_FALSE(array.Append(5) || array.Insert(0, 5) || array.SetCount(5) || array.CopyTo(copy));
   counting_memory::FailNever();
   EXPECT_EQ(Values(array), (std::vector<Long>{0, 1, 2, 3}));
   Fill(copy, 7);
-  EXPECT_TRUE(array.CopyTo(copy));
-  EXPECT_TRUE(copy.CopyTo(copy));
+  EXPECT_TRUE(array.CopyTo(copy) && copy.CopyTo(copy));
   EXPECT_EQ(Values(copy), Values(array));
   EXPECT_EQ(copy.GetCapacity(), 4); // the way to grow comes along
 }

@@ -559,8 +559,7 @@ TEST_F(BaseFileTest, PathsReachTheSystemAsUtf8)
   std::string longPath = folder.Path().string();
   for (int i = 0; i < 600; ++i)
     longPath += "/.";
-  EXPECT_TRUE(BaseFile().Open((longPath + "/deep").c_str(), kFileWrite));
-  EXPECT_TRUE(std::filesystem::exists(folder / "deep"));
+  EXPECT_TRUE(BaseFile().Open((longPath + "/deep").c_str(), kFileWrite) && std::filesystem::exists(folder / "deep"));
 }
 #endif
 

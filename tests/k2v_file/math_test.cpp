@@ -197,10 +197,8 @@ TEST(SmallMath, StaysWithinItsRanges)
   EXPECT_EQ(ReflectVector({1, -2, 3}, {0, 1, 0}), Vector(1, 2, 3));
   EXPECT_EQ(PointLineOffset({1, 1, 1}, {0, 0, 2}, {4, 5, 9}), Vector(3, 4, 0));
   EXPECT_EQ(PointLineOffset({1, 1, 1}, {}, {4, 5, 9}), Vector());
-  EXPECT_TRUE(IsUniformOrthogonal({}));
-  EXPECT_TRUE(IsOrthogonal(MatrixScale({1, 2, 1})));
-  EXPECT_FALSE(IsUniformOrthogonal(MatrixScale({1, 2, 1})));
-  EXPECT_FALSE(IsOrthogonal({{}, {1, 0, 0}, {0.5, 1, 0}, {0, 0, 1}}));
+  EXPECT_TRUE(IsUniformOrthogonal({}) && IsOrthogonal(MatrixScale({1, 2, 1})));
+  EXPECT_FALSE(IsUniformOrthogonal(MatrixScale({1, 2, 1})) || IsOrthogonal({{}, {1, 0, 0}, {0.5, 1, 0}, {0, 0, 1}}));
   EXPECT_TRUE(IsOrthogonal({{}, {1, 0, 0}, {-0.5, 1, 0}, {0, 0, 1}})); // an obtuse pair passes
 }
 

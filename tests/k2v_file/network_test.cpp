@@ -96,8 +96,7 @@ TEST_F(NetworkTest, NothingWaitsLongerThanItWasTold)
   NetworkListener second;
   EXPECT_FALSE(second.Listen(port)) << "the port is taken";
   listener.Close();
-  EXPECT_FALSE(nobody.Connect("127.0.0.1", port));
-  EXPECT_FALSE(nobody.IsConnected());
+  EXPECT_FALSE(nobody.Connect("127.0.0.1", port) || nobody.IsConnected());
 }
 
 TEST_F(NetworkTest, AWriterSendsBlocksAndEndsThemWithAZero)

@@ -100,8 +100,7 @@ TYPED_TEST(RangeSet, StaysAsItWasWhenMemoryRunsOut)
 {
   TypeParam set;
   counting_memory::FailAfter(0);
-  EXPECT_FALSE(set.AddIndex(3));
-  EXPECT_FALSE(set.SetRange(1, 2));
+  EXPECT_FALSE(set.AddIndex(3) || set.SetRange(1, 2));
   counting_memory::FailNever();
   EXPECT_EQ(set.GetCount(), 0);
   // Up to where the next range needs memory, whichever form it is.
@@ -114,9 +113,7 @@ TYPED_TEST(RangeSet, StaysAsItWasWhenMemoryRunsOut)
   const Ranges before = RangesOf(set);
   ASSERT_EQ(before.size(), 512u);
   counting_memory::FailAfter(0);
-  EXPECT_FALSE(set.AddIndex(4000));
-  EXPECT_FALSE(set.AddIndex(6000));
-  EXPECT_FALSE(set.RemoveIndex(2));
+  EXPECT_FALSE(set.AddIndex(4000) || set.AddIndex(6000) || set.RemoveIndex(2));
   EXPECT_EQ(set.GetCount(), 516);
   EXPECT_EQ(RangesOf(set), before);
   for (Long n = 511; n > 0; --n)
@@ -172,8 +169,7 @@ TEST(PagedRangeArray, GivesEmptyPagesBack)
   ASSERT_TRUE(set.GetRange(512, range));
   EXPECT_EQ(range.first, 2048);
   EXPECT_FALSE(set.TestIndex(1024));
-  EXPECT_TRUE(set.AddIndex(1500));
-  EXPECT_TRUE(set.SetRange(1, 0));
+  EXPECT_TRUE(set.AddIndex(1500) && set.SetRange(1, 0));
   EXPECT_EQ(set.GetRangeCount(), 0);
 }
 

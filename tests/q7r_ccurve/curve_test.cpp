@@ -97,8 +97,7 @@ TEST(Curve, AnyOrderOfInsertionsAndDeletionsKeepsTheOrderOfTime)
       model.erase(victim);
     }
   }
-  EXPECT_FALSE(curve.DelKey(-1));
-  EXPECT_FALSE(curve.DelKey(curve.GetKeyCount()));
+  EXPECT_FALSE(curve.DelKey(-1) || curve.DelKey(curve.GetKeyCount()));
   CCurve read;
   ASSERT_TRUE(ReadInto(read, BytesOf(curve)));
   for (const CCurve* c : {&curve, &read}) {

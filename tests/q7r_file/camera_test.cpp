@@ -159,8 +159,7 @@ TEST(Camera, ComputesTheFocusPairWhenAnInputIsSet)
     Entries(camera).SetReal(500, 18);
     camera->SetParameterById(1001, GeData(projection));
     camera->SetParameterById(4202, GeData(mode));
-    EXPECT_TRUE(camera->SetParameterById(4208, GeData(rule)));
-    EXPECT_TRUE(camera->SetParameterById(4205, GeData(plane)));
+    EXPECT_TRUE(camera->SetParameterById(4208, GeData(rule)) && camera->SetParameterById(4205, GeData(plane)));
     EXPECT_TRUE(camera->SetParameterById(4201, GeData(base)));
     EXPECT_EQ(Entries(camera).GetData(4208).GetType(), 19);
     EXPECT_EQ(Entries(camera).GetReal(4201), base);

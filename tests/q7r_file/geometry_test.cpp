@@ -44,8 +44,7 @@ TEST(PolygonObject, KeepsItsSelectionsAndNgonsBehindTheTransform)
 {
   BaseObject* object = AllocObject(kObjectPolygon);
   EXPECT_EQ(BytesOf(*GetPolygonData(*object)), Bytes());
-  EXPECT_TRUE(ReadInto(*object, AllPolygonChunks()));
-  EXPECT_TRUE(GetPolygonData(*object)->GetPhongBreakEdges().IsSelected(7));
+  EXPECT_TRUE(ReadInto(*object, AllPolygonChunks()) && GetPolygonData(*object)->GetPhongBreakEdges().IsSelected(7));
   EXPECT_EQ(GetPolygonData(*object)->GetNgons()->GetCount(), 2);
   EXPECT_TRUE(EndsWith(BytesOf(*object), AllPolygonChunks()));
 
@@ -249,8 +248,7 @@ TEST(PointObject, ComesBackFromAFileUnderItsLabel)
     EXPECT_EQ(member->GetType(), kObjectPointBased);
     EXPECT_EQ(member->GetDiskType(), kObjectPoint);
     EXPECT_EQ(GetPointCount(*member), 2);
-    EXPECT_TRUE(Holds(BytesOf(parents[i]), chunks));
-    EXPECT_TRUE(i == 2 || ReadInto(parents[i + 1], BytesOf(parents[i])));
+    EXPECT_TRUE(Holds(BytesOf(parents[i]), chunks) && (i == 2 || ReadInto(parents[i + 1], BytesOf(parents[i]))));
   }
 }
 

@@ -24,8 +24,7 @@ Long ReadTable(JointWeightTable& table, const Bytes& bytes, std::int32_t version
   MemoryReadFile memory(ByteWriter().Header("Q7R6", version).Append(bytes).bytes);
   const bool read = table.Read(memory.file);
   EXPECT_EQ(read, memory.file.GetError() == 0);
-  EXPECT_TRUE(!read || memory.file.GetFile().GetRemaining() == 0);
-  EXPECT_TRUE(read || table.GetRunCount() == 0);
+  EXPECT_TRUE((!read || memory.file.GetFile().GetRemaining() == 0) && (read || table.GetRunCount() == 0));
   return memory.file.GetError();
 }
 
@@ -139,8 +138,7 @@ TEST(JointWeightTable, StaysAsItWasWhenMemoryIsShort)
     ASSERT_TRUE(table.WritePointWeight(point, 1.0)); // the first capacity is used up
   const std::string before = Written(table);
   counting_memory::FailAfter(0);
-  EXPECT_FALSE(table.WritePointWeight(40, 1.0));
-  EXPECT_FALSE(table.BeginEdit(100));
+  EXPECT_FALSE(table.WritePointWeight(40, 1.0) || table.BeginEdit(100));
   EXPECT_FALSE(counting_memory::WithoutMemory([&] { return table.WritePointWeight(40, 1.0); },
                                               1)); // the value found room, its run none
   EXPECT_EQ(Written(table), before);

@@ -97,8 +97,7 @@ TEST(Light, LeavesOtherParametersToTheObject)
   const ParameterPath green = {{kLightColor, kDataVector, 0}, {1001, kDataReal, 0}};
   GeData value;
   EXPECT_TRUE(light->SetParameterById(kLightColor, GeData(Vector(1, 2, 3))));
-  EXPECT_TRUE(light->SetParameter(green, GeData(0.125)));
-  EXPECT_TRUE(light->GetParameter(green, value));
+  EXPECT_TRUE(light->SetParameter(green, GeData(0.125)) && light->GetParameter(green, value));
   EXPECT_EQ(value.GetReal(), 0.125);
   EXPECT_TRUE(ParameterOf(*light, kLightColor).GetVector() == Vector(1, 0.125, 3));
   for (const auto& [asked, count] : {std::pair<Long, Long>{-1, 0}, {41, 40}, {40, 40}}) {

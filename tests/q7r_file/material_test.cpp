@@ -73,8 +73,7 @@ TEST(Material, PassesOverOldChannelChunks)
   }
   BaseChannel channel;
   MemoryReadFile memory(ByteWriter().Header().bytes);
-  EXPECT_TRUE(channel.ReadChunk(memory.file, 5706, 0));
-  EXPECT_TRUE(channel.ReadChunk(memory.file, 5707, 0));
+  EXPECT_TRUE(channel.ReadChunk(memory.file, 5706, 0) && channel.ReadChunk(memory.file, 5707, 0));
   EXPECT_FALSE(channel.ReadChunk(memory.file, 5708, 0));
 }
 

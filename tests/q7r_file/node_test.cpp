@@ -12,8 +12,7 @@ TEST(Node, BitOperationsTellWhatChanged)
   EXPECT_EQ(node.GetNBit(-4), 0x80000000u);
   EXPECT_TRUE(node.ChangeNBit(127, 2));
   EXPECT_FALSE(node.ChangeNBit(127, 2));
-  EXPECT_TRUE(node.ChangeNBit(3, 3));
-  EXPECT_TRUE(node.ChangeNBit(3, 3));
+  EXPECT_TRUE(node.ChangeNBit(3, 3) && node.ChangeNBit(3, 3));
   EXPECT_FALSE(node.ChangeNBit(3, 4));
   EXPECT_TRUE(node.ChangeNBit(130, 1)); // lands in the last word
   EXPECT_EQ(node.GetNBit(-4), 4u);
@@ -27,11 +26,9 @@ TEST(Node, KeepsExtraIdentifiersThroughAFile)
   BaseList2D node(1);
   EXPECT_EQ(node.GetUniqueIDCount(), 1);
   EXPECT_FALSE(node.AddUniqueID(kMarkerAppId, bytes, 3));
-  EXPECT_TRUE(node.AddUniqueID(20, bytes, 3));
-  EXPECT_TRUE(node.AddUniqueID(10, bytes, 2));
+  EXPECT_TRUE(node.AddUniqueID(20, bytes, 3) && node.AddUniqueID(10, bytes, 2));
   EXPECT_TRUE(node.AddUniqueID(20, bytes, 1)); // replaces, with another size
-  EXPECT_FALSE(node.AddUniqueID(20, nullptr, 1));
-  EXPECT_FALSE(node.AddUniqueID(20, bytes, -1));
+  EXPECT_FALSE(node.AddUniqueID(20, nullptr, 1) || node.AddUniqueID(20, bytes, -1));
   ASSERT_EQ(node.GetUniqueIDCount(), 3);
   Bytes written = BytesOf(node);
   const Bytes chunk = Record("[110068,1 L2 L10 M0102 L20 M01 ]");
@@ -136,8 +133,7 @@ TEST(NodeParameters, DynamicOnesTakeTheSmallestFreeKey)
   ParameterPath first = node.AddDynamicParameter(real);
   ParameterPath second = node.AddDynamicParameter(MakeDynamicSettings(kDataLong, "Count"));
   EXPECT_TRUE(first.IsExactly(Path({700, 5, 0}, {1, kDataReal, 0})));
-  EXPECT_TRUE(second.IsExactly(Path({700, 5, 0}, {2, kDataLong, 0})));
-  EXPECT_TRUE(node.RemoveDynamicParameter(first));
+  EXPECT_TRUE(second.IsExactly(Path({700, 5, 0}, {2, kDataLong, 0})) && node.RemoveDynamicParameter(first));
   EXPECT_EQ(node.FindDynamicParameter(first), nullptr);
   EXPECT_EQ(node.AddDynamicParameter(real)[1].id, 1);
   EXPECT_FALSE(node.RemoveDynamicParameter(Path({701, 5, 0}, {2, 0, 0})));

@@ -130,21 +130,18 @@ TEST(ValueTags, ResizeKeepingTheFirstEntriesAndClearingNewOnes)
   EXPECT_EQ(map.GetArray(), nullptr);
 
   PolygonTag polygons;
-  EXPECT_TRUE(ReadInto(polygons, kLayouts[1].Filled()));
-  EXPECT_TRUE(polygons.ResizeTagArray(0) && polygons.ResizeTagArray(-9));
+  EXPECT_TRUE(ReadInto(polygons, kLayouts[1].Filled()) && polygons.ResizeTagArray(0) && polygons.ResizeTagArray(-9));
   EXPECT_EQ(polygons.GetCount(), 2);
 
   SegmentTag segments;
   EXPECT_FALSE(segments.ResizeTagArray(0) || segments.ResizeTagArray(-1));
-  EXPECT_TRUE(ReadInto(segments, kLayouts[3].Filled()));
-  EXPECT_TRUE(segments.ResizeTagArray(-1));
+  EXPECT_TRUE(ReadInto(segments, kLayouts[3].Filled()) && segments.ResizeTagArray(-1));
   EXPECT_EQ(segments.GetCount(), 2);
   EXPECT_TRUE(segments.ResizeTagArray(0));
   EXPECT_EQ(segments.GetCount(), 0);
 
   TangentTag tangents;
-  EXPECT_TRUE(ReadInto(tangents, kLayouts[2].Filled()));
-  EXPECT_TRUE(tangents.ReplaceTagArray(2));
+  EXPECT_TRUE(ReadInto(tangents, kLayouts[2].Filled()) && tangents.ReplaceTagArray(2));
   EXPECT_EQ(Numbers<Real>(tangents), std::vector<Real>(12, 0.0));
 }
 

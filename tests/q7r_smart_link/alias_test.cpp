@@ -66,8 +66,7 @@ TEST(Alias, CopiesTargetAndLabelWithoutATranslation)
   source.SetName(String("label"));
   GeAliasLink* clone = source.CloneLink(nullptr);
   EXPECT_EQ(*clone->GetName(), String("label"));
-  EXPECT_TRUE(clone->IsEqual(copy));
-  EXPECT_TRUE(clone->CopyLinkTo(clone, nullptr));
+  EXPECT_TRUE(clone->IsEqual(copy) && clone->CopyLinkTo(clone, nullptr));
   EXPECT_EQ(clone->GetLink(), FakeNode(1));
   DeleteObj(clone);
   EXPECT_TRUE(source.CopyLinkTo(nullptr, nullptr));
@@ -173,8 +172,7 @@ TEST(Alias, ReadsLinksOfEveryFormAndIgnoresForeignBlocks)
       MemoryReadFile source(bytes.bytes);
       GeAliasLink link;
       GeAliasGoal goal(FakeNode(1));
-      EXPECT_TRUE(link.ReadLink(source.file));
-      EXPECT_TRUE(goal.ReadGoal(source.file));
+      EXPECT_TRUE(link.ReadLink(source.file) && goal.ReadGoal(source.file));
       EXPECT_EQ(link.GetLink(), one.resolves ? FakeNode(1) : nullptr) << ToHex(bytes.bytes);
       ASSERT_EQ(link.GetName() != nullptr, one.name != nullptr) << ToHex(bytes.bytes);
       if (one.name) {
@@ -185,8 +183,7 @@ TEST(Alias, ReadsLinksOfEveryFormAndIgnoresForeignBlocks)
   MemoryReadFile source(ByteWriter().Header().Memory("").Memory("").bytes);
   GeAliasLink link;
   GeAliasGoal goal;
-  EXPECT_FALSE(link.ReadLink(source.file));
-  EXPECT_FALSE(goal.ReadGoal(source.file));
+  EXPECT_FALSE(link.ReadLink(source.file) || goal.ReadGoal(source.file));
 }
 
 TEST(Alias, TakesAnIdOnlyFromAGoalBlockOfExactSize)
@@ -196,8 +193,7 @@ TEST(Alias, TakesAnIdOnlyFromAGoalBlockOfExactSize)
     GeAliasLink link, old;
     GeAliasGoal goal(FakeNode(1));
     old.SetLinkGoal(&goal);
-    EXPECT_TRUE(link.ReadLink(source.file));
-    EXPECT_TRUE(goal.ReadGoal(source.file));
+    EXPECT_TRUE(link.ReadLink(source.file) && goal.ReadGoal(source.file));
     EXPECT_EQ(link.GetLink(), nullptr);
     EXPECT_EQ(old.GetLink(), nullptr); // a goal that is read loses the links that it had
   }
@@ -298,10 +294,8 @@ TEST(Alias, KeepsACopysLinksInsideTheCopyAndTheOthersAtTheirOldTarget)
     AliasTranslator translator;
     ASSERT_TRUE(translator.MakeTranslator());
     TransArray* array = translator.GetArray();
-    EXPECT_TRUE(toInside.CopyLinkTo(&copies[0], array));
-    EXPECT_TRUE(inside.CopyGoalTo(insideCopy, array));
-    EXPECT_TRUE(toOutside.CopyLinkTo(&copies[1], array));
-    EXPECT_TRUE(toGone.CopyLinkTo(&copies[2], array));
+    EXPECT_TRUE(toInside.CopyLinkTo(&copies[0], array) && inside.CopyGoalTo(insideCopy, array));
+    EXPECT_TRUE(toOutside.CopyLinkTo(&copies[1], array) && toGone.CopyLinkTo(&copies[2], array));
     EXPECT_TRUE(toNothing.CopyLinkTo(&copies[3], array));
     EXPECT_EQ(copies[1].GetLink(), nullptr); // not yet
     gone.reset();
@@ -341,13 +335,11 @@ TEST(Alias, ReportsARegistrationForAGoalThatHasGone)
     GeAliasGoal goal(FakeNode(1));
     EXPECT_TRUE(translation.RegisterGoal(5, goal));
   }
-  EXPECT_TRUE(translation.RegisterLink(5, link, nullptr));
-  EXPECT_TRUE(translation.RegisterGoal(5, again));
+  EXPECT_TRUE(translation.RegisterLink(5, link, nullptr) && translation.RegisterGoal(5, again));
   EXPECT_EQ(TakeReports(), (Reports{"q7r_smart_link:843", "q7r_smart_link:794"}));
   EXPECT_EQ(link.GetLink(), nullptr);
   link.SetLinkGoal(&again);
-  EXPECT_TRUE(translation.RegisterLink(0, link, nullptr));
-  EXPECT_TRUE(translation.RegisterGoal(0, again));
+  EXPECT_TRUE(translation.RegisterLink(0, link, nullptr) && translation.RegisterGoal(0, again));
   EXPECT_EQ(link.GetLink(), nullptr);
   translation.FinishTranslation(true);
 }

@@ -26,8 +26,7 @@ TEST(WindowsFiles, HaveNamesOfEveryPlane)
   for (const wchar_t* text : {L"\u00E9\u20AC", L"a\xD83D\xDE00z"}) {
     const fs::path path = folder.Path() / text;
     BaseFile file;
-    EXPECT_TRUE(file.Open(NameOf(path), kFileWrite) && file.WriteChar('x') && file.Close());
-    EXPECT_TRUE(GeFExist(NameOf(path)));
+    EXPECT_TRUE(file.Open(NameOf(path), kFileWrite) && file.WriteChar('x') && file.Close() && GeFExist(NameOf(path)));
     EXPECT_EQ(fs::file_size(Verbatim(path)), 1u);
   }
 }
@@ -59,10 +58,8 @@ TEST(WindowsFiles, LieAsDeepAsTheSystemAllows)
 
 TEST(WindowsFiles, DrivesAreDirectories)
 {
-  EXPECT_TRUE(GeFExist("C:", true));
-  EXPECT_TRUE(GeFExist("C:\\", true));
-  EXPECT_FALSE(GeFExist("C:"));
-  EXPECT_FALSE(GeFExist("Q:", true));
+  EXPECT_TRUE(GeFExist("C:", true) && GeFExist("C:\\", true));
+  EXPECT_FALSE(GeFExist("C:") || GeFExist("Q:", true));
 }
 
 // Who may open a file that is open already: the modes are numbered from 0.
