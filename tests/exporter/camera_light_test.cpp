@@ -8,24 +8,18 @@ using namespace export_test;
 
 TEST(Camera, TakesItsApertureFromTheFilm)
 {
-  struct Case
-  {
-    const char* what;
-    AEGP_FilmSizeUnits units;
-    Real size; // pixels; 72 are 25.4 mm
-    Real aperture;
-  };
   // Behind 400 by 300 pixels a diagonal of 5 is 4 wide.
-  const Case cases[] = {{"horizontal", 1, 72, 25.4},
-                        {"vertical", 2, 54, 25.4},
-                        {"diagonal", 3, 90, 25.4},
-                        {"no units", 0, 72, 36},
-                        {"other units", 4, 72, 36},
-                        {"less than a millimetre", 1, 2.8, 36},
-                        {"a millimetre", 1, 2.9, 2.9 * 25.4 / 72},
-                        {"nothing", 3, 0, 36}};
-  for (const Case& c : cases)
-    EXPECT_NEAR(exporter::ApertureWidth(c.units, c.size, 400, 300), c.aperture, 1e-12) << c.what;
+  // size: pixels; 72 are 25.4 mm
+  const std::tuple<const char*, AEGP_FilmSizeUnits, Real, Real> cases[] = {{"horizontal", 1, 72, 25.4},
+                                                                           {"vertical", 2, 54, 25.4},
+                                                                           {"diagonal", 3, 90, 25.4},
+                                                                           {"no units", 0, 72, 36},
+                                                                           {"other units", 4, 72, 36},
+                                                                           {"less than a millimetre", 1, 2.8, 36},
+                                                                           {"a millimetre", 1, 2.9, 2.9 * 25.4 / 72},
+                                                                           {"nothing", 3, 0, 36}};
+  for (const auto& [what, units, size, aperture] : cases)
+    EXPECT_NEAR(exporter::ApertureWidth(units, size, 400, 300), aperture, 1e-12) << what;
 }
 
 TEST(Camera, HasProjectionViewFieldAndFocus)

@@ -17,8 +17,7 @@ struct ItemAnswers
   A_Err typeError;
   AEGP_ItemType type;
   A_Err compositionError;
-  bool hasComposition;
-  bool enables;
+  bool hasComposition, enables;
 };
 
 const ItemAnswers* answers;

@@ -20,8 +20,7 @@ void ExpectNear(const Vector& actual, const Vector& expected, const char* what)
 
 TEST(Transform, TurnsHostPixelsIntoSceneUnits)
 {
-  const Vector full(100, 100, 100);
-  const Vector none;
+  const Vector full(100, 100, 100), none;
   const TransformRules plane = {.width = 100, .height = 50, .useAnchor = true, .useScale = true};
   TransformRules turned = plane;
   turned.useRotation = true;

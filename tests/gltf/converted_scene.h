@@ -15,8 +15,7 @@ inline constexpr double kQuarter = 1.5707963267948966;
 
 struct KeyPoint
 {
-  double time;
-  double value;
+  double time, value;
   Long interpolation = kInterpolationLinear;
 };
 

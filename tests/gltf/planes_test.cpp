@@ -84,24 +84,17 @@ TEST_F(GltfPlanes, AreQuadsThatFaceTheViewer)
 
 TEST_F(GltfPlanes, HaveTheColourOfTheirMaterial)
 {
-  struct Case
-  {
-    const char* name;
-    Vector color;
-    Real brightness;
-    bool on;
-    std::vector<double> linear;
-  };
-  const Case cases[] = {{"plain", {1, 0.5, 0.04}, 1, true, {1, 0.214041140482, 0.003095975232, 1}},
-                        {"half", {1, 1, 1}, 0.5, true, {0.214041140482, 0.214041140482, 0.214041140482, 1}},
-                        {"bright", {1, 2, -3}, 5, true, {1, 1, 0, 1}},
-                        {"off", {1, 1, 1}, 1, false, {0, 0, 0, 1}}};
-  for (const Case& c : cases) {
-    Material* material = AddMaterial(c.name, c.color);
-    material->SetParameterById(2101, c.brightness);
-    material->SwitchChannel(0, c.on ? 1 : 0);
+  const std::tuple<const char*, Vector, Real, bool, std::vector<double>> cases[] = {
+      {"plain", {1, 0.5, 0.04}, 1, true, {1, 0.214041140482, 0.003095975232, 1}},
+      {"half", {1, 1, 1}, 0.5, true, {0.214041140482, 0.214041140482, 0.214041140482, 1}},
+      {"bright", {1, 2, -3}, 5, true, {1, 1, 0, 1}},
+      {"off", {1, 1, 1}, 1, false, {0, 0, 0, 1}}};
+  for (const auto& [name, color, brightness, on, linear] : cases) {
+    Material* material = AddMaterial(name, color);
+    material->SetParameterById(2101, brightness);
+    material->SwitchChannel(0, on ? 1 : 0);
     material->SwitchChannel(8, 1);
-    AddPlane(c.name, 1, 1, material);
+    AddPlane(name, 1, 1, material);
   }
   AddMaterial("not used", {1, 1, 1});
   Material* many = AddMaterial("many", {1, 1, 1});
@@ -209,8 +202,7 @@ TEST_F(GltfPlanes, BlendPicturesThatLetThrough)
 
 TEST_F(GltfPlanes, ShowTheColourAloneWherePicturesFail)
 {
-  const Bytes png = Png(6);
-  const Bytes jpeg = Jpeg();
+  const Bytes png = Png(6), jpeg = Jpeg();
   Write("cut.png", Bytes(png.begin(), png.end() - 13));
   Write("header.png", Bytes(png.begin(), png.begin() + 20));
   Write("none.png", Png(6, false, 0));

@@ -18,30 +18,23 @@ host::Project LoadText(const std::string& text)
 
 TEST(CompositionSettings, GiveTheExactFrameDuration)
 {
-  struct Case
-  {
-    const char* rate;
-    A_long value;
-    A_u_long scale;
-  };
-  const Case cases[] = {
+  const std::tuple<const char*, A_long, A_u_long> cases[] = {
       {"25", 1, 25},          {"30.0000005", 1, 30},        {"1", 1, 1},
       {"999", 1, 999},        {"23.976", 1001, 24000},      {"29.97", 1001, 30000},
       {"59.94", 1001, 60000}, {"29.97002997", 1001, 30000}, {"12.5", 1000, 12500},
       {"29.9", 1000, 29900},  {"0.5", 1000, 500},           {"0.999", 1001, 1000},
       {"0.00001", 1000, 1},   {"30.00001", 1000, 30000},
   };
-  for (const Case& c : cases) {
-    SCOPED_TRACE(c.rate);
-    const Stage stage(
-        LoadText(std::string(R"({"w": 1, "h": 1, "ip": 0, "op": 9, "layers": [], "fr": )") + c.rate + "}"));
+  for (const auto& [text, value, scale] : cases) {
+    SCOPED_TRACE(text);
+    const Stage stage(LoadText(std::string(R"({"w": 1, "h": 1, "ip": 0, "op": 9, "layers": [], "fr": )") + text + "}"));
     A_Time duration{};
     A_FpLong rate = 0;
     EXPECT_EQ(0, stage.comps->AEGP_GetCompFrameDuration(stage.ActiveComp(), &duration));
     EXPECT_EQ(0, stage.comps->AEGP_GetCompFramerate(stage.ActiveComp(), &rate));
-    EXPECT_EQ(c.value, duration.value);
-    EXPECT_EQ(c.scale, duration.scale);
-    EXPECT_EQ(std::stod(c.rate), rate);
+    EXPECT_EQ(value, duration.value);
+    EXPECT_EQ(scale, duration.scale);
+    EXPECT_EQ(std::stod(text), rate);
   }
 }
 
@@ -54,31 +47,26 @@ TEST(CompositionSettings, GiveTheWorkAreaAndPixelAspectOfEachComposition)
   Stage stage(LoadText(std::string(R"({"w": 9, "h": 9, "fr": 29.97, "ip": 1.5, "op": 60, "layers": [],
       "ae": {"workArea": [10, 20]}, )") +
                        assets + "}"));
-  struct Case
-  {
-    const char* composition;
-    A_long start, duration;
-    A_Ratio aspect;
-  };
-  const Case cases[] = {{"orbit", 10 * 1001, 10 * 1001, {1, 1}},
-                        {"a", -3 * 1001, 9 * 1001, {10, 11}},
-                        {"Inner", 2 * 1001, 58 * 1001, {1, 1}}, // that of the root's frames
-                        {"b", 2 * 1001, 58 * 1001, {1, 1}},
-                        {"c", 8 * 1001, 0, {1, 1}}};
-  for (const Case& c : cases) {
-    SCOPED_TRACE(c.composition);
-    ASSERT_TRUE(stage.host.ActivateComposition(c.composition));
+  const std::tuple<const char*, A_long, A_long, A_Ratio> cases[] = {
+      {"orbit", 10 * 1001, 10 * 1001, {1, 1}},
+      {"a", -3 * 1001, 9 * 1001, {10, 11}},
+      {"Inner", 2 * 1001, 58 * 1001, {1, 1}}, // that of the root's frames
+      {"b", 2 * 1001, 58 * 1001, {1, 1}},
+      {"c", 8 * 1001, 0, {1, 1}}};
+  for (const auto& [composition, wantedStart, wantedDuration, wantedAspect] : cases) {
+    SCOPED_TRACE(composition);
+    ASSERT_TRUE(stage.host.ActivateComposition(composition));
     A_Time start{}, duration{};
     A_Ratio aspect{};
     EXPECT_EQ(0, stage.comps->AEGP_GetCompWorkAreaStart(stage.ActiveComp(), &start));
     EXPECT_EQ(0, stage.comps->AEGP_GetCompWorkAreaDuration(stage.ActiveComp(), &duration));
     EXPECT_EQ(0, stage.items->AEGP_GetItemPixelAspectRatio(stage.ActiveItem(), &aspect));
-    EXPECT_EQ(c.start, start.value);
+    EXPECT_EQ(wantedStart, start.value);
     EXPECT_EQ(30000u, start.scale);
-    EXPECT_EQ(c.duration, duration.value);
+    EXPECT_EQ(wantedDuration, duration.value);
     EXPECT_EQ(30000u, duration.scale);
-    EXPECT_EQ(c.aspect.num, aspect.num);
-    EXPECT_EQ(c.aspect.den, aspect.den);
+    EXPECT_EQ(wantedAspect.num, aspect.num);
+    EXPECT_EQ(wantedAspect.den, aspect.den);
   }
   EXPECT_FALSE(stage.host.ActivateComposition("nowhere") || stage.host.ActivateComposition(""));
 }
@@ -194,13 +182,8 @@ TEST(ProjectItems, AnswerThroughTheSuites)
 
 TEST(Layers, HaveTheirKindFlagsAndPlaceInTheList)
 {
-  struct Case
-  {
-    const char* layer;
-    AEGP_ObjectType type;
-    AEGP_LayerFlags flags; // 0x800 stands for 3D
-  };
-  const Case cases[] = {
+  // 0x800 stands for 3D.
+  const std::tuple<const char*, AEGP_ObjectType, AEGP_LayerFlags> cases[] = {
       {R"({"ty": 0, "ddd": 1})", 0, 0x801},
       {R"({"ty": 1, "hd": true})", 0, 0},
       {R"({"ty": 2, "hd": false, "ddd": 0})", 0, 1},
@@ -221,18 +204,18 @@ TEST(Layers, HaveTheirKindFlagsAndPlaceInTheList)
       {R"({"ty": 7, "ddd": 1})", -1, 1},
       {R"({"ddd": 1})", -1, 1},
   };
-  for (const Case& c : cases) {
-    SCOPED_TRACE(c.layer);
-    const Stage stage(c.layer);
+  for (const auto& [layer, wantedType, wantedFlags] : cases) {
+    SCOPED_TRACE(layer);
+    const Stage stage(layer);
     AEGP_ObjectType type = -7;
     AEGP_LayerFlags flags = -7;
     A_Boolean is3D = 7;
     EXPECT_EQ(0, stage.layers->AEGP_GetLayerObjectType(stage.Layer(0), &type));
     EXPECT_EQ(0, stage.layers->AEGP_GetLayerFlags(stage.Layer(0), &flags));
     EXPECT_EQ(0, stage.layers->AEGP_IsLayer3D(stage.Layer(0), &is3D));
-    EXPECT_EQ(c.type, type);
-    EXPECT_EQ(c.flags, flags);
-    EXPECT_EQ((c.flags & 0x800) != 0, is3D);
+    EXPECT_EQ(wantedType, type);
+    EXPECT_EQ(wantedFlags, flags);
+    EXPECT_EQ((wantedFlags & 0x800) != 0, is3D);
   }
 }
 
@@ -305,12 +288,7 @@ TEST(Layers, AnswerForCamerasAndLightsAlone)
 TEST(Streams, AreLegalByTheKindOfLayer)
 {
   using Ids = std::vector<AEGP_LayerStream>;
-  struct Case
-  {
-    const char* layer;
-    Ids legal;
-  };
-  const Case cases[] = {
+  const std::pair<const char*, Ids> cases[] = {
       {R"({"ty": 1})", {0, 1, 2, 3}},
       {R"({"ty": 2, "ddd": 1})", {0, 1, 2, 3, 8, 9, 10}},
       {R"({"ty": 6, "ddd": 1})", {0, 1, 2, 3}},
@@ -325,9 +303,9 @@ TEST(Streams, AreLegalByTheKindOfLayer)
       {R"({"ty": 14, "light": {"type": "spot"}})", {1, 3, 8, 9, 10, 16, 17, 18, 19, 20, 28}},
       {R"({"ty": 14, "light": {"type": "ambient"}, "ks": {"a": {"k": 0}}})", {16, 17}},
   };
-  for (const Case& c : cases) {
-    SCOPED_TRACE(c.layer);
-    Stage stage(c.layer);
+  for (const auto& [layer, wanted] : cases) {
+    SCOPED_TRACE(layer);
+    Stage stage(layer);
     const auto* older = stage::Acquire<AEGP_StreamSuite7>(stage.host, "AEGP Stream Suite", 7);
     Ids legal, gettable;
     for (AEGP_LayerStream id = -1; id < 40; ++id) {
@@ -340,20 +318,13 @@ TEST(Streams, AreLegalByTheKindOfLayer)
       if (stage.Stream(0, id))
         gettable.push_back(id);
     }
-    EXPECT_EQ(c.legal, legal);
-    EXPECT_EQ(c.legal, gettable);
+    EXPECT_EQ(wanted, legal);
+    EXPECT_EQ(wanted, gettable);
   }
 }
 
 TEST(Streams, ReadTheirPlaceOrTheirDefault)
 {
-  struct Case
-  {
-    const char* layer;
-    AEGP_LayerStream stream;
-    host::Value expected;
-    AEGP_StreamType type;
-  };
   const char* const solid = R"({"ty": 1, "ddd": 1, "ks": {"a": {"k": [1, 2]}, "s": {"k": [50]}, "r": {"k": 30},
                                "rx": {"k": [40]}, "ry": {"k": 50}, "or": {"k": [5, 6, 7]}}})";
   const char* const spot = R"({"ty": 14, "light": {"type": "spot", "intensity": {"k": 70}, "color": {"k": [1, 0.5]},
@@ -361,7 +332,7 @@ TEST(Streams, ReadTheirPlaceOrTheirDefault)
                               "shadowDarkness": {"k": 30}}})";
   const char* const plainSpot = R"({"ty": 14, "light": {"type": "spot"}})";
   const char* const zooming = R"({"ty": 13, "pe": {"k": [{"t": 5, "s": [800]}, {"t": 9, "s": [400]}]}})";
-  const Case cases[] = {
+  const std::tuple<const char*, AEGP_LayerStream, host::Value, AEGP_StreamType> cases[] = {
       {solid, 0, {1, 2, 0}, 1},
       {solid, 1, {0, 0, 0}, 1},
       {solid, 2, {50, 100, 100}, 2},
@@ -389,13 +360,13 @@ TEST(Streams, ReadTheirPlaceOrTheirDefault)
       {plainSpot, 28, {0}, 5},
       {plainSpot, 20, {100}, 5},
   };
-  for (const Case& c : cases) {
-    SCOPED_TRACE(std::string(c.layer) + " stream " + std::to_string(c.stream));
-    const Stage stage(c.layer);
-    EXPECT_EQ(c.expected, stage.ValueAt(0, c.stream, {20, 25}));
+  for (const auto& [layer, stream, expected, wantedType] : cases) {
+    SCOPED_TRACE(std::string(layer) + " stream " + std::to_string(stream));
+    const Stage stage(layer);
+    EXPECT_EQ(expected, stage.ValueAt(0, stream, {20, 25}));
     AEGP_StreamType type = 0;
-    EXPECT_EQ(0, stage.streams->AEGP_GetStreamType(stage.Stream(0, c.stream), &type));
-    EXPECT_EQ(c.type, type);
+    EXPECT_EQ(0, stage.streams->AEGP_GetStreamType(stage.Stream(0, stream), &type));
+    EXPECT_EQ(wantedType, type);
   }
 }
 

@@ -49,9 +49,7 @@ class Data
 // A chunk, or a list when it has a kind.
 struct Node
 {
-  std::string id;
-  std::string data;
-  std::string kind = {};
+  std::string id, data, kind = {};
   std::vector<Node> children = {};
 };
 

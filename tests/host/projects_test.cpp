@@ -25,12 +25,6 @@ TEST(ProjectForms, GiveTheSameCompositions)
 
 TEST(ProjectCompositions, StateTheirTimesExactly)
 {
-  struct Case
-  {
-    Comp comp;
-    A_Time frame, start, duration;
-    double rate;
-  };
   Comp television{.ticksPerFrame = 800, .ticksPerSecond = 23976, .rate = 29, .rateFraction = 63570};
   television.duration[0] = 2894 * 800;
   television.duration[1] = 23976;
@@ -42,24 +36,25 @@ TEST(ProjectCompositions, StateTheirTimesExactly)
   Comp between{}; // on no frame
   between.areaStart[0] = 1;
   between.areaStart[1] = 50;
-  const Case cases[] = {{Comp{}, {1, 25}, {0, 25}, {250, 25}, 25},
-                        {television, {100, 2997}, {0, 2997}, {289400, 2997}, 29.970001220703125},
-                        {cut, {100, 2997}, {1000, 2997}, {3000, 2997}, 29.970001220703125},
-                        {between, {1, 25}, {1, 50}, {499, 50}, 25}};
-  for (const Case& c : cases) {
-    const Stage stage(Read(c.comp));
+  const std::tuple<Comp, A_Time, A_Time, A_Time, double> cases[] = {
+      {Comp{}, {1, 25}, {0, 25}, {250, 25}, 25},
+      {television, {100, 2997}, {0, 2997}, {289400, 2997}, 29.970001220703125},
+      {cut, {100, 2997}, {1000, 2997}, {3000, 2997}, 29.970001220703125},
+      {between, {1, 25}, {1, 50}, {499, 50}, 25}};
+  for (const auto& [comp, wantedFrame, wantedStart, wantedDuration, wantedRate] : cases) {
+    const Stage stage(Read(comp));
     A_Time frame{}, start{}, duration{};
     A_FpLong rate = 0;
     EXPECT_EQ(0, stage.comps->AEGP_GetCompFrameDuration(stage.ActiveComp(), &frame));
     EXPECT_EQ(0, stage.comps->AEGP_GetCompWorkAreaStart(stage.ActiveComp(), &start));
     EXPECT_EQ(0, stage.comps->AEGP_GetCompWorkAreaDuration(stage.ActiveComp(), &duration));
     EXPECT_EQ(0, stage.comps->AEGP_GetCompFramerate(stage.ActiveComp(), &rate));
-    const std::pair<A_Time, A_Time> times[] = {{c.frame, frame}, {c.start, start}, {c.duration, duration}};
+    const std::pair<A_Time, A_Time> times[] = {{wantedFrame, frame}, {wantedStart, start}, {wantedDuration, duration}};
     for (const auto& [expected, actual] : times) {
       EXPECT_EQ(expected.value, actual.value);
       EXPECT_EQ(expected.scale, actual.scale);
     }
-    EXPECT_EQ(c.rate, rate);
+    EXPECT_EQ(wantedRate, rate);
   }
 }
 
@@ -187,14 +182,7 @@ TEST(ProjectFootage, KeepsPathsCountsAndColours)
 {
   const Data sequence = Settings(64, 48).U32(172, 7).U32(176, 106).U32(180, 4);
   const Data unknown = Settings(64, 48).U32(172, 0xFFFFFFFF).U32(176, 0xFFFFFFFF);
-  struct Case
-  {
-    Node item;
-    const char* name;
-    const char* path;
-    A_long files;
-  };
-  const Case cases[] = {
+  const std::tuple<Node, const char*, const char*, A_long> cases[] = {
       {Footage(60, "/Users/me/Sky.png", false, Settings(64, 48)), "Sky.png", "/Users/me/Sky.png", 1},
       {Footage(60, "C:\\Shots\\Sky.png", false, Settings(64, 48), {}, "Mine"), "Mine", "C:\\Shots\\Sky.png", 1},
       {Footage(60, "D:\\Seq", true, sequence, {Utf8("leaf_"), Utf8(".png")}), "leaf_0007.png", "D:\\Seq\\leaf_0007.png",
@@ -207,13 +195,13 @@ TEST(ProjectFootage, KeepsPathsCountsAndColours)
        "Later", "", 1},
       {Solid(60, "W\xE4nde", 64, 48, kGrey), "W\xC3\xA4nde", "", 1}, // Windows-1252
   };
-  for (const Case& c : cases) {
-    SCOPED_TRACE(c.path);
-    const host::Project project = Read(WithLayers({MakeLayer({.source = 60})}), {c.item});
+  for (const auto& [footage, name, path, files] : cases) {
+    SCOPED_TRACE(path);
+    const host::Project project = Read(WithLayers({MakeLayer({.source = 60})}), {footage});
     const host::Item& item = *project.root->layers[0]->source;
-    EXPECT_EQ(c.name, item.name);
-    EXPECT_EQ(c.path, item.path);
-    EXPECT_EQ(c.files, item.files);
+    EXPECT_EQ(name, item.name);
+    EXPECT_EQ(path, item.path);
+    EXPECT_EQ(files, item.files);
     EXPECT_EQ(64, item.width);
     EXPECT_EQ(48, item.height);
     EXPECT_TRUE(project.warnings.empty());
@@ -340,30 +328,26 @@ TEST(ProjectKeyframes, EaseEachComponentByItsOwnSpeed)
 
 TEST(ProjectKeyframes, CountTimeFromTheLayersStart)
 {
-  struct Case
-  {
-    Layer layer;
-    double frame, value; // keyframes at -0.5 s and 1.5 s of layer time, 10 and 50
-  };
   const std::vector<std::string> keys = {PlainKey(-12800, kLinear, kLinear, {10}, {{}}),
                                          PlainKey(38400, kLinear, kLinear, {50}, {{}})};
-  const Case cases[] = {{{}, -12.5, 10},
-                        {{}, 12.5, 30},
-                        {{.start = {-1, 2}}, 0, 30 - 10 + 0.0 + 0},
-                        {{.start = {1, 3}}, 25.0 / 3 + 37.5, 50},
-                        {{.start = {1, 3}}, 25.0 / 3, 20},
-                        {{.stretch = {2, 1}}, 25, 30},
-                        {{.stretch = {1, 3}, .start = {2, 1}}, 50 + 12.5 / 3, 30},
-                        {{.stretch = {-1, 1}, .start = {2, 1}}, 50 - 12.5, 30}};
-  for (const Case& c : cases) {
-    const double start = static_cast<double>(c.layer.start[0]) / static_cast<double>(c.layer.start[1]);
-    const double stretch = static_cast<double>(c.layer.stretch[0]) / static_cast<double>(c.layer.stretch[1]);
-    const double layerTime = (c.frame / 25 - start) / stretch;
+  // Keyframes at -0.5 s and 1.5 s of layer time, 10 and 50
+  const std::tuple<Layer, double, double> cases[] = {{{}, -12.5, 10},
+                                                     {{}, 12.5, 30},
+                                                     {{.start = {-1, 2}}, 0, 30 - 10 + 0.0 + 0},
+                                                     {{.start = {1, 3}}, 25.0 / 3 + 37.5, 50},
+                                                     {{.start = {1, 3}}, 25.0 / 3, 20},
+                                                     {{.stretch = {2, 1}}, 25, 30},
+                                                     {{.stretch = {1, 3}, .start = {2, 1}}, 50 + 12.5 / 3, 30},
+                                                     {{.stretch = {-1, 1}, .start = {2, 1}}, 50 - 12.5, 30}};
+  for (const auto& [layer, frame, value] : cases) {
+    const double start = static_cast<double>(layer.start[0]) / static_cast<double>(layer.start[1]);
+    const double stretch = static_cast<double>(layer.stretch[0]) / static_cast<double>(layer.stretch[1]);
+    const double layerTime = (frame / 25 - start) / stretch;
     const double expected = 10 + 40 * std::clamp((layerTime + 0.5) / 2, 0.0, 1.0);
-    const host::Project project = Read(WithProperty("ADBE Rotate X", Body({.keys = keys}), c.layer), {kSolid});
+    const host::Project project = Read(WithProperty("ADBE Rotate X", Body({.keys = keys}), layer), {kSolid});
     const auto& property =
         project.layers[0].streams[host::StreamIndex(*host::FindStreamInfo(AEGP_LayerStream_ROTATE_X))];
-    EXPECT_NEAR(expected, property->At(c.frame)[0], 1e-9) << c.frame;
+    EXPECT_NEAR(expected, property->At(frame)[0], 1e-9) << frame;
   }
   // A hold switches exactly at its frame, whichever way the layer runs, in frames of 100/2997 s.
   Comp television{.ticksPerFrame = 800, .ticksPerSecond = 23976, .rate = 29, .rateFraction = 63570};

@@ -195,13 +195,7 @@ TEST(PropertyValue, IsFoundInAnyOrderOfFrames)
 
 TEST(PropertyState, CountsKeysAndTellsWhatVaries)
 {
-  struct Case
-  {
-    const char* position;
-    A_long keys;
-    bool varies, hasExpression;
-  };
-  const Case cases[] = {
+  const std::tuple<const char*, A_long, bool, bool> cases[] = {
       {R"({"k": [1, 2, 3]})", 0, false, false},
       {R"({"k": [{"t": 0, "s": [1, 2]}]})", 1, false, false},
       {R"({"k": [{"t": 0, "s": [1]}, {"t": 9, "s": [1]}]})", 2, true, false},
@@ -212,18 +206,18 @@ TEST(PropertyState, CountsKeysAndTellsWhatVaries)
       {R"({"s": true, "x": {"k": 1}, "y": {"k": [{"t": 0, "s": 1}, {"t": 1, "s": 1}]}, "z": {"k": 0, "x": "t"}})", 2,
        true, true},
   };
-  for (const Case& c : cases) {
-    SCOPED_TRACE(c.position);
-    const Stage stage = WithPosition(c.position);
+  for (const auto& [position, wantedKeys, isVarying, hasExpression] : cases) {
+    SCOPED_TRACE(position);
+    const Stage stage = WithPosition(position);
     const AEGP_StreamRefH stream = stage.Stream(0, AEGP_LayerStream_POSITION);
     A_long keys = -1;
     A_Boolean varies = 2, isOn = 2;
     EXPECT_EQ(0, stage.keyframes->AEGP_GetStreamNumKFs(stream, &keys));
     EXPECT_EQ(0, stage.streams->AEGP_IsStreamTimevarying(stream, &varies));
     EXPECT_EQ(0, stage.streams->AEGP_GetExpressionState(0, stream, &isOn));
-    EXPECT_EQ(c.keys, keys);
-    EXPECT_EQ(c.varies, varies);
-    EXPECT_EQ(c.hasExpression, isOn);
+    EXPECT_EQ(wantedKeys, keys);
+    EXPECT_EQ(isVarying, varies);
+    EXPECT_EQ(hasExpression, isOn);
   }
 }
 

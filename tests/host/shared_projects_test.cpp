@@ -156,23 +156,20 @@ void ExpectSameMovement(const host::Project& project, const host::Project& expor
 
 TEST(SharedProjects, MoveAsWhatWasExportedFromThem)
 {
-  const struct
-  {
-    const char *file, *exported, *composition;
-  } pairs[] = {{"HamburgerArrow.aep", "HamburgerArrow.json", "HamburgerArrow"},
-               {"MatteTimeStretch.aep", "MatteTimeStretch--Line.json", "Line"},
-               {"MatteTimeStretch.aep", "MatteTimeStretch--Scan.json", "Scan"},
-               {"MoveMultiple.aep", "MoveMultiple.json", "Main"}};
-  if (SharedFile(pairs[0].file).empty())
+  const std::string cases[][3] = {{"HamburgerArrow.aep", "HamburgerArrow.json", "HamburgerArrow"},
+                                  {"MatteTimeStretch.aep", "MatteTimeStretch--Line.json", "Line"},
+                                  {"MatteTimeStretch.aep", "MatteTimeStretch--Scan.json", "Scan"},
+                                  {"MoveMultiple.aep", "MoveMultiple.json", "Main"}};
+  if (SharedFile(cases[0][0]).empty())
     GTEST_SKIP() << "the shared projects are not here";
-  for (const auto& pair : pairs) {
-    SCOPED_TRACE(pair.exported);
-    const auto project = host::OpenProjectFile(SharedFile(pair.file));
+  for (const auto& [file, json, composition] : cases) {
+    SCOPED_TRACE(json);
+    const auto project = host::OpenProjectFile(SharedFile(file));
     const auto list = project->Compositions();
     const auto found =
-        std::find_if(list.begin(), list.end(), [&](const auto& c) { return c.name == pair.composition; });
+        std::find_if(list.begin(), list.end(), [&name = composition](const auto& c) { return c.name == name; });
     const host::Project read = project->Read(static_cast<std::size_t>(found - list.begin()));
-    const host::Project exported = host::LoadComposition(SharedFile(pair.exported));
+    const host::Project exported = host::LoadComposition(SharedFile(json));
     EXPECT_EQ(exported.root->layers.size(), read.root->layers.size());
     EXPECT_EQ(exported.root->item->width, read.root->item->width);
     EXPECT_EQ(exported.root->frameRate, read.root->frameRate);

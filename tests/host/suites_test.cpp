@@ -12,13 +12,7 @@ constexpr const char* kTwoLayers = R"({"ty": 13, "nm": "Eye", "pe": {"k": 400}},
 
 TEST(SuiteTables, HoldTheirOperationsInTheHostsSlots)
 {
-  const struct
-  {
-    const char* name;
-    std::int32_t version;
-    std::size_t slots;
-    std::vector<std::size_t> used;
-  } cases[] = {
+  const std::tuple<const char*, std::int32_t, std::size_t, std::vector<std::size_t>> cases[] = {
       {"AEGP Command Suite", 1, 8, {0, 1, 4, 5}},
       {"AEGP Register Suite", 6, 12, {0, 1}},
       {"AEGP Utility Suite", 11, 31, {0, 8, 27}},
@@ -34,17 +28,17 @@ TEST(SuiteTables, HoldTheirOperationsInTheHostsSlots)
       {"AEGP Light Suite", 2, 2, {0}},
   };
   Stage stage(kTwoLayers);
-  for (const auto& c : cases) {
-    SCOPED_TRACE(c.name);
-    const auto* table = stage::Acquire<const void*>(stage.host, c.name, c.version);
+  for (const auto& [name, version, slots, wanted] : cases) {
+    SCOPED_TRACE(name);
+    const auto* table = stage::Acquire<const void*>(stage.host, name, version);
     ASSERT_NE(nullptr, table);
     std::vector<std::size_t> used;
-    for (std::size_t slot = 0; slot < c.slots; ++slot)
+    for (std::size_t slot = 0; slot < slots; ++slot)
       if (table[slot])
         used.push_back(slot);
-    EXPECT_EQ(c.used, used);
+    EXPECT_EQ(wanted, used);
     const void* other = table;
-    EXPECT_NE(0, stage.host.Basic()->AcquireSuite(c.name, c.version + 100, &other));
+    EXPECT_NE(0, stage.host.Basic()->AcquireSuite(name, version + 100, &other));
     EXPECT_EQ(nullptr, other);
   }
 }

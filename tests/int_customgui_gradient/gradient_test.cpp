@@ -101,22 +101,19 @@ TEST(Gradient, GivesAndTakesItsPartsByPath)
   GradientData gradient;
   AddKnots(gradient, {{0.5, 0.25, {1, 2, 3}, 0.75, 3}, {0, 0, kBlack, 1, 3}});
   constexpr Long kAlpha = 1000000000;
-  struct Case
-  {
-    ParameterPath path;
-    double value; // of the knot of id 3, and then set to one more
-  };
-  const Case answered[] = {{1000, 0}, {10301, 0.75}, {10302, 0.5}, {10303, 0.25}, {{{10300}, {1001}}, 2}};
+  // Of the knot of id 3, and then set to one more.
+  const std::pair<ParameterPath, double> answered[] = {
+      {1000, 0}, {10301, 0.75}, {10302, 0.5}, {10303, 0.25}, {{{10300}, {1001}}, 2}};
   const ParameterPath refused[] = {999,    9999,          10304,          10399,     10400, {{10300}, {1003}},
                                    kAlpha, kAlpha + 1000, kAlpha + 10301, kAlpha + 5};
   GeData value;
-  for (const Case& c : answered) {
+  for (const auto& [path, number] : answered) {
     ULong flags = 0;
-    EXPECT_TRUE(gradient.GetGradientValue(c.path, value, flags));
+    EXPECT_TRUE(gradient.GetGradientValue(path, value, flags));
     EXPECT_EQ(flags, 2U);
-    EXPECT_EQ(value.GetReal(), c.value) << c.path[0].id;
-    EXPECT_TRUE(gradient.SetParameter(c.path, GeData(c.value + 1)) && gradient.GetParameter(c.path, value));
-    EXPECT_EQ(value.GetReal(), c.value + 1) << c.path[0].id;
+    EXPECT_EQ(value.GetReal(), number) << path[0].id;
+    EXPECT_TRUE(gradient.SetParameter(path, GeData(number + 1)) && gradient.GetParameter(path, value));
+    EXPECT_EQ(value.GetReal(), number + 1) << path[0].id;
   }
   EXPECT_TRUE(gradient.GetParameter(10300, value) && value.GetVector() == Vector(1, 3, 3));
   const GeData before(kCustomGradient, gradient);

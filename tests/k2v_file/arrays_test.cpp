@@ -72,8 +72,7 @@ TEST(DynArray, MovesInFrontOfTheElementAtTheTarget)
 
 TEST(DynArray, StaysAsItWasWhenMemoryRunsOut)
 {
-  LongArray array(4);
-  LongArray copy;
+  LongArray array(4), copy;
   Fill(array, 4);
   counting_memory::FailAfter(0);
   EXPECT_FALSE(array.Append(5) || array.Insert(0, 5) || array.SetCount(5) || array.CopyTo(copy));
@@ -225,13 +224,10 @@ std::vector<int> Numbers(const GeTempPublicList2D<Node>& list)
 
 TEST(List, KeepsBothDirectionsInStepThroughEveryChange)
 {
-  Node a(1);
-  Node b(2);
-  Node outside(3);
+  Node a(1), b(2), outside(3);
   EXPECT_EQ(a.GetNext(), nullptr);
   {
-    GeTempPublicList2D<Node> list;
-    GeTempPublicList2D<Node> other;
+    GeTempPublicList2D<Node> list, other;
     EXPECT_TRUE(list.IsEmpty());
     EXPECT_EQ(list.GetFirst(), nullptr);
     list.InsertLast(&a);

@@ -109,8 +109,7 @@ TEST(BaseContainer, CountsOnlyWhatChangesAValue)
 
 TEST(BaseContainer, TakesValuesThatLieInItself)
 {
-  BaseContainer container;
-  BaseContainer inner(3);
+  BaseContainer container, inner(3);
   inner.SetString(1, String("deep"));
   inner.SetContainer(2, BaseContainer(4));
   container.SetContainer(5, inner);
@@ -179,11 +178,7 @@ TEST(BaseContainer, WalksAParameterPath)
   container.SetContainer(2, group);
   container.SetLong(3, 30);
   container.SetVector(4, Vector(7, 8, 9));
-  struct Case
-  {
-    ParameterPath path;
-    GeData value;
-  } cases[] = {
+  const std::pair<ParameterPath, GeData> cases[] = {
       {ParameterPath(3), GeData(30)},
       {ParameterPath(99), GeData()},
       {ParameterPath({2, 5, 0}, {3, 15, 0}), GeData(33)},
@@ -195,10 +190,10 @@ TEST(BaseContainer, WalksAParameterPath)
       {ParameterPath({3, 15, 0}, {4, 19, 0}), GeData(30)},
       {ParameterPath({2, 5, 0}, {4, 15, 0}, {1, 15, 0}), GeData(group)}, // back to the first level's id
   };
-  for (const Case& one : cases) {
+  for (const auto& [path, wanted] : cases) {
     GeData value(12345);
-    EXPECT_TRUE(container.GetParameter(one.path, value));
-    EXPECT_TRUE(value.IsEqual(one.value)) << one.path[0].id << " " << one.path[1].id;
+    EXPECT_TRUE(container.GetParameter(path, value));
+    EXPECT_TRUE(value.IsEqual(wanted)) << path[0].id << " " << path[1].id;
   }
   GeData value;
   EXPECT_FALSE(container.GetParameter(ParameterPath(), value));
@@ -313,12 +308,7 @@ TEST(ParameterPathTest, WritesItsLevelsAndReadsThoseOfOlderFiles)
   EXPECT_EQ(ToHex(WriteToMemory([&](HyperFile& file) { path.Write(file); })),
             "01 00 00 00 01 00 00 00 02 0F 00 00 00 02 0F 00 00 03 87 0F 00 00 00 17 0F 00 00 00 00 "
             "0F 00 00 03 E8 0F 00 00 00 13 0F 00 00 00 05 02");
-  struct Case
-  {
-    ByteWriter body;
-    bool read;
-    std::vector<ParameterLevel> levels;
-  } cases[] = {
+  const std::tuple<ByteWriter, bool, std::vector<ParameterLevel>> cases[] = {
       {ByteWriter().Start(1, 0).End(), true, {}},
       {ByteWriter().Start(1, 1).Long(1).Long(3).Long(19).End(), true, {{3, 19, 0}}},
       {ByteWriter().Start(1, 3).Long(1).Long(3).Long(19).Long(8).String(u"new").End(), true, {{3, 19, 8}}},
@@ -327,14 +317,14 @@ TEST(ParameterPathTest, WritesItsLevelsAndReadsThoseOfOlderFiles)
       {ByteWriter().Start(2, 2).Long(0).End(), false, {}},
       {ByteWriter().Start(1, -1).End(), false, {}},
   };
-  for (const Case& one : cases) {
-    MemoryReadFile source(ByteWriter().Header().Append(one.body.bytes).bytes);
+  for (const auto& [body, isRead, levels] : cases) {
+    MemoryReadFile source(ByteWriter().Header().Append(body.bytes).bytes);
     ParameterPath read(5);
-    EXPECT_EQ(read.Read(source.file), one.read) << ToHex(one.body.bytes);
-    if (one.read) {
-      ASSERT_EQ(read.GetStoredCount(), static_cast<Long>(one.levels.size()));
-      for (std::size_t i = 0; i < one.levels.size(); ++i)
-        EXPECT_EQ(read[static_cast<Long>(i)], one.levels[i]);
+    EXPECT_EQ(read.Read(source.file), isRead) << ToHex(body.bytes);
+    if (isRead) {
+      ASSERT_EQ(read.GetStoredCount(), static_cast<Long>(levels.size()));
+      for (std::size_t i = 0; i < levels.size(); ++i)
+        EXPECT_EQ(read[static_cast<Long>(i)], levels[i]);
       EXPECT_EQ(source.file.GetPosition(), source.file.GetLength());
     }
   }

@@ -82,13 +82,8 @@ class BaseFileTest : public testing::Test
 
 TEST_F(BaseFileTest, NumbersTakeTheBytesOfTheFileOrder)
 {
-  const struct
-  {
-    std::function<Bool(BaseFile&)> write;
-    std::function<Bool(BaseFile&)> readsBack;
-    const char* big;
-    const char* little;
-  } kCases[] = {
+  using Act = std::function<Bool(BaseFile&)>;
+  const std::tuple<Act, Act, const char*, const char*> kCases[] = {
 #define NUMBER(Type, value, big, little)                                                                               \
   {[](BaseFile& f) { return f.Write##Type(value); },                                                                   \
    [](BaseFile& f) {                                                                                                   \
@@ -108,15 +103,15 @@ TEST_F(BaseFileTest, NumbersTakeTheBytesOfTheFileOrder)
       NUMBER(Real, 0.15625, "3F C4 00 00 00 00 00 00", "00 00 00 00 00 00 C4 3F"),
 #undef NUMBER
   };
-  for (const auto& number : kCases) {
+  for (const auto& [write, readsBack, big, little] : kCases) {
     for (Long order : {kByteOrderBig, kByteOrderLittle}) {
       const Filename name((folder / "number").c_str());
       BaseFile file;
-      ASSERT_TRUE(file.Open(name, kFileWrite, false, order) && number.write(file) && file.Close());
-      EXPECT_EQ(ToHex(ReadWholeFile(folder / "number")), order == kByteOrderBig ? number.big : number.little);
+      ASSERT_TRUE(file.Open(name, kFileWrite, false, order) && write(file) && file.Close());
+      EXPECT_EQ(ToHex(ReadWholeFile(folder / "number")), order == kByteOrderBig ? big : little);
       ASSERT_TRUE(file.Open(name, kFileRead, false, order));
-      EXPECT_TRUE(number.readsBack(file)) << number.big;
-      EXPECT_FALSE(number.readsBack(file)) << "a number past the end";
+      EXPECT_TRUE(readsBack(file)) << big;
+      EXPECT_FALSE(readsBack(file)) << "a number past the end";
       EXPECT_EQ(file.GetError(), FILEERROR_READ);
     }
   }
@@ -293,40 +288,36 @@ TEST_F(BaseFileTest, AReadToTheEndIsNoErrorAndOnePastItEndsTheFile)
 
 TEST_F(BaseFileTest, ModesDecideWhatMayBeDone)
 {
-  const struct
-  {
-    Long mode;
-    Bool opensMissing, reads, writes;
-    Long modeKept;
-    const char* afterwards; // the content "abc" after an "X" was written where that works
-  } kCases[] = {{kFileReadWriteAtEnd, true, false, true, 0, "abcX"},
-                {kFileRead, false, true, false, 1, "abc"},
-                {kFileWrite, true, false, true, 2, "X"},
-                {kFileReadWrite, true, true, true, 3, "Xbc"},
-                {kFileReadAlias, false, true, false, 1, "abc"},
-                {kFileReadShared, false, true, false, 1, "abc"}};
-  for (const auto& rule : kCases) {
-    SCOPED_TRACE(rule.mode);
+  // afterwards: the content "abc" after an "X" was written where that works
+  const std::tuple<Long, Bool, Bool, Bool, Long, const char*> kCases[] = {
+      {kFileReadWriteAtEnd, true, false, true, 0, "abcX"},
+      {kFileRead, false, true, false, 1, "abc"},
+      {kFileWrite, true, false, true, 2, "X"},
+      {kFileReadWrite, true, true, true, 3, "Xbc"},
+      {kFileReadAlias, false, true, false, 1, "abc"},
+      {kFileReadShared, false, true, false, 1, "abc"}};
+  for (const auto& [mode, opensMissing, reads, writes, modeKept, afterwards] : kCases) {
+    SCOPED_TRACE(mode);
     BaseFile file;
-    EXPECT_EQ(file.Open((folder / ("new" + std::to_string(rule.mode))).c_str(), rule.mode), rule.opensMissing);
-    EXPECT_EQ(file.GetError(), rule.opensMissing ? FILEERROR_NONE : FILEERROR_OPEN);
+    EXPECT_EQ(file.Open((folder / ("new" + std::to_string(mode))).c_str(), mode), opensMissing);
+    EXPECT_EQ(file.GetError(), opensMissing ? FILEERROR_NONE : FILEERROR_OPEN);
     const Filename name = NameOf("disk", {'a', 'b', 'c'});
     UChar byte = 0;
-    ASSERT_TRUE(file.Open(name, rule.mode));
-    EXPECT_EQ(file.GetMode(), rule.modeKept);
-    EXPECT_EQ(file.WriteBytes("X", 1), rule.writes);
-    EXPECT_EQ(file.GetError(), rule.writes ? FILEERROR_NONE : FILEERROR_INVALID);
+    ASSERT_TRUE(file.Open(name, mode));
+    EXPECT_EQ(file.GetMode(), modeKept);
+    EXPECT_EQ(file.WriteBytes("X", 1), writes);
+    EXPECT_EQ(file.GetError(), writes ? FILEERROR_NONE : FILEERROR_INVALID);
     file.Close();
     const Bytes bytes = ReadWholeFile(folder / "file");
-    EXPECT_EQ(std::string(bytes.begin(), bytes.end()), rule.afterwards);
-    ASSERT_TRUE(file.Open(name, rule.mode));
-    EXPECT_EQ(file.ReadBytes(&byte, 1) == 1, rule.reads);
-    EXPECT_EQ(file.GetError(), rule.reads ? FILEERROR_NONE : FILEERROR_INVALID);
-    EXPECT_EQ(CountReports(), rule.reads ? 0 : 1);
-    ASSERT_TRUE(file.Open(name, rule.mode));
+    EXPECT_EQ(std::string(bytes.begin(), bytes.end()), afterwards);
+    ASSERT_TRUE(file.Open(name, mode));
+    EXPECT_EQ(file.ReadBytes(&byte, 1) == 1, reads);
+    EXPECT_EQ(file.GetError(), reads ? FILEERROR_NONE : FILEERROR_INVALID);
+    EXPECT_EQ(CountReports(), reads ? 0 : 1);
+    ASSERT_TRUE(file.Open(name, mode));
     file.GetLength();
-    EXPECT_EQ(file.GetError(), rule.reads ? FILEERROR_NONE : FILEERROR_INVALID);
-    EXPECT_EQ(file.Seek(0), rule.reads) << "a length that may not be asked for closes the file";
+    EXPECT_EQ(file.GetError(), reads ? FILEERROR_NONE : FILEERROR_INVALID);
+    EXPECT_EQ(file.Seek(0), reads) << "a length that may not be asked for closes the file";
   }
   for (Long mode : {6, -1}) {
     BaseFile file;
@@ -377,12 +368,8 @@ TEST_F(BaseFileTest, MisuseIsInvalidAndSomeOfItIsReported)
 {
   UChar byte = 0;
   const std::string kAny = "disk", kMemory = "memory", kStream = "stream";
-  const struct
-  {
-    std::string target;
-    std::function<void(BaseFile&)> act;
-    int reports;
-  } kCases[] = {
+  int number = 0;
+  const std::tuple<std::string, std::function<void(BaseFile&)>, int> kCases[] = {
       {kAny, [](BaseFile& f) { f.Seek(-1); }, 1},
       {kAny, [](BaseFile& f) { f.Seek(-3, kSeekRelative); }, 1},
       {kAny, [](BaseFile& f) { f.Seek(std::numeric_limits<LLong>::max(), kSeekRelative); }, 1},
@@ -397,13 +384,13 @@ TEST_F(BaseFileTest, MisuseIsInvalidAndSomeOfItIsReported)
       {kStream, [](BaseFile& f) { f.Open(Filename(f.GetName()), kFileWrite), f.WriteChar(1); }, 0},
       {kAny, [](BaseFile& f) { f.Open(Filename(f.GetName()), kFileWrite), f.WriteBytes("", -1); }, 0},
   };
-  for (const auto& misuse : kCases) {
-    SCOPED_TRACE(&misuse - kCases);
+  for (const auto& [target, act, reports] : kCases) {
+    SCOPED_TRACE(++number);
     BaseFile file;
-    ASSERT_TRUE(file.Open(NameOf(misuse.target, {'a', 'b', 'c'}), kFileRead) && file.ReadUChar(byte));
-    misuse.act(file);
+    ASSERT_TRUE(file.Open(NameOf(target, {'a', 'b', 'c'}), kFileRead) && file.ReadUChar(byte));
+    act(file);
     EXPECT_EQ(file.GetError(), FILEERROR_INVALID);
-    EXPECT_EQ(CountReports(), misuse.reports);
+    EXPECT_EQ(CountReports(), reports);
     EXPECT_TRUE(file.Seek(0, kSeekRelative)) << "staying where one is works in any state";
   }
 }
@@ -537,23 +524,19 @@ TEST_F(BaseFileTest, PositionsPastTwoGigabytesWork)
 #ifndef _WIN32 // tests/windows has its system's
 TEST_F(BaseFileTest, PathsReachTheSystemAsUtf8)
 {
-  const struct
-  {
-    std::u16string name;
-    const char* bytes;
-  } kCases[] = {
+  const std::pair<std::u16string, const char*> kCases[] = {
       {u"\u00E9\u20AC", "\xC3\xA9\xE2\x82\xAC"},
       {u"a\U0001F600b", "a\xF0\x9F\x98\x80"
                         "b"},
       {u"\xD83D\u00E9", "\xED\xA0\xBD\xC3\xA9"},     // the first half of a pair alone
       {u"\xDE00\xD83D", "\xED\xB8\x80\xED\xA0\xBD"}, // halves in the wrong order
   };
-  for (const auto& each : kCases) {
-    const std::u16string path = folder.Path().u16string() + u"/" + each.name;
+  for (const auto& [units, bytes] : kCases) {
+    const std::u16string path = folder.Path().u16string() + u"/" + units;
     const Filename name(String(reinterpret_cast<const UniChar*>(path.data()), static_cast<Long>(path.size())));
     BaseFile file;
     ASSERT_TRUE(file.Open(name, kFileWrite) && file.WriteChar('x') && file.Close());
-    EXPECT_EQ(ReadWholeFile(folder / each.bytes), Bytes{'x'});
+    EXPECT_EQ(ReadWholeFile(folder / bytes), Bytes{'x'});
     EXPECT_TRUE(GeFExist(name));
   }
   std::string longPath = folder.Path().string();

@@ -155,12 +155,7 @@ TEST(BmpFiles, ComeBackFromBothDirectionsOfRows)
 TEST(BmpFiles, GiveACodeForEachFault)
 {
   const Bytes good = FromHex(kSmallBmp);
-  const struct
-  {
-    const char* name;
-    Bytes bytes;
-    Long result;
-  } cases[] = {
+  const std::tuple<const char*, Bytes, Long> cases[] = {
       {"signature", With(good, 0, 0x4D43, 2), IMAGERESULT_FORMAT},
       {"header size", With(good, 14, 108), IMAGERESULT_FORMAT},
       {"8 bits", With(good, 28, 8, 2), IMAGERESULT_FORMAT},
@@ -176,10 +171,10 @@ TEST(BmpFiles, GiveACodeForEachFault)
       {"runs behind the end", With(With(With(good, 30, 2), 2, 0x7FFFFFFF), 34, 0x7FFFFFFF), IMAGERESULT_FILE},
       {"runs behind a wrong offset", With(With(good, 30, 1), 10, 0x7FFFFFFF), IMAGERESULT_FILE},
   };
-  for (const auto& c : cases) {
-    SCOPED_TRACE(c.name);
+  for (const auto& [name, bytes, result] : cases) {
+    SCOPED_TRACE(name);
     Bitmap bitmap;
-    EXPECT_EQ(c.result, LoadFromMemory(BmpLoader(), c.bytes, bitmap));
+    EXPECT_EQ(result, LoadFromMemory(BmpLoader(), bytes, bitmap));
   }
   // The runs of 24-bit files stand for nothing.
   Bitmap bitmap;
@@ -229,13 +224,7 @@ TEST(ImageValues, HoldAPictureSavedInTheWantedFormat)
 
 TEST(BmpRuns, DecodeByHand)
 {
-  const struct
-  {
-    const char* name;
-    Long bits, width, height;
-    const char* codes;
-    const char* lines;
-  } cases[] = {
+  const std::tuple<const char*, Long, Long, Long, const char*, const char*> cases[] = {
       {"run and end of line", 8, 4, 2, "03 AA 00 00 04 BB 00 01", "AA AA AA 00 | BB BB BB BB"},
       {"literals of odd count", 8, 5, 1, "00 03 01 02 03 FF 02 09", "01 02 03 09 09 00 00 00"},
       {"a run stops at the row's end", 8, 4, 1, "FF 07 00 00", "07 07 07 07"},
@@ -250,9 +239,9 @@ TEST(BmpRuns, DecodeByHand)
       {"24 bits have no runs", 24, 2, 2, "02 FF 00 00 00 02 01 02 00 00",
        "00 00 00 00 00 00 00 00 | 00 00 00 00 00 00 00 00"},
   };
-  for (const auto& c : cases) {
-    SCOPED_TRACE(c.name);
-    EXPECT_EQ(c.lines, DecodeRuns(c.bits, c.width, c.height, c.codes));
+  for (const auto& [name, bits, width, height, codes, lines] : cases) {
+    SCOPED_TRACE(name);
+    EXPECT_EQ(lines, DecodeRuns(bits, width, height, codes));
   }
 }
 
@@ -282,28 +271,19 @@ TEST(BmpFiles, OfOtherProgramsOpen)
 {
   if (SharedImage("photo-119x96.bmp").empty() || !HasProgram("convert"))
     GTEST_SKIP() << "the public pictures or ImageMagick are not here";
-  const struct
-  {
-    const char* name;
-    int width, height;
-  } cases[] = {{"photo-119x96.bmp", 119, 96}, {"photo-192x144.bmp", 192, 144}};
-  for (const auto& c : cases) {
+  const std::tuple<const char*, int, int> cases[] = {{"photo-119x96.bmp", 119, 96}, {"photo-192x144.bmp", 192, 144}};
+  for (const auto& [name, width, height] : cases) {
     Bitmap bitmap;
-    ASSERT_EQ(IMAGERESULT_OK, bitmap.LoadBmp(SharedImage(c.name).c_str()));
-    EXPECT_EQ(c.width, bitmap.GetBw());
-    EXPECT_EQ(c.height, bitmap.GetBh());
-    EXPECT_EQ(PictureFrom("convert " + SharedImage(c.name) + " -depth 8 ppm:-"), PixelsOf(bitmap));
+    ASSERT_EQ(IMAGERESULT_OK, bitmap.LoadBmp(SharedImage(name).c_str()));
+    EXPECT_EQ(width, bitmap.GetBw());
+    EXPECT_EQ(height, bitmap.GetBh());
+    EXPECT_EQ(PictureFrom("convert " + SharedImage(name) + " -depth 8 ppm:-"), PixelsOf(bitmap));
   }
 }
 
 TEST(PictureFiles, AreToldByTheirFirstBytes)
 {
-  const struct
-  {
-    const char* name;
-    Bytes bytes;
-    bool bmp, jpeg;
-  } cases[] = {
+  const std::tuple<const char*, Bytes, bool, bool> cases[] = {
       {"bmp", FromHex(kSmallBmp), true, false},
       {"bmp, too short", FromHex("42 4D 4E 00 00 00 00 00 00 00 36 00 00 00 28 00 00"), false, false},
       {"bmp of another header", With(FromHex(kSmallBmp), 14, 12), false, false},
@@ -318,10 +298,10 @@ TEST(PictureFiles, AreToldByTheirFirstBytes)
       {"three segments, then anything", FromHex("FF D8 FF E0 00 02 FF E1 00 02 FF E2 00 02 00 00 00 00"), false, true},
       {"a segment past the end", FromHex("FF D8 FF E0 FF FF 00 00"), false, true},
   };
-  for (const auto& c : cases) {
-    SCOPED_TRACE(c.name);
-    EXPECT_EQ(c.bmp, BmpLoader().Identify({}, c.bytes.data(), static_cast<LLong>(c.bytes.size())));
-    EXPECT_EQ(c.jpeg, JpgLoader().Identify({}, c.bytes.data(), static_cast<LLong>(c.bytes.size())));
+  for (const auto& [name, bytes, bmp, jpeg] : cases) {
+    SCOPED_TRACE(name);
+    EXPECT_EQ(bmp, BmpLoader().Identify({}, bytes.data(), static_cast<LLong>(bytes.size())));
+    EXPECT_EQ(jpeg, JpgLoader().Identify({}, bytes.data(), static_cast<LLong>(bytes.size())));
   }
   EXPECT_EQ(kImageFormatBmp, BmpLoader().GetFormatId());
   EXPECT_EQ(kImageFormatJpeg, JpgLoader().GetFormatId());

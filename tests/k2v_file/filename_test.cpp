@@ -61,9 +61,7 @@ TEST(Filename, CutsAndComparesSuffixes)
                                              {".c", "", "", ".q7r"},
                                              {"", "", "", ".q7r"}};
   for (const auto& [path, cleared, completely, withSuffix] : rows) {
-    Filename clear = Path(path);
-    Filename complete = clear;
-    Filename set = clear;
+    Filename clear = Path(path), complete = clear, set = clear;
     clear.ClearSuffix();
     complete.ClearSuffixComplete();
     set.SetSuffix("q7r");

@@ -130,8 +130,7 @@ TEST(HyperFileArray, TakesBlocksAsItTakesSingleElements)
     Bytes written = write(close, kSizes[type]);
     EXPECT_TRUE(written == write(apart, 2 * kSizes[type]));
     std::copy(close.begin(), close.end(), written.begin() + 6); // unclean in the file too
-    MemoryReadFile first(WithHeader(written));
-    MemoryReadFile second(WithHeader(written));
+    MemoryReadFile first(WithHeader(written)), second(WithHeader(written));
     ASSERT_TRUE(first.file.ReadArray(close.data(), type, kSizes[type], kCount));
     ASSERT_TRUE(second.file.ReadArray(apart.data(), type, 2 * kSizes[type], kCount));
     for (std::size_t i = 0; i < close.size(); ++i)

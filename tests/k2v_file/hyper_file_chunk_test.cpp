@@ -8,8 +8,7 @@ namespace
 struct BodyRow
 {
   std::uint8_t tag;
-  std::size_t wide;
-  std::size_t narrow;
+  std::size_t wide, narrow;
 };
 constexpr BodyRow kBodies[] = {{11, 1, 1},   {12, 1, 1},   {13, 2, 2},   {14, 2, 2},   {15, 4, 4},
                                {16, 4, 4},   {17, 8, 8},   {18, 8, 8},   {19, 8, 4},   {20, 8, 8},
@@ -260,8 +259,7 @@ TEST(HyperFileContainer, ReadsTheOldFormOfEveryKind)
   };
   for (bool flush : {true, false}) {
     MemoryReadFile read(compose(-1));
-    BaseContainer container;
-    BaseContainer former(5);
+    BaseContainer container, former(5);
     former.SetLong(30, 3);
     container.SetContainer(9, former);
     Long next = 0;

@@ -66,8 +66,7 @@ bool ReadsImage(HyperFile& file, std::string_view encoded)
 bool ReadsChunk(HyperFile& file, UChar tag, Long id, Long level)
 {
   UChar found = 0;
-  Long foundId = 0;
-  Long foundLevel = 0;
+  Long foundId = 0, foundLevel = 0;
   return file.ReadValueHeader(found) && found == tag &&
          (tag == 2 || (file.ReadChunkStart(foundId, foundLevel) && foundId == id && foundLevel == level));
 }
@@ -259,8 +258,7 @@ TEST(HyperFile, CleansNumbersThatAreNotFinite)
   EXPECT_EQ(ToHex(written), ToHex(FromHex("13 00 00 00 00 00 00 00 00 14 00 00 00 00 00 00 00 00 1D 00 00 00 00 17" +
                                           Numbers({0, 0x3FF0, 0}, 8) + "1B" + Numbers({0, 0x3F80, 0x4000}, 4))));
   MemoryReadFile read(ByteWriter().Header().Real(kNan).LReal(kInfinity).SReal(NAN).Vector(1, kNan, -kInfinity).bytes);
-  Real real = 5;
-  Real wide = 5;
+  Real real = 5, wide = 5;
   SReal narrow = 5;
   Vector vector;
   EXPECT_TRUE(read.file.ReadReal(real) && read.file.ReadLReal(wide) && read.file.ReadSReal(narrow) &&
@@ -275,8 +273,7 @@ TEST(HyperFile, ReadsWhatOlderAndSloppyWritersLeft)
   EXPECT_TRUE(before.file.ReadFloat(narrow) && narrow == 2.5F);
   MemoryReadFile other(ByteWriter().Header().U8(21).U8(7).Block(130, {0, 65, 0}).Block(130, {9}).Long(3).bytes);
   Bool flag = false;
-  String text;
-  String empty("former");
+  String text, empty("former");
   Long next = 0;
   EXPECT_TRUE(other.file.ReadBool(flag) && other.file.ReadString(text) && other.file.ReadString(empty) &&
               other.file.ReadLong(next));
@@ -312,8 +309,7 @@ TEST(HyperFile, TakesMemoryAsBytesComeWhereTheLengthIsUnknown)
   ByteWriter writer;
   writer.Header().Memory(block).String(std::u16string(50000, u'x')).U8(130).U32(0xFFFFFFF0).Raw(block);
   NetworkListener listener;
-  NetworkConnection near;
-  NetworkConnection far;
+  NetworkConnection near, far;
   ASSERT_TRUE(listener.Listen() && near.Connect("127.0.0.1", listener.GetPort()) && listener.Accept(far));
   near.SetTimeout(5000);
   far.SetTimeout(5000);

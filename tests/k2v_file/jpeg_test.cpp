@@ -11,8 +11,7 @@ struct MakeOptions
 {
   J_COLOR_SPACE space = JCS_RGB; // of the pixels given
   int components = 3;
-  bool progressive = false;
-  bool arithmetic = false;
+  bool progressive = false, arithmetic = false;
   int restart = 0; // rows of blocks between restart marks
 };
 
@@ -114,31 +113,23 @@ TEST(JpegFiles, MayBeWiderThanBmpFiles)
 {
   const TempFolder folder;
   const std::string path = folder / "wide";
-  const struct
-  {
-    Long width, height, bmp, jpeg;
-  } cases[] = {{32000, 1, 1, 1},  {32001, 1, -7, 1},  {1, 32001, -7, 1},
-               {65000, 1, -7, 1}, {65001, 1, -7, -7}, {1, 65001, -7, -7}};
-  for (const auto& c : cases) {
+  const std::tuple<Long, Long, Long, Long> cases[] = {{32000, 1, 1, 1},  {32001, 1, -7, 1},  {1, 32001, -7, 1},
+                                                      {65000, 1, -7, 1}, {65001, 1, -7, -7}, {1, 65001, -7, -7}};
+  for (const auto& [width, height, bmp, jpeg] : cases) {
     Bitmap bitmap;
-    bitmap.Init(c.width, c.height, kDepthGrey);
-    EXPECT_EQ(c.bmp, bitmap.Save(path.c_str(), kImageFormatBmp, nullptr, 0));
-    EXPECT_EQ(c.jpeg, bitmap.Save(path.c_str(), kImageFormatJpeg, nullptr, kImageSaveGrey));
-    if (c.jpeg == 1) {
+    bitmap.Init(width, height, kDepthGrey);
+    EXPECT_EQ(bmp, bitmap.Save(path.c_str(), kImageFormatBmp, nullptr, 0));
+    EXPECT_EQ(jpeg, bitmap.Save(path.c_str(), kImageFormatJpeg, nullptr, kImageSaveGrey));
+    if (jpeg == 1) {
       EXPECT_EQ(IMAGERESULT_OK, JpgLoader().Load(path.c_str(), bitmap, kFirstFrame));
-      EXPECT_EQ(c.width, bitmap.GetBw());
+      EXPECT_EQ(width, bitmap.GetBw());
     }
   }
 }
 
 TEST(JpegFiles, OfEveryKindOpenAsInOtherPrograms)
 {
-  const struct
-  {
-    const char* name;
-    int width, height;
-    MakeOptions options;
-  } cases[] = {
+  const std::tuple<const char*, int, int, MakeOptions> cases[] = {
       {"baseline", 33, 17, {}},
       {"grey", 15, 9, {.space = JCS_GRAYSCALE, .components = 1}},
       {"progressive", 40, 30, {.progressive = true}},
@@ -151,12 +142,12 @@ TEST(JpegFiles, OfEveryKindOpenAsInOtherPrograms)
   };
   const TempFolder folder;
   const std::string path = folder / "picture.jpg";
-  for (const auto& c : cases) {
-    SCOPED_TRACE(c.name);
-    WriteWholeFile(path, MakeJpeg(c.width, c.height, c.options));
+  for (const auto& [name, width, height, options] : cases) {
+    SCOPED_TRACE(name);
+    WriteWholeFile(path, MakeJpeg(width, height, options));
     Bitmap bitmap;
     ASSERT_EQ(IMAGERESULT_OK, JpgLoader().Load(path.c_str(), bitmap, kFirstFrame));
-    EXPECT_LE(Difference(SmoothPicture(c.width, c.height, c.options.components), PixelsOf(bitmap)), 40);
+    EXPECT_LE(Difference(SmoothPicture(width, height, options.components), PixelsOf(bitmap)), 40);
     if (HasProgram("djpeg")) {
       EXPECT_EQ(PictureFrom("djpeg -pnm " + path), PixelsOf(bitmap));
     }
@@ -203,12 +194,7 @@ TEST(JpegFiles, GiveACodeForEachFault)
   scans.resize(scan);
   for (int i = 0; i < 5000; ++i)
     scans.insert(scans.end(), oneScan.begin(), oneScan.end());
-  const struct
-  {
-    const char* name;
-    Bytes bytes;
-    Long result;
-  } cases[] = {
+  const std::tuple<const char*, Bytes, Long> cases[] = {
       {"four components", MakeJpeg(8, 8, {.space = JCS_CMYK, .components = 4}), IMAGERESULT_FORMAT},
       {"two components", twoComponents, IMAGERESULT_FORMAT},
       {"12 bits", twelveBits, IMAGERESULT_MEMORY},
@@ -219,10 +205,10 @@ TEST(JpegFiles, GiveACodeForEachFault)
   };
   counting_memory::ResetPeak();
   const LLong before = counting_memory::Get().peakBytes;
-  for (const auto& c : cases) {
-    SCOPED_TRACE(c.name);
+  for (const auto& [name, bytes, result] : cases) {
+    SCOPED_TRACE(name);
     Bitmap bitmap;
-    EXPECT_EQ(c.result, LoadFromMemory(JpgLoader(), c.bytes, bitmap));
+    EXPECT_EQ(result, LoadFromMemory(JpgLoader(), bytes, bitmap));
   }
   EXPECT_LT(counting_memory::Get().peakBytes - before, 1 << 20);
   const TempFolder folder;

@@ -169,25 +169,22 @@ TEST_F(NetworkTest, AReadThatFailsSaysSo)
   cutBlock.push_back(1);
   AddBlock(ended, {1, 2, 3, 4});
   AddLength(ended, 0);
-  const struct
-  {
-    const Bytes& sent;
-    Bool allowShort;
-    LLong seek; // in place of reading
-  } kCases[] = {{lie, true, 0}, {cutLength, true, 0}, {cutBlock, true, 0}, {ended, false, 0}, {ended, true, 5}};
-  for (const auto& each : kCases) {
-    SCOPED_TRACE(&each - kCases);
+  int number = 0; // seek: in place of reading
+  const std::tuple<const Bytes&, Bool, LLong> kCases[] = {
+      {lie, true, 0}, {cutLength, true, 0}, {cutBlock, true, 0}, {ended, false, 0}, {ended, true, 5}};
+  for (const auto& [sent, allowShort, seek] : kCases) {
+    SCOPED_TRACE(++number);
     SetUp();
-    std::thread other = SendFromFar(each.sent);
+    std::thread other = SendFromFar(sent);
     BaseFile file;
     ULLong value = 0;
     counting_memory::ResetPeak();
     const LLong before = counting_memory::Get().bytes;
     ASSERT_TRUE(file.Open(nearName, kFileRead));
-    if (each.seek != 0)
-      EXPECT_FALSE(file.Seek(each.seek));
+    if (seek != 0)
+      EXPECT_FALSE(file.Seek(seek));
     else
-      EXPECT_EQ(file.ReadBytes(&value, 8, each.allowShort), 0);
+      EXPECT_EQ(file.ReadBytes(&value, 8, allowShort), 0);
     EXPECT_EQ(file.GetError(), FILEERROR_READ);
     EXPECT_LT(counting_memory::Get().peakBytes - before, 4'000'000) << "an announced length takes no memory";
     other.join();

@@ -45,9 +45,7 @@ TEST(String, KeepsCapacityAtMultiplesOf16AndReusesTheBlock)
 
 TEST(String, CopiesAndMovesItsCharacters)
 {
-  String first("first");
-  String copy = first;
-  String moved = std::move(copy);
+  String first("first"), copy = first, moved = std::move(copy);
   first[0] = u'F';
   EXPECT_EQ(Utf8(moved), "first");
   EXPECT_EQ(Utf8(first), "First");
@@ -65,12 +63,7 @@ TEST(String, CopiesAndMovesItsCharacters)
 
 TEST(String, ComparesByTheFirstDifferenceThenByTheNextCharacter)
 {
-  struct Row
-  {
-    std::u16string a, b;
-    Long compare, lexCompare, similarity;
-  };
-  const Row rows[] = {
+  const std::tuple<std::u16string, std::u16string, Long, Long, Long> rows[] = {
       {u"", u"", 0, 0, 100000},
       {u"", u"a", -97, -65, 0},
       {u"b", u"", 98, 66, 0},
@@ -82,15 +75,14 @@ TEST(String, ComparesByTheFirstDifferenceThenByTheNextCharacter)
       {u"\u00E9", u"\u00C9", 32, 32, 0},                   // no case beyond the three umlauts
       {u"abcdefghijklx", u"abcdefghijkl", 'x', 'X', 1257}, // the bonus falls from 10 to 1 and stays there
   };
-  for (const Row& row : rows) {
-    String a = FromUnits(row.a);
-    String b = FromUnits(row.b);
-    EXPECT_EQ(a.Compare(b), row.compare) << Utf8(a) << " " << Utf8(b);
-    EXPECT_EQ(b.Compare(a), -row.compare);
-    EXPECT_EQ(a.LexCompare(b), row.lexCompare) << Utf8(a) << " " << Utf8(b);
-    EXPECT_EQ(a.Similarity(b), row.similarity) << Utf8(a) << " " << Utf8(b);
-    EXPECT_EQ(a < b, row.compare < 0);
-    EXPECT_EQ(a >= b, row.compare >= 0);
+  for (const auto& [first, second, compare, lexCompare, similarity] : rows) {
+    const String a = FromUnits(first), b = FromUnits(second);
+    EXPECT_EQ(a.Compare(b), compare) << Utf8(a) << " " << Utf8(b);
+    EXPECT_EQ(b.Compare(a), -compare);
+    EXPECT_EQ(a.LexCompare(b), lexCompare) << Utf8(a) << " " << Utf8(b);
+    EXPECT_EQ(a.Similarity(b), similarity) << Utf8(a) << " " << Utf8(b);
+    EXPECT_EQ(a < b, compare < 0);
+    EXPECT_EQ(a >= b, compare >= 0);
   }
   EXPECT_EQ(String("xxabc").ComparePart("abd", 2, 2), 0);
   EXPECT_EQ(String("xxabc").ComparePart("abd", 3, 2), 'c' - 'd');
@@ -223,14 +215,8 @@ TEST(StringEncoding, NeverWritesPastATinyBuffer)
 
 TEST(StringEncoding, ReadsBytesAsTheEncodingTells)
 {
-  struct Row
-  {
-    StringEncoding encoding;
-    std::string bytes;
-    std::u16string text;
-  };
   using namespace std::string_literals;
-  const Row rows[] = {
+  const std::tuple<StringEncoding, std::string, std::u16string> rows[] = {
       {STRINGENCODING_DEFAULT, "a\\", u"a\\"},
       {STRINGENCODING_DEFAULT, "\\u12", u"\\u12"},
       {STRINGENCODING_DEFAULT, "\\u00G9", u"\\u00G9"},
@@ -267,10 +253,10 @@ TEST(StringEncoding, ReadsBytesAsTheEncodingTells)
        "a\0b"s,
        u"_a_b"},
   };
-  for (const Row& row : rows) {
+  for (const auto& [encoding, bytes, units] : rows) {
     String text;
-    text.SetCString(row.bytes.data(), static_cast<Long>(row.bytes.size()), row.encoding);
-    EXPECT_EQ(Units(text), row.text) << row.bytes << " in " << row.encoding;
+    text.SetCString(bytes.data(), static_cast<Long>(bytes.size()), encoding);
+    EXPECT_EQ(Units(text), units) << bytes << " in " << encoding;
   }
 }
 

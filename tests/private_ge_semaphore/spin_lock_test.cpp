@@ -44,8 +44,7 @@ TEST(ReadWriteSpinLock, AWaitingWriterComesBeforeNewReaders)
 {
   Lock lock;
   std::atomic<int> step{0};
-  int writerStep = 0;
-  int readerStep = 0;
+  int writerStep = 0, readerStep = 0;
   lock.EnterRead();
   std::thread writer([&] {
     WriteGuard guard(lock);

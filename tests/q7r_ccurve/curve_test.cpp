@@ -24,19 +24,14 @@ std::string Keys(const CCurve& curve)
 
 TEST(Curve, TakesKeysWithinTenThousandSeconds)
 {
-  struct Case
-  {
-    BaseTime time;
-    Long index; // -1: refused
-  };
   CCurve curve;
-  const Case cases[] = {{{0, 1}, 0},           {{10000, 1}, 1},         {{10000001, 1000}, -1},
-                        {{-10000, 1}, 0},      {{-10000001, 1000}, -1}, {{1, 2}, 2},
-                        {{20000001, 2000}, -1}};
-  for (const Case& c : cases) {
+  const std::pair<BaseTime, Long> cases[] = {{{0, 1}, 0},           {{10000, 1}, 1},         {{10000001, 1000}, -1},
+                                             {{-10000, 1}, 0},      {{-10000001, 1000}, -1}, {{1, 2}, 2},
+                                             {{20000001, 2000}, -1}};
+  for (const auto& [time, wanted] : cases) { // -1: refused
     Long index = 99;
-    EXPECT_EQ(curve.AddKey(c.time, &index) != nullptr, c.index >= 0) << c.time.Get();
-    EXPECT_EQ(index, c.index) << c.time.Get();
+    EXPECT_EQ(curve.AddKey(time, &index) != nullptr, wanted >= 0) << time.Get();
+    EXPECT_EQ(index, wanted) << time.Get();
   }
   EXPECT_EQ(Keys(curve), "-10000:0 0:0 0.5:0 10000:0");
 }

@@ -134,8 +134,7 @@ TEST(KeyRows, ARecordThatIsDamagedIsReadAsInTheGeneralWay)
   auto read = [](const FileBytes& damaged) {
     MemoryReadFile memory(damaged);
     UChar tag = 0;
-    Long id = 0;
-    Long level = 0;
+    Long id = 0, level = 0;
     CCurve copy;
     memory.file.ReadValueHeader(tag);
     memory.file.ReadChunkStart(id, level);
@@ -182,11 +181,9 @@ TEST(KeyRows, ProgressIsToldAtTheSamePlaces)
 
 bool AreEqual(const CCurve& a, const CCurve& b)
 {
-  CKey ofA;
-  CKey ofB;
+  CKey ofA, ofB;
   for (Long i = 0; i < a.GetKeyCount(); ++i) {
-    KeyValues x;
-    KeyValues y;
+    KeyValues x, y;
     if (!a.GetKeyValues(i, x) || !b.GetKeyValues(i, y) || !a.PeekKey(i, ofA)->IsEqual(*b.PeekKey(i, ofB)) ||
         x.time != y.time || x.value != y.value || x.leftTime != y.leftTime || x.rightValue != y.rightValue ||
         x.interpolation != y.interpolation || x.switches != y.switches ||
@@ -201,8 +198,7 @@ bool AreEqual(const CCurve& a, const CCurve& b)
 
 TEST(KeyRows, ChangeAndEvaluateLikeNodes)
 {
-  CCurve rows;
-  CCurve nodes;
+  CCurve rows, nodes;
   nodes.AddKey(BaseTime(0, 1));
   rows.SetKeyValues({});
   std::mt19937 random(3);

@@ -16,8 +16,7 @@ void Fill(CKey& key)
 
 TEST(Key, PassesOverAChunkBelowItsLevels)
 {
-  CKey key;
-  CKey fresh;
+  CKey key, fresh;
   EXPECT_TRUE(ReadInto(key, Record("[110416,-1 T3 T1 T1 R1 R2 R3 L3 L15 L7 ]")) && key.IsEqual(fresh));
 }
 

@@ -33,8 +33,7 @@ class PolygonLikeData : public NodeData
     readLevel = level;
     return file.SkipToEndChunk();
   }
-  Long readId = 0;
-  Long readLevel = 0;
+  Long readId = 0, readLevel = 0;
 
  private:
   Long diskType_;
@@ -104,20 +103,15 @@ TEST(BaseObject, SumsThePointsAndPolygonsOfPolygonObjectsAlone)
 // The matrices and the values of the oldest files, which a new file doesn't hold.
 TEST(BaseObject, DerivesItsMatricesFromATransformThatIsRead)
 {
-  struct Row
-  {
-    const char* sample;
-    Long order;
-    bool frozen;
-  };
-  for (const Row& row : {Row{"transform 0 before 7500", 6, false},
-                         {"transform 1 before 7500", 6, false},
-                         {"transform 6 before 11600", 6, true},
-                         {"transform 8", 6, false},
-                         {"transform", 8, false},
-                         {"frozen transform", 4, true}}) {
-    SCOPED_TRACE(row.sample);
-    const RecordSample& sample = FindRecordSample(row.sample);
+  const std::tuple<const char*, Long, bool> rows[] = {{"transform 0 before 7500", 6, false},
+                                                      {"transform 1 before 7500", 6, false},
+                                                      {"transform 6 before 11600", 6, true},
+                                                      {"transform 8", 6, false},
+                                                      {"transform", 8, false},
+                                                      {"frozen transform", 4, true}};
+  for (const auto& [name, order, frozen] : rows) {
+    SCOPED_TRACE(name);
+    const RecordSample& sample = FindRecordSample(name);
     BaseObject object(kObjectNull);
     ByteWriter chunk;
     chunk.Start(110052, sample.level).Append(Record(sample.body, sample.version)).End();
@@ -129,16 +123,16 @@ TEST(BaseObject, DerivesItsMatricesFromATransformThatIsRead)
     EXPECT_EQ(object.GetEditorMode(), modes ? 1 : 2);
     EXPECT_EQ(object.GetRenderMode(), modes ? 0 : 2);
     EXPECT_EQ(object.GetDisabled(), modes ? 1 : 0);
-    EXPECT_EQ(object.GetRotationOrder(), row.order);
+    EXPECT_EQ(object.GetRotationOrder(), order);
     EXPECT_EQ(object.GetStoredMatrix().off, oldest ? Vector() : Vector(8, 9, 10));
-    EXPECT_EQ(object.GetAbsPos(), row.frozen ? Vector(23, 23.5, 22.75) : object.GetRelPos());
-    EXPECT_EQ(object.GetAbsScale(), row.frozen ? Vector(24, 24.5, 23.75) : object.GetRelScale());
-    EXPECT_EQ(object.GetAbsRot(), row.frozen ? Vector(25, 25.5, 24.75) : object.GetRelRot());
-    Matrix rotation = AnglesToMatrix({3, 3.5, 2.75}, row.order);
+    EXPECT_EQ(object.GetAbsPos(), frozen ? Vector(23, 23.5, 22.75) : object.GetRelPos());
+    EXPECT_EQ(object.GetAbsScale(), frozen ? Vector(24, 24.5, 23.75) : object.GetRelScale());
+    EXPECT_EQ(object.GetAbsRot(), frozen ? Vector(25, 25.5, 24.75) : object.GetRelRot());
+    Matrix rotation = AnglesToMatrix({3, 3.5, 2.75}, order);
     rotation.off = Vector(1, 1.5, 0.75);
     EXPECT_EQ(object.GetRelativeNormalizedMatrix(), rotation);
     EXPECT_EQ(object.GetFrozenTransformMatrix().v1,
-              row.frozen ? AnglesToMatrix({22, 22.5, 21.75}, row.order).v1 : Vector(1, 0, 0));
+              frozen ? AnglesToMatrix({22, 22.5, 21.75}, order).v1 : Vector(1, 0, 0));
   }
 }
 

@@ -114,13 +114,7 @@ TEST(BaseSelect, AgreesWithAPlainBitSetOverManyOperations)
 
 TEST(BaseSelect, ComesToTheseSegments)
 {
-  struct Row
-  {
-    Segments start;
-    std::function<Bool(BaseSelect&)> change;
-    Segments end;
-  };
-  const Row rows[] = {
+  const std::tuple<Segments, std::function<Bool(BaseSelect&)>, Segments> rows[] = {
       {{}, [](BaseSelect& s) { return s.SelectAdd(5) && s.SelectAdd(7) && s.SelectAdd(6); }, {{5, 7}}},
       {{{5, 7}}, [](BaseSelect& s) { return s.SelectRemove(6); }, {{5, 5}, {7, 7}}},
       {{{5, 5}}, [](BaseSelect& s) { return s.SelectRemove(5) && !s.SegmentArray(); }, {}},
@@ -146,14 +140,15 @@ TEST(BaseSelect, ComesToTheseSegments)
        {{0, INT_MAX}}},
       {{{0, INT_MAX}}, [](BaseSelect& s) { return s.SelectToggleRange(1, INT_MAX - 1); }, {{0, 0}, {INT_MAX, INT_MAX}}},
   };
-  for (const Row& row : rows) {
+  int number = 0;
+  for (const auto& [start, change, end] : rows) {
+    SCOPED_TRACE(++number);
     BaseSelect set;
-    Fill(set, row.start);
-    const int number = static_cast<int>(&row - rows);
+    Fill(set, start);
     const ULong before = set.GetChangeCount();
-    EXPECT_TRUE(row.change(set)) << "row " << number;
-    EXPECT_EQ(SegmentsOf(set), row.end) << "row " << number;
-    EXPECT_TRUE(row.start == row.end || set.GetChangeCount() > before) << "row " << number;
+    EXPECT_TRUE(change(set));
+    EXPECT_EQ(SegmentsOf(set), end);
+    EXPECT_TRUE(start == end || set.GetChangeCount() > before);
   }
 }
 

@@ -42,8 +42,7 @@ TEST(BaseTag, CopiesOntoATagOfTheSameTypeOnly)
   BaseTag source(kTagTarget);
   source.SetName(String("aim"));
   source.GetDataInstance().SetLong(1234, 5);
-  BaseTag same(kTagTarget);
-  BaseTag other(kTagProtection);
+  BaseTag same(kTagTarget), other(kTagProtection);
   BaseTag disguised(kTagPlugin, kTagTarget); // the same number, but another class
   EXPECT_TRUE(source.CopyWithTranslation(same, 0, nullptr));
   EXPECT_EQ(same.GetName(), String("aim"));

@@ -188,23 +188,20 @@ TEST(SplineObject, HasTangentsAsItsTypeAsks)
 
 TEST(SplineObject, ResizesPointsTangentsAndSegments)
 {
-  struct Row
-  {
-    Long points, segments;
-    Long pointsThen, segmentsThen, tangentsThen; // -1: no tag
-  };
-  const Row rows[] = {{8, -1, 8, -1, 8}, {8, 2, 8, 2, 8},  {4, -1, 4, 2, 4}, {-1, 3, 4, 3, 4},
-                      {0, 1, 0, 1, 4},   {5, 0, 5, -1, 5}, {5, 0, 5, -1, 5}};
+  int number = 0; // segmentsThen: -1 where there is no tag
+  const std::tuple<Long, Long, Long, Long, Long> rows[] = {{8, -1, 8, -1, 8}, {8, 2, 8, 2, 8}, {4, -1, 4, 2, 4},
+                                                           {-1, 3, 4, 3, 4},  {0, 1, 0, 1, 4}, {5, 0, 5, -1, 5},
+                                                           {5, 0, 5, -1, 5}};
   SplineObject* spline = AllocSpline(1, 2);
   BaseArrayTag* map = AddTag(*spline, kTagVertexMap, 1);
-  for (const Row& row : rows) {
-    const int number = static_cast<int>(&row - rows);
-    EXPECT_TRUE(ResizeSpline(*spline, row.points, row.segments)) << number;
-    EXPECT_EQ(GetPointCount(*spline), row.pointsThen) << number;
-    EXPECT_EQ(map->GetCount(), row.pointsThen) << number;
-    EXPECT_EQ(GetTangentTag(*spline)->GetCount(), row.tangentsThen) << number;
-    const SegmentTag* segments = GetSegmentTag(*spline);
-    EXPECT_EQ(segments ? segments->GetCount() : -1, row.segmentsThen) << number;
+  for (const auto& [points, segments, pointsThen, segmentsThen, tangentsThen] : rows) {
+    SCOPED_TRACE(++number);
+    EXPECT_TRUE(ResizeSpline(*spline, points, segments));
+    EXPECT_EQ(GetPointCount(*spline), pointsThen);
+    EXPECT_EQ(map->GetCount(), pointsThen);
+    EXPECT_EQ(GetTangentTag(*spline)->GetCount(), tangentsThen);
+    const SegmentTag* tag = GetSegmentTag(*spline);
+    EXPECT_EQ(tag ? tag->GetCount() : -1, segmentsThen);
   }
   DeleteObj(spline);
 }

@@ -290,9 +290,7 @@ TEST(IESLight, SumsTheSameDirectionsEachTime)
   int below = 0;
   double heights = 0;
   for (int i = 0; i < 65536;) {
-    const double x = draw();
-    const double y = draw();
-    const double z = draw();
+    const double x = draw(), y = draw(), z = draw();
     const double length = std::sqrt(x * x + y * y + z * z);
     if (length > 1.0)
       continue;

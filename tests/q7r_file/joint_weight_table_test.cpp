@@ -198,13 +198,8 @@ TEST(JointWeightTable, ReadsPresentAndOldFilesAndKeepsWhatItDoesNotUse)
 
 TEST(JointWeightTable, RefusesRunsThatAreNotSound)
 {
-  struct Row
-  {
-    ByteWriter table;
-    bool sound;
-  };
   const std::uint32_t huge = 0xFFFFFFFFU;
-  const Row rows[] = {
+  const std::pair<ByteWriter, bool> rows[] = {
       {TableOf({}, 0), true},
       {TableOf({3, 4, 0}, 2), true},
       {TableOf({3, 4, 1, 8, 8, 0}, 4), true}, // values in another order, and one too many

@@ -126,8 +126,7 @@ TEST_F(SharedDefaults, StayWhereTheyLieWhenMoreOfThemChange)
 // Whole, cut at every byte, and with a byte changed.
 TEST_F(SharedDefaults, AreReadAsOwnElements)
 {
-  TextureTag target;
-  TextureTag source;
+  TextureTag target, source;
   source.GetDataInstance().SetId(kTagTexture);
   source.GetDataInstance().SetLink(kTextureMaterial, &target);
   source.GetDataInstance().SetReal(kTextureOffsetX, 0.25);

@@ -166,8 +166,7 @@ TEST(TextureTag, TakesAMatrixApartNearItsPresentRotation)
 
 TEST(TextureTag, CopiesItsEntriesButComputesItsMatrixAnew)
 {
-  TextureTag source;
-  TextureTag target;
+  TextureTag source, target;
   source.SetPosition({1, 2, 3});
   target.SetPosition({4, 4, 4});
   EXPECT_EQ(target.TextureMatrix().off, Vector(4, 4, 4));

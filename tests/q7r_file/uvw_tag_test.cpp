@@ -111,8 +111,7 @@ TEST(UVWTag, FailsOnBadArraysWithTheMemoryError)
     whole.Header().Start(5671, i % 2 == 0 ? 3 : 1).Append(bad[i / 2]).End().End();
     MemoryReadFile memory(whole.bytes);
     UChar header = 0;
-    Long id = 0;
-    Long level = 0;
+    Long id = 0, level = 0;
     ASSERT_TRUE(memory.file.ReadValueHeader(header) && memory.file.ReadChunkStart(id, level));
     EXPECT_FALSE(tag.ReadChunk(memory.file, id, level));
     EXPECT_EQ(memory.file.GetError(), -7) << i;

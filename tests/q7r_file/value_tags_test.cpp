@@ -108,8 +108,7 @@ TEST(ValueTags, ReportMemoryThatIsShortAndKeepTheirEntries)
 
     MemoryReadFile memory(ByteWriter().Header().Append(layout.Filled()).bytes);
     UChar header = 0;
-    Long id = 0;
-    Long level = 0;
+    Long id = 0, level = 0;
     ASSERT_TRUE(memory.file.ReadValueHeader(header) && memory.file.ReadChunkStart(id, level));
     EXPECT_FALSE(counting_memory::WithoutMemory([&] { return tag->ReadChunk(memory.file, id, level); }));
     EXPECT_EQ(memory.file.GetError(), -7) << layout.type;

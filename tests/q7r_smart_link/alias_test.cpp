@@ -142,12 +142,8 @@ TEST(Alias, WritesIdAndLabelInOneBlock)
 TEST(Alias, ReadsLinksOfEveryFormAndIgnoresForeignBlocks)
 {
   const std::string id5 = Record("alias2", 5), large(8, '\xFF');
-  struct Case
-  {
-    std::string block;
-    bool resolves;
-    const char* name; // null for none
-  } cases[] = {
+  // name: null for none
+  const std::tuple<std::string, bool, const char*> cases[] = {
       {id5, true, nullptr},
       {id5 + std::string("\0\0\0\2xy", 6), true, "xy"},
       {id5 + std::string("\0\0\0\1xy", 6), true, "x"},
@@ -160,23 +156,23 @@ TEST(Alias, ReadsLinksOfEveryFormAndIgnoresForeignBlocks)
       {Record("agoal1", 5), false, nullptr},
       {"x", false, nullptr},
   };
-  for (const Case& one : cases) {
+  for (const auto& [block, resolves, name] : cases) {
     for (bool large139 : {false, true}) {
       ByteWriter bytes;
       bytes.Header();
       if (large139)
-        bytes.U8(139).I64(static_cast<std::int64_t>(one.block.size())).Raw(one.block);
+        bytes.U8(139).I64(static_cast<std::int64_t>(block.size())).Raw(block);
       else
-        bytes.Memory(one.block);
+        bytes.Memory(block);
       bytes.Memory(Record("agoal1", 5));
       MemoryReadFile source(bytes.bytes);
       GeAliasLink link;
       GeAliasGoal goal(FakeNode(1));
       EXPECT_TRUE(link.ReadLink(source.file) && goal.ReadGoal(source.file));
-      EXPECT_EQ(link.GetLink(), one.resolves ? FakeNode(1) : nullptr) << ToHex(bytes.bytes);
-      ASSERT_EQ(link.GetName() != nullptr, one.name != nullptr) << ToHex(bytes.bytes);
-      if (one.name) {
-        EXPECT_EQ(*link.GetName(), String(one.name));
+      EXPECT_EQ(link.GetLink(), resolves ? FakeNode(1) : nullptr) << ToHex(bytes.bytes);
+      ASSERT_EQ(link.GetName() != nullptr, name != nullptr) << ToHex(bytes.bytes);
+      if (name) {
+        EXPECT_EQ(*link.GetName(), String(name));
       }
     }
   }

@@ -41,8 +41,7 @@ std::vector<std::pair<Long, Long>> ChunksOf(const std::vector<std::uint8_t>& byt
   std::vector<std::pair<Long, Long>> chunks;
   MemoryReadFile memory(bytes);
   for (UChar tag = 0; memory.file.GetPosition() < memory.file.GetLength() && memory.file.ReadValueHeader(tag);) {
-    Long id = 0;
-    Long level = 0;
+    Long id = 0, level = 0;
     if (tag == kTagChunkStart && memory.file.ReadChunkStart(id, level))
       chunks.emplace_back(id, level);
     else if (tag != kTagChunkEnd)

@@ -24,9 +24,7 @@ using Nodes = std::multiset<std::tuple<Long, Long, Long, Long>>;
 
 void Note(BaseList2D& node, Nodes& nodes)
 {
-  Long tags = 0;
-  Long tracks = 0;
-  Long keys = 0;
+  Long tags = 0, tracks = 0, keys = 0;
   if (auto* object = NodeCast<BaseObject>(&node)) {
     for (BaseTag* tag = object->GetFirstTag(); tag; tag = tag->GetNext())
       ++tags;
@@ -88,8 +86,7 @@ bool GetsTheSame(const FileBytes& bytes)
 TEST(NodeSink, GetsWhatAWholeLoadGives)
 {
   std::mt19937 random(5);
-  int exact = 0;
-  int files = 0;
+  int exact = 0, files = 0;
   for (const CorpusFile& file : SceneCorpus()) {
     SCOPED_TRACE(file.name);
     ++files;

@@ -16,8 +16,7 @@
 // Pixels from the top row down, without padding.
 struct PlainPicture
 {
-  int width = 0;
-  int height = 0;
+  int width = 0, height = 0;
   int components = 0; // 1 or 3
   std::vector<std::uint8_t> values;
 

@@ -158,11 +158,7 @@ TEST_F(CommandLine, SaysWhatIsWrongWithASceneFileAndDestroysNothing)
 
 TEST_F(CommandLine, TellsArgumentsThatItCannotTake)
 {
-  const struct
-  {
-    const char* arguments;
-    const char* says;
-  } cases[] = {
+  const std::pair<const char*, const char*> cases[] = {
       {"", "which verb? (q7r --help"},
       {"help exprot", "there is no verb \"exprot\"; did you mean export?"},
       {"version", "there is no verb \"version\"; did you mean --version?"},
@@ -182,8 +178,8 @@ TEST_F(CommandLine, TellsArgumentsThatItCannotTake)
       {"export a b --quiet --verbose", "--quiet excludes --verbose"},
       {"extract a -o b c", "extract: \"c\" is one argument too many"},
   };
-  for (const auto& c : cases)
-    ExpectRefusal(RunQ7r(c.arguments), {c.says});
+  for (const auto& [arguments, says] : cases)
+    ExpectRefusal(RunQ7r(arguments), {says});
   for (const char* verb : {"", "export", "info", "tree", "dump", "check", "resave", "merge", "diff"}) {
     const RunResult run = RunQ7r(std::string(verb) + " --help");
     EXPECT_EQ(run.status, 0) << verb;

@@ -55,15 +55,12 @@ class Preview : public testing::Test
 TEST_F(Preview, GoesInAndComesOutInBothFormats)
 {
   const std::string scene = Write("plain.q7r", plain_);
-  const struct
-  {
-    std::string picture;
-    int components;
-  } cases[] = {{Picture("in.bmp", 31, 20), 3}, {Picture("in.jpg", 31, 20), 3}, {Picture("grey.jpg", 31, 20, 1), 1}};
+  const std::pair<std::string, int> cases[] = {
+      {Picture("in.bmp", 31, 20), 3}, {Picture("in.jpg", 31, 20), 3}, {Picture("grey.jpg", 31, 20, 1), 1}};
   const std::string with = folder_ / "with.q7r";
-  for (const auto& c : cases) {
-    SCOPED_TRACE(c.picture);
-    ASSERT_EQ(0, Run(scene, "--force --set " + Quoted(c.picture), with).status);
+  for (const auto& [picture, components] : cases) {
+    SCOPED_TRACE(picture);
+    ASSERT_EQ(0, Run(scene, "--force --set " + Quoted(picture), with).status);
     // A scene that is written again still has it.
     ASSERT_EQ(0, RunQ7r("resave --force " + Quoted(with) + " " + Quoted(folder_ / "again.q7r")).status);
     for (const char* name : {"out.BMP", "out.jpg", "out.jpeg"}) {
@@ -75,8 +72,8 @@ TEST_F(Preview, GoesInAndComesOutInBothFormats)
       const Long result = std::string(name) == "out.BMP" ? bitmap.LoadBmp(out.c_str())
                                                          : JpgLoader().Load(out.c_str(), bitmap, kFirstFrame);
       ASSERT_EQ(IMAGERESULT_OK, result);
-      const PlainPicture slopes = SmoothPicture(31, 20, c.components);
-      EXPECT_LE(Difference(c.components == 1 ? AsColor(slopes) : slopes, PixelsOf(bitmap)), 60);
+      const PlainPicture slopes = SmoothPicture(31, 20, components);
+      EXPECT_LE(Difference(components == 1 ? AsColor(slopes) : slopes, PixelsOf(bitmap)), 60);
     }
   }
 }
@@ -97,11 +94,7 @@ TEST_F(Preview, RefusesWithOneLine)
   const std::string damaged = Write("damaged.q7r", SceneWith(Bytes(100, 1), ByteWriter().End().bytes));
   Bytes narrow = ReadWholeFile(Picture("in.bmp", 4, 4));
   narrow[28] = 8;
-  const struct
-  {
-    const char* name;
-    std::string scene, rest, output, says;
-  } cases[] = {
+  const std::tuple<const char*, std::string, std::string, std::string, std::string> cases[] = {
       {"no picture", scene, "", "out.jpg", "plain.q7r: holds no preview"},
       {"a damaged picture", damaged, "", "out.jpg", "damaged.q7r: byte "},
       {"no scene", folder_ / "none.q7r", "", "out.jpg", "none.q7r"},
@@ -111,9 +104,9 @@ TEST_F(Preview, RefusesWithOneLine)
       {"8 bits", scene, "--set " + Quoted(Write("8.bmp", narrow)), "out.q7r", "8.bmp: this kind isn't read"},
       {"a cut picture", scene, "--set " + Quoted(Write("cut.jpg", {0xFF, 0xD8, 0xFF})), "out.q7r", "cut.jpg: damaged"},
   };
-  for (const auto& c : cases) {
-    SCOPED_TRACE(c.name);
-    ExpectRefusal(Run(c.scene, c.rest, folder_ / c.output), folder_ / c.output, c.says);
+  for (const auto& [name, scene, rest, output, says] : cases) {
+    SCOPED_TRACE(name);
+    ExpectRefusal(Run(scene, rest, folder_ / output), folder_ / output, says);
   }
   // An existing file is left alone.
   const std::string with = folder_ / "with.q7r";

@@ -130,8 +130,7 @@ inline bool IsSameValue(const Scene& sceneA, const Scene& sceneB, Identifiers& i
 // Where the first difference is; empty if there is none. `count` receives how many values were compared.
 inline std::string FirstDifference(const std::string& pathA, const std::string& pathB, int& count)
 {
-  Scene a(pathA);
-  Scene b(pathB);
+  Scene a(pathA), b(pathB);
   Identifiers identifiers;
   for (count = 0;; ++count) {
     const bool moreInA = a.Next();

@@ -9,9 +9,7 @@ int main()
 {
   const String text("hello");
   const Filename file("/a/b.c");
-  const GeData number(Long{7});
-  const GeData words(String("ab"));
-  const GeData place(Vector(1, 2.5, -3));
+  const GeData number(Long{7}), words(String("ab")), place(Vector(1, 2.5, -3));
   BaseContainer entries;
   entries.SetLong(5, 6);
   entries.SetString(7, String("x"));
