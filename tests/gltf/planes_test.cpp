@@ -102,8 +102,8 @@ TEST_F(GltfPlanes, HaveTheColourOfTheirMaterial)
   many->SwitchChannel(-1, 1);
   AddPlane("many", 1, 1, many);
   const Converted scene = Convert();
-  for (const Case& c : cases)
-    ExpectNear(scene.MaterialOf(c.name)["pbrMetallicRoughness"]["baseColorFactor"], c.linear);
+  for (const auto& [name, color, brightness, on, linear] : cases)
+    ExpectNear(scene.MaterialOf(name)["pbrMetallicRoughness"]["baseColorFactor"], linear);
   const Json& plain = scene.MaterialOf("plain");
   EXPECT_EQ(scene.json["materials"].size(), 5U);
   EXPECT_EQ(plain["name"], "plain");

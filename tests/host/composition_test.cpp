@@ -8,6 +8,8 @@
 namespace
 {
 
+using stage::Answer;
+using stage::Fraction;
 using stage::Load;
 using stage::Stage;
 
@@ -28,13 +30,9 @@ TEST(CompositionSettings, GiveTheExactFrameDuration)
   for (const auto& [text, value, scale] : cases) {
     SCOPED_TRACE(text);
     const Stage stage(LoadText(std::string(R"({"w": 1, "h": 1, "ip": 0, "op": 9, "layers": [], "fr": )") + text + "}"));
-    A_Time duration{};
-    A_FpLong rate = 0;
-    EXPECT_EQ(0, stage.comps->AEGP_GetCompFrameDuration(stage.ActiveComp(), &duration));
-    EXPECT_EQ(0, stage.comps->AEGP_GetCompFramerate(stage.ActiveComp(), &rate));
-    EXPECT_EQ(value, duration.value);
-    EXPECT_EQ(scale, duration.scale);
-    EXPECT_EQ(std::stod(text), rate);
+    const A_Time duration = Answer(stage.comps->AEGP_GetCompFrameDuration, stage.ActiveComp());
+    EXPECT_EQ(std::pair(value, scale), Fraction(duration));
+    EXPECT_EQ(std::stod(text), Answer(stage.comps->AEGP_GetCompFramerate, stage.ActiveComp()));
   }
 }
 
@@ -53,20 +51,14 @@ TEST(CompositionSettings, GiveTheWorkAreaAndPixelAspectOfEachComposition)
       {"Inner", 2 * 1001, 58 * 1001, {1, 1}}, // that of the root's frames
       {"b", 2 * 1001, 58 * 1001, {1, 1}},
       {"c", 8 * 1001, 0, {1, 1}}};
-  for (const auto& [composition, wantedStart, wantedDuration, wantedAspect] : cases) {
+  for (const auto& [composition, start, duration, wanted] : cases) {
     SCOPED_TRACE(composition);
     ASSERT_TRUE(stage.host.ActivateComposition(composition));
-    A_Time start{}, duration{};
-    A_Ratio aspect{};
-    EXPECT_EQ(0, stage.comps->AEGP_GetCompWorkAreaStart(stage.ActiveComp(), &start));
-    EXPECT_EQ(0, stage.comps->AEGP_GetCompWorkAreaDuration(stage.ActiveComp(), &duration));
-    EXPECT_EQ(0, stage.items->AEGP_GetItemPixelAspectRatio(stage.ActiveItem(), &aspect));
-    EXPECT_EQ(wantedStart, start.value);
-    EXPECT_EQ(30000u, start.scale);
-    EXPECT_EQ(wantedDuration, duration.value);
-    EXPECT_EQ(30000u, duration.scale);
-    EXPECT_EQ(wantedAspect.num, aspect.num);
-    EXPECT_EQ(wantedAspect.den, aspect.den);
+    const AEGP_CompH comp = stage.ActiveComp();
+    EXPECT_EQ(std::pair(start, 30000u), Fraction(Answer(stage.comps->AEGP_GetCompWorkAreaStart, comp)));
+    EXPECT_EQ(std::pair(duration, 30000u), Fraction(Answer(stage.comps->AEGP_GetCompWorkAreaDuration, comp)));
+    const A_Ratio aspect = Answer(stage.items->AEGP_GetItemPixelAspectRatio, stage.ActiveItem());
+    EXPECT_TRUE(wanted.num == aspect.num && wanted.den == aspect.den);
   }
   EXPECT_FALSE(stage.host.ActivateComposition("nowhere") || stage.host.ActivateComposition(""));
 }
@@ -138,44 +130,29 @@ TEST(ProjectItems, AnswerThroughTheSuites)
   const double colors[][3] = {{1, 128 / 255.0, 0}, {0, 170 / 255.0, 1}, {1, 1, 1}};
   for (A_long i = 0; i < 4; ++i) {
     SCOPED_TRACE(i);
-    AEGP_FootageH footage = nullptr;
-    AEGP_FootageSignature signature = -1;
-    AEGP_ItemType type = 0;
+    const AEGP_FootageH footage = Answer(stage.footage->AEGP_GetMainFootageFromItem, stage.Source(i));
     AEGP_ColorVal color{};
-    EXPECT_EQ(0, stage.footage->AEGP_GetMainFootageFromItem(stage.Source(i), &footage));
-    EXPECT_EQ(0, stage.footage->AEGP_GetFootageSignature(footage, &signature));
-    EXPECT_EQ(0, stage.items->AEGP_GetItemType(stage.Source(i), &type));
-    EXPECT_EQ(signatures[i], signature);
-    EXPECT_EQ(4, type);
+    EXPECT_EQ(signatures[i], Answer(stage.footage->AEGP_GetFootageSignature, footage));
+    EXPECT_EQ(4, Answer(stage.items->AEGP_GetItemType, stage.Source(i)));
     EXPECT_EQ(i < 3, stage.footage->AEGP_GetSolidFootageColor(stage.Source(i), 0, &color) == 0);
     if (i < 3) {
-      EXPECT_EQ(1, color.alphaF);
-      EXPECT_EQ(colors[i][0], color.redF);
-      EXPECT_EQ(colors[i][1], color.greenF);
-      EXPECT_EQ(colors[i][2], color.blueF);
+      EXPECT_EQ(std::tuple(1, colors[i][0], colors[i][1], colors[i][2]),
+                std::tuple(color.alphaF, color.redF, color.greenF, color.blueF));
     }
   }
-  AEGP_FootageH footage = nullptr;
+  const AEGP_FootageH footage = Answer(stage.footage->AEGP_GetMainFootageFromItem, stage.Source(3));
   A_long mainFiles = 0, perFrame = 0;
-  AEGP_MemHandle path = nullptr;
-  EXPECT_EQ(0, stage.footage->AEGP_GetMainFootageFromItem(stage.Source(3), &footage));
   EXPECT_EQ(0, stage.footage->AEGP_GetFootageNumFiles(footage, &mainFiles, &perFrame));
-  EXPECT_EQ(3, mainFiles);
-  EXPECT_EQ(1, perFrame);
-  EXPECT_EQ(0, stage.footage->AEGP_GetFootagePath(footage, 0, 0, &path));
+  EXPECT_TRUE(mainFiles == 3 && perFrame == 1);
+  AEGP_MemHandle path = Answer(stage.footage->AEGP_GetFootagePath, footage, 0, 0);
   EXPECT_EQ((stage::kFolder / "x.png").u16string(), stage.TakeText<char16_t>(path));
   EXPECT_NE(0, stage.footage->AEGP_GetFootagePath(footage, 3, 0, &path));
 
-  AEGP_ItemType type = 0;
-  EXPECT_EQ(0, stage.items->AEGP_GetItemType(stage.Source(4), &type));
-  EXPECT_EQ(2, type);
+  EXPECT_EQ(2, Answer(stage.items->AEGP_GetItemType, stage.Source(4)));
   EXPECT_EQ(u"Raum \u00fc \U0001F680", stage.ItemName(stage.Source(4)));
-  EXPECT_EQ(0, stage.footage->AEGP_GetMainFootageFromItem(stage.Source(4), &footage));
-  EXPECT_EQ(nullptr, footage);
+  EXPECT_EQ(nullptr, Answer(stage.footage->AEGP_GetMainFootageFromItem, stage.Source(4)));
   EXPECT_EQ(nullptr, stage.Source(5));
-  AEGP_CompH comp = stage.ActiveComp();
-  EXPECT_EQ(0, stage.comps->AEGP_GetCompFromItem(stage.Source(0), &comp));
-  EXPECT_EQ(nullptr, comp);
+  EXPECT_EQ(nullptr, Answer(stage.comps->AEGP_GetCompFromItem, stage.Source(0)));
 }
 
 // --- Layers
@@ -204,18 +181,12 @@ TEST(Layers, HaveTheirKindFlagsAndPlaceInTheList)
       {R"({"ty": 7, "ddd": 1})", -1, 1},
       {R"({"ddd": 1})", -1, 1},
   };
-  for (const auto& [layer, wantedType, wantedFlags] : cases) {
+  for (const auto& [layer, type, flags] : cases) {
     SCOPED_TRACE(layer);
     const Stage stage(layer);
-    AEGP_ObjectType type = -7;
-    AEGP_LayerFlags flags = -7;
-    A_Boolean is3D = 7;
-    EXPECT_EQ(0, stage.layers->AEGP_GetLayerObjectType(stage.Layer(0), &type));
-    EXPECT_EQ(0, stage.layers->AEGP_GetLayerFlags(stage.Layer(0), &flags));
-    EXPECT_EQ(0, stage.layers->AEGP_IsLayer3D(stage.Layer(0), &is3D));
-    EXPECT_EQ(wantedType, type);
-    EXPECT_EQ(wantedFlags, flags);
-    EXPECT_EQ((wantedFlags & 0x800) != 0, is3D);
+    EXPECT_EQ(type, Answer(stage.layers->AEGP_GetLayerObjectType, stage.Layer(0)));
+    EXPECT_EQ(flags, Answer(stage.layers->AEGP_GetLayerFlags, stage.Layer(0)));
+    EXPECT_EQ((flags & 0x800) != 0, Answer(stage.layers->AEGP_IsLayer3D, stage.Layer(0)));
   }
 }
 
@@ -224,16 +195,8 @@ TEST(Layers, CountTheirIdsThroughTheAssetsAndFindParentsInTheirList)
   Stage stage(R"({"ty": 3, "ind": 7, "parent": 9}, {"ty": 5, "nm": "Titel \u2014", "ind": 9})",
               R"("assets": [{"id": "i", "p": "x.png"}, {"id": "c", "layers": [{"ty": 3, "ind": 9}]},
                             {"id": "d", "layers": [{"ty": 3}, {"ty": 3, "ind": 1, "parent": 2}, {"ty": 3, "ind": 2}]}])");
-  const auto id = [&](AEGP_LayerH layer) {
-    AEGP_LayerIDVal value = 0;
-    EXPECT_EQ(0, stage.layers->AEGP_GetLayerID(layer, &value));
-    return value;
-  };
-  const auto parent = [&](A_long index) {
-    AEGP_LayerH value = stage.Layer(0);
-    EXPECT_EQ(0, stage.layers->AEGP_GetLayerParent(stage.Layer(index), &value));
-    return value;
-  };
+  const auto id = [&](AEGP_LayerH layer) { return Answer(stage.layers->AEGP_GetLayerID, layer); };
+  const auto parent = [&](A_long index) { return Answer(stage.layers->AEGP_GetLayerParent, stage.Layer(index)); };
   EXPECT_EQ(1, id(stage.Layer(0)));
   EXPECT_EQ(stage.Layer(1), parent(0));
   EXPECT_EQ(nullptr, parent(1));
@@ -248,9 +211,7 @@ TEST(Layers, CountTheirIdsThroughTheAssetsAndFindParentsInTheirList)
   EXPECT_NE(0, stage.layers->AEGP_GetCompLayerByIndex(stage.ActiveComp(), -1, &none));
 
   ASSERT_TRUE(stage.host.ActivateComposition("d"));
-  A_long count = 0;
-  EXPECT_EQ(0, stage.layers->AEGP_GetCompNumLayers(stage.ActiveComp(), &count));
-  EXPECT_EQ(3, count);
+  EXPECT_EQ(3, Answer(stage.layers->AEGP_GetCompNumLayers, stage.ActiveComp()));
   EXPECT_EQ(4, id(stage.Layer(0))); // behind two of the root and one of "c"
   EXPECT_EQ(6, id(parent(1)));
 }
@@ -265,21 +226,15 @@ TEST(Layers, AnswerForCamerasAndLightsAlone)
   const AEGP_FilmSizeUnits units[] = {1, 3, 2};
   const double sizes[] = {102.047244094488, 72, 102.047244094488};
   for (A_long i = 0; i < 3; ++i) {
-    AEGP_CameraType type = 9;
     AEGP_FilmSizeUnits unit = 9;
-    double size = 0;
-    EXPECT_EQ(0, stage.cameras->AEGP_GetCameraType(stage.Layer(i), &type));
-    EXPECT_EQ(0, stage.cameras->AEGP_GetCameraFilmSize(stage.Layer(i), &unit, &size));
-    EXPECT_EQ(types[i], type);
+    EXPECT_EQ(types[i], Answer(stage.cameras->AEGP_GetCameraType, stage.Layer(i)));
+    EXPECT_EQ(sizes[i], Answer(stage.cameras->AEGP_GetCameraFilmSize, stage.Layer(i), &unit));
     EXPECT_EQ(units[i], unit);
-    EXPECT_EQ(sizes[i], size);
   }
+  const AEGP_LightType lights[] = {2, 0, 1, 3};
+  for (A_long i = 3; i < 7; ++i)
+    EXPECT_EQ(lights[i - 3], Answer(stage.lights->AEGP_GetLightType, stage.Layer(i)));
   AEGP_LightType light = 9;
-  for (A_long i = 3; i < 7; ++i) {
-    const AEGP_LightType lights[] = {2, 0, 1, 3};
-    EXPECT_EQ(0, stage.lights->AEGP_GetLightType(stage.Layer(i), &light));
-    EXPECT_EQ(lights[i - 3], light);
-  }
   AEGP_CameraType camera = 9;
   EXPECT_NE(0, stage.lights->AEGP_GetLightType(stage.Layer(0), &light));
   EXPECT_NE(0, stage.cameras->AEGP_GetCameraType(stage.Layer(3), &camera));
@@ -309,10 +264,8 @@ TEST(Streams, AreLegalByTheKindOfLayer)
     const auto* older = stage::Acquire<AEGP_StreamSuite7>(stage.host, "AEGP Stream Suite", 7);
     Ids legal, gettable;
     for (AEGP_LayerStream id = -1; id < 40; ++id) {
-      A_Boolean isLegal = 9, isLegalOlder = 9;
-      EXPECT_EQ(0, stage.streams->AEGP_IsStreamLegal(stage.Layer(0), id, &isLegal));
-      EXPECT_EQ(0, older->AEGP_IsStreamLegal(stage.Layer(0), id, &isLegalOlder));
-      EXPECT_EQ(isLegal, isLegalOlder);
+      const A_Boolean isLegal = Answer(stage.streams->AEGP_IsStreamLegal, stage.Layer(0), id);
+      EXPECT_EQ(isLegal, Answer(older->AEGP_IsStreamLegal, stage.Layer(0), id));
       if (isLegal)
         legal.push_back(id);
       if (stage.Stream(0, id))
@@ -360,13 +313,11 @@ TEST(Streams, ReadTheirPlaceOrTheirDefault)
       {plainSpot, 28, {0}, 5},
       {plainSpot, 20, {100}, 5},
   };
-  for (const auto& [layer, stream, expected, wantedType] : cases) {
+  for (const auto& [layer, stream, expected, type] : cases) {
     SCOPED_TRACE(std::string(layer) + " stream " + std::to_string(stream));
     const Stage stage(layer);
     EXPECT_EQ(expected, stage.ValueAt(0, stream, {20, 25}));
-    AEGP_StreamType type = 0;
-    EXPECT_EQ(0, stage.streams->AEGP_GetStreamType(stage.Stream(0, stream), &type));
-    EXPECT_EQ(wantedType, type);
+    EXPECT_EQ(type, Answer(stage.streams->AEGP_GetStreamType, stage.Stream(0, stream)));
   }
 }
 
@@ -396,9 +347,7 @@ TEST(LoadComposition, FindsParentsAndNestedLayersOfAUsersFile)
     GTEST_SKIP() << "the users' compositions are not here";
   const Stage stage(host::LoadComposition(file));
   EXPECT_EQ(u"Parented Rotation", stage.ItemName(stage.ActiveItem()));
-  AEGP_LayerH parent = nullptr;
-  EXPECT_EQ(0, stage.layers->AEGP_GetLayerParent(stage.Layer(1), &parent));
-  EXPECT_EQ(stage.Layer(0), parent);
+  EXPECT_EQ(stage.Layer(0), Answer(stage.layers->AEGP_GetLayerParent, stage.Layer(1)));
   EXPECT_EQ(host::Value{45}, stage.ValueAt(0, AEGP_LayerStream_ROTATE_Z, {30, 60}));
   // Half way between two keys of a curve that is the same seen from both ends.
   EXPECT_NEAR(22.5, stage.ValueAt(0, AEGP_LayerStream_ROTATE_Z, {15, 60})[0], 1e-9);

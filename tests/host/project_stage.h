@@ -12,7 +12,9 @@ namespace project_tests
 
 using namespace project_bytes;
 using host::Value;
+using stage::Answer;
 using stage::ExpectNear;
+using stage::Fraction;
 using stage::Stage;
 
 inline std::unique_ptr<host::ProjectFile> Open(const std::string& bytes)

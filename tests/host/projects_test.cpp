@@ -36,25 +36,19 @@ TEST(ProjectCompositions, StateTheirTimesExactly)
   Comp between{}; // on no frame
   between.areaStart[0] = 1;
   between.areaStart[1] = 50;
-  const std::tuple<Comp, A_Time, A_Time, A_Time, double> cases[] = {
+  using Time = std::pair<A_long, A_u_long>;
+  const std::tuple<Comp, Time, Time, Time, double> cases[] = {
       {Comp{}, {1, 25}, {0, 25}, {250, 25}, 25},
       {television, {100, 2997}, {0, 2997}, {289400, 2997}, 29.970001220703125},
       {cut, {100, 2997}, {1000, 2997}, {3000, 2997}, 29.970001220703125},
       {between, {1, 25}, {1, 50}, {499, 50}, 25}};
-  for (const auto& [comp, wantedFrame, wantedStart, wantedDuration, wantedRate] : cases) {
+  for (const auto& [comp, frame, start, duration, rate] : cases) {
     const Stage stage(Read(comp));
-    A_Time frame{}, start{}, duration{};
-    A_FpLong rate = 0;
-    EXPECT_EQ(0, stage.comps->AEGP_GetCompFrameDuration(stage.ActiveComp(), &frame));
-    EXPECT_EQ(0, stage.comps->AEGP_GetCompWorkAreaStart(stage.ActiveComp(), &start));
-    EXPECT_EQ(0, stage.comps->AEGP_GetCompWorkAreaDuration(stage.ActiveComp(), &duration));
-    EXPECT_EQ(0, stage.comps->AEGP_GetCompFramerate(stage.ActiveComp(), &rate));
-    const std::pair<A_Time, A_Time> times[] = {{wantedFrame, frame}, {wantedStart, start}, {wantedDuration, duration}};
-    for (const auto& [expected, actual] : times) {
-      EXPECT_EQ(expected.value, actual.value);
-      EXPECT_EQ(expected.scale, actual.scale);
-    }
-    EXPECT_EQ(wantedRate, rate);
+    const AEGP_CompH active = stage.ActiveComp();
+    EXPECT_EQ(frame, Fraction(Answer(stage.comps->AEGP_GetCompFrameDuration, active)));
+    EXPECT_EQ(start, Fraction(Answer(stage.comps->AEGP_GetCompWorkAreaStart, active)));
+    EXPECT_EQ(duration, Fraction(Answer(stage.comps->AEGP_GetCompWorkAreaDuration, active)));
+    EXPECT_EQ(rate, Answer(stage.comps->AEGP_GetCompFramerate, active));
   }
 }
 
@@ -452,12 +446,10 @@ TEST(ProjectProperties, MayBeSeparatedOrHaveExpressions)
   const Stage stage(Read(WithLayers({MakeLayer(layer)}), {kSolid}));
   ExpectNear({11, 6, 0}, At(stage, AEGP_LayerStream_POSITION, 12.5));
   ExpectNear({4}, At(stage, AEGP_LayerStream_ROTATE_X, 12.5));
-  A_Boolean isOn = 0;
   for (const auto& [stream, expected] :
        {std::pair{AEGP_LayerStream_POSITION, 1}, std::pair{AEGP_LayerStream_ROTATE_Y, 0}}) {
     const AEGP_StreamRefH handle = stage.Stream(0, stream);
-    EXPECT_EQ(0, stage.streams->AEGP_GetExpressionState(0, handle, &isOn));
-    EXPECT_EQ(expected, isOn);
+    EXPECT_EQ(expected, Answer(stage.streams->AEGP_GetExpressionState, 0, handle));
     EXPECT_EQ(0, stage.streams->AEGP_DisposeStream(handle));
   }
 }

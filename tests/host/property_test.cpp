@@ -206,18 +206,13 @@ TEST(PropertyState, CountsKeysAndTellsWhatVaries)
       {R"({"s": true, "x": {"k": 1}, "y": {"k": [{"t": 0, "s": 1}, {"t": 1, "s": 1}]}, "z": {"k": 0, "x": "t"}})", 2,
        true, true},
   };
-  for (const auto& [position, wantedKeys, isVarying, hasExpression] : cases) {
+  for (const auto& [position, keys, varies, hasExpression] : cases) {
     SCOPED_TRACE(position);
     const Stage stage = WithPosition(position);
     const AEGP_StreamRefH stream = stage.Stream(0, AEGP_LayerStream_POSITION);
-    A_long keys = -1;
-    A_Boolean varies = 2, isOn = 2;
-    EXPECT_EQ(0, stage.keyframes->AEGP_GetStreamNumKFs(stream, &keys));
-    EXPECT_EQ(0, stage.streams->AEGP_IsStreamTimevarying(stream, &varies));
-    EXPECT_EQ(0, stage.streams->AEGP_GetExpressionState(0, stream, &isOn));
-    EXPECT_EQ(wantedKeys, keys);
-    EXPECT_EQ(isVarying, varies);
-    EXPECT_EQ(hasExpression, isOn);
+    EXPECT_EQ(keys, stage::Answer(stage.keyframes->AEGP_GetStreamNumKFs, stream));
+    EXPECT_EQ(varies, stage::Answer(stage.streams->AEGP_IsStreamTimevarying, stream));
+    EXPECT_EQ(hasExpression, stage::Answer(stage.streams->AEGP_GetExpressionState, 0, stream));
   }
 }
 

@@ -5,7 +5,11 @@
 
 #include <gtest/gtest.h>
 
+#include <cstring>
 #include <string>
+#include <tuple>
+#include <type_traits>
+#include <utility>
 
 namespace stage
 {
@@ -33,6 +37,18 @@ const Suite* Acquire(host::StandaloneHost& host, const char* name, std::int32_t 
   return static_cast<const Suite*>(table);
 }
 
+// What a question answers in its last argument.
+template <class... Parameters, class... Arguments>
+auto Answer(A_Err (*ask)(Parameters...), Arguments... arguments)
+{
+  std::remove_pointer_t<std::tuple_element_t<sizeof...(Parameters) - 1, std::tuple<Parameters...>>> answer;
+  std::memset(&answer, 0x5A, sizeof answer);
+  EXPECT_EQ(0, ask(arguments..., &answer));
+  return answer;
+}
+
+inline std::pair<A_long, A_u_long> Fraction(A_Time time) { return {time.value, time.scale}; }
+
 inline void ExpectNear(const host::Value& expected, const host::Value& actual, double tolerance = 1e-9)
 {
   for (std::size_t c = 0; c < 3; ++c)
@@ -58,33 +74,10 @@ struct Stage
   const AEGP_CameraSuite2* cameras = Acquire<AEGP_CameraSuite2>(host, "AEGP Camera Suite", 2);
   const AEGP_LightSuite2* lights = Acquire<AEGP_LightSuite2>(host, "AEGP Light Suite", 2);
 
-  AEGP_ItemH ActiveItem() const
-  {
-    AEGP_ItemH item = nullptr;
-    EXPECT_EQ(0, items->AEGP_GetActiveItem(&item));
-    return item;
-  }
-
-  AEGP_CompH ActiveComp() const
-  {
-    AEGP_CompH comp = nullptr;
-    EXPECT_EQ(0, comps->AEGP_GetCompFromItem(ActiveItem(), &comp));
-    return comp;
-  }
-
-  AEGP_LayerH Layer(A_long index) const
-  {
-    AEGP_LayerH layer = nullptr;
-    EXPECT_EQ(0, layers->AEGP_GetCompLayerByIndex(ActiveComp(), index, &layer));
-    return layer;
-  }
-
-  AEGP_ItemH Source(A_long index) const
-  {
-    AEGP_ItemH item = nullptr;
-    EXPECT_EQ(0, layers->AEGP_GetLayerSourceItem(Layer(index), &item));
-    return item;
-  }
+  AEGP_ItemH ActiveItem() const { return Answer(items->AEGP_GetActiveItem); }
+  AEGP_CompH ActiveComp() const { return Answer(comps->AEGP_GetCompFromItem, ActiveItem()); }
+  AEGP_LayerH Layer(A_long index) const { return Answer(layers->AEGP_GetCompLayerByIndex, ActiveComp(), index); }
+  AEGP_ItemH Source(A_long index) const { return Answer(layers->AEGP_GetLayerSourceItem, Layer(index)); }
 
   AEGP_StreamRefH Stream(A_long index, AEGP_LayerStream which) const
   {
@@ -97,8 +90,7 @@ struct Stage
   template <class Char>
   std::basic_string<Char> TakeText(AEGP_MemHandle handle) const
   {
-    void* data = nullptr;
-    EXPECT_EQ(0, memory->AEGP_LockMemHandle(handle, &data));
+    const void* data = Answer(memory->AEGP_LockMemHandle, handle);
     std::basic_string<Char> text = data ? static_cast<const Char*>(data) : std::basic_string<Char>();
     EXPECT_EQ(0, memory->AEGP_UnlockMemHandle(handle));
     EXPECT_EQ(0, memory->AEGP_FreeMemHandle(handle));
@@ -107,9 +99,7 @@ struct Stage
 
   std::u16string ItemName(AEGP_ItemH item) const
   {
-    AEGP_MemHandle name = nullptr;
-    EXPECT_EQ(0, items->AEGP_GetItemName(0, item, &name));
-    return TakeText<char16_t>(name);
+    return TakeText<char16_t>(Answer(items->AEGP_GetItemName, 0, item));
   }
 
   // The three components of a stream's value, those that it doesn't have 0.
@@ -118,8 +108,7 @@ struct Stage
     const AEGP_StreamRefH stream = Stream(index, which);
     AEGP_StreamValue2 value{};
     EXPECT_EQ(0, streams->AEGP_GetNewStreamValue(0, stream, AEGP_LTimeMode_CompTime, &time, preExpression, &value));
-    AEGP_StreamType type = 0;
-    EXPECT_EQ(0, streams->AEGP_GetStreamType(stream, &type));
+    const AEGP_StreamType type = Answer(streams->AEGP_GetStreamType, stream);
     host::Value result{value.val.three_d.x, value.val.three_d.y, value.val.three_d.z};
     if (type == AEGP_StreamType_OneD)
       result = {value.val.one_d};
