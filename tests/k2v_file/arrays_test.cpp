@@ -15,10 +15,8 @@ void Fill(LongArray& array, Long count)
 
 TEST(DynArray, GrowsByItsIncrementOrTwofold)
 {
-  for (const auto& [first, increment, count, capacity] :
-       {std::tuple<Long, Long, Long, Long>{4, 0, 1, 4}, std::tuple<Long, Long, Long, Long>{4, 0, 5, 8},
-        std::tuple<Long, Long, Long, Long>{4, 0, 9, 16}, std::tuple<Long, Long, Long, Long>{4, 3, 5, 7},
-        std::tuple<Long, Long, Long, Long>{4, 3, 8, 10}}) {
+  const Long rows[][4] = {{4, 0, 1, 4}, {4, 0, 5, 8}, {4, 0, 9, 16}, {4, 3, 5, 7}, {4, 3, 8, 10}};
+  for (const auto& [first, increment, count, capacity] : rows) {
     LongArray array(first, increment);
     Fill(array, count);
     EXPECT_EQ(array.GetCapacity(), capacity);
@@ -48,8 +46,7 @@ TEST(DynArray, EditsWithinItsBounds)
   array.Swap(0, 5);
   EXPECT_EQ(Values(array), (std::vector<Long>{9, 1, 2, 8, 0}));
   Long last = -1;
-  EXPECT_TRUE(array.Pop(&last));
-  EXPECT_EQ(last, 0);
+  EXPECT_TRUE(array.Pop(&last) && last == 0);
   EXPECT_TRUE(array.SetCount(6));
   EXPECT_EQ(Values(array), (std::vector<Long>{9, 1, 2, 8, 0, 0}));
   EXPECT_FALSE(array.SetCount(-1));
@@ -98,8 +95,7 @@ TEST(ToolDynArray, HandlesPointersByIdentityAndByOrder)
   EXPECT_EQ(array.Pop(), nullptr);
   for (Long& number : numbers)
     ASSERT_TRUE(array.Append(&number));
-  EXPECT_EQ(array.Find(&numbers[2]), 2);
-  EXPECT_EQ(array.Find(&array), -1);
+  EXPECT_TRUE(array.Find(&numbers[2]) == 2 && array.Find(&array) == -1);
   EXPECT_FALSE(array.RemoveObject(&array));
   array.Sort(CompareLongs);
   const Long sought = 10;
@@ -107,8 +103,7 @@ TEST(ToolDynArray, HandlesPointersByIdentityAndByOrder)
   EXPECT_EQ(array.Pop(), &numbers[0]);
   EXPECT_TRUE(array.RemoveObject(&numbers[2]));
   const Long missing = 20;
-  EXPECT_EQ(array.Search(&missing, CompareLongs), nullptr);
-  EXPECT_EQ(array.Search(nullptr, CompareLongs), nullptr);
+  EXPECT_FALSE(array.Search(&missing, CompareLongs) || array.Search(nullptr, CompareLongs));
 }
 
 // Orders elements of any size by the number in their first bytes.
@@ -164,10 +159,8 @@ TEST(SortAndSearch, FindsTheFirstOfEqualsAndThePlaceOfAMissingKey)
     ASSERT_EQ(order.Search(&key, values.data(), static_cast<Long>(values.size()), 1), found);
   }
   UChar value = 1;
-  EXPECT_EQ(order.Search(nullptr, &value, 1, 1), nullptr);
-  EXPECT_EQ(order.Search(&value, nullptr, 1, 1), nullptr);
-  EXPECT_EQ(order.Search(&value, &value, 0, 1), nullptr);
-  EXPECT_EQ(order.Search(&value, &value, 1, 0), nullptr);
+  EXPECT_FALSE(order.Search(nullptr, &value, 1, 1) || order.Search(&value, nullptr, 1, 1));
+  EXPECT_FALSE(order.Search(&value, &value, 0, 1) || order.Search(&value, &value, 1, 0));
 }
 
 struct Entry
@@ -184,8 +177,7 @@ TEST(SortSearchArray, KeepsElementsInTheOrderOfTheirKeys)
   for (ULong key : {7u, 3u, large, 5u})
     ASSERT_TRUE(array.Insert({key, static_cast<Long>(key & 15)}));
   EXPECT_TRUE(array.IsSorted());
-  EXPECT_EQ(array[0].key, 3u);
-  EXPECT_EQ(array[3].key, large);
+  EXPECT_TRUE(array[0].key == 3u && array[3].key == large);
   ASSERT_TRUE(array.Append({4, 44}));
   EXPECT_FALSE(array.IsSorted());
   Long position = -1;
@@ -211,8 +203,7 @@ class Node : public GeTempPublicNode2D<Node>
 
 std::vector<int> Numbers(const GeTempPublicList2D<Node>& list)
 {
-  std::vector<int> forward;
-  std::vector<int> backward;
+  std::vector<int> forward, backward;
   for (const Node* node = list.GetFirst(); node; node = node->GetNext())
     forward.push_back(node->number);
   for (const Node* node = list.GetLast(); node; node = node->GetPrev())

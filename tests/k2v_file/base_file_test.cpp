@@ -134,14 +134,10 @@ TEST_F(BaseFileTest, FloatsThatAreNotFiniteBecomeZeroInBothDirections)
 
   const Bytes bytes = ByteWriter().U32(0x7F800000).U32(0xFFC00001).U32(0x7FF00000).U32(0).U32(0xFFF80000).U32(1).bytes;
   ASSERT_TRUE(file.Open(NameOf("memory", bytes), kFileRead));
-  for (int i = 0; i < 2; ++i) {
-    SReal value = 1;
+  for (SReal value : {1.0F, 1.0F})
     EXPECT_TRUE(file.ReadSReal(value) && value == 0);
-  }
-  for (int i = 0; i < 2; ++i) {
-    Real value = 1;
+  for (Real value : {1.0, 1.0})
     EXPECT_TRUE(file.ReadReal(value) && value == 0);
-  }
 }
 
 // One random step of reading; `position` is what the file's must be.
@@ -273,12 +269,9 @@ TEST_F(BaseFileTest, AReadToTheEndIsNoErrorAndOnePastItEndsTheFile)
     file.SetError(FILEERROR_INVALID);
     EXPECT_EQ(file.GetError(), FILEERROR_READ);
     EXPECT_FALSE(file.Seek(0));
-    EXPECT_EQ(file.ReadBytes(got.data(), 1, true), 0);
-    EXPECT_EQ(file.ReadBytes(got.data(), 0), 0);
-    EXPECT_FALSE(file.WriteBytes(got.data(), 0));
-    EXPECT_EQ(file.GetLength(), 0);
-    EXPECT_EQ(file.GetRemaining(), 0);
-    EXPECT_EQ(file.ReadWindow(1), nullptr);
+    EXPECT_TRUE(file.ReadBytes(got.data(), 1, true) == 0 && file.ReadBytes(got.data(), 0) == 0);
+    EXPECT_FALSE(file.WriteBytes(got.data(), 0) || file.ReadWindow(1));
+    EXPECT_TRUE(file.GetLength() == 0 && file.GetRemaining() == 0);
     EXPECT_FALSE(file.Close());
     EXPECT_EQ(file.GetPosition(), 20000);
     EXPECT_TRUE(file.Open(NameOf(target, bytes), kFileRead)) << "opening starts afresh";
@@ -516,8 +509,7 @@ TEST_F(BaseFileTest, PositionsPastTwoGigabytesWork)
   for (Long mode : {kFileRead, kFileReadWrite}) {
     ASSERT_TRUE(file.Open(name, mode) && file.Seek(kFar) && file.ReadULong(value));
     EXPECT_EQ(value, 0x01020304U);
-    EXPECT_EQ(file.GetLength(), kFar + 4);
-    EXPECT_EQ(file.GetPosition(), kFar + 4);
+    EXPECT_TRUE(file.GetLength() == kFar + 4 && file.GetPosition() == kFar + 4);
   }
 }
 
@@ -526,8 +518,7 @@ TEST_F(BaseFileTest, PathsReachTheSystemAsUtf8)
 {
   const std::pair<std::u16string, const char*> kCases[] = {
       {u"\u00E9\u20AC", "\xC3\xA9\xE2\x82\xAC"},
-      {u"a\U0001F600b", "a\xF0\x9F\x98\x80"
-                        "b"},
+      {u"a\U0001F600b", "a\360\237\230\200b"},
       {u"\xD83D\u00E9", "\xED\xA0\xBD\xC3\xA9"},     // the first half of a pair alone
       {u"\xDE00\xD83D", "\xED\xB8\x80\xED\xA0\xBD"}, // halves in the wrong order
   };

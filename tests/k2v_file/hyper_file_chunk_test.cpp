@@ -66,14 +66,10 @@ TEST(HyperFileSkip, PassesOverEveryValueInMemoryAndOnDisk)
 
 TEST(HyperFileSkip, CountsSomeOldArraysByAnotherElementSize)
 {
-  for (const auto& [version, precision, tag, length, body] :
-       {std::tuple<std::int32_t, std::uint8_t, std::uint8_t, std::uint32_t, std::size_t>{11924, 0, 133, 25, 50},
-        std::tuple<std::int32_t, std::uint8_t, std::uint8_t, std::uint32_t, std::size_t>{11925, 0, 133, 25, 25},
-        std::tuple<std::int32_t, std::uint8_t, std::uint8_t, std::uint32_t, std::size_t>{11924, 1, 133, 25, 25},
-        std::tuple<std::int32_t, std::uint8_t, std::uint8_t, std::uint32_t, std::size_t>{11924, 0, 136, 100, 168},
-        std::tuple<std::int32_t, std::uint8_t, std::uint8_t, std::uint32_t, std::size_t>{11925, 0, 136, 100, 100},
-        std::tuple<std::int32_t, std::uint8_t, std::uint8_t, std::uint32_t, std::size_t>{11924, 1, 136, 100, 100},
-        std::tuple<std::int32_t, std::uint8_t, std::uint8_t, std::uint32_t, std::size_t>{11924, 0, 134, 100, 100}}) {
+  const std::tuple<std::int32_t, std::uint8_t, std::uint8_t, std::uint32_t, std::size_t> rows[] = {
+      {11924, 0, 133, 25, 50},   {11925, 0, 133, 25, 25},   {11924, 1, 133, 25, 25},  {11924, 0, 136, 100, 168},
+      {11925, 0, 136, 100, 100}, {11924, 1, 136, 100, 100}, {11924, 0, 134, 100, 100}};
+  for (const auto& [version, precision, tag, length, body] : rows) {
     ByteWriter writer;
     writer.Header("Q7R6", version, precision).U8(tag).U32(length);
     MemoryReadFile read(Filler(writer, body).End().Long(77).bytes);
@@ -198,8 +194,7 @@ TEST(HyperFileContainer, ReplacesElementsUnlessItIsFlushed)
   container.SetLong(50, 1);
   EXPECT_TRUE(read.file.ReadContainer(container, false));
   ASSERT_EQ(container.GetCount(), 3); // 1, which was read twice, 50 and 2
-  EXPECT_TRUE(container.GetString(1) == String("ab") && container.GetLong(50) == 1 &&
-              container.GetContainerInstance(2));
+  EXPECT_TRUE(container.GetString(1) == String("ab") && container.GetLong(50) == 1 && container.FindData(2));
 }
 
 TEST(HyperFileContainer, RefusesWhatIsNoContainer)

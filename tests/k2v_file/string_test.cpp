@@ -8,28 +8,15 @@ String Repeat(Long count) { return String(count, u'x'); }
 TEST(String, KeepsCapacityAtMultiplesOf16AndReusesTheBlock)
 {
   String text;
-  EXPECT_EQ(text.GetCapacity(), 0);
-  EXPECT_EQ(text.Data(), nullptr);
+  EXPECT_TRUE(text.GetCapacity() == 0 && text.Data() == nullptr);
   const std::tuple<std::function<void()>, Long, Long> steps[] = {
       {[&] { text.FillChars(1, u'a'); }, 1, 16},
       {[&] { text.FillChars(16, u'b'); }, 16, 16},
       {[&] { text.InsertChar(16, u'c'); }, 17, 32},
       {[&] { text.Append(Repeat(15)); }, 32, 32},
-      {[&] {
-         text.Delete(16, 9);
-         text.Trim();
-       },
-       23, 32},
-      {[&] {
-         text.Delete(16, 7);
-         text.Trim();
-       },
-       16, 32},
-      {[&] {
-         text.Delete(15, 1);
-         text.Trim();
-       },
-       15, 16},
+      {[&] { text.Delete(16, 9), text.Trim(); }, 23, 32},
+      {[&] { text.Delete(16, 7), text.Trim(); }, 16, 32},
+      {[&] { text.Delete(15, 1), text.Trim(); }, 15, 16},
       {[&] { text.FillChars(40, u'd'); }, 40, 48},
       {[&] { text.Delete(3, 100); }, 3, 48},
       {[&] { text.Trim(); }, 3, 16},
@@ -111,14 +98,10 @@ TEST(String, FindsTheFirstAndTheLastPlace)
     }
   }
   Long at = 0;
-  EXPECT_TRUE(text.FindLast("ab", at));
-  EXPECT_EQ(at, 6);
-  EXPECT_TRUE(text.FindLast(u'A', at));
-  EXPECT_EQ(at, 3);
-  EXPECT_TRUE(text.FindLastUpper(u'a', at));
-  EXPECT_EQ(at, 6);
-  EXPECT_TRUE(text.FindFirstUpper(u'c', at, 3));
-  EXPECT_EQ(at, 5);
+  EXPECT_TRUE(text.FindLast("ab", at) && at == 6);
+  EXPECT_TRUE(text.FindLast(u'A', at) && at == 3);
+  EXPECT_TRUE(text.FindLastUpper(u'a', at) && at == 6);
+  EXPECT_TRUE(text.FindFirstUpper(u'c', at, 3) && at == 5);
 }
 
 TEST(String, EditsWithinItsBounds)
@@ -223,15 +206,9 @@ TEST(StringEncoding, ReadsBytesAsTheEncodingTells)
       {STRINGENCODING_DEFAULT, "\\u00e9x", u"\u00E9x"},
       {STRINGENCODING_DEFAULT, "\\u0000", u"_"},
       {STRINGENCODING_TABLE, "\x80\xE9\x9F", u"\u20AC\u00E9\u0178"},
-      {STRINGENCODING_DEFAULT,
-       "\x81"
-       "A",
-       u"\u0001A"}, // no pair begins with it
+      {STRINGENCODING_DEFAULT, "\201A", u"\u0001A"}, // no pair begins with it
       {STRINGENCODING_DEFAULT, "A\x81", u"A_"},
-      {STRINGENCODING_DEFAULT,
-       "\xFF"
-       "A",
-       u"\u0001A"},
+      {STRINGENCODING_DEFAULT, "\377A", u"\u0001A"},
       {STRINGENCODING_DEFAULT, "\0A"s, u"A"}, // a pair with the value of A
       {STRINGENCODING_ESCAPED, "\\u20AC\xE9", u"\u20AC\u00E9"},
       {STRINGENCODING_ESCAPED, "&#x00E9;", u"&#x00E9;"},
@@ -241,17 +218,11 @@ TEST(StringEncoding, ReadsBytesAsTheEncodingTells)
       {STRINGENCODING_UTF8, "A\xC3\xA9\xE4\xB8\xAD\\u00E9", u"A\u00E9\u4E2D\\u00E9"},
       {STRINGENCODING_UTF8, "\xE2\x80\x93\xE2\x80\x94", u"\n\u2014"},
       {STRINGENCODING_UTF8, "\xF0\x9F\x98\x80x", u"_x"},
-      {STRINGENCODING_UTF8,
-       "\xF8...."
-       "x\xFC.....x\xFE......x",
-       u"_x_x_x"},
+      {STRINGENCODING_UTF8, "\xF8....x\xFC.....x\xFE......x", u"_x_x_x"},
       {STRINGENCODING_UTF8, "\xE2\x80", u"\u00E2\u0080"}, // cut short
       {STRINGENCODING_UTF8, "\xF0\x9F", u"\u00F0\u009F"},
       {STRINGENCODING_UTF8, "\xC3\x28", u"\u00E8"}, // the second byte is only masked
-      {STRINGENCODING_UTF8,
-       "\xC0\x80"
-       "a\0b"s,
-       u"_a_b"},
+      {STRINGENCODING_UTF8, "\300\200a\0b"s, u"_a_b"},
   };
   for (const auto& [encoding, bytes, units] : rows) {
     String text;
@@ -312,7 +283,7 @@ TEST(String, KeepsItsBlockAfterShutdown)
 {
   const void* kept = nullptr;
   {
-    String text("static");
+    const String text("static");
     kept = text.Data();
     String::SetShutdown(true);
   }

@@ -115,7 +115,7 @@ TEST(BaseSelect, AgreesWithAPlainBitSetOverManyOperations)
 TEST(BaseSelect, ComesToTheseSegments)
 {
   const std::tuple<Segments, std::function<Bool(BaseSelect&)>, Segments> rows[] = {
-      {{}, [](BaseSelect& s) { return s.SelectAdd(5) && s.SelectAdd(7) && s.SelectAdd(6); }, {{5, 7}}},
+      {Segments{}, [](BaseSelect& s) { return s.SelectAdd(5) && s.SelectAdd(7) && s.SelectAdd(6); }, {{5, 7}}},
       {{{5, 7}}, [](BaseSelect& s) { return s.SelectRemove(6); }, {{5, 5}, {7, 7}}},
       {{{5, 5}}, [](BaseSelect& s) { return s.SelectRemove(5) && !s.SegmentArray(); }, {}},
       {{{1, 2}}, [](BaseSelect& s) { return s.SelectAll(4, 3) && !s.SegmentArray(); }, {}},
@@ -129,13 +129,13 @@ TEST(BaseSelect, ComesToTheseSegments)
        {{2, 5}}},
       {{{2, 5}}, [](BaseSelect& s) { return !s.GetSegment(-1, nullptr, nullptr) && s.SelectNone(); }, {}},
       // Both ends of the numbers.
-      {{}, [](BaseSelect& s) { return s.SelectAdd(-1) && s.SelectRemove(-1) && !s.IsSelected(-1); }, {}},
+      {Segments{}, [](BaseSelect& s) { return s.SelectAdd(-1) && s.SelectRemove(-1) && !s.IsSelected(-1); }, {}},
       {{{0, 0}}, [](BaseSelect& s) { return !s.IsSelected(-1) && s.SelectAdd(INT_MIN); }, {{0, 0}}},
-      {{}, [](BaseSelect& s) { return s.SelectAll(-7, 2) && s.SelectToggleRange(-9, 0); }, {{1, 2}}},
+      {Segments{}, [](BaseSelect& s) { return s.SelectAll(-7, 2) && s.SelectToggleRange(-9, 0); }, {{1, 2}}},
       {{{INT_MAX - 1, INT_MAX - 1}},
        [](BaseSelect& s) { return s.SelectAdd(INT_MAX) && s.IsSelected(INT_MAX); },
        {{INT_MAX - 1, INT_MAX}}},
-      {{},
+      {Segments{},
        [](BaseSelect& s) { return s.SelectAll(0, INT_MAX) && s.SelectedCount() == (LLong{1} << 31); },
        {{0, INT_MAX}}},
       {{{0, INT_MAX}}, [](BaseSelect& s) { return s.SelectToggleRange(1, INT_MAX - 1); }, {{0, 0}, {INT_MAX, INT_MAX}}},

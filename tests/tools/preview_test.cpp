@@ -104,9 +104,9 @@ TEST_F(Preview, RefusesWithOneLine)
       {"8 bits", scene, "--set " + Quoted(Write("8.bmp", narrow)), "out.q7r", "8.bmp: this kind isn't read"},
       {"a cut picture", scene, "--set " + Quoted(Write("cut.jpg", {0xFF, 0xD8, 0xFF})), "out.q7r", "cut.jpg: damaged"},
   };
-  for (const auto& [name, scene, rest, output, says] : cases) {
+  for (const auto& [name, input, rest, output, says] : cases) {
     SCOPED_TRACE(name);
-    ExpectRefusal(Run(scene, rest, folder_ / output), folder_ / output, says);
+    ExpectRefusal(Run(input, rest, folder_ / output), folder_ / output, says);
   }
   // An existing file is left alone.
   const std::string with = folder_ / "with.q7r";
