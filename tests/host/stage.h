@@ -42,6 +42,7 @@ template <class... Parameters, class... Arguments>
 auto Answer(A_Err (*ask)(Parameters...), Arguments... arguments)
 {
   std::remove_pointer_t<std::tuple_element_t<sizeof...(Parameters) - 1, std::tuple<Parameters...>>> answer;
+  // NOLINTNEXTLINE(bugprone-sizeof-expression): the answer's own bytes, be it a pointer or not
   std::memset(&answer, 0x5A, sizeof answer);
   EXPECT_EQ(0, ask(arguments..., &answer));
   return answer;
