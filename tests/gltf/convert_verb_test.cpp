@@ -5,7 +5,6 @@
 namespace
 {
 
-
 constexpr const char* kComposition = R"({"fr":25,"ip":0,"op":10,"w":1000,"h":500,"nm":"Main","layers":[
   {"ddd":1,"ty":13,"nm":"Eye","ks":{"p":{"k":[500,250,-800]}},"pe":{"k":800}},
   {"ddd":1,"ty":1,"nm":"Wall","sw":100,"sh":50,"sc":"#ff8000",
