@@ -45,7 +45,7 @@ SceneSettings SettingsOf(BaseDocument& document, const Options& options)
 class SceneTracks
 {
  public:
-  explicit SceneTracks(const SceneTree& tree) : tracks(tree.Count()), motions(tree.Count())
+  explicit SceneTracks(const SceneTree& tree) : tracks(tree), motions(tree)
   {
     for (std::size_t i = 0; i < tree.Count(); ++i) {
       if (!tree[i].object->GetFirstTrack())
@@ -54,15 +54,16 @@ class SceneTracks
       keys += set->CountKeys();
       earliest = std::min(earliest, set->Earliest());
       auto motion = std::make_unique<Motion>(*tree[i].object, *set);
-      tracks[i] = set.get();
-      motions[i] = motion->IsStill() ? nullptr : motion.get();
+      tracks.Set(i, set.get());
+      if (!motion->IsStill())
+        motions.Set(i, motion.get());
       ownedTracks_.push_back(std::move(set));
       ownedMotions_.push_back(std::move(motion));
     }
   }
 
-  std::vector<TrackSet*> tracks; // by object; null for none, as below
-  std::vector<const Motion*> motions;
+  ByObject<TrackSet> tracks;
+  ByObject<const Motion> motions;
   std::size_t keys = 0;
   Real earliest = 0.0;
 

@@ -42,14 +42,11 @@ void WriteGlb(const Model& model, const Sink& take)
     word(first);
     word(second);
   };
-  auto text = [&take](const std::string& part) {
-    take(reinterpret_cast<const std::uint8_t*>(part.data()), part.size());
-  };
+  auto text = [&take](std::string_view part) { take(reinterpret_cast<const std::uint8_t*>(part.data()), part.size()); };
   word(kMagic);
   header(kVersion, whole);
   header(json, kJsonChunk);
-  for (const std::string& piece : model.json.Pieces())
-    text(piece);
+  model.json.ForEachPiece(text);
   text(std::string(json - model.json.Size(), ' '));
   if (bytes == 0)
     return;

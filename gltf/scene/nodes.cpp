@@ -47,8 +47,8 @@ std::string UniqueNames::Take(const std::string& name)
   }
 }
 
-Nodes::Nodes(Context& context, Targets& targets, const std::vector<const Motion*>& motions,
-             std::vector<TrackSet*>& tracks)
+Nodes::Nodes(Context& context, Targets& targets, const ByObject<const Motion>& motions,
+             const ByObject<TrackSet>& tracks)
     : context_(context),
       targets_(targets),
       motions_(motions),
@@ -105,7 +105,7 @@ Nodes::Parts Nodes::PartsOf(std::size_t index, TrackSet& tracks)
 
 void Nodes::AddChildren(std::size_t index, std::size_t hiddenPart, Json& node) const
 {
-  for (std::size_t child = context_.tree[index].firstChild; child != kNone; child = context_.tree[child].nextSibling)
+  for (std::size_t child = context_.tree.FirstChild(index); child != kNone; child = context_.tree[child].nextSibling)
     node["children"].push_back(child);
   if (hiddenPart != kNone)
     node["children"].push_back(hiddenPart);

@@ -27,7 +27,7 @@ class UniqueNames
 class Nodes
 {
  public:
-  Nodes(Context& context, Targets& targets, const std::vector<const Motion*>& motions, std::vector<TrackSet*>& tracks);
+  Nodes(Context& context, Targets& targets, const ByObject<const Motion>& motions, const ByObject<TrackSet>& tracks);
 
   // Adds all nodes, in the order of the tree, and their channels.
   void Write();
@@ -53,8 +53,8 @@ class Nodes
 
   Context& context_;
   Targets& targets_;
-  const std::vector<const Motion*>& motions_;
-  std::vector<TrackSet*>& tracks_;
+  const ByObject<const Motion>& motions_;
+  const ByObject<TrackSet>& tracks_;
   Meshes meshes_;
   UniqueNames names_;
   std::vector<Json> addedNodes_; // behind those of the objects

@@ -56,14 +56,13 @@ SceneTree::SceneTree(BaseDocument& document)
 // Without a recursion: chains of parents are as long as their makers like.
 void SceneTree::AddAll(BaseObject* first)
 {
+  std::vector<std::size_t> offLayer; // by object: the nearest ancestor that isn't on its scene layer, or kNone
   std::size_t parent = kNone;
   std::size_t before = kNone; // the sibling before
   for (BaseObject* object = first; object;) {
-    const std::size_t index = Add(*object, parent);
+    const std::size_t index = Add(*object, parent, offLayer);
     if (before != kNone)
       objects_[before].nextSibling = index;
-    else if (parent != kNone)
-      objects_[parent].firstChild = index;
     before = index;
     if (BaseObject* child = object->GetDown()) {
       parent = index;
@@ -78,28 +77,32 @@ void SceneTree::AddAll(BaseObject* first)
     }
     object = object->GetNext();
   }
+  objects_.shrink_to_fit();
 }
 
-std::size_t SceneTree::Add(BaseObject& object, std::size_t parent)
+std::size_t SceneTree::Add(BaseObject& object, std::size_t parent, std::vector<std::size_t>& offLayer)
 {
-  SceneObject entry = {&object, parent, kNone, kNone, kNone, false};
-  if (parent != kNone)
-    entry.offLayer = LayerOf(*objects_[parent].object) == LayerOf(object) ? objects_[parent].offLayer : parent;
-  entry.hidden = IsHidden(entry);
-  objects_.push_back(entry);
+  const bool isOff = parent != kNone && LayerOf(*objects_[parent].object) != LayerOf(object);
+  offLayer.push_back(isOff || parent == kNone ? parent : offLayer[parent]);
+  objects_.push_back({&object, parent, kNone, IsHidden(object, parent, offLayer.back())});
   return objects_.size() - 1;
 }
 
-bool SceneTree::IsHidden(const SceneObject& entry) const
+bool SceneTree::IsHidden(const BaseObject& object, std::size_t parent, std::size_t offLayer) const
 {
-  const Long mode = entry.object->GetRenderMode();
+  const Long mode = object.GetRenderMode();
   if (mode == kObjectModeOff || mode == kObjectModeOn)
     return mode == kObjectModeOff;
-  if (!StandsForLayer(*entry.object))
-    return entry.parent != kNone && objects_[entry.parent].hidden;
-  const LayerObject* layer = LayerOf(*entry.object);
-  const bool isNested = layer && !layer->GetFlag(kFlagLocked) && entry.offLayer != kNone;
-  return isNested && objects_[entry.offLayer].hidden;
+  if (!StandsForLayer(object))
+    return parent != kNone && objects_[parent].hidden;
+  const LayerObject* layer = LayerOf(object);
+  const bool isNested = layer && !layer->GetFlag(kFlagLocked) && offLayer != kNone;
+  return isNested && objects_[offLayer].hidden;
+}
+
+std::size_t SceneTree::FirstChild(std::size_t index) const
+{
+  return index + 1 < objects_.size() && objects_[index + 1].parent == index ? index + 1 : kNone;
 }
 
 std::size_t SceneTree::Find(const GeListNode* node) const

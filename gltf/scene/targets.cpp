@@ -25,7 +25,7 @@ std::size_t LinkedTarget(const SceneTree& tree, const BaseObject& object)
 
 } // namespace
 
-Targets::Targets(const SceneTree& tree, const std::vector<const Motion*>& motions) : tree_(tree), motions_(motions)
+Targets::Targets(const SceneTree& tree, const ByObject<const Motion>& motions) : tree_(tree), motions_(motions)
 {
   for (std::size_t i = 0; i < tree.Count(); ++i) {
     const std::size_t target = LinkedTarget(tree, *tree[i].object);

@@ -16,8 +16,8 @@ namespace gltf
 class Targets
 {
  public:
-  // `motions` has an entry for each object; null where nothing moves. Both must outlive this.
-  Targets(const SceneTree& tree, const std::vector<const Motion*>& motions);
+  // Both must outlive this.
+  Targets(const SceneTree& tree, const ByObject<const Motion>& motions);
 
   // What an object looks at: its index, or kNone.
   std::size_t TargetOf(std::size_t index) const { return targets_.empty() ? kNone : targets_[index]; }
@@ -45,7 +45,7 @@ class Targets
   void NewTime();
 
   const SceneTree& tree_;
-  const std::vector<const Motion*>& motions_;
+  const ByObject<const Motion>& motions_;
   std::vector<std::size_t> targets_; // by object; empty if no object has one
   struct World
   {

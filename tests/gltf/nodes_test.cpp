@@ -240,4 +240,26 @@ TEST_F(GltfHidden, HiddenCamerasStayAndHiddenPartsCanBeKept)
       << "a hidden light lights nothing";
 }
 
+// What lies in a temporary file comes back, in its place, also when more follows.
+TEST(GltfLongText, IsWholeWhereverItLies)
+{
+  gltf::LongText text;
+  std::string expected = "before";
+  text += expected;
+  for (const char* part : {"first", "second"}) {
+    gltf::LongText section;
+    for (int i = 0; i < 400'000; ++i)
+      section += part + std::to_string(i);
+    const std::string whole = section.Joined();
+    EXPECT_TRUE(whole.size() == section.Size() && whole.starts_with(part) && whole.ends_with("399999"));
+    section += "behind";
+    text.Take(section);
+    EXPECT_EQ(section.Joined(), "");
+    text += "between";
+    expected += whole + "behind" + "between";
+  }
+  EXPECT_EQ(text.Size(), expected.size());
+  EXPECT_TRUE(text.Joined() == expected);
+}
+
 } // namespace

@@ -41,8 +41,8 @@ void WriteMain(const gltf::Model& model, const std::string& title, GltfForm form
     return gltf::WritePage(model, title, write);
   if (form == GltfForm::kGlb)
     return gltf::WriteGlb(model, write);
-  for (const std::string& piece : model.json.Pieces())
-    write(reinterpret_cast<const std::uint8_t*>(piece.data()), piece.size());
+  model.json.ForEachPiece(
+      [&write](std::string_view piece) { write(reinterpret_cast<const std::uint8_t*>(piece.data()), piece.size()); });
 }
 
 // A file that `fill` hands its bytes to, piece by piece.
