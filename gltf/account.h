@@ -56,7 +56,7 @@ class Account
   // One line for each kind, and for each picture.
   std::vector<std::string> Lines() const;
   std::size_t CountOf(Loss loss, int detail = 0) const;
-  // A picture is missing or damaged.
+  // A picture is missing, damaged or can't be read.
   bool HasProblems() const { return !pictures_.empty(); }
 
  private:

@@ -140,8 +140,6 @@ PictureFile ReadPictureFile(const std::filesystem::path& path, bool keepBytes)
   if (!std::filesystem::is_regular_file(path, error))
     return {};
   std::ifstream file(path, std::ios::binary);
-  if (!file)
-    return {};
   // A movie may be large, and its first bytes tell enough.
   Bytes bytes(sizeof kPngSignature);
   file.read(reinterpret_cast<char*>(bytes.data()), static_cast<std::streamsize>(bytes.size()));
@@ -156,6 +154,8 @@ PictureFile ReadPictureFile(const std::filesystem::path& path, bool keepBytes)
     }
   }
   PictureFile picture = LookAtPicture(std::move(bytes));
+  if (!file.is_open() || file.bad())
+    picture.state = PictureState::kUnreadable;
   if (!keepBytes)
     Bytes().swap(picture.bytes);
   return picture;

@@ -12,9 +12,10 @@ namespace gltf
 enum class PictureState
 {
   kGood,
-  kMissing, // no file, or one that can't be read
-  kOther,   // neither PNG nor JPEG
-  kDamaged, // cut, or without a pixel
+  kMissing,
+  kUnreadable, // the system refuses it
+  kOther,      // neither PNG nor JPEG
+  kDamaged,    // cut, or without a pixel
 };
 
 struct PictureFile

@@ -45,6 +45,8 @@ Picture Pictures::Read(const std::string& name)
     picture.image = AddImage(path, file);
   else if (file.state == PictureState::kMissing)
     context_.output.account.TellPicture(name, "the picture is missing");
+  else if (file.state == PictureState::kUnreadable)
+    context_.output.account.TellPicture(name, "the picture can't be read");
   else if (file.state == PictureState::kDamaged)
     context_.output.account.TellPicture(name, "the picture is damaged");
   if (!error)

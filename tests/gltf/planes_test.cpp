@@ -230,6 +230,10 @@ TEST_F(GltfPlanes, ShowTheColourAloneWherePicturesFail)
                                 "missing.png: the picture is missing", "/nowhere/missing.png: the picture is missing",
                                 "/dev/zero: the picture is missing", "1 movie: the colour alone",
                                 "2 pictures that are neither PNG nor JPEG: the colour alone"}));
+#ifdef __linux__ // has a file that opens, but that can't be read from its start
+  AddPlane("unreadable", 1, 1, AddPicture("unreadable", "/proc/self/mem"));
+  EXPECT_EQ(Convert().Account().Lines()[9], "/proc/self/mem: the picture can't be read");
+#endif
 }
 
 TEST_F(GltfPlanes, TellWhatOfAPictureIsLost)

@@ -319,13 +319,15 @@ void WriteOutput(const std::string& path, std::string_view bytes, const std::str
   });
 }
 
-DocumentPtr ReadBack(const std::string& partial, const std::string& path)
+SceneCounts ReadBack(const std::string& partial, const std::string& path)
 {
-  FileProblem problem;
-  DocumentPtr document(LoadDocument(ToFilename(partial), LoadObjects | LoadMaterials, &problem));
-  if (!document)
-    throw Failure(ProblemText(path, problem) + " (what was written can't be read back)");
-  return document;
+  try {
+    SceneCounts counts;
+    CountFile(partial, counts);
+    return counts;
+  } catch (const Failure& failure) {
+    throw Failure(path, failure.Message() + " (what was written can't be read back)", failure.Offset(), failure.Path());
+  }
 }
 
 void WriteScene(BaseDocument& document, const std::string& path)

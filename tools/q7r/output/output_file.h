@@ -10,7 +10,7 @@
 #include <string_view>
 #include <vector>
 
-#include "scene_file.h"
+#include "listing/scene_counts.h"
 
 namespace q7r
 {
@@ -54,8 +54,8 @@ void WriteOutput(const std::string& path, std::string_view bytes, const std::str
 // A temporary file for a scene that goes on into another file: its path is plain ASCII. Throws std::system_error.
 std::unique_ptr<TemporaryFile> MakePlainFile();
 
-// Reads a written scene back; `path` is the name that the user knows it by.
-DocumentPtr ReadBack(const std::string& partial, const std::string& path);
+// Reads a written scene back, node by node, and counts what it holds; `path` is the name that the user knows it by.
+SceneCounts ReadBack(const std::string& partial, const std::string& path);
 
 // Saves a document so.
 void WriteScene(_torvane_::BaseDocument& document, const std::string& path);

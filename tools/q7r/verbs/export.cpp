@@ -109,10 +109,10 @@ bool PlayExport(host::StandaloneHost& player, const std::string& output, const s
 }
 
 // Of several exports each account says whose it is.
-void TellAccount(const host::Composition& composition, _torvane_::BaseDocument& document, const std::string& output)
+void TellAccount(const host::Composition& composition, const SceneCounts& scene, const std::string& output)
 {
   const std::string whose = ToldTogether::IsInForce() ? output + ": " : "";
-  TellNote(whose + AccountText(composition, CountScene(document)));
+  TellNote(whose + AccountText(composition, scene));
 }
 
 // Goes through the scene, which is kept in a temporary file meanwhile.
@@ -121,7 +121,7 @@ int ExportAsGltf(host::StandaloneHost& player, const host::Composition& composit
   const std::unique_ptr<TemporaryFile> scene = MakePlainFile();
   const bool quiet = PlayExport(player, work.output, scene->Path().string());
   const DocumentPtr document = LoadScene(scene->Path().string());
-  TellAccount(composition, *document, work.output);
+  TellAccount(composition, CountScene(*document), work.output);
   const int status = WriteGltf(*document, work.input, work.output, GltfFormOf(work.output), {});
   return quiet ? status : kProblems;
 }
@@ -160,8 +160,7 @@ int ExportOne(const Work& work, const Options& options)
   bool quiet = true;
   WriteOutput(work.output, [&](const std::string& partial) {
     quiet = PlayExport(player, work.output, partial);
-    const DocumentPtr document = ReadBack(partial, work.output);
-    TellAccount(chosen, *document, work.output);
+    TellAccount(chosen, ReadBack(partial, work.output), work.output);
     return std::string();
   });
   return quiet && !isWarned ? kDone : kProblems;
