@@ -283,10 +283,9 @@ void LightBody::SplitOldVector()
 
 void LightObjectData::WriteChunks(HyperFile& file)
 {
-  if (!NeedSettings())
-    return file.SetError(FILEERROR_MEMORY);
   ChunkWriter writer(file, kLevelLight);
-  LightBody{*this, *settings_}.VisitBody(writer);
+  Settings settings = GetSettings(); // the body may be read into; a light of the defaults alone stays one
+  LightBody{*this, settings}.VisitBody(writer);
 }
 
 Bool LightObjectData::ReadData(HyperFile& file, Long id, Long level)
