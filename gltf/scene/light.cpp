@@ -2,6 +2,8 @@
 
 #include <algorithm>
 #include <cmath>
+#include <iterator>
+#include <utility>
 
 #include "gltf/motion/animation.h"
 #include "gltf/scene/color.h"
@@ -74,10 +76,11 @@ class LightWriter
   std::size_t Write()
   {
     context_.output.UseExtension("KHR_lights_punctual");
+    SampleColor();
     const Vector linear = ToLinear(color_);
     Json light = {{"type", TypeName()},
                   {"color", ToJson(linear * (1.0 / Excess(linear)))},
-                  {"intensity", Finite(Intensity(brightness_) * Excess(linear))}};
+                  {"intensity", Finite(Intensity(brightness_) * restExcess_)}};
     if (type_ == kLightSpot) {
       const Real outer = OuterCone(Parameter(object_, kLightOuterAngle).GetReal());
       light["spot"] = {{"innerConeAngle", InnerCone(Parameter(object_, kLightInnerAngle).GetReal(), outer)},
@@ -132,7 +135,29 @@ class LightWriter
     AddPointerChannel(context_.output, pointer_ + name, samples, context_.options.pointers);
   }
 
-  // Whether a component is ever above 1.
+  // The colour is sampled before anything is written: what it needs of the intensity stands there at rest too. Where
+  // it is animated beyond what glTF allows the two hang together.
+  void SampleColor()
+  {
+    Input parts[3];
+    tracks_.TakeVector(kLightColor, color_, parts);
+    std::vector<Input> inputs(std::begin(parts), std::end(parts));
+    brightnessInput_ = {tracks_.Take(kLightBrightness), brightness_};
+    exceeds_ = Exceeds(inputs);
+    all_ = inputs;
+    all_.push_back(brightnessInput_);
+    colorSamples_ = SampleOf(exceeds_ ? all_ : inputs, {3, true, [](const Real* c, Real* out) {
+                                                          const Vector linear = ToLinear(Vector(c[0], c[1], c[2]));
+                                                          const Real part = 1.0 / Excess(linear);
+                                                          out[0] = linear.x * part;
+                                                          out[1] = linear.y * part;
+                                                          out[2] = linear.z * part;
+                                                        }});
+    Thin(colorSamples_, 0.0);
+    restExcess_ = colorSamples_.IsEmpty() || exceeds_ ? Excess(ToLinear(color_)) : 1.0;
+  }
+
+  // Whether a component is ever above 1 in motion.
   bool Exceeds(const std::vector<Input>& color)
   {
     const Shape shape = {1, true,
@@ -141,35 +166,17 @@ class LightWriter
     return std::any_of(samples.values.begin(), samples.values.end(), [](float value) { return value > 1.0F; });
   }
 
-  // Colour and intensity. Where the colour is animated beyond what glTF allows they hang together.
   void AddColorChannels()
   {
-    Input parts[3];
-    tracks_.TakeVector(kLightColor, color_, parts);
-    const std::vector<Input> color(std::begin(parts), std::end(parts));
-    const Input brightness = {tracks_.Take(kLightBrightness), brightness_};
-    const bool moves = std::any_of(color.begin(), color.end(), [](const Input& one) { return one.curve != nullptr; });
-    std::vector<Input> all = color;
-    all.push_back(brightness);
-    const bool together = moves && Exceeds(color);
-    if (moves)
-      Add("color", SampleOf(together ? all : color, {3, true, [](const Real* c, Real* out) {
-                                                       const Vector linear = ToLinear(Vector(c[0], c[1], c[2]));
-                                                       const Real part = 1.0 / Excess(linear);
-                                                       out[0] = linear.x * part;
-                                                       out[1] = linear.y * part;
-                                                       out[2] = linear.z * part;
+    Add("color", std::move(colorSamples_));
+    if (exceeds_)
+      Add("intensity", SampleOf(all_, {1, true, [this](const Real* c, Real* out) {
+                                         out[0] = Intensity(c[3]) * Excess(ToLinear(Vector(c[0], c[1], c[2])));
+                                       }}));
+    else if (brightnessInput_.curve)
+      Add("intensity", SampleOf({brightnessInput_}, {1, false, [this](const Real* b, Real* out) {
+                                                       out[0] = Intensity(b[0]) * restExcess_;
                                                      }}));
-    if (together)
-      Add("intensity", SampleOf(all, {1, true, [this](const Real* c, Real* out) {
-                                        out[0] = Intensity(c[3]) * Excess(ToLinear(Vector(c[0], c[1], c[2])));
-                                      }}));
-    else if (brightness.curve) {
-      const Real excess = Excess(ToLinear(color_));
-      Add("intensity", SampleOf({brightness}, {1, false, [this, excess](const Real* b, Real* out) {
-                                                 out[0] = Intensity(b[0]) * excess;
-                                               }}));
-    }
   }
 
   void AddConeChannels()
@@ -193,6 +200,11 @@ class LightWriter
   Real full_;
   Vector color_; // as the scene has it
   Real brightness_;
+  Input brightnessInput_{};
+  std::vector<Input> all_; // the colour's components and the brightness
+  Samples colorSamples_;
+  bool exceeds_ = false;
+  Real restExcess_ = 1.0; // what the intensity at rest takes over from the colour
   std::string pointer_;
 };
 

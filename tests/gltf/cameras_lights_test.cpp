@@ -203,4 +203,21 @@ TEST_F(GltfViews, ColoursBeyondFullHangTogetherWithTheIntensity)
   ExpectNear(intensity.values, {kPi, kPi * excess, kPi * excess}, 1e-4);
 }
 
+TEST_F(GltfViews, AColourBeyondFullAtRestAloneLeavesTheIntensity)
+{
+  BaseObject* light = Add(kObjectLight, "light");
+  light->SetParameterById(kLightType, Long{4});
+  light->SetParameterById(kLightColor, Vector(2, 0, 0));
+  AddTrack(*light, Component(kLightColor, 0), {{0, 1}, {0.04, 0.5}});
+  const Converted scene = Convert();
+  ExpectNear(scene.PointerChannel(PointerTo("color")).values, {1, 0, 0, 0.2140411, 0, 0}, 1e-6);
+  EXPECT_NEAR(LightOf(scene, "light")["intensity"].get<double>(), kPi, 1e-9);
+  BaseObject* still = Add(kObjectLight, "still");
+  still->SetParameterById(kLightType, Long{4});
+  still->SetParameterById(kLightColor, Vector(2, 0, 0));
+  AddTrack(*still, Component(kLightColor, 0), {{0, 1}});
+  EXPECT_NEAR(LightOf(Convert(), "still")["intensity"].get<double>(), kPi * std::pow(2.055 / 1.055, 2.4), 1e-6)
+      << "one key moves nothing";
+}
+
 } // namespace
