@@ -198,9 +198,8 @@ TEST(BlendLayers, RouteAParameterToItsLayer)
   EXPECT_EQ(flags, 2U);
   EXPECT_EQ(value.GetReal(), 1.0);
   EXPECT_FALSE(stack.Data().GetParameter(10025, value) || stack.Data().SetParameter(10025, GeData(1.0)));
-  for (Long none : {0, 9999, 10000, 10019, 10100}) {
+  for (Long none : {0, 9999, 10000, 10019, 10100})
     EXPECT_FALSE(stack.Data().GetValue(none, value, flags) || stack.Data().SetValue(none, GeData(1.0), flags)) << none;
-  }
   // A component of a Vector, below a folder.
   EXPECT_TRUE(stack.Data().SetParameter({{10063}, {1001}}, GeData(9.0)));
   EXPECT_TRUE(stack.Data().GetParameter(10063, value) && value.GetVector() == Vector(1, 9, 1));
@@ -261,8 +260,7 @@ TEST(BlendLayers, FindAndSelectDepthFirst)
   CBlendLayers& children = stack.Add(kBlendFolder, 2)->AsFolder()->GetChildren();
   children.AppendLayer(kBlendClip)->SetLayerId(5);
   stack.Add(kBlendClamp, 5);
-  EXPECT_EQ(stack.Layers().FindById(5), children.GetLayer(0));
-  EXPECT_EQ(stack.Layers().FindById(6), nullptr);
+  EXPECT_TRUE(stack.Layers().FindById(5) == children.GetLayer(0) && stack.Layers().FindById(6) == nullptr);
   EXPECT_EQ(stack.Layers().FirstSelected(), nullptr);
   stack.Layers().GetLayer(2)->SetSelected(true);
   EXPECT_EQ(stack.Layers().FirstSelected(), stack.Layers().GetLayer(2));

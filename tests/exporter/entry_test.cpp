@@ -23,8 +23,7 @@ TEST(Entry, RegistersMenuEntryNameAndHooks)
   ASSERT_EQ(host.Start(EntryPointFunc), 0);
   ASSERT_EQ(host.MenuEntries().size(), 1u);
   EXPECT_EQ(host.MenuEntries()[0].name, "KORVEX Exporter...");
-  EXPECT_EQ(host.MenuEntries()[0].menu, 13);
-  EXPECT_EQ(host.MenuEntries()[0].afterItem, -2);
+  EXPECT_TRUE(host.MenuEntries()[0].menu == 13 && host.MenuEntries()[0].afterItem == -2);
   EXPECT_EQ(host.PluginName(), "KORVEX Exporter...");
   EXPECT_EQ(exporter::PluginId, host.RegisteredPlugin());
   EXPECT_EQ(host.CallMenuHook(), 0);

@@ -29,10 +29,8 @@ TEST(Keyframes, AreAutomaticClampedSplineKeysOnThreeTracks)
   EXPECT_TRUE(track->GetPath().IsExactly({ParameterLevel{903, 23, 0}, ParameterLevel{1001, 19, 0}}));
   EXPECT_EQ(track->GetKind(), kTrackValue);
   const CKey& key = *track->GetCurve(1, 0)->GetKey(3);
-  EXPECT_EQ(key.GetNBit(-2), 0x4200u);
-  EXPECT_EQ(key.GetInterpolation(), kInterpolationSpline);
-  EXPECT_EQ(key.GetTime().GetNumerator(), 3);
-  EXPECT_EQ(key.GetTime().GetDenominator(), 25);
+  EXPECT_TRUE(key.GetNBit(-2) == 0x4200u && key.GetInterpolation() == kInterpolationSpline);
+  EXPECT_TRUE(key.GetTime().GetNumerator() == 3 && key.GetTime().GetDenominator() == 25);
   EXPECT_EQ(key.GetGeData().GetRawType(), kDataNil);
 }
 

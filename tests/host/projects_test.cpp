@@ -60,15 +60,12 @@ TEST(ProjectCompositions, AreListedWithWhatAnExportMakesOfThem)
                            MakeLayer({.id = 12, .kind = 1, .switches = 0}), MakeLayer({.id = 13, .kind = 4})});
   const auto list = Open(BinaryFile(Root({MakeItem(outer), Folder("F", {MakeItem(inner)})}, 2)))->Compositions();
   ASSERT_EQ(2U, list.size());
-  EXPECT_EQ("Main", list[0].name);
-  EXPECT_EQ(4U, list[0].layers);
+  EXPECT_TRUE(list[0].name == "Main" && list[0].layers == 4U);
   EXPECT_EQ(5U, list[0].exported); // two uses with a camera each, and a light
-  EXPECT_EQ(1U, list[1].exported);
-  EXPECT_EQ("2", list[1].id);
+  EXPECT_TRUE(list[1].exported == 1U && list[1].id == "2");
   EXPECT_FALSE(list[0].isActive);
   EXPECT_TRUE(list[1].isActive);
-  EXPECT_EQ(250, list[1].frames);
-  EXPECT_EQ(10, list[1].seconds);
+  EXPECT_TRUE(list[1].frames == 250 && list[1].seconds == 10);
 }
 
 TEST(ProjectLayers, OfAllKindsAreWhatTheyWere)
@@ -122,8 +119,7 @@ TEST(ProjectLayers, OfAllKindsAreWhatTheyWere)
   for (std::size_t i = 0; i < std::size(cases); ++i) {
     SCOPED_TRACE(i);
     const host::Layer& layer = *project.root->layers[i];
-    EXPECT_EQ(cases[i].type, layer.type);
-    EXPECT_EQ(cases[i].flags, layer.flags);
+    EXPECT_TRUE(cases[i].type == layer.type && cases[i].flags == layer.flags);
     EXPECT_EQ((cases[i].flags & k3D) != 0, layer.is3D);
     EXPECT_EQ(100 + static_cast<A_long>(i), layer.id);
     EXPECT_EQ(i % 2 ? "Own name" : "", layer.name);
@@ -157,9 +153,8 @@ TEST(ProjectLayers, BeginAndEndWithTheirSource)
       {{.source = 60, .out = {40, 1}}, 0, 75, 0}, // 1.5 s at 24, made to have 12, twice, cut to half by a stretch
   };
   std::vector<Node> nodes;
-  for (const Case& c : cases) {
+  for (const Case& c : cases)
     nodes.push_back(MakeLayer(c.layer));
-  }
   const Data movie = Settings(8, 8).Ratio(38, 3, 4).U32(56, 24).U8(129, 2).U16(148, 12);
   const host::Project project =
       Read(WithLayers(nodes), {kSolid, MakeItem(inner), Footage(60, "/a/b.mov", false, movie)});
@@ -193,11 +188,8 @@ TEST(ProjectFootage, KeepsPathsCountsAndColours)
     SCOPED_TRACE(path);
     const host::Project project = Read(WithLayers({MakeLayer({.source = 60})}), {footage});
     const host::Item& item = *project.root->layers[0]->source;
-    EXPECT_EQ(name, item.name);
-    EXPECT_EQ(path, item.path);
-    EXPECT_EQ(files, item.files);
-    EXPECT_EQ(64, item.width);
-    EXPECT_EQ(48, item.height);
+    EXPECT_TRUE(item.name == name && item.path == path && item.files == files);
+    EXPECT_TRUE(item.width == 64 && item.height == 48);
     EXPECT_TRUE(project.warnings.empty());
   }
   const host::Project solid = Read(WithLayers({MakeLayer({.source = 50})}), {kSolid});

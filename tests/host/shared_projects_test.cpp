@@ -112,8 +112,7 @@ TEST(SharedProjects, AgreeWithAfterEffectsPropertyByProperty)
       const auto id = std::to_string(item["id"].get<int>());
       const auto found = std::find_if(list.begin(), list.end(), [&](const auto& c) { return c.id == id; });
       ASSERT_NE(list.end(), found);
-      EXPECT_EQ(item["name"], found->name);
-      EXPECT_EQ(item["width"], found->width);
+      EXPECT_TRUE(found->name == item["name"] && found->width == item["width"]);
       EXPECT_EQ(item["height"], found->height);
       EXPECT_NEAR(item["frameRate"], found->frameRate, 1e-12);
       EXPECT_NEAR(item["duration"], found->seconds, 1e-12);

@@ -6,6 +6,7 @@
 namespace
 {
 
+using stage::Answer;
 using stage::Stage;
 
 constexpr const char* kTwoLayers = R"({"ty": 13, "nm": "Eye", "pe": {"k": 400}}, {"ty": 1, "ddd": 1, "nm": "Wall"})";
@@ -88,11 +89,9 @@ TEST(HostBalance, CountsWhatIsGivenOut)
   EXPECT_EQ((host::HostBalance{0, 0, 0, 0, 12}), start);
 
   AEGP_MemHandle name = nullptr;
-  void* data = nullptr;
   EXPECT_EQ(0, stage.layers->AEGP_GetLayerName(0, stage.Layer(0), &name, nullptr));
-  EXPECT_EQ(0, stage.memory->AEGP_LockMemHandle(name, &data));
-  const AEGP_StreamRefH stream = stage.Stream(0, AEGP_LayerStream_ZOOM);
-  const AEGP_StreamRefH again = stage.Stream(0, AEGP_LayerStream_ZOOM);
+  void* data = Answer(stage.memory->AEGP_LockMemHandle, name);
+  const AEGP_StreamRefH stream = stage.Stream(0, AEGP_LayerStream_ZOOM), again = stage.Stream(0, AEGP_LayerStream_ZOOM);
   AEGP_StreamValue2 value{};
   const A_Time time{0, 1};
   EXPECT_EQ(0, stage.streams->AEGP_GetNewStreamValue(0, stream, 1, &time, 0, &value));
@@ -146,9 +145,8 @@ TEST(HostErrors, ComeWhenTheyAreAskedFor)
   Stage stage(kTwoLayers);
   const std::uint64_t before = stage.host.CallCount();
   stage.host.FailCall(before + 2, 77);
-  AEGP_ItemH item = nullptr;
+  const AEGP_ItemH item = stage.ActiveItem();
   AEGP_ItemType type = 0;
-  EXPECT_EQ(0, stage.items->AEGP_GetActiveItem(&item));
   EXPECT_EQ(77, stage.items->AEGP_GetItemType(item, &type));
   EXPECT_EQ(0, type);
   EXPECT_EQ(0, stage.items->AEGP_GetItemType(item, &type));
@@ -200,39 +198,30 @@ TEST(HostCommands, AreRegisteredEnabledAndCalled)
 {
   Stage stage(kTwoLayers);
   Plugin all, one;
-  AEGP_Command command = 0, other = 0;
-  AEGP_PluginID id = 0;
-  EXPECT_EQ(0, stage.host.Start(Enter));
-  EXPECT_EQ(516, stage.host.Start(EnterThrowing));
-  EXPECT_EQ(0, stage.commands->AEGP_GetUniqueCommand(&command));
-  EXPECT_EQ(0, stage.commands->AEGP_GetUniqueCommand(&other));
-  EXPECT_NE(0, command);
-  EXPECT_NE(command, other);
+  EXPECT_TRUE(stage.host.Start(Enter) == 0 && stage.host.Start(EnterThrowing) == 516);
+  const AEGP_Command command = Answer(stage.commands->AEGP_GetUniqueCommand);
+  const AEGP_Command other = Answer(stage.commands->AEGP_GetUniqueCommand);
+  EXPECT_TRUE(command != 0 && command != other);
   EXPECT_EQ(0, stage.commands->AEGP_InsertMenuCommand(command, "Do it...", 13, -2));
-  EXPECT_EQ(0, stage.utility->AEGP_RegisterWithAEGP(nullptr, "Small", &id));
-  EXPECT_EQ(id, stage.host.RegisteredPlugin());
-  EXPECT_EQ("Small", stage.host.PluginName());
+  const AEGP_PluginID id = Answer(stage.utility->AEGP_RegisterWithAEGP, nullptr, "Small");
+  EXPECT_TRUE(stage.host.RegisteredPlugin() == id && stage.host.PluginName() == "Small");
   EXPECT_EQ(0, stage.hooks->AEGP_RegisterCommandHook(id, 2, 0, OnCommand, &all));
   EXPECT_EQ(0, stage.hooks->AEGP_RegisterCommandHook(id, 2, command, OnCommand, &one));
   EXPECT_EQ(0, stage.hooks->AEGP_RegisterUpdateMenuHook(id, OnMenu, &all));
 
   ASSERT_EQ(1u, stage.host.MenuEntries().size());
-  EXPECT_EQ(13, stage.host.MenuEntries()[0].menu);
-  EXPECT_EQ(-2, stage.host.MenuEntries()[0].afterItem);
-  EXPECT_EQ(command, stage.host.FindCommand("Do it..."));
-  EXPECT_EQ(0, stage.host.FindCommand("Undo it..."));
+  EXPECT_TRUE(stage.host.MenuEntries()[0].menu == 13 && stage.host.MenuEntries()[0].afterItem == -2);
+  EXPECT_TRUE(stage.host.FindCommand("Do it...") == command && stage.host.FindCommand("Undo it...") == 0);
   EXPECT_FALSE(stage.host.IsCommandEnabled(command));
   EXPECT_EQ(0, stage.commands->AEGP_EnableCommand(command));
-  EXPECT_TRUE(stage.host.IsCommandEnabled(command));
-  EXPECT_FALSE(stage.host.IsCommandEnabled(other));
+  EXPECT_TRUE(stage.host.IsCommandEnabled(command) && !stage.host.IsCommandEnabled(other));
   EXPECT_EQ(0, stage.commands->AEGP_DisableCommand(command));
   EXPECT_FALSE(stage.host.IsCommandEnabled(command));
 
   EXPECT_EQ(0, stage.host.CallMenuHook());
   EXPECT_EQ(5, stage.host.CallMenuHook());
   EXPECT_TRUE(stage.host.CallCommandHook(command).isHandled);
-  EXPECT_EQ(command, all.seen);
-  EXPECT_EQ(0, all.seenHandled);
+  EXPECT_TRUE(all.seen == command && all.seenHandled == 0);
   EXPECT_EQ(command, one.seen);
   EXPECT_EQ(1, one.seenHandled); // by the first
   const host::CommandResult thrown = stage.host.CallCommandHook(516, true);
@@ -242,8 +231,7 @@ TEST(HostCommands, AreRegisteredEnabledAndCalled)
   EXPECT_EQ(command, one.seen);
 
   stage.host.WithholdCommand();
-  EXPECT_EQ(0, stage.commands->AEGP_GetUniqueCommand(&other));
-  EXPECT_EQ(0, other);
+  EXPECT_EQ(0, Answer(stage.commands->AEGP_GetUniqueCommand));
 }
 
 TEST(HostScripts, AnswerTheTwoDialogs)
@@ -287,8 +275,7 @@ TEST(StandaloneHost, IsTheOneThatWasMadeLast)
 {
   auto first = std::make_unique<Stage>(R"({"ty": 13})", R"("nm": "One")");
   auto second = std::make_unique<Stage>(R"({"ty": 13})", R"("nm": "Two")");
-  EXPECT_EQ(first->host.Basic(), second->host.Basic());
-  EXPECT_EQ(first->items, second->items);
+  EXPECT_TRUE(first->host.Basic() == second->host.Basic() && first->items == second->items);
   EXPECT_EQ(u"Two", first->ItemName(first->ActiveItem()));
   first.reset(); // in any order
   EXPECT_EQ(u"Two", second->ItemName(second->ActiveItem()));

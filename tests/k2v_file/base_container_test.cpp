@@ -118,8 +118,7 @@ TEST(BaseContainer, TakesValuesThatLieInItself)
   container.SetData(5, *stored->GetContainer()->FindData(1));
   EXPECT_EQ(container.GetString(5), String("deep"));
   EXPECT_TRUE(container.GetContainerInstance(6)->CopyTo(container, 0, nullptr)); // out of itself
-  EXPECT_EQ(container.GetCount(), 2);
-  EXPECT_EQ(container.GetContainerInstance(5)->GetCount(), 2);
+  EXPECT_TRUE(container.GetCount() == 2 && container.GetContainerInstance(5)->GetCount() == 2);
   BaseContainer* nested = container.GetContainerInstance(5);
   EXPECT_TRUE(container.CopyTo(*nested, 0, nullptr)); // into itself
   EXPECT_EQ(container.GetContainerInstance(5)->GetContainerInstance(5)->GetId(), 3);
@@ -158,8 +157,7 @@ TEST(BaseContainer, GivesTheDefaultOnlyForAnAbsentId)
   EXPECT_EQ(container.GetVector(2, Vector(1, 2, 3)), Vector(1, 2, 3));
   EXPECT_EQ(container.GetString(2, String("d")), String("d"));
   EXPECT_EQ(CountReports(), 0);
-  EXPECT_EQ(container.GetLong(1, 8), 0);
-  EXPECT_EQ(container.GetContainerInstance(1), nullptr);
+  EXPECT_TRUE(container.GetLong(1, 8) == 0 && container.GetContainerInstance(1) == nullptr);
   EXPECT_EQ(CountReports(), 2);
   EXPECT_EQ(container.GetData(2).GetType(), kDataNil);
 }
@@ -334,8 +332,7 @@ TEST(ParameterPathTest, KeepsManyLevelsThroughCopiesMovesAndFailures)
   shorter = copy;
   ParameterPath moved(std::move(copy));
   EXPECT_TRUE(moved.IsExactly(shorter));
-  EXPECT_EQ(moved.WithoutFirst(18)[0].id, 19);
-  EXPECT_EQ(moved[9].id, 1);
+  EXPECT_TRUE(moved.WithoutFirst(18)[0].id == 19 && moved[9].id == 1);
   counting_memory::FailAfter(0);
   ParameterPath failed(path);
   Bool appended = true;

@@ -80,8 +80,7 @@ TEST(GeData, WritesEachKindAsItsTypeAndValueAndReadsItBack)
     MemoryReadFile source(bytes.bytes);
     GeData read(3);
     ASSERT_TRUE(read.Read(source.file));
-    EXPECT_EQ(read.GetType(), form.value.GetType());
-    EXPECT_EQ(Written(read), form.hex);
+    EXPECT_TRUE(read.GetType() == form.value.GetType() && form.hex == Written(read));
     Long next = 0;
     EXPECT_TRUE(source.file.ReadLong(next) && next == 99);
   }

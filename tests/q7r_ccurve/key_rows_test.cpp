@@ -10,8 +10,6 @@
 namespace
 {
 
-using FileBytes = std::vector<std::uint8_t>;
-
 class GeneralWay
 {
  public:
@@ -50,7 +48,7 @@ CCurve& AddCurve(BaseDocument& document)
 }
 
 // Curves of plain keys with and without tangents, and curves in which one key or another is not plain.
-FileBytes SceneOfCurves()
+Bytes SceneOfCurves()
 {
   const DocumentPtr document = NewDocument();
   for (Long special = 0; special < 10; ++special) {
@@ -84,9 +82,9 @@ FileBytes SceneOfCurves()
   return SaveToBytes(*document);
 }
 
-std::vector<FileBytes> SceneFiles()
+std::vector<Bytes> SceneFiles()
 {
-  std::vector<FileBytes> files = {SceneOfCurves(), SaveToBytes(*full_scene::MakeFullScene())};
+  std::vector<Bytes> files = {SceneOfCurves(), SaveToBytes(*full_scene::MakeFullScene())};
   for (const auto& entry : std::filesystem::recursive_directory_iterator(TEST_SOURCE_DIR "/fuzz/corpus")) {
     std::ifstream file(entry.path(), std::ios::binary);
     if (entry.is_regular_file())
@@ -96,7 +94,7 @@ std::vector<FileBytes> SceneFiles()
 }
 
 // What is saved of a file that was loaded; with `asNodes` every key was asked for. Nothing if it can't be loaded.
-FileBytes Resaved(const FileBytes& bytes, bool asNodes)
+Bytes Resaved(const Bytes& bytes, bool asNodes)
 {
   Filename name;
   name.SetMemoryRead(bytes.data(), static_cast<LLong>(bytes.size()));
@@ -112,10 +110,10 @@ FileBytes Resaved(const FileBytes& bytes, bool asNodes)
 
 TEST(KeyRows, AllWaysOfReadingAndWritingGiveTheSameBytes)
 {
-  const std::vector<FileBytes> files = SceneFiles();
+  const std::vector<Bytes> files = SceneFiles();
   ASSERT_GT(files.size(), 2U);
-  for (const FileBytes& file : files) {
-    const FileBytes quick = Resaved(file, false);
+  for (const Bytes& file : files) {
+    const Bytes quick = Resaved(file, false);
     EXPECT_TRUE(quick == Resaved(file, true)) << &file - files.data();
     const GeneralWay general(true);
     EXPECT_TRUE(quick == Resaved(file, false)) << &file - files.data();
@@ -129,9 +127,9 @@ TEST(KeyRows, ARecordThatIsDamagedIsReadAsInTheGeneralWay)
   CCurve curve;
   for (Long frame = 0; frame < 3; ++frame)
     curve.SetKeyValues(Value(frame, frame));
-  const FileBytes bytes = WriteToMemory([&](HyperFile& file) { curve.WriteAsChunk(file, 110415); }, true);
+  const Bytes bytes = WriteToMemory([&](HyperFile& file) { curve.WriteAsChunk(file, 110415); }, true);
   EXPECT_TRUE(bytes == WriteToMemory([&](HyperFile& file) { curve.WriteAsChunk(file, 110415); }, true)); // markers stay
-  auto read = [](const FileBytes& damaged) {
+  auto read = [](const Bytes& damaged) {
     MemoryReadFile memory(damaged);
     UChar tag = 0;
     Long id = 0, level = 0;
@@ -140,12 +138,12 @@ TEST(KeyRows, ARecordThatIsDamagedIsReadAsInTheGeneralWay)
     memory.file.ReadChunkStart(id, level);
     copy.ReadChunkLoop(memory.file, true);
     memory.file.Close(); // links that lead nowhere become empty
-    const FileBytes again = WriteToMemory([&](HyperFile& file) { copy.WriteChunks(file); });
+    const Bytes again = WriteToMemory([&](HyperFile& file) { copy.WriteChunks(file); });
     return std::tuple(memory.file.GetError(), memory.file.GetProblem().position, WithoutMarkers(again));
   };
   for (std::size_t place = 22; place < bytes.size(); ++place) {
     for (const int change : {0x01, 0x80}) {
-      FileBytes damaged = bytes;
+      Bytes damaged = bytes;
       damaged[place] = static_cast<std::uint8_t>(damaged[place] ^ change);
       const auto quick = read(damaged);
       const GeneralWay general(true);
@@ -163,7 +161,7 @@ TEST(KeyRows, ProgressIsToldAtTheSamePlaces)
   for (const bool generally : {false, true}) {
     const GeneralWay way(generally);
     auto note = [](Long number, void* list) { static_cast<std::vector<Long>*>(list)->push_back(number); };
-    const FileBytes bytes = WriteToMemory(
+    const Bytes bytes = WriteToMemory(
         [&](HyperFile& file) {
           file.SetWriteProgress(note, &told[generally]);
           curve.WriteChunks(file);
@@ -225,8 +223,7 @@ TEST(KeyRows, ChangeAndEvaluateLikeNodes)
   const Owned<GeListNode> copy(rows.MakeClone(0, nullptr));
   EXPECT_TRUE(copy && AreEqual(*NodeCast<CCurve>(copy.get()), nodes));
   CKey* key = rows.GetKey(3); // from here on nodes
-  EXPECT_EQ(key->GetCurve(), &rows);
-  EXPECT_EQ(key->GetNext(), rows.GetKey(4));
+  EXPECT_TRUE(key->GetCurve() == &rows && key->GetNext() == rows.GetKey(4));
   EXPECT_TRUE(AreEqual(rows, nodes));
 }
 
@@ -236,7 +233,7 @@ TEST(KeyRows, TakeFewBytesAndAskForNoNodeToBeLookedAt)
   CCurve curve;
   for (Long frame = 0; frame < kKeys; ++frame)
     curve.SetKeyValues(Value(frame, frame));
-  const FileBytes bytes = WriteToMemory([&](HyperFile& file) { curve.WriteChunks(file); }, true);
+  const Bytes bytes = WriteToMemory([&](HyperFile& file) { curve.WriteChunks(file); }, true);
   MemoryReadFile memory(bytes);
   const LLong before = counting_memory::Get().bytes;
   CCurve read;

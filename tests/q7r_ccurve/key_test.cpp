@@ -32,12 +32,9 @@ TEST(Key, ParametersReachFieldsAndBits)
   }
   EXPECT_TRUE(key.SetParameterById(913, 13.0) && key.SetParameterById(914, 14.0));
   EXPECT_TRUE(key.SetParameterById(924, Long{2}));
-  EXPECT_EQ(key.GetTime(), BaseTime(901, 1));
-  EXPECT_EQ(key.GetLeftTime(), BaseTime(911, 1));
-  EXPECT_EQ(key.GetRightTime(), BaseTime(912, 1));
-  EXPECT_EQ(key.GetLeftValue(), 13.0);
-  EXPECT_EQ(key.GetRightValue(), 14.0);
-  EXPECT_EQ(key.GetInterpolation(), kInterpolationLinear);
+  EXPECT_TRUE(key.GetTime() == BaseTime(901, 1) && key.GetLeftTime() == BaseTime(911, 1));
+  EXPECT_TRUE(key.GetRightTime() == BaseTime(912, 1) && key.GetLeftValue() == 13.0);
+  EXPECT_TRUE(key.GetRightValue() == 14.0 && key.GetInterpolation() == kInterpolationLinear);
   EXPECT_FALSE(key.GetParameterById(910, value) && value.GetRawType() != kDataNil);
 
   const std::pair<Long, ULong> switches[] = {{902, 0x100},  {915, 0x400},   {917, 0x1000},   {918, 0x2000},

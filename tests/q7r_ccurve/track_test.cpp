@@ -110,9 +110,8 @@ TEST(Track, FlagsAndLinkAreParameters)
   for (bool on : {false, true}) {
     EXPECT_TRUE(track.SetParameterById(904, on) && track.SetParameterById(905, on));
     EXPECT_EQ(track.GetNBit(-1), on ? 0x40000u : 0x20000u); // the first one is stored the other way round
-    for (Long id : {904, 905}) {
+    for (Long id : {904, 905})
       EXPECT_EQ(ParameterOf(track, id).GetBool(), on) << id;
-    }
   }
   GeAliasLink link;
   link.SetLink(&target);

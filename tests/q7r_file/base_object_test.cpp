@@ -167,10 +167,8 @@ TEST(BaseObject, ALoadedContainerStaysWhatItWasWhenDataAreMade)
   ASSERT_NE(object.GetObjectData(), nullptr);
   EXPECT_EQ(object.GetObjectData()->GetNode(), &object);
   EXPECT_TRUE(object.Execute());
-  EXPECT_EQ(object.GetName(), String("plane"));
-  EXPECT_EQ(object.GetDataInstance().GetCount(), 1);
-  EXPECT_EQ(object.GetDataInstance().GetLong(1100), 1100);
-  EXPECT_EQ(object.GetRelPos(), Vector(1, 2, 3));
+  EXPECT_TRUE(object.GetName() == String("plane") && object.GetDataInstance().GetCount() == 1);
+  EXPECT_TRUE(object.GetDataInstance().GetLong(1100) == 1100 && object.GetRelPos() == Vector(1, 2, 3));
 }
 
 TEST(BaseObject, PolygonChunksStandBesideTheTransformAndReachTheData)
@@ -336,14 +334,12 @@ TEST(BaseObject, ClonesTakeTagsTransformAndChildrenAlong)
   ASSERT_NE(clone, nullptr);
   EXPECT_EQ(ToHex(WithoutMarkers(BytesOf(*clone))), ToHex(WithoutMarkers(BytesOf(*source))));
   EXPECT_EQ(clone->GetLocalMatrix(), source->GetLocalMatrix());
-  EXPECT_EQ(clone->GetTag(kTagTarget)->GetObject(), clone);
-  EXPECT_EQ(clone->GetDownLast()->GetUp(), clone);
+  EXPECT_TRUE(clone->GetTag(kTagTarget)->GetObject() == clone && clone->GetDownLast()->GetUp() == clone);
   DeleteObj(clone);
 
   clone = static_cast<BaseObject*>(source->MakeClone(kCopyNoChildren | kCopyNoBranches | kCopyNoInfo, nullptr));
   ASSERT_NE(clone, nullptr);
-  EXPECT_EQ(clone->GetDown(), nullptr);
-  EXPECT_EQ(clone->GetFirstTag(), nullptr);
+  EXPECT_TRUE(clone->GetDown() == nullptr && clone->GetFirstTag() == nullptr);
   EXPECT_FALSE(clone->GetBit(2));
 
   BaseObject other(kObjectCamera);

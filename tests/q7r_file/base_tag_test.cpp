@@ -33,8 +33,7 @@ TEST(BaseTag, SkipsChunksThatItDoesNotKnowAndKeepsItsOwnName)
   tag.SetName(String("mine"));
   const std::string unknown = kUnknownChunk; // the second replaces the first
   ASSERT_TRUE(ReadInto(tag, Record("[9,0 SA ] " + unknown + " " + unknown)));
-  EXPECT_EQ(tag.GetName(), String("mine"));
-  EXPECT_EQ(tag.GetRawSize(), 17);
+  EXPECT_TRUE(tag.GetName() == String("mine") && tag.GetRawSize() == 17);
 }
 
 TEST(BaseTag, CopiesOntoATagOfTheSameTypeOnly)
@@ -45,8 +44,7 @@ TEST(BaseTag, CopiesOntoATagOfTheSameTypeOnly)
   BaseTag same(kTagTarget), other(kTagProtection);
   BaseTag disguised(kTagPlugin, kTagTarget); // the same number, but another class
   EXPECT_TRUE(source.CopyWithTranslation(same, 0, nullptr));
-  EXPECT_EQ(same.GetName(), String("aim"));
-  EXPECT_EQ(same.GetDataInstance().GetLong(1234), 5);
+  EXPECT_TRUE(same.GetName() == String("aim") && same.GetDataInstance().GetLong(1234) == 5);
   EXPECT_FALSE(source.CopyWithTranslation(other, 0, nullptr) || source.CopyWithTranslation(disguised, 0, nullptr));
 
   BaseTag unknown(kTagPlugin);
@@ -79,12 +77,9 @@ TEST(BaseTag, IsFoundOnItsObjectByItsRealType)
   object.InsertTag(plugin, first);
   object.InsertTag(nullptr);
   BaseTag* newest = object.MakeTag(kTagTarget);
-  EXPECT_EQ(object.GetFirstTag(), newest);
-  EXPECT_EQ(object.GetTag(kTagTarget), newest);
-  EXPECT_EQ(object.GetTag(5698), plugin);
-  EXPECT_EQ(object.GetTag(kTagPlugin), nullptr);
-  EXPECT_EQ(plugin->GetPrev(), first);
-  EXPECT_EQ(plugin->GetObject(), &object);
+  EXPECT_TRUE(object.GetFirstTag() == newest && object.GetTag(kTagTarget) == newest);
+  EXPECT_TRUE(object.GetTag(5698) == plugin && object.GetTag(kTagPlugin) == nullptr);
+  EXPECT_TRUE(plugin->GetPrev() == first && plugin->GetObject() == &object);
   plugin->SetNodeData(NewObj<AnsweringData>());
   EXPECT_EQ(ParameterOf(*plugin, 5).GetLong(), 99) << "the behaviour object answers first";
   plugin->SetParameterById(6, GeData(static_cast<Long>(3)));

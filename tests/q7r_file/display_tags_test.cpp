@@ -51,9 +51,8 @@ TEST(DisplayTag, AnswersElevenParametersFromItsOwnSettings)
   EXPECT_EQ(data.GetLong(1003), 7) << "what is not among them goes to the container";
 
   auto* clone = static_cast<DisplayTag*>(tag.MakeClone(0, nullptr));
-  for (const Long id : {1001, 1002, 1007, 1008, 1009, 1010, 1012, 1014, 1015}) {
+  for (const Long id : {1001, 1002, 1007, 1008, 1009, 1010, 1012, 1014, 1015})
     EXPECT_EQ(ParameterOf(*clone, id).GetLong(), id);
-  }
   EXPECT_EQ(ParameterOf(*clone, 1006).GetReal(), 1006.5);
   DeleteObj(clone);
 }

@@ -47,8 +47,7 @@ void ExpectScene(BaseDocument& document)
   BaseObject* child = parent->GetDown();
   ASSERT_NE(child, nullptr);
   EXPECT_TRUE(child->GetName() == String("Child"));
-  EXPECT_EQ(child->GetUp(), parent);
-  EXPECT_EQ(child->GetDocument(), &document);
+  EXPECT_TRUE(child->GetUp() == parent && child->GetDocument() == &document);
   EXPECT_EQ(TargetOf(child), parent);
   EXPECT_EQ(TargetOf(parent), child);
   EXPECT_EQ(child->GetLayer(), document.GetFirstLayer());
@@ -270,10 +269,8 @@ TEST(Document, MergesBehindNothingButAboveWhatIsThere)
     names += Utf8(object->GetName()) + " ";
   EXPECT_EQ(names, "Second Parent Old ");
   BaseObject* child = target->GetFirstObject()->GetNext()->GetDown();
-  EXPECT_EQ(child->GetDocument(), target.get());
-  EXPECT_EQ(TargetOf(child), child->GetUp());
-  EXPECT_EQ(child->GetLayer(), target->GetFirstLayer());
-  EXPECT_EQ(target->GetRenderDataRoot()->GetCount(), 2);
+  EXPECT_TRUE(child->GetDocument() == target.get() && child->GetUp() == TargetOf(child));
+  EXPECT_TRUE(child->GetLayer() == target->GetFirstLayer() && target->GetRenderDataRoot()->GetCount() == 2);
   name.SetString("no such file");
   EXPECT_FALSE(MergeDocument(target.get(), name, LoadObjects, &problem));
   EXPECT_EQ(problem.code, FILEERROR_OPEN);

@@ -140,8 +140,7 @@ TEST(PolygonObject, TakesAnotherNumberOfNgonsWithTheirEdges)
   EXPECT_TRUE(ngons.Resize(3) && ngons.SetEdges(0, edges, 3) && ngons.SetEdges(2, edges, 1));
   EXPECT_FALSE(ngons.SetEdges(3, edges, 1) || ngons.SetEdges(-1, edges, 1));
   EXPECT_TRUE(ngons.Resize(2) && ngons.Resize(4));
-  EXPECT_EQ(ngons.GetEntry(0)->edges[2], 7u);
-  EXPECT_EQ(ngons.GetEntry(2)->count, 0);
+  EXPECT_TRUE(ngons.GetEntry(0)->edges[2] == 7u && ngons.GetEntry(2)->count == 0);
   EXPECT_EQ(ngons.GetEntry(4), nullptr);
   EXPECT_TRUE(ngons.Resize(-3));
   EXPECT_EQ(ngons.GetCount(), 0);
@@ -166,11 +165,9 @@ TEST(SplineObject, HasTangentsAsItsTypeAsks)
   ASSERT_NE(GetTangentTag(*spline), nullptr);
   EXPECT_EQ(GetTangentTag(*spline)->GetCount(), 0);
   const BaseContainer& data = spline->GetDataInstance();
-  EXPECT_EQ(data.GetLong(kSplineType), 1);
-  EXPECT_EQ(data.GetLong(1001), 3);
+  EXPECT_TRUE(data.GetLong(kSplineType) == 1 && data.GetLong(1001) == 3);
   EXPECT_TRUE(data.FindData(1002) && !data.GetBool(1002));
-  EXPECT_EQ(data.GetLong(1003), 8);
-  EXPECT_EQ(data.GetReal(1004), 5.0 / 180.0 * 3.141592653589793);
+  EXPECT_TRUE(data.GetLong(1003) == 8 && data.GetReal(1004) == 5.0 / 180.0 * 3.141592653589793);
   EXPECT_EQ(data.GetReal(1005), 5.0);
 
   EXPECT_TRUE(ResizeSpline(*spline, 3, 2));
@@ -242,8 +239,7 @@ TEST(PointObject, ComesBackFromAFileUnderItsLabel)
   for (int i = 0; i < 3; ++i) {
     BaseObject* member = parents[i].GetDown();
     ASSERT_NE(member, nullptr);
-    EXPECT_EQ(member->GetType(), kObjectPointBased);
-    EXPECT_EQ(member->GetDiskType(), kObjectPoint);
+    EXPECT_TRUE(member->GetType() == kObjectPointBased && member->GetDiskType() == kObjectPoint);
     EXPECT_EQ(GetPointCount(*member), 2);
     EXPECT_TRUE(Holds(BytesOf(parents[i]), chunks) && (i == 2 || ReadInto(parents[i + 1], BytesOf(parents[i]))));
   }

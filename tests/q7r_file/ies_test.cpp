@@ -134,8 +134,7 @@ TEST(IESFile, CutsLongLinesAndWords)
   // 512 characters are a line, what remains is the next one: there a keyword counts again.
   IESPtr light = LoadText("[LAMP] " + std::string(505, 'x') + "[LUMCAT] behind\n" + kHead + kNumbers);
   ASSERT_NE(light, nullptr);
-  EXPECT_EQ(light->lamp.GetLength(), 505);
-  EXPECT_EQ(light->luminaireCatalogue, String("behind"));
+  EXPECT_TRUE(light->lamp.GetLength() == 505 && light->luminaireCatalogue == String("behind"));
   // A number on the border becomes two: 12 is read as 1 and 2.
   EXPECT_EQ(FirstValue(kHead + std::string(511, ' ') + "12 1 2 1" + kOpening + kTable), 100);
   // Of a word 256 characters count.
@@ -175,8 +174,7 @@ TEST(IESFile, TakesVersionAndTextsFromTheirExactKeywords)
                kHead + kNumbers);
   ASSERT_NE(light, nullptr);
   EXPECT_EQ(light->manufacturer, String("Sun & Co, Moon=2 "));
-  EXPECT_EQ(light->luminaireCatalogue, String("L-1"));
-  EXPECT_EQ(light->luminaire, String("Disc"));
+  EXPECT_TRUE(light->luminaireCatalogue == String("L-1") && light->luminaire == String("Disc"));
   EXPECT_EQ(light->lampCatalogue, String());
   EXPECT_EQ(Units(light->lamp), u"a\u00E9");
 }
@@ -186,8 +184,7 @@ TEST(IESFile, ReadsOrRefusesTheTiltOfTheLamp)
   for (const char* data : {"1 2 0 90 1 0.5 ", "2 0 ", "1 1 0\n1 ", "1 -3 "}) {
     const IESPtr light = LoadText(std::string("IESNA91\nTILT=INCLUDE\n") + data + kNumbers);
     ASSERT_NE(light, nullptr) << data;
-    EXPECT_EQ(light->tiltMode, 2);
-    EXPECT_EQ(light->candela[0], 100);
+    EXPECT_TRUE(light->tiltMode == 2 && light->candela[0] == 100);
   }
   EXPECT_EQ(FirstValue("IESNA91\n TILT NONE\n" + kNumbers), 100);
   for (const char* line : {"TILT", "TILT=", "TILT=none", "TILT=lamp.tlt", "TILT==NONE", "TILT=TILT", "TILT=IESNA91"})
@@ -208,8 +205,7 @@ TEST(IESFile, RefusesCountsOutOfRangeAndTablesThatEndEarly)
     IESPtr light;
     EXPECT_EQ(LoadText(head + Repeat("3 ", table), light), result) << counts;
     if (result == 1) {
-      EXPECT_EQ(light->GetVerticalCount(), vertical);
-      EXPECT_EQ(light->GetHorizontalCount(), horizontal);
+      EXPECT_TRUE(light->GetVerticalCount() == vertical && light->GetHorizontalCount() == horizontal);
       EXPECT_EQ(light->candela.GetCount(), table);
       EXPECT_EQ(light->maxCandela, table > 0 ? 3 : 0);
     }
@@ -231,8 +227,7 @@ TEST(IESFile, MultipliesTheTableByItsFactors)
   // Lines alone are a file without a table.
   const IESPtr none = LoadText("IESNA91\n[LAMP] only");
   ASSERT_NE(none, nullptr);
-  EXPECT_EQ(none->lamp, String("only"));
-  EXPECT_EQ(none->candela.GetCount(), 0);
+  EXPECT_TRUE(none->lamp == String("only") && none->candela.GetCount() == 0);
   EXPECT_EQ(none->GetTotalFlux(), 12.566370614359172);
 }
 

@@ -91,8 +91,7 @@ TEST(Material, OfAnUnknownTypeComesBackByteForByte)
   for (int generation = 0; generation < 2; ++generation) {
     material = Reloaded(document);
     ASSERT_NE(material, nullptr);
-    EXPECT_EQ(material->GetType(), kUnknownType);
-    EXPECT_EQ(material->GetDiskType(), 5705);
+    EXPECT_TRUE(material->GetType() == kUnknownType && material->GetDiskType() == 5705);
     EXPECT_TRUE(material->IsInstanceOf(kUnknownType));
     EXPECT_FALSE(material->GetInfo() & kMaterialNoPreview);
     ASSERT_NE(material->GetShaders(), nullptr);
@@ -116,8 +115,7 @@ TEST(Material, IsMadeAndClonedByItsType)
     BaseMaterial* material = MakeMaterial(type);
     auto* clone = static_cast<BaseMaterial*>(material->MakeClone(0, nullptr));
     for (BaseMaterial* each : {material, clone}) {
-      EXPECT_EQ(each->GetType(), seen);
-      EXPECT_EQ(each->GetDiskType(), disk);
+      EXPECT_TRUE(each->GetType() == seen && each->GetDiskType() == disk);
       EXPECT_EQ(NodeCast<Material>(each) != nullptr, type == 5703);
       EXPECT_TRUE(each->Execute());
     }
@@ -139,10 +137,8 @@ TEST(Material, BindsShadersToItsSlots)
   EXPECT_EQ(material.BindChannelBitmap(8000, Filename("b.png")), first);
   EXPECT_EQ(Utf8(first->BitmapFilename().GetString()), "a.png");
   BaseShader* second = material.BindChannelShader(8000, kUnknownType);
-  EXPECT_EQ(material.ChannelShaderOf(8000), second);
-  EXPECT_EQ(material.ChannelShaderOf(8001), nullptr);
-  EXPECT_EQ(material.ChannelShaderOf(2100), nullptr);
-  EXPECT_EQ(material.GetShaders(), first);
+  EXPECT_TRUE(material.ChannelShaderOf(8000) == second && material.ChannelShaderOf(8001) == nullptr);
+  EXPECT_TRUE(material.ChannelShaderOf(2100) == nullptr && material.GetShaders() == first);
   EXPECT_EQ(first->GetNext(), second);
   EXPECT_EQ(second->GetUp(), nullptr);
   // A link that names no shader is no shader of the slot.

@@ -44,8 +44,7 @@ TEST(ObjectTransform, RelativeAndAbsoluteValuesAreOneWithoutAFrozenPart)
   object.SetRelPos({1, 2, 3});
   object.SetRelScale({2, 3, 4});
   object.SetAbsRot({kQuarter, 0, 0});
-  EXPECT_EQ(object.GetAbsPos(), Vector(1, 2, 3));
-  EXPECT_EQ(object.GetAbsScale(), Vector(2, 3, 4));
+  EXPECT_TRUE(object.GetAbsPos() == Vector(1, 2, 3) && object.GetAbsScale() == Vector(2, 3, 4));
   EXPECT_EQ(object.GetRelRot(), Vector(kQuarter, 0, 0));
   ExpectNear(object.GetLocalMatrix(), Matrix({1, 2, 3}, {0, 0, 2}, {0, 3, 0}, {-4, 0, 0}));
   ExpectNear(object.GetNormalizedLocalMatrix(), Matrix({1, 2, 3}, {0, 0, 1}, {0, 1, 0}, {-1, 0, 0}));
@@ -80,14 +79,12 @@ TEST(ObjectTransform, AbsoluteValuesAreBroughtUnderTheFrozenPartAndKeptExactly)
   ExpectNear(object.GetRelPos(), {1, 2, 3}, "position");
   EXPECT_EQ(object.GetRelScale(), Vector(5, 6, 7));
   ExpectNear(object.GetRelRot(), {kQuarter, 0, 0}, "rotation");
-  EXPECT_EQ(object.GetAbsPos(), Vector(7, 22, 31));
-  EXPECT_EQ(object.GetAbsScale(), Vector(10, 24, 56));
+  EXPECT_TRUE(object.GetAbsPos() == Vector(7, 22, 31) && object.GetAbsScale() == Vector(10, 24, 56));
   EXPECT_EQ(object.GetAbsRot(), Vector(kPiValue, 0, 0));
   for (const Vector& value : {Vector(0.3, 0.2, 0.1), Vector(-2.1, 1.3, 0.7)}) { // not lost on the way there and back
     object.SetAbsPos(value);
     object.SetAbsRot(value);
-    EXPECT_EQ(object.GetAbsPos(), value);
-    EXPECT_EQ(object.GetAbsRot(), value);
+    EXPECT_TRUE(object.GetAbsPos() == value && object.GetAbsRot() == value);
   }
   object.SetFrozenScale({2, 0, 8});
   object.SetAbsScale({4, 5, 16});
@@ -104,11 +101,9 @@ TEST(ObjectTransform, FrozenFlagsFollowTheFrozenValues)
   EXPECT_EQ(object.GetFrozenFlags(), kFrozenPos | kFrozenScale);
   EXPECT_EQ(object.GetAbsPos(), Vector(11, 22, 33));
   object.SetFrozenPos({0, 0, 0});
-  EXPECT_EQ(object.GetFrozenFlags(), kFrozenScale);
-  EXPECT_EQ(object.GetAbsPos(), Vector(1, 2, 3));
+  EXPECT_TRUE(object.GetFrozenFlags() == kFrozenScale && object.GetAbsPos() == Vector(1, 2, 3));
   object.SetFrozenScale({1, 1, 1});
-  EXPECT_EQ(object.GetFrozenFlags(), 0u);
-  EXPECT_EQ(object.GetAbsScale(), Vector(5, 6, 7));
+  EXPECT_TRUE(object.GetFrozenFlags() == 0u && object.GetAbsScale() == Vector(5, 6, 7));
 }
 
 TEST(ObjectTransform, MatricesPassThroughParentsAndFrozenParts)
@@ -195,10 +190,8 @@ TEST(ObjectTransform, AProtectionTagHoldsOffEverySetter)
   object.SetLocalMatrix(Matrix());
   object.SetGlobalMatrix(Matrix());
   object.SetParameterById(kObjectGlobalPos, GeData(v));
-  EXPECT_EQ(object.GetGlobalMatrix(), before);
-  EXPECT_EQ(object.GetRelPos(), Vector(1, 2, 3));
-  EXPECT_EQ(object.GetRotationOrder(), 6);
-  EXPECT_EQ(object.GetFrozenScale(), Vector(2, 4, 8));
+  EXPECT_TRUE(object.GetGlobalMatrix() == before && object.GetRelPos() == Vector(1, 2, 3));
+  EXPECT_TRUE(object.GetRotationOrder() == 6 && object.GetFrozenScale() == Vector(2, 4, 8));
 }
 
 TEST(ObjectTransform, GlobalParametersWorkInTheParentsSystem)

@@ -1,21 +1,9 @@
 // Containers that share their elements against containers of their own ones: edited, written and read alike.
-#include <random>
-
-#include <gtest/gtest.h>
-
-#include "support/counting_memory.h"
-#include "support/every_failed_allocation.h"
-#include "support/memory_file.h"
-#include "torvane/links/alias.h"
+#include "support/library.h"
 #include "torvane/stream/prepared_record.h"
-#include "torvane/tags/texture_tag.h"
-#include "torvane/values/base_container.h"
 
 namespace
 {
-
-using namespace _torvane_;
-using FileBytes = std::vector<std::uint8_t>;
 
 constexpr int kSteps = 40;
 
@@ -35,16 +23,16 @@ void Fill(BaseContainer& own, const BaseContainer& other)
     own.InsertData(id, *value);
 }
 
-FileBytes BytesOf(const BaseContainer& container)
+Bytes BytesOf(const BaseContainer& container)
 {
   return WriteToMemory([&](HyperFile& file) { file.WriteContainer(container); });
 }
 
 // In the general way.
-FileBytes PlainBytesOf(const BaseContainer& container)
+Bytes PlainBytesOf(const BaseContainer& container)
 {
   PreparedRecord::SetEnabled(false);
-  FileBytes bytes = BytesOf(container);
+  Bytes bytes = BytesOf(container);
   PreparedRecord::SetEnabled(true);
   return bytes;
 }
@@ -118,8 +106,7 @@ TEST_F(SharedDefaults, StayWhereTheyLieWhenMoreOfThemChange)
   for (Long id = 1000; id < 1010; ++id)
     container.SetData(id, GeData(id));
   container.InsertData(5, GeData(5));
-  EXPECT_EQ(container.FindData(1002), first);
-  EXPECT_EQ(container.GetLong(1002), 1002);
+  EXPECT_TRUE(container.FindData(1002) == first && container.GetLong(1002) == 1002);
   EXPECT_EQ(TextureTag().GetDataInstance().GetReal(1002), 1.0);
 }
 
@@ -130,9 +117,9 @@ TEST_F(SharedDefaults, AreReadAsOwnElements)
   source.GetDataInstance().SetId(kTagTexture);
   source.GetDataInstance().SetLink(kTextureMaterial, &target);
   source.GetDataInstance().SetReal(kTextureOffsetX, 0.25);
-  const FileBytes whole = WriteToMemory([&](HyperFile& file) { file.WriteContainer(source.GetDataInstance()); }, true);
+  const Bytes whole = WriteToMemory([&](HyperFile& file) { file.WriteContainer(source.GetDataInstance()); }, true);
   std::mt19937 random(1);
-  const auto isReadAlike = [](const FileBytes& bytes) {
+  const auto isReadAlike = [](const Bytes& bytes) {
     TextureTag tags[2];
     Bool read[2] = {};
     Long errors[2] = {};
@@ -151,7 +138,7 @@ TEST_F(SharedDefaults, AreReadAsOwnElements)
   for (std::size_t size = 13; size <= whole.size(); ++size)
     ASSERT_TRUE(isReadAlike({whole.begin(), whole.begin() + static_cast<std::ptrdiff_t>(size)})) << size << " bytes";
   for (std::size_t place = 13; place < whole.size(); ++place) {
-    FileBytes changed = whole;
+    Bytes changed = whole;
     for (const int change : {1, 2, 128}) {
       changed[place] = static_cast<std::uint8_t>(whole[place] ^ change);
       ASSERT_TRUE(isReadAlike(changed)) << "byte " << place << " with " << change;

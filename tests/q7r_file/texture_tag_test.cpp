@@ -53,10 +53,8 @@ TEST(TextureTag, TakesPlaceLinksAndAspectsFromItsOldChunk)
       ASSERT_TRUE(version < 7500 ||
                   (first.ReadChunkLoop(memory.file, true) && second.ReadChunkLoop(memory.file, true)));
     }
-    EXPECT_EQ(tag.Position(), Vector(1, 1.5, 0.75));
-    EXPECT_EQ(tag.Size(), Vector(2, 2.5, 1.75));
-    EXPECT_EQ(tag.Rotation(), Vector(3, 3.5, 2.75));
-    EXPECT_EQ(tag.TextureMatrix().off, Vector(1, 1.5, 0.75));
+    EXPECT_TRUE(tag.Position() == Vector(1, 1.5, 0.75) && tag.Size() == Vector(2, 2.5, 1.75));
+    EXPECT_TRUE(tag.Rotation() == Vector(3, 3.5, 2.75) && tag.TextureMatrix().off == Vector(1, 1.5, 0.75));
     EXPECT_EQ(tag.GetMaterial(), hasFirst ? &first : nullptr);
     EXPECT_EQ(tag.GetDataInstance().GetLink(1017), hasSecond ? &second : nullptr);
     EXPECT_EQ(Entries(tag, {1018, 1020, 1200}), entries);
@@ -160,8 +158,7 @@ TEST(TextureTag, TakesAMatrixApartNearItsPresentRotation)
   const Matrix& back = tag.TextureMatrix();
   EXPECT_NEAR(Length(back.v1 - matrix.v1) + Length(back.v2 - matrix.v2) + Length(back.v3 - matrix.v3), 0.0, 1e-12);
   tag.SetTextureMatrix(Matrix({1, 1, 1}, {}, {}, {}));
-  EXPECT_EQ(tag.Size(), Vector());
-  EXPECT_EQ(tag.Rotation(), Vector());
+  EXPECT_TRUE(tag.Size() == Vector() && tag.Rotation() == Vector());
 }
 
 TEST(TextureTag, CopiesItsEntriesButComputesItsMatrixAnew)

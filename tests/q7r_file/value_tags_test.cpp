@@ -183,8 +183,7 @@ TEST(ValueTags, ReadOldVertexMapsByTypeAndVersion)
     tag->SetName("mine");
     const char* body = version < 11925 ? " Smap X89000000043F000000 ]" : " L2 A5:0.5,0.5 ]";
     ASSERT_TRUE(ReadInto(*tag, Record("[" + std::to_string(type) + ",0" + body), version));
-    EXPECT_EQ(tag->GetName(), String(name));
-    EXPECT_EQ(tag->GetCount(), count);
+    EXPECT_TRUE(tag->GetName() == String(name) && tag->GetCount() == count);
     const bool read = type == 5682 || version == 11925;
     EXPECT_EQ(Numbers<SReal>(*tag)[0], read ? 0.5F : 1.0F);
     std::unique_ptr<GeListNode> clone(tag->MakeClone(0, nullptr));

@@ -47,8 +47,7 @@ TEST(View, MakesFourDrawsWithThePerspectiveFirst)
     SCOPED_TRACE(index);
     BaseDraw* draw = panel.GetBaseDraw(index);
     const BaseContainer& camera = draw->GetEditorCamera()->GetDataInstance();
-    EXPECT_EQ(camera.GetLong(1001), kMade[index].projection);
-    EXPECT_EQ(camera.GetReal(1000), 1.0);
+    EXPECT_TRUE(camera.GetLong(1001) == kMade[index].projection && camera.GetReal(1000) == 1.0);
     EXPECT_EQ(camera.GetReal(500), 36.0);
     EXPECT_EQ(camera.GetReal(1118) + camera.GetReal(1119), 0.0);
     const Long ids[] = {1003, 1042, 1004, 1043};
@@ -129,8 +128,7 @@ TEST(View, LooksThroughTheSceneCameraThatWasSetLast)
   ASSERT_NE(loaded, nullptr);
   auto* camera = static_cast<BaseList2D*>(DrawAt(*FirstPanel(*loaded), 0)->GetSceneCamera().GetLink());
   ASSERT_NE(camera, nullptr);
-  EXPECT_EQ(camera->GetName(), String("Two"));
-  EXPECT_EQ(camera->GetDocument(), loaded.get());
+  EXPECT_TRUE(camera->GetName() == String("Two") && camera->GetDocument() == loaded.get());
   auto* copy = static_cast<ViewPanel*>(FirstPanel(*document)->MakeClone(0, nullptr));
   ASSERT_NE(copy, nullptr);
   EXPECT_EQ(DrawAt(*copy, 0)->GetSceneCamera().GetLink(), second);

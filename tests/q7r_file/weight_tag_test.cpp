@@ -42,10 +42,8 @@ std::string RowOf(int kind, BaseObject& object)
 TEST(WeightTag, BeginsWithItsEntriesAndNoJoints)
 {
   Rig rig;
-  EXPECT_EQ(rig.tag->GetDataInstance().GetReal(2007), 1.0);
-  EXPECT_EQ(rig.Tree().GetRowCount(), 0);
-  EXPECT_EQ(rig.data->GetJointCount(), 0);
-  EXPECT_EQ(rig.data->GetJoint(0), nullptr);
+  EXPECT_TRUE(rig.tag->GetDataInstance().GetReal(2007) == 1.0 && rig.Tree().GetRowCount() == 0);
+  EXPECT_TRUE(rig.data->GetJointCount() == 0 && rig.data->GetJoint(0) == nullptr);
   EXPECT_FALSE(WeightTagData().Init()); // without a tag
 }
 
@@ -82,8 +80,7 @@ TEST(WeightTag, AddsEachJointOnceAndKeepsRowsForThem)
   for (Long i = 0; i < 3; ++i)
     EXPECT_EQ(rig.data->InsertJointRecord(&joints[i]), i);
   EXPECT_EQ(rig.data->InsertJointRecord(&joints[1]), 1);
-  EXPECT_EQ(rig.data->GetTreeChanges(), 3);
-  EXPECT_EQ(rig.data->GetGlobalMatrix().off, Vector(4, 0, 0));
+  EXPECT_TRUE(rig.data->GetTreeChanges() == 3 && rig.data->GetGlobalMatrix().off == Vector(4, 0, 0));
   EXPECT_EQ(rig.data->GetGlobalInverse().off, Vector(-4, 0, 0));
   EXPECT_EQ(rig.Rows(), RowOf(1, joints[0]) + RowOf(1, joints[1]) + RowOf(1, joints[2]));
   rig.data->GetJoint(1)->AddEntry()->link.SetLink(&listed);
@@ -132,8 +129,7 @@ TEST(WeightTag, TakesTheBindPoseFromTheJoints)
   EXPECT_EQ(rig.data->GetJoint(1)->bindMatrix, Matrix());
   rig.data->GetJoint(1)->object = nullptr; // as after reading: found in the tree
   EXPECT_TRUE(rig.data->RefreshBindPose(-1));
-  EXPECT_EQ(rig.data->GetJoint(1)->bindMatrix.off, Vector(1, 3, 4));
-  EXPECT_EQ(rig.data->GetJoint(1)->length, 0.0);
+  EXPECT_TRUE(rig.data->GetJoint(1)->bindMatrix.off == Vector(1, 3, 4) && rig.data->GetJoint(1)->length == 0.0);
   rig.data->GetJoint(1)->joint->SetLink(rig.tag); // no object
   EXPECT_FALSE(rig.data->RefreshBindPose(-1));
 }
@@ -188,12 +184,9 @@ TEST(WeightTag, CopiesItsJointsWithTheirLinks)
   auto* data = static_cast<WeightTagData*>(copy.GetTag(kTagWeight)->GetNodeData());
   ASSERT_TRUE(data && data->GetJointCount() == 1);
   const JointRecord& copied = *data->GetJoint(0);
-  EXPECT_EQ(copied.GetTarget(), copy.GetDown());
-  EXPECT_EQ(copied.second->GetLink(), copy.GetDown());
-  EXPECT_EQ(copied.entries[0]->link.GetLink(), copy.GetDown());
-  EXPECT_EQ(copied.entries[0]->value, 8);
-  EXPECT_EQ(copied.index, 4);
-  EXPECT_EQ(copied.restMatrix, Frame(1, 2));
+  EXPECT_TRUE(copied.GetTarget() == copy.GetDown() && copied.second->GetLink() == copy.GetDown());
+  EXPECT_TRUE(copied.entries[0]->link.GetLink() == copy.GetDown() && copied.entries[0]->value == 8);
+  EXPECT_TRUE(copied.index == 4 && copied.restMatrix == Frame(1, 2));
   EXPECT_EQ(copied.weights.ReadPointWeight(2), 1.0);
   EXPECT_EQ(data->GetGlobalMatrix(), Frame(3, 1));
 

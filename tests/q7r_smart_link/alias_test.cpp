@@ -43,11 +43,9 @@ TEST(Alias, FollowsItsGoalUntilThatGoes)
     EXPECT_NE(goal.GetGoalId(), 0U);
     EXPECT_EQ(other.GetGoalId(), 0U);
     goal.resolvable = false;
-    EXPECT_EQ(link.GetLink(), nullptr);
-    EXPECT_EQ(link.GetLinkGoal(), &goal);
+    EXPECT_TRUE(link.GetLink() == nullptr && link.GetLinkGoal() == &goal);
   }
-  EXPECT_EQ(link.GetLink(), nullptr);
-  EXPECT_EQ(link.GetLinkGoal(), nullptr);
+  EXPECT_TRUE(link.GetLink() == nullptr && link.GetLinkGoal() == nullptr);
   GeAliasGoal later(FakeNode(3));
   link.SetLinkGoal(&later);
   EXPECT_EQ(link.GetLink(), FakeNode(3));
@@ -111,8 +109,7 @@ TEST(Alias, LetsLinksAndGoalsGoWhileTheyAreWalked)
     link->SetLinkGoal(goal.get());
   }
   GoalIterator first, second;
-  EXPECT_EQ(goal->FirstLinkOfGoal(first, 0), &links[0]);
-  EXPECT_EQ(goal->FirstLinkOfGoal(second, 0), &links[0]);
+  EXPECT_TRUE(goal->FirstLinkOfGoal(first, 0) == &links[0] && goal->FirstLinkOfGoal(second, 0) == &links[0]);
   links[0].reset();
   links[1].reset(); // the next of both
   links[2]->ClearLink();
@@ -210,8 +207,7 @@ TEST(Alias, ResolvesAContainersLinkThatIsReadBeforeItsGoal)
     container.InsertData(10, *container.FindData(9));
     ASSERT_TRUE(goal.ReadGoal(source.file));
   }
-  EXPECT_EQ(container.GetData(9).GetLink(), FakeNode(4));
-  EXPECT_EQ(container.GetData(10).GetLink(), FakeNode(4));
+  EXPECT_TRUE(container.GetData(9).GetLink() == FakeNode(4) && container.GetData(10).GetLink() == FakeNode(4));
   EXPECT_EQ(copy.GetData(9).GetLink(), FakeNode(4));
   EXPECT_EQ(OwnersOf(goal).size(), 3U);
 }
@@ -298,8 +294,7 @@ TEST(Alias, KeepsACopysLinksInsideTheCopyAndTheOthersAtTheirOldTarget)
     translator.Finish(keep);
     EXPECT_EQ(copies[0].GetLink(), FakeNode(2));
     EXPECT_EQ(copies[1].GetLink(), keep ? FakeNode(3) : nullptr);
-    EXPECT_EQ(copies[2].GetLink(), nullptr);
-    EXPECT_EQ(copies[3].GetLink(), nullptr);
+    EXPECT_TRUE(copies[2].GetLink() == nullptr && copies[3].GetLink() == nullptr);
     EXPECT_EQ(toInside.GetLink(), FakeNode(1));
   }
   EXPECT_TRUE(inside.CopyGoalTo(insideCopy, nullptr)); // without an array nothing happens

@@ -1,23 +1,10 @@
 // Files whose nodes go to a sink, against the same files loaded whole.
-#include <random>
-#include <set>
-#include <tuple>
-
-#include <gtest/gtest.h>
-
-#include "support/record_samples.h"
-#include "support/scene_bytes.h"
+#include "support/library.h"
 #include "support/scene_corpus.h"
-#include "torvane/animation/ctrack.h"
-#include "torvane/materials/base_material.h"
 #include "torvane/nodes/node_sink.h"
-#include "torvane/tags/base_tag.h"
 
 namespace
 {
-
-using namespace _torvane_;
-using FileBytes = std::vector<std::uint8_t>;
 
 // What there is of objects and materials: type, tags, tracks, keys of the first curves.
 using Nodes = std::multiset<std::tuple<Long, Long, Long, Long>>;
@@ -61,7 +48,7 @@ class Noting : public NodeSink
 };
 
 // True if the sink got all that there is.
-bool GetsTheSame(const FileBytes& bytes)
+bool GetsTheSame(const Bytes& bytes)
 {
   FileProblem problems[2];
   Noting sink;
@@ -92,7 +79,7 @@ TEST(NodeSink, GetsWhatAWholeLoadGives)
     ++files;
     exact += GetsTheSame(file.bytes) ? 1 : 0;
     for (int i = 0; i < 12; ++i) {
-      FileBytes damaged = file.bytes;
+      Bytes damaged = file.bytes;
       damaged[random() % damaged.size()] = static_cast<std::uint8_t>(random());
       GetsTheSame(damaged);
       damaged.resize(random() % damaged.size());

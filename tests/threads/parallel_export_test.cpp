@@ -1,22 +1,12 @@
 // Several exports at a time, of one plug-in that was started once, each on a thread and with a host of its own.
-#include <gtest/gtest.h>
-
 #include <thread>
 
 #include "exporter/host_api/aegp_entry.h"
 #include "host/standalone_host.h"
-#include "support/temp_folder.h"
-#include "torvane/document/base_document.h"
-#include "torvane/memory/owned.h"
-#include "torvane/text/filename.h"
-#include "torvane/time/reproducible_run.h"
-#include "torvane/time/uuid.h"
+#include "support/library.h"
 
 namespace
 {
-
-using namespace _torvane_;
-using Bytes = std::vector<std::uint8_t>;
 
 constexpr DateTime kDate = {2001, 2, 3, 4, 5, 6};
 
