@@ -162,8 +162,7 @@ TEST(BlendLayers, BringValuesIntoTheirRanges)
       const double kept = std::clamp(given, low, high);
       EXPECT_TRUE(stack.Data().SetParameter(path, GeData(given)));
       GeData value;
-      EXPECT_TRUE(stack.Data().GetParameter(path, value));
-      EXPECT_EQ(value.GetReal(), kept);
+      EXPECT_TRUE(stack.Data().GetParameter(path, value) && value.GetReal() == kept);
       EXPECT_EQ(RealOf(*layer, id), kept);
     }
     EXPECT_TRUE(layer->SetLayerParameter(id, GeData(5000.0)));
@@ -384,8 +383,7 @@ TEST(BlendLayers, LetAShaderLiveThatHoldsTheirStack)
     BlendLayer* folder = layers.AppendLayer(kBlendFolder);
     BlendLayer* layer = folder->AsFolder()->GetChildren().AppendLayer(kBlendShader);
     layer->GetLink()->SetLink(target);
-    EXPECT_TRUE(layers.RemoveLayer(folder));
-    EXPECT_EQ(layers.GetCount(), 0);
+    EXPECT_TRUE(layers.RemoveLayer(folder) && layers.GetCount() == 0);
     EXPECT_TRUE(owner.GetShaders() == outer && outer->GetDown() == inner);
     CBlendLayers::DeleteLayer(folder);
   }

@@ -6,9 +6,7 @@ namespace
 
 using namespace gltf_test;
 
-constexpr Long kLine = kInterpolationLinear;
-constexpr Long kStep = kInterpolationStep;
-constexpr Long kSpline = kInterpolationSpline;
+constexpr Long kLine = kInterpolationLinear, kStep = kInterpolationStep, kSpline = kInterpolationSpline;
 
 class GltfMotion : public GltfScene
 {
@@ -123,8 +121,7 @@ TEST_F(GltfMotion, FrozenAndAbsoluteTracksMoveThePlace)
 
 TEST_F(GltfMotion, KeysThatTheirNeighboursGiveBackGo)
 {
-  std::vector<KeyPoint> line;
-  std::vector<KeyPoint> still;
+  std::vector<KeyPoint> line, still;
   for (int i = 0; i <= 100; ++i) {
     line.push_back({i / 10.0, 100.0 * i + (i == 50 ? 0.005 : 0.0)});
     still.push_back({i / 10.0, 3.0});

@@ -153,17 +153,11 @@ inline Node Folder(const std::string& name, std::vector<Node> items)
 
 inline Node MakeItem(const Comp& c)
 {
-  std::vector<Node> more = {Chunk("cdta", Data(204)
-                                              .U32(4, c.ticksPerFrame)
-                                              .U32(8, c.ticksPerSecond)
-                                              .Ratio(28, c.areaStart[0], c.areaStart[1])
-                                              .Ratio(36, c.areaEnd[0], c.areaEnd[1])
-                                              .Ratio(44, c.duration[0], c.duration[1])
-                                              .U16(140, c.width)
-                                              .U16(142, c.height)
-                                              .Ratio(144, c.pixelAspect[0], c.pixelAspect[1])
-                                              .U16(156, c.rate)
-                                              .U16(158, c.rateFraction))};
+  Data data(204);
+  data.U32(4, c.ticksPerFrame).U32(8, c.ticksPerSecond).Ratio(28, c.areaStart[0], c.areaStart[1]);
+  data.Ratio(36, c.areaEnd[0], c.areaEnd[1]).Ratio(44, c.duration[0], c.duration[1]);
+  data.U16(140, c.width).U16(142, c.height).Ratio(144, c.pixelAspect[0], c.pixelAspect[1]);
+  std::vector<Node> more = {Chunk("cdta", data.U16(156, c.rate).U16(158, c.rateFraction))};
   more.insert(more.end(), c.layers.begin(), c.layers.end());
   return Item(4, c.id, c.name, std::move(more));
 }
@@ -228,22 +222,11 @@ inline Node MakeLayer(const Layer& l)
       members.push_back(MatchName(name));
       members.push_back(Group(*group));
     }
-  const Data data = Data(160)
-                        .U32(0, l.id)
-                        .U32(8, l.stretch[0])
-                        .Ratio(12, l.start[0], l.start[1])
-                        .Ratio(20, l.in[0], l.in[1])
-                        .Ratio(28, l.out[0], l.out[1])
-                        .U8(38, l.switches)
-                        .U8(39, l.moreSwitches)
-                        .U32(40, l.source)
-                        .U32(108, l.stretch[1])
-                        .U8(131, l.kind)
-                        .U32(132, l.parent)
-                        .U32(136, l.lightKind)
-                        .U32(140, l.cameraKind)
-                        .U32(148, l.filmSizeUnits)
-                        .F64(152, 102.047244094488);
+  Data data(160);
+  data.U32(0, l.id).U32(8, l.stretch[0]).Ratio(12, l.start[0], l.start[1]).Ratio(20, l.in[0], l.in[1]);
+  data.Ratio(28, l.out[0], l.out[1]).U8(38, l.switches).U8(39, l.moreSwitches).U32(40, l.source);
+  data.U32(108, l.stretch[1]).U8(131, l.kind).U32(132, l.parent).U32(136, l.lightKind).U32(140, l.cameraKind);
+  data.U32(148, l.filmSizeUnits).F64(152, 102.047244094488);
   return List("Layr", {Chunk("ldta", data), Utf8(l.name), Group(std::move(members))});
 }
 
@@ -264,12 +247,9 @@ struct Property
 // The `tdbs` alone.
 inline Node Body(const Property& p)
 {
-  std::vector<Node> nodes = {Chunk("tdsb", Data().U32(0, p.switches)), Chunk("tdb4", Data(124)
-                                                                                         .U16(0, 0xDB99)
-                                                                                         .U16(2, p.components)
-                                                                                         .U8(5, p.form)
-                                                                                         .U32(12, p.ticksPerSecond)
-                                                                                         .U8(119, p.expressionOff))};
+  Data head(124);
+  head.U16(0, 0xDB99).U16(2, p.components).U8(5, p.form).U32(12, p.ticksPerSecond).U8(119, p.expressionOff);
+  std::vector<Node> nodes = {Chunk("tdsb", Data().U32(0, p.switches)), Chunk("tdb4", head)};
   if (p.keys.empty()) {
     nodes.push_back(Chunk("cdat", Data().Reals(0, p.value)));
   } else {
@@ -323,15 +303,10 @@ inline std::string WideKey(std::int64_t ticks, Way in, Way out, const std::vecto
                            bool isRoving = false)
 {
   const std::size_t n = value.size();
-  return Data(56 + 24 * n)
-      .U32(0, ticks)
-      .U8(4, in)
-      .U8(5, out)
-      .U8(7, isRoving ? 0x20 : 0)
-      .Reals(24, {ease.speedIn, ease.influenceIn, ease.speedOut, ease.influenceOut})
-      .Reals(56, value)
-      .Reals(56 + 8 * n, tangentIn)
-      .Reals(56 + 16 * n, tangentOut);
+  Data data(56 + 24 * n);
+  data.U32(0, ticks).U8(4, in).U8(5, out).U8(7, isRoving ? 0x20 : 0);
+  data.Reals(24, {ease.speedIn, ease.influenceIn, ease.speedOut, ease.influenceOut}).Reals(56, value);
+  return data.Reals(56 + 8 * n, tangentIn).Reals(56 + 16 * n, tangentOut);
 }
 
 inline std::vector<Node> Root(std::vector<Node> items, unsigned active = 0)

@@ -155,8 +155,7 @@ TEST(Gradient, CopiesAndComparesAllThatItHolds)
 TEST(Gradient, PreparesItsKnotsInOrderOfPosition)
 {
   GradientData gradient;
-  EXPECT_TRUE(gradient.PrepareGradient());
-  EXPECT_EQ(gradient.GetKnotCache(), nullptr);
+  EXPECT_TRUE(gradient.PrepareGradient() && gradient.GetKnotCache() == nullptr);
   Vector color;
   EXPECT_FALSE(gradient.EvaluateGradient(0.5, color));
 

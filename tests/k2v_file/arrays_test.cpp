@@ -190,8 +190,7 @@ TEST(SortSearchArray, KeepsElementsInTheOrderOfTheirKeys)
   ASSERT_TRUE(array.Insert({5, 55}));
   EXPECT_EQ(array.Find(5)->value, 55); // before its equal
   decltype(array) copy;
-  EXPECT_TRUE(array.CopyTo(copy));
-  EXPECT_EQ(copy.Find(large)->value, 0);
+  EXPECT_TRUE(array.CopyTo(copy) && copy.Find(large)->value == 0);
 }
 
 class Node : public GeTempPublicNode2D<Node>
@@ -219,8 +218,7 @@ TEST(List, KeepsBothDirectionsInStepThroughEveryChange)
   EXPECT_EQ(a.GetNext(), nullptr);
   {
     GeTempPublicList2D<Node> list, other;
-    EXPECT_TRUE(list.IsEmpty());
-    EXPECT_EQ(list.GetFirst(), nullptr);
+    EXPECT_TRUE(list.IsEmpty() && list.GetFirst() == nullptr);
     list.InsertLast(&a);
     list.InsertFirst(&b);
     Node* made = NewObj<Node>(4);

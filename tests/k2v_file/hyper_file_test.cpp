@@ -222,8 +222,7 @@ TEST(HyperFile, KeepsTheVersionOfAnEarlierFileThatTellsOne)
   Bytes old = ByteWriter().Raw("YQ7RQ7R6").bytes;
   Filename name;
   name.SetMemoryRead(old.data(), static_cast<LLong>(old.size()));
-  EXPECT_TRUE(read.file.Open(kSceneIdent, name, kHyperFileRead));
-  EXPECT_EQ(read.file.GetFileVersion(), 9420);
+  EXPECT_TRUE(read.file.Open(kSceneIdent, name, kHyperFileRead) && read.file.GetFileVersion() == 9420);
 }
 
 TEST(HyperFile, RefusesADamagedHeaderAndClosesTheFile)
@@ -364,18 +363,13 @@ TEST(HyperFile, KeepsStepAcrossTheBorderOfTheDiskBuffer)
   }
 }
 
-namespace
-{
-void RecordNumber(Long number, void* numbers) { static_cast<std::vector<Long>*>(numbers)->push_back(number); }
-
-} // namespace
-
 TEST(HyperFile, CallsTheProgressHooksAtTheirIntervals)
 {
+  const auto record = [](Long number, void* numbers) { static_cast<std::vector<Long>*>(numbers)->push_back(number); };
   std::vector<Long> positions;
   Bytes bytes = WriteToMemory(
       [&](HyperFile& file) {
-        file.SetWriteProgress(RecordNumber, &positions);
+        file.SetWriteProgress(record, &positions);
         for (int i = 0; i < 100001; ++i)
           file.WriteChar(1);
       },
@@ -385,7 +379,7 @@ TEST(HyperFile, CallsTheProgressHooksAtTheirIntervals)
   bytes.resize(13 + 2 * 1000); // 2013 bytes: a call when the counter has reached 4, which then goes on from 1
   std::vector<Long> percents;
   MemoryReadFile read(bytes);
-  read.file.SetReadProgress(RecordNumber, &percents);
+  read.file.SetReadProgress(record, &percents);
   Char value = 0;
   for (int i = 0; i < 1000; ++i)
     read.file.ReadChar(value);

@@ -5,9 +5,6 @@ namespace
 
 using Ranges = std::vector<std::pair<Long, Long>>;
 
-constexpr Long kLowest = std::numeric_limits<Long>::min();
-constexpr Long kHighest = std::numeric_limits<Long>::max();
-
 template <class Set>
 Ranges RangesOf(const Set& set)
 {
@@ -34,8 +31,7 @@ TYPED_TEST(RangeSet, MergesAndSplitsRanges)
   EXPECT_TRUE(set.AddIndex(5));
   EXPECT_EQ(RangesOf(set), (Ranges{{1, 9}}));
   EXPECT_EQ(set.GetCount(), 9);
-  EXPECT_TRUE(set.AddIndex(5));
-  EXPECT_EQ(set.GetCount(), 9);
+  EXPECT_TRUE(set.AddIndex(5) && set.GetCount() == 9);
   EXPECT_TRUE(set.RemoveIndex(5));
   EXPECT_EQ(RangesOf(set), (Ranges{{1, 4}, {6, 9}}));
   EXPECT_EQ(set.GetCount(), 8);
@@ -52,13 +48,13 @@ TYPED_TEST(RangeSet, MergesAndSplitsRanges)
 TYPED_TEST(RangeSet, ReachesTheEndsOfTheNumbers)
 {
   TypeParam set;
-  for (Long n : {kHighest, kLowest, kHighest - 1, kLowest + 1, 0})
+  for (Long n : {INT_MAX, INT_MIN, INT_MAX - 1, INT_MIN + 1, 0})
     ASSERT_TRUE(set.AddIndex(n));
-  EXPECT_EQ(RangesOf(set), (Ranges{{kLowest, kLowest + 1}, {0, 0}, {kHighest - 1, kHighest}}));
-  for (Long n : {kHighest, kLowest, 0})
+  EXPECT_EQ(RangesOf(set), (Ranges{{INT_MIN, INT_MIN + 1}, {0, 0}, {INT_MAX - 1, INT_MAX}}));
+  for (Long n : {INT_MAX, INT_MIN, 0})
     EXPECT_TRUE(set.RemoveIndex(n));
-  EXPECT_EQ(RangesOf(set), (Ranges{{kLowest + 1, kLowest + 1}, {kHighest - 1, kHighest - 1}}));
-  EXPECT_TRUE(set.SetRange(kLowest, kHighest));
+  EXPECT_EQ(RangesOf(set), (Ranges{{INT_MIN + 1, INT_MIN + 1}, {INT_MAX - 1, INT_MAX - 1}}));
+  EXPECT_TRUE(set.SetRange(INT_MIN, INT_MAX));
   EXPECT_EQ(set.GetCount(), LLong{1} << 32);
 }
 
@@ -106,10 +102,8 @@ TYPED_TEST(RangeSet, StaysAsItWasWhenMemoryRunsOut)
   // Up to where the next range needs memory, whichever form it is.
   for (Long n = 0; n < 512; ++n)
     ASSERT_TRUE(set.AddIndex(3 * n));
-  ASSERT_TRUE(set.AddIndex(1));
-  ASSERT_TRUE(set.AddIndex(2)); // (0, 4) joins two ranges
-  ASSERT_TRUE(set.AddIndex(4));
-  ASSERT_TRUE(set.AddIndex(5000));
+  for (Long n : {1, 2, 4, 5000})
+    ASSERT_TRUE(set.AddIndex(n)); // 2 joins two ranges
   const Ranges before = RangesOf(set);
   ASSERT_EQ(before.size(), 512u);
   counting_memory::FailAfter(0);
@@ -169,8 +163,7 @@ TEST(PagedRangeArray, GivesEmptyPagesBack)
   ASSERT_TRUE(set.GetRange(512, range));
   EXPECT_EQ(range.first, 2048);
   EXPECT_FALSE(set.TestIndex(1024));
-  EXPECT_TRUE(set.AddIndex(1500) && set.SetRange(1, 0));
-  EXPECT_EQ(set.GetRangeCount(), 0);
+  EXPECT_TRUE(set.AddIndex(1500) && set.SetRange(1, 0) && set.GetRangeCount() == 0);
 }
 
 TEST(PagedRangeArray, KeepsItsCursorOnTheRangeLastFound)
@@ -182,10 +175,8 @@ TEST(PagedRangeArray, KeepsItsCursorOnTheRangeLastFound)
   EXPECT_EQ(set.GetCursor(), 700); // pages that are filled in order are full
   EXPECT_FALSE(set.TestIndex(2 * 700 + 1));
   EXPECT_EQ(set.GetCursor(), 0);
-  EXPECT_TRUE(set.TestIndex(2 * 512));
-  EXPECT_EQ(set.GetCursor(), 512);
-  EXPECT_TRUE(set.RemoveIndex(0));
-  EXPECT_EQ(set.GetCursor(), 0);
+  EXPECT_TRUE(set.TestIndex(2 * 512) && set.GetCursor() == 512);
+  EXPECT_TRUE(set.RemoveIndex(0) && set.GetCursor() == 0);
   EXPECT_TRUE(set.TestIndex(2 * 512));
   EXPECT_EQ(set.GetCursor(), 512); // the first page has 511 ranges now
 }

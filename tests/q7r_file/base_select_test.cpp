@@ -214,8 +214,7 @@ TEST(BaseSelect, IsCopied)
   EXPECT_EQ(SegmentsOf(target), (Segments{{5, 7}, {9, 9}}));
   EXPECT_EQ(SegmentsOf(*clone), (Segments{{5, 7}, {9, 9}}));
   DeleteObj(clone);
-  EXPECT_TRUE(set.CopySelect(target));
-  EXPECT_EQ(target.SegmentArray(), nullptr);
+  EXPECT_TRUE(set.CopySelect(target) && target.SegmentArray() == nullptr);
 }
 
 TEST(BaseSelect, ReadsAMillionSingleNumbersInAFewAllocations)
@@ -246,6 +245,5 @@ TEST(BaseSelect, TakesPairsFromAPlainFile)
   EXPECT_EQ(SegmentsOf(set), (Segments{{2, 3}, {7, 7}}));
   EXPECT_FALSE(set.AssignSegments(&file, INT_MAX));
   EXPECT_EQ(set.SegmentCount(), 0);
-  EXPECT_TRUE(set.SelectAdd(1) && set.AssignSegments(&file, 0));
-  EXPECT_EQ(set.SegmentArray(), nullptr);
+  EXPECT_TRUE(set.SelectAdd(1) && set.AssignSegments(&file, 0) && set.SegmentArray() == nullptr);
 }

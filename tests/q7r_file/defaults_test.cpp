@@ -126,8 +126,7 @@ TEST(Defaults, AreSharedUntilTheyChange)
       EXPECT_NE(TextOf(changed), text);
     }
     const UWord dirty = data.GetDirty();
-    EXPECT_TRUE(data.InsertDataAfter(-5, GeData(1.5), reader.GetIndexData(0)));
-    EXPECT_EQ(data.GetIndexId(1), -1);
+    EXPECT_TRUE(data.InsertDataAfter(-5, GeData(1.5), reader.GetIndexData(0)) && data.GetIndexId(1) == -1);
     EXPECT_TRUE(data.RemoveData(reader.GetIndexId(0)) && data.SetData(999999, GeData(true)));
     EXPECT_EQ(data.GetCount(), count + 1);
     EXPECT_EQ(static_cast<UWord>(data.GetDirty() - dirty), 3);

@@ -48,8 +48,7 @@ void ExpectScene(BaseDocument& document)
   ASSERT_NE(child, nullptr);
   EXPECT_TRUE(child->GetName() == String("Child"));
   EXPECT_TRUE(child->GetUp() == parent && child->GetDocument() == &document);
-  EXPECT_EQ(TargetOf(child), parent);
-  EXPECT_EQ(TargetOf(parent), child);
+  EXPECT_TRUE(TargetOf(child) == parent && TargetOf(parent) == child);
   EXPECT_EQ(child->GetLayer(), document.GetFirstLayer());
   CTrack* track = child->FindTrack({{903, 0, 0}, {1000, 0, 0}});
   ASSERT_NE(track, nullptr);
@@ -73,8 +72,7 @@ TEST(DocumentFile, BeginsAndEndsAsEveryReaderExpects)
 
 TEST(DocumentFile, ASceneComesBackWhole)
 {
-  DocumentPtr document = MakeScene();
-  DocumentPtr back = LoadFromBytes(SaveToBytes(*document));
+  const DocumentPtr back = LoadFromBytes(SaveToBytes(*MakeScene()));
   ASSERT_NE(back, nullptr);
   ExpectScene(*back);
   EXPECT_EQ(back->GetLoadedVersion(), 13000);
@@ -85,8 +83,7 @@ TEST(DocumentFile, ASceneComesBackWhole)
 
 TEST(DocumentFile, EveryCutGivesNullAndLeaksNothing)
 {
-  DocumentPtr document = MakeScene();
-  Bytes whole = SaveToBytes(*document);
+  Bytes whole = SaveToBytes(*MakeScene());
   for (std::size_t size = 0; size < whole.size(); ++size) {
     FileProblem problem;
     ASSERT_EQ(LoadFromBytes(Bytes(whole.begin(), whole.begin() + static_cast<long>(size)), 3, &problem), nullptr)
@@ -100,8 +97,7 @@ TEST(DocumentFile, EveryCutGivesNullAndLeaksNothing)
 
 TEST(DocumentFile, NoChangedByteCrashesTheReader)
 {
-  DocumentPtr document = MakeScene();
-  const Bytes whole = SaveToBytes(*document);
+  const Bytes whole = SaveToBytes(*MakeScene());
   std::mt19937 random(7);
   for (int round = 0; round < 3000; ++round) {
     Bytes damaged = whole;
@@ -136,8 +132,7 @@ TEST(DocumentFile, RefusesWhatIsNoSceneFile)
 
 TEST(DocumentFile, PartialLoadsReadNoMoreThanTheyNeed)
 {
-  DocumentPtr document = MakeScene();
-  Bytes whole = SaveToBytes(*document);
+  Bytes whole = SaveToBytes(*MakeScene());
   DocumentPtr materialsOnly = LoadFromBytes(whole, LoadMaterials);
   ASSERT_NE(materialsOnly, nullptr);
   EXPECT_EQ(materialsOnly->GetFirstObject(), nullptr);
@@ -172,14 +167,9 @@ TEST(DocumentState, TranslatesOldModesAndTools)
     EXPECT_EQ(document->GetSettings(4).GetLong(75), 75); // the one before it is dropped
     EXPECT_EQ(document->GetSettings(5).GetCount(), 0);
   }
-  for (auto [tool, expected] : {std::pair<Long, Long>{12110, 200000089},
-                                {12111, 200000090},
-                                {12152, 200000088},
-                                {12256, 200000086},
-                                {12572, 200000084},
-                                {12573, 200000085},
-                                {12574, 200000083},
-                                {77, 77}})
+  const Long tools[][2] = {{12110, 200000089}, {12111, 200000090}, {12152, 200000088}, {12256, 200000086},
+                           {12572, 200000084}, {12573, 200000085}, {12574, 200000083}, {77, 77}};
+  for (const auto& [tool, expected] : tools)
     EXPECT_EQ(load(0, tool)->GetActiveTool(), expected);
 }
 
@@ -193,8 +183,8 @@ TEST(Document, AnswersItsParameters)
   }
   // The first loop mark follows the minimum, the last one the maximum.
   document->SetParameterById(kDocumentMinTime, GeData(BaseTime(5.0, 1.0)));
-  EXPECT_TRUE(document->GetPref().GetMaxTime() == BaseTime(5.0, 1.0));
-  EXPECT_TRUE(document->GetPref().GetLoopMin() == BaseTime(5.0, 1.0));
+  EXPECT_EQ(document->GetPref().GetMaxTime(), BaseTime(5.0, 1.0));
+  EXPECT_EQ(document->GetPref().GetLoopMin(), BaseTime(5.0, 1.0));
   document->SetParameterById(kDocumentMaxTime, GeData(BaseTime(4.0, 1.0)));
   EXPECT_TRUE(document->GetPref().GetMaxTime() == BaseTime(5.0, 1.0));
   document->SetParameterById(kDocumentMaxTime, GeData(BaseTime(8.0, 1.0)));

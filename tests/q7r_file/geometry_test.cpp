@@ -142,8 +142,7 @@ TEST(PolygonObject, TakesAnotherNumberOfNgonsWithTheirEdges)
   EXPECT_TRUE(ngons.Resize(2) && ngons.Resize(4));
   EXPECT_TRUE(ngons.GetEntry(0)->edges[2] == 7u && ngons.GetEntry(2)->count == 0);
   EXPECT_EQ(ngons.GetEntry(4), nullptr);
-  EXPECT_TRUE(ngons.Resize(-3));
-  EXPECT_EQ(ngons.GetCount(), 0);
+  EXPECT_TRUE(ngons.Resize(-3) && ngons.GetCount() == 0);
 }
 
 TEST(Geometry, SurvivesLittleMemory)
@@ -224,8 +223,7 @@ TEST(SplineObject, KeepsItsSelectionsInItsOwnChunkOnce)
   EXPECT_EQ(GetPointCount(*read), 2);
   EXPECT_TRUE(Holds(BytesOf(again), chunks));
   read->SetName(String("arc"));
-  EXPECT_TRUE(ReadInto(*read, Record("[110069,2 L0 C0 ]")));
-  EXPECT_EQ(read->GetName(), String("arc"));
+  EXPECT_TRUE(ReadInto(*read, Record("[110069,2 L0 C0 ]")) && read->GetName() == String("arc"));
 }
 
 TEST(PointObject, ComesBackFromAFileUnderItsLabel)

@@ -167,6 +167,7 @@ TEST(Material, SurvivesTheLackOfMemoryAtEveryStep)
 
 namespace
 {
+
 // Two objects, each with a texture tag on a material whose first slot is bound to a shader, crosswise: the first object
 // has the second material.
 DocumentPtr MakeLinkedScene(const char* prefix)

@@ -32,8 +32,7 @@ TEST(Shader, KeepsAFilenameOnlyAsABitmap)
   BaseShader bitmap;
   EXPECT_FALSE(bitmap.HasBitmapFilename());
   bitmap.SetBitmapFilename(Filename("a.png"));
-  EXPECT_TRUE(bitmap.HasBitmapFilename());
-  EXPECT_EQ(bitmap.GetDataInstance().GetData(1000).GetType(), 131);
+  EXPECT_TRUE(bitmap.HasBitmapFilename() && bitmap.GetDataInstance().GetData(1000).GetType() == 131);
   BaseShader other(1012161);
   other.SetBitmapFilename(Filename("a.png"));
   EXPECT_EQ(other.GetDataInstance().GetCount(), 0);

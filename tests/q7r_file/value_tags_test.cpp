@@ -125,8 +125,7 @@ TEST(ValueTags, ResizeKeepingTheFirstEntriesAndClearingNewOnes)
   ASSERT_TRUE(map.ResizeTagArray(1));
   EXPECT_EQ(Numbers<SReal>(map), (std::vector<SReal>{1.0F}));
   EXPECT_FALSE(map.ResizeTagArray(-1));
-  EXPECT_TRUE(map.ResizeTagArray(0));
-  EXPECT_EQ(map.GetArray(), nullptr);
+  EXPECT_TRUE(map.ResizeTagArray(0) && map.GetArray() == nullptr);
 
   PolygonTag polygons;
   EXPECT_TRUE(ReadInto(polygons, kLayouts[1].Filled()) && polygons.ResizeTagArray(0) && polygons.ResizeTagArray(-9));
@@ -136,8 +135,7 @@ TEST(ValueTags, ResizeKeepingTheFirstEntriesAndClearingNewOnes)
   EXPECT_FALSE(segments.ResizeTagArray(0) || segments.ResizeTagArray(-1));
   EXPECT_TRUE(ReadInto(segments, kLayouts[3].Filled()) && segments.ResizeTagArray(-1));
   EXPECT_EQ(segments.GetCount(), 2);
-  EXPECT_TRUE(segments.ResizeTagArray(0));
-  EXPECT_EQ(segments.GetCount(), 0);
+  EXPECT_TRUE(segments.ResizeTagArray(0) && segments.GetCount() == 0);
 
   TangentTag tangents;
   EXPECT_TRUE(ReadInto(tangents, kLayouts[2].Filled()) && tangents.ReplaceTagArray(2));

@@ -123,8 +123,7 @@ TEST(WeightTag, TakesTheBindPoseFromTheJoints)
   ASSERT_EQ(rig.data->InsertJointRecord(parent), 0);
   ASSERT_EQ(rig.data->InsertJointRecord(child), 1);
   EXPECT_FALSE(rig.data->RefreshBindPose(2) || rig.data->RefreshBindPose(-2));
-  EXPECT_TRUE(rig.data->RefreshBindPose(0));
-  EXPECT_EQ(rig.data->GetJoint(0)->length, 5.0);
+  EXPECT_TRUE(rig.data->RefreshBindPose(0) && rig.data->GetJoint(0)->length == 5.0);
   EXPECT_EQ(rig.data->GetJoint(0)->bindInverse.off, Vector(-1, 0, 0));
   EXPECT_EQ(rig.data->GetJoint(1)->bindMatrix, Matrix());
   rig.data->GetJoint(1)->object = nullptr; // as after reading: found in the tree
@@ -190,8 +189,7 @@ TEST(WeightTag, CopiesItsJointsWithTheirLinks)
   EXPECT_EQ(copied.weights.ReadPointWeight(2), 1.0);
   EXPECT_EQ(data->GetGlobalMatrix(), Frame(3, 1));
 
-  EXPECT_TRUE(rig.data->CopyTo(*rig.data, 0, nullptr));
-  EXPECT_EQ(rig.data->GetJointCount(), 1);
+  EXPECT_TRUE(rig.data->CopyTo(*rig.data, 0, nullptr) && rig.data->GetJointCount() == 1);
   WeightTagData loose;
   EXPECT_FALSE(rig.data->CopyTo(loose, 0, nullptr));
 }

@@ -40,8 +40,7 @@ TEST(Alias, FollowsItsGoalUntilThatGoes)
     link.SetLinkGoal(&other);
     link.SetLinkGoal(&goal);
     EXPECT_EQ(link.GetLink(), FakeNode(1));
-    EXPECT_NE(goal.GetGoalId(), 0U);
-    EXPECT_EQ(other.GetGoalId(), 0U);
+    EXPECT_TRUE(goal.GetGoalId() != 0 && other.GetGoalId() == 0);
     goal.resolvable = false;
     EXPECT_TRUE(link.GetLink() == nullptr && link.GetLinkGoal() == &goal);
   }
@@ -59,13 +58,11 @@ TEST(Alias, CopiesTargetAndLabelWithoutATranslation)
   GeAliasLink source, copy;
   copy.SetName(String("old"));
   source.SetLinkGoal(&goal);
-  EXPECT_TRUE(source.CopyLinkTo(&copy, nullptr));
-  EXPECT_EQ(copy.GetName(), nullptr);
+  EXPECT_TRUE(source.CopyLinkTo(&copy, nullptr) && copy.GetName() == nullptr);
   source.SetName(String("label"));
   GeAliasLink* clone = source.CloneLink(nullptr);
   EXPECT_EQ(*clone->GetName(), String("label"));
-  EXPECT_TRUE(clone->IsEqual(copy) && clone->CopyLinkTo(clone, nullptr));
-  EXPECT_EQ(clone->GetLink(), FakeNode(1));
+  EXPECT_TRUE(clone->IsEqual(copy) && clone->CopyLinkTo(clone, nullptr) && clone->GetLink() == FakeNode(1));
   DeleteObj(clone);
   EXPECT_TRUE(source.CopyLinkTo(nullptr, nullptr));
   GeAliasLink().CopyLinkTo(&copy, nullptr);
@@ -82,8 +79,7 @@ TEST(Alias, WalksTheOwnersOfTheLinksInTheOrderOfTheirCreation)
   links[2].SetLinkOwner(&links[2]);
   std::vector<GeAliasLink*> owners = OwnersOf(goal);
   ASSERT_EQ(owners.size(), 3U);
-  EXPECT_EQ(owners[0], &links[0]);
-  EXPECT_EQ(owners[2], &links[2]);
+  EXPECT_TRUE(owners[0] == &links[0] && owners[2] == &links[2]);
   EXPECT_NE(owners[1], nullptr); // the shared empty object
   GoalIterator iterator;
   EXPECT_EQ(goal.FirstLinkOfGoal(iterator, 1), goal.node);
@@ -93,10 +89,9 @@ TEST(Alias, WalksTheOwnersOfTheLinksInTheOrderOfTheirCreation)
   before.SetLinkOwner(&before);
   before.SetLinkGoal(&other);
   goal.MoveLinksTo(other);
-  EXPECT_EQ(OwnersOf(other).size(), 4U);
-  EXPECT_EQ(OwnersOf(other)[0], &before);
-  EXPECT_EQ(OwnersOf(other)[3], &links[2]);
-  EXPECT_TRUE(OwnersOf(goal).empty());
+  owners = OwnersOf(other);
+  ASSERT_EQ(owners.size(), 4U);
+  EXPECT_TRUE(owners[0] == &before && owners[3] == &links[2] && OwnersOf(goal).empty());
 }
 
 TEST(Alias, LetsLinksAndGoalsGoWhileTheyAreWalked)
@@ -186,8 +181,7 @@ TEST(Alias, TakesAnIdOnlyFromAGoalBlockOfExactSize)
     GeAliasLink link, old;
     GeAliasGoal goal(FakeNode(1));
     old.SetLinkGoal(&goal);
-    EXPECT_TRUE(link.ReadLink(source.file) && goal.ReadGoal(source.file));
-    EXPECT_EQ(link.GetLink(), nullptr);
+    EXPECT_TRUE(link.ReadLink(source.file) && goal.ReadGoal(source.file) && link.GetLink() == nullptr);
     EXPECT_EQ(old.GetLink(), nullptr); // a goal that is read loses the links that it had
   }
 }

@@ -34,6 +34,12 @@ BaseObject* FindBelow(BaseDocument& document, Long type)
   return object;
 }
 
+BaseObject* Taken(BaseObject* object)
+{
+  object->RemoveFromList();
+  return object;
+}
+
 Material& FirstMaterial(BaseDocument& document)
 {
   BaseMaterial* material = document.GetFirstMaterial();
@@ -59,33 +65,19 @@ const Change kChanges[] = {
      [](BaseDocument& d) { FindBelow(d, kObjectLight)->SetParameterById(kLightBrightness, 0.5); },
      {"params/90001 (brightness): 1 -> 0.5"}},
     {"the place",
-     [](BaseDocument& d) {
-       FindBelow(d, kObjectPlane)->SetRelPos({1, 2, 3});
-     },
+     [](BaseDocument& d) { FindBelow(d, kObjectPlane)->SetRelPos(Vector(1, 2, 3)); },
      {"objects/" + kText + "/" + kText, "  pos: (0, 0, 0) -> (1, 2, 3)"}},
     {"a new object",
      [](BaseDocument& d) { full_scene::AddObject(d, kObjectSky)->SetName("New"); },
      {"added    objects/New"}},
     {"an object less",
-     [](BaseDocument& d) {
-       BaseObject* sky = FindBelow(d, kObjectSky);
-       sky->RemoveFromList();
-       DeleteObj(sky);
-     },
+     [](BaseDocument& d) { const ObjectPtr sky(Taken(FindBelow(d, kObjectSky))); },
      {"removed  objects/" + kText}},
     {"an object elsewhere",
-     [](BaseDocument& d) {
-       BaseObject* plane = FindBelow(d, kObjectPlane);
-       plane->RemoveFromList();
-       d.InsertObject(plane, d.GetFirstObject());
-     },
+     [](BaseDocument& d) { d.InsertObject(Taken(FindBelow(d, kObjectPlane)), d.GetFirstObject()); },
      {"moved    objects/" + kText + "/" + kText, " -> objects/" + kText}},
     {"the order",
-     [](BaseDocument& d) {
-       BaseObject* last = d.GetFirstObject()->GetDownLast();
-       last->RemoveFromList();
-       last->InsertUnder(d.GetFirstObject());
-     },
+     [](BaseDocument& d) { Taken(d.GetFirstObject()->GetDownLast())->InsertUnder(d.GetFirstObject()); },
      {"order    objects/" + kText}},
     {"a name",
      [](BaseDocument& d) { FindBelow(d, kObjectPlane)->SetName("Wall"); },
@@ -121,9 +113,7 @@ const Change kChanges[] = {
      },
      {"tracks/" + kText, "keys/0  data: ", " -> \"b\""}},
     {"a material's colour",
-     [](BaseDocument& d) {
-       FirstMaterial(d).GetDataInstance().SetVector(kMaterialColor, {1, 0, 0});
-     },
+     [](BaseDocument& d) { FirstMaterial(d).GetDataInstance().SetVector(kMaterialColor, Vector(1, 0, 0)); },
      {"materials/" + kText, "data/2100 (color)", " -> (1, 0, 0)"}},
     {"a channel", [](BaseDocument& d) { FirstMaterial(d).SwitchChannel(5, 1); }, {"channels/5: 0 -> 1"}},
     {"a shader's picture",

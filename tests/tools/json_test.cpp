@@ -2,12 +2,11 @@
 
 #include "support/full_scene.h"
 #include "support/json_schema.h"
+#include "support/library.h"
 #include "support/run_q7r.h"
 
 namespace
 {
-
-using namespace _torvane_;
 
 const JsonSchema& Schema()
 {
@@ -15,7 +14,7 @@ const JsonSchema& Schema()
   return schema;
 }
 
-std::string Write(const TempFolder& folder, const std::string& name, const std::vector<std::uint8_t>& bytes)
+std::string Write(const TempFolder& folder, const std::string& name, const Bytes& bytes)
 {
   WriteWholeFile(folder / name, bytes);
   return folder / name;
@@ -27,15 +26,11 @@ std::string WriteText(const TempFolder& folder, const std::string& name, const s
 }
 
 // An unknown object, with chunks that nobody knows around it.
-std::vector<std::uint8_t> StrangeScene()
+Bytes StrangeScene()
 {
-  ByteWriter w;
-  w.Header().Start(110059, 0).Start(777002, 1).Long(5).End().Start(110107, 0).Start(110100, 0).Start(5154, 0);
-  w.Start(777001, 3).Bool(true).End().Start(110064, 9).Long(1012345).Long(0).String(u"Fog").Real(0.25).End();
-  w.Start(110108, 0).Start(110100, 0).Start(5691, 0).Start(110064, 8).Long(1012346).Long(0).String(u"Mark").LLong(1);
-  for (int i = 0; i < 8; ++i)
-    w.End();
-  return w.bytes;
+  return WithHeader(Record("[110059,0 [777002,1 L5 ] [110107,0 [110100,0 [5154,0 [777001,3 B1 ] "
+                           "[110064,9 L1012345 L SFog R0.25 ] [110108,0 [110100,0 [5691,0 [110064,8 L1012346 L SMark "
+                           "X110000000000000001 ] ] ] ] ] ] ] ]"));
 }
 
 Json Parsed(const std::string& text)
