@@ -1,9 +1,6 @@
 #include "export_fixture.h"
 #include "exporter/walk/camera.h"
 
-namespace
-{
-
 using namespace export_test;
 
 TEST(Camera, TakesItsApertureFromTheFilm)
@@ -141,5 +138,3 @@ TEST(Light, AnimatesAllButTheSwitchOfItsShadow)
   EXPECT_EQ(exported.Parameter("L", 90003).GetLong(), 1); // as where the work area starts
   EXPECT_NEAR(exported.Parameter("L", 90001).GetReal(), 0.2, 1e-12);
 }
-
-} // namespace

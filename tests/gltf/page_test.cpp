@@ -135,32 +135,27 @@ TEST_F(ViewVerb, RefusesWithOneSentence)
 
 TEST_F(ViewVerb, OpensTheBrowserOrTellsWhereThePageIs)
 {
-  struct
-  {
-    const char* opener; // null: there is none
-    const char* display;
-    bool isOpened;
-  } const cases[] = {
+  const std::tuple<const char*, const char*, bool> cases[] = {
       {"#!/bin/sh\necho \"$1\" >\"$TMPDIR/opened\"\n", ":9", true},
       {"#!/bin/sh\nexit 3\n", ":9", false},
       {"#!/bin/sh\necho \"$1\" >\"$TMPDIR/opened\"\n", "", false},
       {nullptr, ":9", false},
   };
-  for (const auto& row : cases) {
+  for (const auto& [opener, display, isOpened] : cases) {
     const TempFolder home;
-    if (row.opener) {
-      std::ofstream(home / "xdg-open") << row.opener;
+    if (opener) {
+      std::ofstream(home / "xdg-open") << opener;
       std::filesystem::permissions(home / "xdg-open", std::filesystem::perms::owner_all);
     }
     const RunResult run = RunQ7r("view " + Quoted(folder_ / "in.q7r"),
                                  "TMPDIR=" + Quoted(home.Path().string()) + " PATH=" + Quoted(home.Path().string()) +
-                                     " WAYLAND_DISPLAY= DISPLAY=" + Quoted(row.display));
+                                     " WAYLAND_DISPLAY= DISPLAY=" + Quoted(display));
     EXPECT_EQ(run.status, 0) << run.err;
     const std::string page = run.out.substr(0, run.out.find(": "));
     EXPECT_TRUE(page.ends_with("/in.html")) << run.out;
     EXPECT_TRUE(std::filesystem::exists(page)) << run.out;
-    EXPECT_EQ(run.err.empty(), row.isOpened) << run.err;
-    if (row.isOpened) {
+    EXPECT_EQ(run.err.empty(), isOpened) << run.err;
+    if (isOpened) {
       EXPECT_EQ(ReadOutput(home / "opened"), page + "\n");
     }
   }

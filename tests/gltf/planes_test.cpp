@@ -180,23 +180,18 @@ TEST_F(GltfPlanes, PackTheirPicturesInOnce)
 
 TEST_F(GltfPlanes, BlendPicturesThatLetThrough)
 {
-  struct Case
-  {
-    const char* file;
-    Bytes bytes;
-    bool blend;
-  };
-  const Case cases[] = {{"grey.png", Png(0), false},      {"rgb.png", Png(2), false},  {"palette.png", Png(3), false},
-                        {"grey-alpha.png", Png(4), true}, {"rgba.png", Png(6), true},  {"trns.png", Png(3, true), true},
-                        {"named-as.png", Jpeg(), false},  {"photo.jpg", Jpeg(), false}};
-  for (const Case& c : cases) {
-    Write(c.file, c.bytes);
-    AddPlane(c.file, 1, 1, AddPicture(c.file, c.file));
+  const std::tuple<const char*, Bytes, bool> cases[] = {
+      {"grey.png", Png(0), false},      {"rgb.png", Png(2), false},  {"palette.png", Png(3), false},
+      {"grey-alpha.png", Png(4), true}, {"rgba.png", Png(6), true},  {"trns.png", Png(3, true), true},
+      {"named-as.png", Jpeg(), false},  {"photo.jpg", Jpeg(), false}};
+  for (const auto& [file, bytes, blend] : cases) {
+    Write(file, bytes);
+    AddPlane(file, 1, 1, AddPicture(file, file));
   }
   options.embed = true;
   const Converted scene = Convert();
-  for (const Case& c : cases)
-    EXPECT_EQ(scene.MaterialOf(c.file).value("alphaMode", ""), c.blend ? "BLEND" : "") << c.file;
+  for (const auto& [file, bytes, blend] : cases)
+    EXPECT_EQ(scene.MaterialOf(file).value("alphaMode", ""), blend ? "BLEND" : "") << file;
   EXPECT_EQ(scene.json["images"][6]["mimeType"], "image/jpeg");
 }
 

@@ -101,12 +101,8 @@ TEST(ProjectLayers, OfAllKindsAreWhatTheyWere)
       {{.source = 999}, AEGP_ObjectType_AV, kVideo | k3D, nullptr},
   };
   std::vector<Node> nodes;
-  for (Layer layer : [&] {
-         std::vector<Layer> list;
-         for (const Case& c : cases)
-           list.push_back(c.layer);
-         return list;
-       }()) {
+  for (const Case& each : cases) {
+    Layer layer = each.layer;
     layer.id = 100 + static_cast<unsigned>(nodes.size());
     layer.parent = nodes.empty() ? 0 : 100;
     layer.name = nodes.size() % 2 ? "Own name" : "";
@@ -137,14 +133,10 @@ TEST(ProjectLayers, OfAllKindsAreWhatTheyWere)
 
 TEST(ProjectLayers, BeginAndEndWithTheirSource)
 {
-  struct Case
-  {
-    Layer layer;
-    double in, out, start; // frames
-  };
   const Node remapped = Body({.keys = {PlainKey(0, kLinear, kLinear, {0}, {{}})}});
   Comp inner{.id = 2, .name = "Inner"}; // 10 s
-  const Case cases[] = {
+  const std::tuple<Layer, double, double, double> cases[] = {
+      // in, out and start in frames
       {{.source = 50, .start = {-1, 1}, .in = {2, 1}, .out = {400, 10}}, 25, 975, -25},
       {{.source = 2, .in = {-1, 1}, .out = {40, 1}}, 0, 250, 0},
       {{.source = 2, .stretch = {1, 2}, .start = {1, 1}, .in = {2, 1}, .out = {40, 1}}, 50, 150, 25},
@@ -153,17 +145,18 @@ TEST(ProjectLayers, BeginAndEndWithTheirSource)
       {{.source = 60, .out = {40, 1}}, 0, 75, 0}, // 1.5 s at 24, made to have 12, twice, cut to half by a stretch
   };
   std::vector<Node> nodes;
-  for (const Case& c : cases)
-    nodes.push_back(MakeLayer(c.layer));
+  for (const auto& each : cases)
+    nodes.push_back(MakeLayer(std::get<Layer>(each)));
   const Data movie = Settings(8, 8).Ratio(38, 3, 4).U32(56, 24).U8(129, 2).U16(148, 12);
   const host::Project project =
       Read(WithLayers(nodes), {kSolid, MakeItem(inner), Footage(60, "/a/b.mov", false, movie)});
   for (std::size_t i = 0; i < std::size(cases); ++i) {
     SCOPED_TRACE(i);
     const host::LayerSpan& span = project.root->layers[i]->span.value();
-    EXPECT_DOUBLE_EQ(cases[i].in, span.in);
-    EXPECT_DOUBLE_EQ(cases[i].out, span.out);
-    EXPECT_DOUBLE_EQ(cases[i].start, span.start);
+    const auto& [layer, in, out, start] = cases[i];
+    EXPECT_DOUBLE_EQ(in, span.in);
+    EXPECT_DOUBLE_EQ(out, span.out);
+    EXPECT_DOUBLE_EQ(start, span.start);
   }
 }
 

@@ -198,14 +198,14 @@ TEST(HyperFileContainer, ReplacesElementsUnlessItIsFlushed)
 
 TEST(HyperFileContainer, RefusesWhatIsNoContainer)
 {
-  for (const auto& [bytes, good, error] :
-       {std::tuple<Bytes, bool, Long>{ByteWriter().Start(132, 0).Long(5).End().bytes, true, FILEERROR_NONE},
-        std::tuple<Bytes, bool, Long>{ByteWriter().Start(133, 1).Long(5).End().bytes, false, FILEERROR_WRONG_VALUE},
-        std::tuple<Bytes, bool, Long>{ByteWriter().Long(5).bytes, false, FILEERROR_WRONG_VALUE},
-        std::tuple<Bytes, bool, Long>{ByteWriter().Start(132, 1).Real(5).End().bytes, false, FILEERROR_WRONG_VALUE},
-        std::tuple<Bytes, bool, Long>{ByteWriter().Start(132, 1).Long(5).Real(1).End().bytes, false, FILEERROR_NONE}}) {
-    SCOPED_TRACE(ToHex(bytes));
-    MemoryReadFile read(WithHeader(bytes));
+  const std::tuple<const char*, bool, Long> rows[] = {{"[132,0 L5 ]", true, FILEERROR_NONE},
+                                                      {"[133,1 L5 ]", false, FILEERROR_WRONG_VALUE},
+                                                      {"L5", false, FILEERROR_WRONG_VALUE},
+                                                      {"[132,1 R5 ]", false, FILEERROR_WRONG_VALUE},
+                                                      {"[132,1 L5 R1 ]", false, FILEERROR_NONE}};
+  for (const auto& [values, good, error] : rows) {
+    SCOPED_TRACE(values);
+    MemoryReadFile read(WithHeader(Record(values)));
     BaseContainer container(3);
     EXPECT_EQ(read.file.ReadContainer(container, true), good);
     EXPECT_EQ(read.file.GetError(), error);

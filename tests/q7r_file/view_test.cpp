@@ -31,12 +31,8 @@ TEST(View, ADrawHasACameraOfItsOwn)
 
 TEST(View, MakesFourDrawsWithThePerspectiveFirst)
 {
-  struct Made
-  {
-    Long projection;
-    Long values[4]; // 1003, 1042, 1004, 1043
-  };
-  constexpr Made kMade[] = {{0, {0, 0, 0, 0}}, {6, {6, 1, 6, 1}}, {3, {6, 1, 6, 1}}, {4, {6, 1, 6, 1}}};
+  // The projection, and the entries 1003, 1042, 1004, 1043.
+  constexpr Long kMade[][5] = {{0, 0, 0, 0, 0}, {6, 6, 1, 6, 1}, {3, 6, 1, 6, 1}, {4, 6, 1, 6, 1}};
   ViewPanel panel;
   for (Long index : {7, 3, 4, 2, 1, 0, -1, -100}) {
     const BaseDraw* draw = panel.GetBaseDraw(index);
@@ -47,13 +43,13 @@ TEST(View, MakesFourDrawsWithThePerspectiveFirst)
     SCOPED_TRACE(index);
     BaseDraw* draw = panel.GetBaseDraw(index);
     const BaseContainer& camera = draw->GetEditorCamera()->GetDataInstance();
-    EXPECT_TRUE(camera.GetLong(1001) == kMade[index].projection && camera.GetReal(1000) == 1.0);
+    EXPECT_TRUE(camera.GetLong(1001) == kMade[index][0] && camera.GetReal(1000) == 1.0);
     EXPECT_EQ(camera.GetReal(500), 36.0);
     EXPECT_EQ(camera.GetReal(1118) + camera.GetReal(1119), 0.0);
     const Long ids[] = {1003, 1042, 1004, 1043};
     for (int i = 0; i < 4; ++i) {
       EXPECT_EQ(draw->GetDataInstance().GetIndexId(53 + i), ids[i]);
-      EXPECT_EQ(draw->GetDataInstance().GetLong(ids[i], -1), kMade[index].values[i]);
+      EXPECT_EQ(draw->GetDataInstance().GetLong(ids[i], -1), kMade[index][i + 1]);
     }
   }
   // A panel that has some gets four before them; all or none when memory is short.

@@ -4,8 +4,6 @@
 #include <cstdlib>
 #include <cstring>
 
-#include <gtest/gtest.h>
-
 #include "torvane/hooks.h"
 
 namespace
@@ -112,9 +110,5 @@ bool FailNever()
   const LLong failAt = gFailAt.exchange(-1);
   return failAt >= 0 && gAllocations > failAt;
 }
-
-BalanceCheck::BalanceCheck() : blocks_(Get().blocks) {}
-
-BalanceCheck::~BalanceCheck() { EXPECT_EQ(Get().blocks, blocks_) << "library blocks were left allocated"; }
 
 } // namespace counting_memory

@@ -45,17 +45,4 @@ auto WithoutMemory(Act&& act, _torvane_::LLong count = 0)
   return result;
 }
 
-// Fails the running test, on leaving the scope, if blocks were left allocated since it was made.
-class BalanceCheck
-{
- public:
-  BalanceCheck();
-  ~BalanceCheck();
-  BalanceCheck(const BalanceCheck&) = delete;
-  BalanceCheck& operator=(const BalanceCheck&) = delete;
-
- private:
-  _torvane_::LLong blocks_;
-};
-
 } // namespace counting_memory

@@ -21,14 +21,15 @@ void EveryFailedAllocation(Operation&& operation, Describe&& describe)
     for (_torvane_::LLong count = 0; failed; ++count) {
       const bool alone = fail == counting_memory::FailOnceAfter;
       SCOPED_TRACE("allocation " + std::to_string(count) + (alone ? " fails alone" : " and all behind it fail"));
-      counting_memory::BalanceCheck balance;
+      const _torvane_::LLong blocks = counting_memory::Get().blocks;
       fail(count);
-      auto made = operation();
-      failed = counting_memory::FailNever();
-      ASSERT_TRUE(failed || made);
-      if (made) {
-        ASSERT_TRUE(describe(made) == wanted) << "a part is missing without a word";
+      {
+        auto made = operation();
+        failed = counting_memory::FailNever();
+        ASSERT_TRUE(failed || made);
+        ASSERT_TRUE(!made || describe(made) == wanted) << "a part is missing without a word";
       }
+      ASSERT_EQ(counting_memory::Get().blocks, blocks) << "library blocks were left allocated";
     }
   }
 }

@@ -3,9 +3,6 @@
 #include "support/library.h"
 #include "support/run_q7r.h"
 
-namespace
-{
-
 TEST(SceneTree, TellsNodesOfOneNameApart)
 {
   const DocumentPtr document = NewDocument();
@@ -56,5 +53,3 @@ TEST(SceneTree, TellsNodesOfOneNameApart)
   EXPECT_EQ(below["tracks"][0]["after"], 3);
   EXPECT_EQ(below["tracks"][0]["curves"]["4"][0]["time"], Json({1.0, 2.0}));
 }
-
-} // namespace
