@@ -28,8 +28,8 @@ TEST(DrawPorts, FillRowsUpToFourBytes)
       {kDepthGrey, 8, 1, 8, 8, 8, 1},    {kDepthColor, 0, -7, 24, 4, 1, 1}, {kDepthGrey, 1, 0, 8, 4, 1, 1}};
   for (const auto& [depth, width, height, bits, rowSize, gotWidth, gotHeight] : cases) {
     const PortPtr port = NewPort(depth, width, height);
-    EXPECT_TRUE(port->GetBits() == bits && port->GetDepth() == depth && port->GetRowSize() == rowSize);
-    EXPECT_TRUE(port->GetWidth() == gotWidth && port->GetHeight() == gotHeight);
+    EXPECT_EQ(std::tuple(port->GetBits(), port->GetDepth(), port->GetRowSize(), port->GetWidth(), port->GetHeight()),
+              std::tuple(bits, depth, rowSize, gotWidth, gotHeight));
     const Bytes pixels(port->GetPixels(), port->GetPixels() + rowSize * gotHeight);
     EXPECT_EQ(Bytes(pixels.size(), 0), pixels);
   }

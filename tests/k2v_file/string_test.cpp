@@ -25,7 +25,7 @@ TEST(String, KeepsCapacityAtMultiplesOf16AndReusesTheBlock)
   };
   for (const auto& [act, length, capacity] : steps) {
     act();
-    EXPECT_TRUE(text.GetLength() == length && text.GetCapacity() == capacity);
+    EXPECT_TRUE(text.GetLength() == length && text.GetCapacity() == capacity) << length << " of " << capacity;
   }
 }
 

@@ -8,7 +8,7 @@ constexpr Real kInfinity = std::numeric_limits<Real>::infinity();
 
 void ExpectFields(const BaseTime& time, Real numerator, Real denominator)
 {
-  EXPECT_TRUE(time.GetNumerator() == numerator && time.GetDenominator() == denominator);
+  EXPECT_EQ(std::pair(time.GetNumerator(), time.GetDenominator()), std::pair(numerator, denominator));
 }
 
 TEST(BaseTime, RoundsSignsAndReducesFractions)

@@ -100,7 +100,7 @@ TEST(Curve, AnyOrderOfInsertionsAndDeletionsKeepsTheOrderOfTime)
     Long index = 0;
     for (auto [time, value] : model) {
       const CKey* key = c->GetKey(index++);
-      EXPECT_TRUE(key->GetTime() == BaseTime(time, 30) && key->GetValue() == value);
+      EXPECT_TRUE(key->GetTime() == BaseTime(time, 30) && key->GetValue() == value) << index;
     }
   }
 }

@@ -205,7 +205,7 @@ TEST(IESFile, RefusesCountsOutOfRangeAndTablesThatEndEarly)
     IESPtr light;
     EXPECT_EQ(LoadText(head + Repeat("3 ", table), light), result) << counts;
     if (result == 1) {
-      EXPECT_TRUE(light->GetVerticalCount() == vertical && light->GetHorizontalCount() == horizontal);
+      EXPECT_TRUE(light->GetVerticalCount() == vertical && light->GetHorizontalCount() == horizontal) << counts;
       EXPECT_EQ(light->candela.GetCount(), table);
       EXPECT_EQ(light->maxCandela, table > 0 ? 3 : 0);
     }
