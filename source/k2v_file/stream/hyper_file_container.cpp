@@ -3,10 +3,10 @@
 #include <cstring>
 
 #include "k2v_file/stream/value_forms.h"
+#include "k2v_file/stream/write_in_memory.h"
 #include "k2v_file/values/container_defaults.h"
 #include "k2v_file/values/container_index.h"
 #include "torvane/memory/spin_lock.h"
-#include "torvane/stream/hyper_file.h"
 #include "torvane/stream/prepared_record.h"
 #include "torvane/values/base_container.h"
 
@@ -93,27 +93,22 @@ Bool LearnDefaults(const BaseContainer::Defaults& defaults)
   const WriteGuard guard(lock);
   if (defaults.isStored.load(std::memory_order_relaxed))
     return true;
-  MemoryDescription description;
-  Filename target;
-  target.SetMemoryWrite(&description);
-  HyperFile file;
-  if (!file.Open(kSceneIdent, target, kHyperFileWrite))
-    return false;
-  const LLong start = file.GetPosition();
-  Long* end = defaults.ends;
-  for (const auto* element = defaults.first; element; element = element->next) {
-    if (element->value.GetRawType() != kDataContainer)
-      WriteElement(file, element->id, element->value);
-    *end++ = static_cast<Long>(file.GetPosition() - start);
-  }
-  const void* data = nullptr;
-  LLong size = 0;
-  if (!file.Close() || !target.GetMemoryContinuous(data, size) ||
-      size - start > defaults.count * BaseContainer::Defaults::kLargestStored)
-    return false;
-  std::memcpy(defaults.bytes, static_cast<const UChar*>(data) + start, static_cast<std::size_t>(size - start));
-  defaults.isStored.store(true, std::memory_order_release);
-  return true;
+  const auto write = [&defaults](HyperFile& file) {
+    const LLong start = file.GetPosition();
+    Long* end = defaults.ends;
+    for (const auto* element = defaults.first; element; element = element->next) {
+      if (element->value.GetRawType() != kDataContainer)
+        WriteElement(file, element->id, element->value);
+      *end++ = static_cast<Long>(file.GetPosition() - start);
+    }
+  };
+  return WriteInMemory(write, [&defaults](const UChar* file, LLong size, LLong header) {
+    if (size - header > defaults.count * BaseContainer::Defaults::kLargestStored)
+      return false;
+    std::memcpy(defaults.bytes, file + header, static_cast<std::size_t>(size - header));
+    defaults.isStored.store(true, std::memory_order_release);
+    return true;
+  });
 }
 
 } // namespace

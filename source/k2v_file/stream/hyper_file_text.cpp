@@ -28,6 +28,23 @@ void UnpackText(UniChar* text, const UChar* place, LLong count)
     text[i] = bytes::GetBig<UniChar>(place + i * 2);
 }
 
+void PackBlockHead(UChar* place, UChar tag, LLong length)
+{
+  place[0] = tag;
+  bytes::PutBig(place + 1, static_cast<ULong>(length));
+}
+
+// The quick way: only if the head stands in the buffer and has the tag.
+Bool TakeBlockHead(BaseFile& file, UChar tag, LLong& length)
+{
+  const UChar* place = file.ReadWindow(kBlockHead);
+  if (!place || place[0] != tag)
+    return false;
+  length = bytes::GetBig<ULong>(place + 1);
+  file.CommitRead(kBlockHead);
+  return true;
+}
+
 } // namespace
 
 Bool HyperFile::PutBlockHead(UChar tag, ULong length)
@@ -35,21 +52,16 @@ Bool HyperFile::PutBlockHead(UChar tag, ULong length)
   if (error_ != FILEERROR_NONE)
     return false;
   LLong start = file_.GetPosition();
-  UChar raw[5];
+  UChar raw[kBlockHead];
   UChar* place = TakeRoom(raw, sizeof raw);
-  place[0] = tag;
-  bytes::PutBig(place + 1, length);
+  PackBlockHead(place, tag, length);
   return FinishRoom(place, raw, sizeof raw) || FailFromFile(start);
 }
 
 Bool HyperFile::GetBlockHead(UChar tag, LLong& length)
 {
-  const UChar* place = error_ == FILEERROR_NONE ? file_.ReadWindow(kBlockHead) : nullptr;
-  if (place && place[0] == tag) {
-    length = bytes::GetBig<ULong>(place + 1);
-    file_.CommitRead(kBlockHead);
+  if (error_ == FILEERROR_NONE && TakeBlockHead(file_, tag, length))
     return true;
-  }
   Long stored = 0;
   if (!ExpectTag(tag) || !ReadPlainLong(stored))
     return false;
@@ -184,8 +196,7 @@ Bool HyperFile::WriteMemory(const void* data, LLong size)
   // Small blocks, as those of links and goals, go into the buffer in one go.
   UChar* place = size > 0 && size <= kSmallBlock ? file_.WriteWindow(kBlockHead + size) : nullptr;
   if (place) {
-    place[0] = kTagMemory;
-    bytes::PutBig(place + 1, static_cast<ULong>(size));
+    PackBlockHead(place, kTagMemory, size);
     GeCopyMem(place + kBlockHead, data, size);
     file_.CommitWrite(kBlockHead + size);
     TickWrite();
@@ -202,12 +213,8 @@ Bool HyperFile::WriteMemory(const void* data, LLong size)
 // The length of a Memory value of either tag.
 Bool HyperFile::GetMemoryLength(LLong& length)
 {
-  const UChar* next = error_ == FILEERROR_NONE ? file_.ReadWindow(kBlockHead) : nullptr;
-  if (next && next[0] == kTagMemory) {
-    length = bytes::GetBig<ULong>(next + 1);
-    file_.CommitRead(kBlockHead);
+  if (error_ == FILEERROR_NONE && TakeBlockHead(file_, kTagMemory, length))
     return true;
-  }
   LLong start = file_.GetPosition();
   UChar tag = 0;
   if (!ReadValueHeader(tag))

@@ -3,8 +3,8 @@
 #include <atomic>
 #include <cstring>
 
+#include "k2v_file/stream/write_in_memory.h"
 #include "torvane/nodes/private_chunk.h"
-#include "torvane/stream/hyper_file.h"
 
 namespace _torvane_
 {
@@ -14,6 +14,22 @@ namespace
 
 std::atomic<Bool> gEnabled{true};
 
+// Reads the one chunk of a file in memory into `copy`, and counts the values.
+Bool CountReadTicks(const UChar* file, LLong size, PrivateChunk& copy, LLong& ticks)
+{
+  Filename source;
+  source.SetMemoryRead(file, size);
+  HyperFile reader;
+  UChar tag = 0;
+  Long id = 0;
+  Long level = 0;
+  if (!reader.Open(kSceneIdent, source, kHyperFileRead))
+    return false;
+  ticks = 0;
+  reader.SetReadProgress([](Long, void* count) { ++*static_cast<LLong*>(count); }, &ticks); // at every value
+  return reader.ReadValueHeader(tag) && reader.ReadChunkStart(id, level) && copy.ReadChunkLoop(reader, true);
+}
+
 } // namespace
 
 void PreparedRecord::SetEnabled(Bool enabled) { gEnabled.store(enabled, std::memory_order_relaxed); }
@@ -22,37 +38,19 @@ Bool PreparedRecord::IsEnabled() { return gEnabled.load(std::memory_order_relaxe
 
 Bool PreparedRecord::Learn(PrivateChunk& sample, PrivateChunk& copy, Long label)
 {
-  MemoryDescription description;
-  Filename target;
-  target.SetMemoryWrite(&description);
-  HyperFile writer;
-  if (!writer.Open(kSceneIdent, target, kHyperFileWrite))
-    return false;
-  const LLong header = writer.GetPosition();
-  sample.WriteAsChunk(writer, label);
-  writeTicks_ = writer.GetTicks();
-  const void* data = nullptr;
-  LLong size = 0;
-  if (!writer.Close() || !target.GetMemoryContinuous(data, size) || size - header > kLargest)
-    return false;
-
-  Filename source;
-  source.SetMemoryRead(data, size);
-  HyperFile reader;
-  UChar tag = 0;
-  Long id = 0;
-  Long level = 0;
-  if (!reader.Open(kSceneIdent, source, kHyperFileRead))
-    return false;
-  readTicks_ = 0;
-  reader.SetReadProgress([](Long, void* ticks) { ++*static_cast<LLong*>(ticks); }, &readTicks_); // at every value
-  if (!reader.ReadValueHeader(tag) || !reader.ReadChunkStart(id, level) || !copy.ReadChunkLoop(reader, true))
-    return false;
-
-  size_ = size - header;
-  std::memcpy(bytes_, static_cast<const UChar*>(data) + header, static_cast<std::size_t>(size_));
-  std::memset(fixed_, 255, static_cast<std::size_t>(size_));
-  return true;
+  const auto write = [&](HyperFile& writer) {
+    sample.WriteAsChunk(writer, label);
+    writeTicks_ = writer.GetTicks();
+  };
+  return WriteInMemory(write, [&](const UChar* file, LLong fileSize, LLong header) {
+    const LLong size = fileSize - header;
+    if (size > kLargest || !CountReadTicks(file, fileSize, copy, readTicks_))
+      return false;
+    size_ = size;
+    std::memcpy(bytes_, file + header, static_cast<std::size_t>(size));
+    std::memset(fixed_, 255, static_cast<std::size_t>(size));
+    return true;
+  });
 }
 
 LLong PreparedRecord::TakeField(const void* mark, LLong size)
