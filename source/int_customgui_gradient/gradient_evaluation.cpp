@@ -1,6 +1,7 @@
 // The colours of a gradient: its sorted knots, the blend between two of them, and the mirrored gradient.
 #include "int_customgui_gradient/gradient_knots.h"
 #include "int_customgui_gradient/gradient_sort.h"
+#include "k2v_file/memory/count_before.h"
 
 namespace _torvane_
 {
@@ -97,16 +98,7 @@ Bool GradientData::PrepareGradient()
 // The last knot that isn't behind the position; -1 before the first one.
 Long GradientData::FindLowerKnot(Real position) const
 {
-  Long lower = -1;
-  Long upper = knotCount_;
-  while (upper - lower > 1) {
-    const Long middle = lower + (upper - lower) / 2;
-    if (knotCache_[middle].position <= position)
-      lower = middle;
-    else
-      upper = middle;
-  }
-  return lower;
+  return CountBefore(knotCount_, [&](Long knot) { return knotCache_[knot].position <= position; }) - 1;
 }
 
 Bool GradientData::EvaluateGradient(Real position, Vector& color) const

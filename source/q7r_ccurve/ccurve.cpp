@@ -1,5 +1,6 @@
 #include "torvane/animation/ccurve.h"
 
+#include "k2v_file/memory/count_before.h"
 #include "k2v_file/stream/chunk_visitor.h"
 #include "q7r_ccurve/key_times.h"
 #include "q7r_file/nodes/node_tools.h"
@@ -193,20 +194,12 @@ CKey* CCurve::InsertKey(CKey* key, Long* index)
 // The index of the first key that isn't before `time`. Keys mostly come in order, so the ends are looked at first.
 Long CCurve::PlaceOf(const BaseTime& time) const
 {
-  Long low = 0;
-  Long high = GetKeyCount();
-  if (high == 0 || TimeOf(high - 1) < time)
-    return high;
+  const Long count = GetKeyCount();
+  if (count == 0 || TimeOf(count - 1) < time)
+    return count;
   if (TimeOf(0) >= time)
     return 0;
-  while (low < high) {
-    Long middle = low + (high - low) / 2;
-    if (TimeOf(middle) < time)
-      low = middle + 1;
-    else
-      high = middle;
-  }
-  return low;
+  return CountBefore(count, [&](Long index) { return TimeOf(index) < time; });
 }
 
 CKey* CCurve::FindKey(const BaseTime& time, Long* index, Long mode) const

@@ -1,6 +1,7 @@
 // Tangents and values of a curve.
 #include <cmath>
 
+#include "k2v_file/memory/count_before.h"
 #include "torvane/animation/ccurve.h"
 
 namespace _torvane_
@@ -127,16 +128,7 @@ Real CCurve::GetValue(Real time) const
   if (GetKeyCount() == 0)
     return 0.0;
   // The last key that isn't behind the time.
-  Long low = 0;
-  Long high = GetKeyCount();
-  while (low < high) {
-    Long middle = low + (high - low) / 2;
-    if (TimeOf(middle).Get() <= time)
-      low = middle + 1;
-    else
-      high = middle;
-  }
-  Long index = low - 1;
+  const Long index = CountBefore(GetKeyCount(), [&](Long place) { return TimeOf(place).Get() <= time; }) - 1;
   if (index < 0)
     return ValueOf(0);
   KeyValues a;

@@ -2,6 +2,8 @@
 
 #include <cstring>
 
+#include "k2v_file/memory/count_before.h"
+
 namespace _torvane_
 {
 
@@ -13,16 +15,7 @@ constexpr Long kFirstCapacity = 4;
 // The number of the first range among `count` sorted ones that ends at n or behind it; `count` if there is none.
 Long LowerBound(const GeRange* ranges, Long count, Long n)
 {
-  Long low = 0;
-  Long high = count;
-  while (low < high) {
-    Long middle = low + (high - low) / 2;
-    if (ranges[middle].last < n)
-      low = middle + 1;
-    else
-      high = middle;
-  }
-  return low;
+  return CountBefore(count, [&](Long place) { return ranges[place].last < n; });
 }
 
 // Whether n + 1 == m, at the ends of the number range too.
@@ -202,16 +195,8 @@ Long GePagedRangeArray::FindFrom(Long n) const noexcept
 Long GePagedRangeArray::FindInPages(Long n) const noexcept
 {
   // The last page that begins at n or before it.
-  Long low = 0;
-  Long high = pages_.GetCount();
-  while (low < high) {
-    Long middle = low + (high - low) / 2;
-    if (pages_[middle]->entries[0].first <= n)
-      low = middle + 1;
-    else
-      high = middle;
-  }
-  Long number = low > 0 ? low - 1 : 0;
+  const Long begun = CountBefore(pages_.GetCount(), [&](Long page) { return pages_[page]->entries[0].first <= n; });
+  const Long number = begun > 0 ? begun - 1 : 0;
   Long position = LowerBound(pages_[number]->entries, pages_[number]->count, n);
   if (position < pages_[number]->count)
     return number * kPageEntries + position;

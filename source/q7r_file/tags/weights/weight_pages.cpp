@@ -2,22 +2,15 @@
 // file, to ask for little memory.
 #include "torvane/tags/joint_weight_table.h"
 
+#include "k2v_file/memory/count_before.h"
+
 namespace _torvane_
 {
 
 // The place of a page, or where it belongs.
 Long WeightPages::FindPage(Long number) const
 {
-  Long low = 0;
-  Long high = pages_.GetCount();
-  while (low < high) {
-    const Long middle = low + (high - low) / 2;
-    if (pages_[middle].number < number)
-      low = middle + 1;
-    else
-      high = middle;
-  }
-  return low;
+  return CountBefore(pages_.GetCount(), [&](Long place) { return pages_[place].number < number; });
 }
 
 // The page, made if there is none; null when memory is short.

@@ -1,5 +1,7 @@
 #include "torvane/tags/joint_weight_table.h"
 
+#include "k2v_file/memory/count_before.h"
+
 namespace _torvane_
 {
 
@@ -21,16 +23,7 @@ LLong WeightRuns::GetWeightCount() const
 // The first run that ends at the point or behind it, or the number of runs.
 Long WeightRuns::FindRun(Long point) const
 {
-  Long low = 0;
-  Long high = runs_.GetCount();
-  while (low < high) {
-    const Long middle = low + (high - low) / 2;
-    if (runs_[middle].last < point)
-      low = middle + 1;
-    else
-      high = middle;
-  }
-  return low;
+  return CountBefore(runs_.GetCount(), [&](Long run) { return runs_[run].last < point; });
 }
 
 UWord WeightRuns::Get(Long point) const
