@@ -51,6 +51,7 @@
 #include "torvane/shaders/base_shader.h"
 #include "torvane/shaders/blend_layers.h"
 #include "torvane/shaders/gradient.h"
+#include "torvane/stream/chunk_fields.h"
 #include "torvane/stream/file_versions.h"
 #include "torvane/stream/hyper_file.h"
 #include "torvane/stream/raw_chunk_body.h"

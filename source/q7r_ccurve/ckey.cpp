@@ -63,33 +63,38 @@ Bool CKey::SetTime(const BaseTime& time)
   return true;
 }
 
-template <class Visitor>
-Bool CKey::VisitBody(Visitor& v)
+template <>
+struct ChunkFields<CKey>
 {
-  v.Time(time_);
-  v.Time(leftTime_);
-  v.Time(rightTime_);
-  v.Real(value_);
-  v.Real(leftValue_);
-  v.Real(rightValue_);
-  v.Long(interpolation_);
-  if constexpr (Visitor::kReading)
-    return v.Note(v.Good() && keyData_.Read(v.File()));
-  else
-    return v.Note(v.Good() && keyData_.Write(v.File()));
-}
+  template <class Visitor>
+  static Bool VisitBody(CKey& key, Visitor& v)
+  {
+    v.Time(key.time_);
+    v.Time(key.leftTime_);
+    v.Time(key.rightTime_);
+    v.Real(key.value_);
+    v.Real(key.leftValue_);
+    v.Real(key.rightValue_);
+    v.Long(key.interpolation_);
+    if constexpr (Visitor::kReading)
+      return v.Note(v.Good() && key.keyData_.Read(v.File()));
+    else
+      return v.Note(v.Good() && key.keyData_.Write(v.File()));
+  }
+};
 
 void CKey::WriteChunks(HyperFile& file)
 {
   BaseList2D::WriteChunks(file);
-  WriteChunk(file, kChunkKey, 0, [this](ChunkWriter& v) { return VisitBody(v); });
+  WriteChunk(file, kChunkKey, 0, [this](ChunkWriter& v) { return ChunkFields<CKey>::VisitBody(*this, v); });
 }
 
 Bool CKey::ReadChunk(HyperFile& file, Long id, Long level)
 {
   if (BaseList2D::ReadChunk(file, id, level))
     return true;
-  return id == kChunkKey && level >= 0 && ReadChunkBody(file, level, [this](ChunkReader& v) { return VisitBody(v); });
+  return id == kChunkKey && level >= 0 &&
+         ReadChunkBody(file, level, [this](ChunkReader& v) { return ChunkFields<CKey>::VisitBody(*this, v); });
 }
 
 Bool CKey::CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation)

@@ -166,30 +166,35 @@ Bool CTrack::ReadOldCurves(HyperFile& file)
   return false;
 }
 
-template <class Visitor>
-Bool CTrack::VisitSettings(Visitor& v)
+template <>
+struct ChunkFields<CTrack>
 {
-  v.Long(before_);
-  v.Long(after_);
-  // Below this level other things stood behind the two numbers.
-  if (v.Level() < kLevelTrackSettings)
+  template <class Visitor>
+  static Bool VisitSettings(CTrack& track, Visitor& v)
+  {
+    v.Long(track.before_);
+    v.Long(track.after_);
+    // Below &track level other things stood behind the two numbers.
+    if (v.Level() < kLevelTrackSettings)
+      return v.Good();
+    v.Link(track.trackLink_);
+    if constexpr (Visitor::kReading)
+      v.Note(v.Good() && track.path_.Read(v.File()));
+    else
+      v.Note(v.Good() && track.path_.Write(v.File()));
+    v.Long(track.kind_);
+    for (ULong& number : track.extra_)
+      v.LongInto(number);
     return v.Good();
-  v.Link(trackLink_);
-  if constexpr (Visitor::kReading)
-    v.Note(v.Good() && path_.Read(v.File()));
-  else
-    v.Note(v.Good() && path_.Write(v.File()));
-  v.Long(kind_);
-  for (ULong& number : extra_)
-    v.LongInto(number);
-  return v.Good();
-}
+  }
+};
 
 void CTrack::WriteChunks(HyperFile& file)
 {
   BaseList2D::WriteChunks(file);
   WriteCurves(file);
-  WriteChunk(file, kChunkTrackSettings, kLevelTrackSettings, [this](ChunkWriter& v) { return VisitSettings(v); });
+  WriteChunk(file, kChunkTrackSettings, kLevelTrackSettings,
+             [this](ChunkWriter& v) { return ChunkFields<CTrack>::VisitSettings(*this, v); });
 }
 
 Bool CTrack::ReadChunk(HyperFile& file, Long id, Long level)
@@ -200,7 +205,7 @@ Bool CTrack::ReadChunk(HyperFile& file, Long id, Long level)
   case kChunkCurves:
     return ReadCurves(file, level);
   case kChunkTrackSettings:
-    return ReadChunkBody(file, level, [this](ChunkReader& v) { return VisitSettings(v); });
+    return ReadChunkBody(file, level, [this](ChunkReader& v) { return ChunkFields<CTrack>::VisitSettings(*this, v); });
   default:
     return false;
   }

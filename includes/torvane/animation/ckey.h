@@ -2,6 +2,7 @@
 #pragma once
 
 #include "torvane/nodes/base_list.h"
+#include "torvane/stream/chunk_fields.h"
 #include "torvane/time/base_time.h"
 
 namespace _torvane_
@@ -87,9 +88,7 @@ class CKey : public BaseList2D
 
  private:
   friend class CCurve; // sets the time of a key that it moves
-
-  template <class Visitor>
-  Bool VisitBody(Visitor& visitor);
+  friend struct ChunkFields<CKey>;
 
   BaseTime time_;
   Real value_ = 0.0;

@@ -2,6 +2,7 @@
 #pragma once
 
 #include "torvane/animation/ccurve.h"
+#include "torvane/stream/chunk_fields.h"
 
 namespace _torvane_
 {
@@ -56,13 +57,13 @@ class CTrack : public BaseList2D
   GeListNode* MakeEmpty() const override { return NewObj<CTrack>(); }
 
  private:
+  friend struct ChunkFields<CTrack>;
+
   void WriteCurves(HyperFile& file);
   Bool ReadCurves(HyperFile& file, Long level);
   Bool ReadOldCurves(HyperFile& file);
   static Bool ReadCurve(HyperFile& file, CCurve*& curve);
   CCurve** SlotOf(Long number);
-  template <class Visitor>
-  Bool VisitSettings(Visitor& visitor);
 
   static constexpr Long kExtraCurves = 9;
   static constexpr Long kExtraNumbers = 4;

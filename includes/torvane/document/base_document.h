@@ -7,6 +7,7 @@
 #include "torvane/objects/base_object.h"
 #include "torvane/pictures/bitmap.h"
 #include "torvane/render/render_data.h"
+#include "torvane/stream/chunk_fields.h"
 #include "torvane/stream/hyper_file.h"
 #include "torvane/text/filename.h"
 #include "torvane/time/base_time.h"
@@ -93,8 +94,8 @@ class DocumentPref : public GeListNode
   void SetLastBool(Bool value) { lastBool_ = value; }
 
  private:
-  template <class Visitor>
-  Bool VisitBody(Visitor& visitor);
+  friend struct ChunkFields<DocumentPref>;
+
   void BringIntoRange(BaseTime& time) const;
 
   Long fps_ = 30;
@@ -184,18 +185,10 @@ class BaseDocument : public BaseList2D
   GeListNode* MakeEmpty() const override { return Alloc(); }
 
  private:
+  friend struct ChunkFields<BaseDocument>;
+
   struct Parameter; // a row of the table of parameters
 
-  template <class Visitor>
-  Bool VisitFileInfo(Visitor& visitor, Bool& hasPreview);
-  template <class Visitor>
-  Bool VisitState(Visitor& visitor);
-  template <class Visitor>
-  Bool VisitOldSettings(Visitor& visitor);
-  template <class Visitor>
-  Bool VisitEmptyNode(Visitor& visitor);
-  template <class Visitor>
-  Bool VisitNewerState(Visitor& visitor);
   Bool ReadPreview(HyperFile& file);
   Bool ReadFileInfo(HyperFile& file, Long level);
   void WriteFileInfo(HyperFile& file);

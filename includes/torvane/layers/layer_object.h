@@ -3,6 +3,7 @@
 
 #include "torvane/math/vector.h"
 #include "torvane/nodes/base_list.h"
+#include "torvane/stream/chunk_fields.h"
 
 namespace _torvane_
 {
@@ -40,8 +41,8 @@ class LayerObject : public BaseList4D
   GeListNode* MakeEmpty() const override { return NewObj<LayerObject>(); }
 
  private:
-  template <class Visitor>
-  Bool VisitBody(Visitor& visitor);
+  friend struct ChunkFields<LayerObject>;
+
   Bool MakeChildList();
 
   Bool flags_[kLayerFlagCount] = {false, true, true, true, false, true, true, true, true};

@@ -4,6 +4,7 @@
 
 #include "torvane/nodes/base_list.h"
 #include "torvane/pictures/bitmap.h"
+#include "torvane/stream/chunk_fields.h"
 #include "torvane/stream/raw_chunk_body.h"
 
 namespace _torvane_
@@ -47,8 +48,8 @@ class BaseMaterial : public BaseList2D
   GeListNode* MakeEmpty() const override;
 
  private:
-  template <class Visitor>
-  Bool VisitPreview(Visitor& visitor);
+  friend struct ChunkFields<BaseMaterial>;
+
   Bool ReadPluginData(HyperFile& file, Long level);
   void WritePluginData(HyperFile& file);
   Long GetPluginLevel() const;

@@ -2,6 +2,7 @@
 #pragma once
 
 #include "torvane/materials/base_material.h"
+#include "torvane/stream/chunk_fields.h"
 #include "torvane/text/filename.h"
 
 namespace _torvane_
@@ -75,8 +76,8 @@ class Material : public BaseMaterial
   BaseShader* BindChannelShader(Long id, Long shaderType);
 
  private:
-  template <class Visitor>
-  Bool VisitChannels(Visitor& visitor);
+  friend struct ChunkFields<Material>;
+
   Bool ReadChannel(HyperFile& file, Long place);
   void WriteChannel(HyperFile& file, Long place) const;
   Bool CopyKeptInChannels(Material& destination) const;

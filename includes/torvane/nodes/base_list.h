@@ -5,6 +5,7 @@
 #include "torvane/nodes/kept_chunks.h"
 #include "torvane/nodes/private_chunk.h"
 #include "torvane/nodes/root_list.h"
+#include "torvane/stream/chunk_fields.h"
 #include "torvane/text/ge_string.h"
 #include "torvane/values/base_container.h"
 
@@ -155,6 +156,8 @@ class BaseList2D : public GeListNode
   mutable Bool markerDrawn_ = false;
 
  private:
+  friend struct ChunkFields<BaseList2D>;
+
   // What most nodes, every key for one, have nothing of. All is owned; the pointers are null until the first member.
   struct Extras
   {
@@ -175,10 +178,6 @@ class BaseList2D : public GeListNode
   Part* NeedExtra(Part* Extras::*part);
   BaseContainer* NeedDynamicParameters();
 
-  template <class Visitor>
-  Bool VisitHeader(Visitor& visitor);
-  template <class Visitor>
-  Bool VisitMarker(Visitor& visitor);
   template <class Root>
   Root* NeedRoot(Root* Extras::*root);
   template <class Root>

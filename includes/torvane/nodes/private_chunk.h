@@ -6,6 +6,7 @@
 #include "torvane/memory/memory.h"
 #include "torvane/memory/private_ge_mtools.h"
 #include "torvane/nodes/node_kind.h"
+#include "torvane/stream/chunk_fields.h"
 #include "torvane/types.h"
 #include "torvane/values/parameter_path.h"
 
@@ -117,8 +118,7 @@ class GeListNode : public PrivateChunk
   ULong nbits_[4] = {0, 0, 0, 0};
 
  private:
-  template <class Visitor>
-  Bool VisitNodeBits(Visitor& visitor);
+  friend struct ChunkFields<GeListNode>;
 };
 
 // The behaviour of a node: what is particular to its type. Owned by the node.

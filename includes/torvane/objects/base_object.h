@@ -4,6 +4,7 @@
 #include "torvane/math/ge_math.h"
 #include "torvane/math/vector.h"
 #include "torvane/nodes/base_list.h"
+#include "torvane/stream/chunk_fields.h"
 #include "torvane/stream/raw_chunk_body.h"
 
 namespace _torvane_
@@ -197,6 +198,8 @@ class BaseObject : public BaseList4D
   RootList2D* AllocChildRoot() const override;
 
  private:
+  friend struct ChunkFields<BaseObject>;
+
   struct LongParameter;
   struct VectorParameter;
   static const LongParameter kLongParameters[];
@@ -226,16 +229,7 @@ class BaseObject : public BaseList4D
   void SetGlobalPos(const Vector& value);
   void SetGlobalAngles(const Vector& value);
   Vector TakeDisplayColor();
-  template <class Visitor>
-  Bool VisitTransform(Visitor& v);
-  template <class Visitor>
-  void VisitDisplay(Visitor& v);
-  template <class Visitor>
-  void VisitFrozen(Visitor& v);
-  template <class Visitor>
-  void VisitMirroring(Visitor& v);
-  template <class Visitor>
-  void VisitLegacyList(Visitor& v, Long number);
+  void WriteTransform(HyperFile& file);
   Bool ReadTransform(HyperFile& file, Long level);
   Bool ReadObjectData(HyperFile& file, Long id, Long level);
   void StoreModelCheckSum();

@@ -5,6 +5,7 @@
 #include "torvane/math/vector.h"
 #include "torvane/memory/memory.h"
 #include "torvane/memory/private_ge_mtools.h"
+#include "torvane/stream/chunk_fields.h"
 #include "torvane/text/ge_string.h"
 
 namespace _torvane_
@@ -83,6 +84,8 @@ class IESLight : public GeMemory
 
  private:
   friend IESLight* CopyIESLight(const IESLight* source);
+  friend struct ChunkFields<IESLight>;
+
   struct Interval;
 
   void FindMaximum();
@@ -92,8 +95,6 @@ class IESLight : public GeMemory
   Real GetHorizontalPosition(Real angle) const;
   Real GetMeanIntensity(Long vertical) const;
   Real SampleRow(Long row, const Interval& vertical) const;
-  template <class Visitor>
-  Bool VisitStored(Visitor& visitor);
 
   mutable Real totalFlux_ = 12.566370614359172;
   mutable Bool fluxIsOpen_ = false; // and to be computed

@@ -3,6 +3,7 @@
 #pragma once
 
 #include "torvane/nodes/private_chunk.h"
+#include "torvane/stream/chunk_fields.h"
 #include "torvane/stream/hyper_file.h"
 #include "torvane/types.h"
 
@@ -86,8 +87,8 @@ class K2VPaintLayer : public K2VPaintTarget
   static constexpr LLong kColorSize = 5;
 
  private:
-  template <class Visitor>
-  Bool VisitHead(Visitor& visitor, Long& type);
+  friend struct ChunkFields<K2VPaintLayer>;
+
   Bool ReadHead(HyperFile& file, Long level, K2VImageFilter& filter);
   Bool ReadPixels(HyperFile& file, Long level, K2VImageFilter& filter);
   Bool ReadRows(HyperFile& file, const PixelBlock& block, K2VImageFilter& filter);

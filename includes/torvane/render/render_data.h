@@ -2,6 +2,7 @@
 #pragma once
 
 #include "torvane/nodes/base_list.h"
+#include "torvane/stream/chunk_fields.h"
 
 namespace _torvane_
 {
@@ -95,8 +96,7 @@ class BaseVideoPost : public BaseList2D
   GeListNode* MakeEmpty() const override { return NewObj<BaseVideoPost>(); }
 
  private:
-  template <class Visitor>
-  Bool VisitHead(Visitor& visitor);
+  friend struct ChunkFields<BaseVideoPost>;
 
   BaseContainer settings_;
   Long pluginId_ = 0;

@@ -3,6 +3,7 @@
 
 #include "torvane/memory/private_ge_mtools.h"
 #include "torvane/memory/spin_lock.h"
+#include "torvane/stream/chunk_fields.h"
 #include "torvane/types.h"
 
 namespace _torvane_
@@ -55,11 +56,8 @@ class WeightRuns
 
  private:
   friend class JointWeightTable;
+  friend struct ChunkFields<WeightRuns>;
 
-  template <class Visitor, class Runs>
-  static Bool VisitRuns(Visitor& visitor, Runs& runs);
-  template <class Visitor, class Runs>
-  static Bool VisitValues(Visitor& visitor, Runs& runs);
   Bool AreSound() const;
   Bool ArePacked() const;
   Bool Pack();

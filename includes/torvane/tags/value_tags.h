@@ -2,6 +2,7 @@
 #pragma once
 
 #include "torvane/math/vector.h"
+#include "torvane/stream/chunk_fields.h"
 #include "torvane/stream/hyper_file.h"
 #include "torvane/tags/base_tag.h"
 
@@ -281,8 +282,8 @@ class UVWTag : public ArrayTag<PackedUVWQuad, BaseArrayTag>
   Bool CopyEntries(BaseArrayTag& target) override;
 
  private:
-  template <class Visitor>
-  Bool VisitEntries(Visitor& visitor);
+  friend struct ChunkFields<UVWTag>;
+
   Bool ReadOldEntries(HyperFile& file, Long level);
   Bool ReadFloatEntries(HyperFile& file);
   Bool ReadPointEntries(HyperFile& file);

@@ -3,6 +3,7 @@
 #pragma once
 
 #include "torvane/nodes/base_list.h"
+#include "torvane/stream/chunk_fields.h"
 
 namespace _torvane_
 {
@@ -44,8 +45,7 @@ class BaseDraw : public BaseList2D
   GeListNode* MakeEmpty() const override { return NewObj<BaseDraw>(); }
 
  private:
-  template <class Visitor>
-  Bool VisitBody(Visitor& visitor);
+  friend struct ChunkFields<BaseDraw>;
 
   BaseDrawPref pref_;
   GeAliasLink sceneCamera_;

@@ -102,33 +102,38 @@ Bool ReadPlane(HyperFile& file, PlaneBuffers& buffers, Long width, Long componen
   return true;
 }
 
-template <class Visitor>
-Bool K2VPaintLayer::VisitHead(Visitor& v, Long& type)
+template <>
+struct ChunkFields<K2VPaintLayer>
 {
-  v.Long(type);
-  if constexpr (Visitor::kReading) {
-    LLong size = 0;
-    v.Note(v.Good() && v.File().ReadMemoryInto(color_, kColorSize, size));
-  } else {
-    const UChar black[3] = {};
-    v.Memory(black, type == kPaintLayerGrey ? 1 : 3);
+  template <class Visitor>
+  static Bool VisitHead(K2VPaintLayer& layer, Visitor& v, Long& type)
+  {
+    v.Long(type);
+    if constexpr (Visitor::kReading) {
+      LLong size = 0;
+      v.Note(v.Good() && v.File().ReadMemoryInto(layer.color_, K2VPaintLayer::kColorSize, size));
+    } else {
+      const UChar black[3] = {};
+      v.Memory(black, type == kPaintLayerGrey ? 1 : 3);
+    }
+    v.ConstantLong(0);
+    v.ConstantReal(1.0);
+    v.ConstantBool(false);
+    v.ConstantLong(0);
+    v.ConstantLong(0);
+    v.ConstantString("Alpha");
+    v.ConstantLong(0);
+    v.ConstantLong(0);
+    v.ConstantBool(false);
+    return v.Good();
   }
-  v.ConstantLong(0);
-  v.ConstantReal(1.0);
-  v.ConstantBool(false);
-  v.ConstantLong(0);
-  v.ConstantLong(0);
-  v.ConstantString("Alpha");
-  v.ConstantLong(0);
-  v.ConstantLong(0);
-  v.ConstantBool(false);
-  return v.Good();
-}
+};
 
 Bool K2VPaintLayer::ReadHead(HyperFile& file, Long level, K2VImageFilter& filter)
 {
   return ReadChunkBody(file, level, [&](ChunkReader& v) {
-    return VisitHead(v, type_) && CreateLayer(file, filter.width_, filter.height_, type_);
+    return ChunkFields<K2VPaintLayer>::VisitHead(*this, v, type_) &&
+           CreateLayer(file, filter.width_, filter.height_, type_);
   });
 }
 
@@ -183,7 +188,8 @@ void K2VPaintLayer::WriteChunks(HyperFile& file)
   Long type = GetLayerType(file);
   Long width = filter->client_->GetImageWidth();
   Long height = filter->client_->GetImageHeight();
-  WriteChunk(file, kChunkLayerHead, kLevelLayerHead, [&](ChunkWriter& v) { return VisitHead(v, type); });
+  WriteChunk(file, kChunkLayerHead, kLevelLayerHead,
+             [&](ChunkWriter& v) { return ChunkFields<K2VPaintLayer>::VisitHead(*this, v, type); });
   file.WriteChunkStart(kChunkPixels, kLevelLayerPixels);
   if (WritePixelBlock(file, width, height, type, [&](Long y, UChar* row) { GetLayerLine(file, 0, y, width, row); }))
     file.WriteChunkEnd();

@@ -1,19 +1,24 @@
-// The two visitors of a record. A class states the values of a chunk once, in file order, in a function template that
+// The two visitors of a record. The values of a class's chunk are told once, in file order, in a function template that
 // takes either of them:
 //
-//   template <class Visitor> Bool LayerSet::VisitBody(Visitor& v)
+//   template <>
+//   struct ChunkFields<LayerSet>
 //   {
-//     v.Long(mode_);
-//     v.ConstantReal(1.0); // an old factor: written so, dropped on reading
-//     if (v.Level() >= 1)
-//       v.Container(settings_);
-//     if (v.VersionBelow(7500))
-//       v.template Skip<Real, Vector>(); // only old files hold them
-//     return v.Good();
-//   }
+//     template <class Visitor>
+//     static Bool VisitBody(LayerSet& set, Visitor& v)
+//     {
+//       v.Long(set.mode_);
+//       v.ConstantReal(1.0); // an old factor: written so, dropped on reading
+//       if (v.Level() >= 1)
+//         v.Container(set.settings_);
+//       if (v.VersionBelow(7500))
+//         v.template Skip<Real, Vector>(); // only old files hold them
+//       return v.Good();
+//     }
+//   };
 //
-//   WriteChunk(file, kChunkLayerSet, 1, [&](auto& v) { return VisitBody(v); });
-//   ReadChunkBody(file, level, [&](auto& v) { return VisitBody(v); });
+//   WriteChunk(file, kChunkLayerSet, 1, [&](auto& v) { return ChunkFields<LayerSet>::VisitBody(*this, v); });
+//   ReadChunkBody(file, level, [&](auto& v) { return ChunkFields<LayerSet>::VisitBody(*this, v); });
 //
 // Every operation gives Good(): true until the first failure, after which nothing is read or written any more; what was
 // not reached keeps its value. The operations have the names of the values; so the value types are written with their

@@ -53,32 +53,127 @@ Long CurrentTool(Long tool)
 
 } // namespace
 
-// The picture is read or written by the caller, behind the flag that announces it.
-template <class Visitor>
-Bool BaseDocument::VisitFileInfo(Visitor& v, Bool& hasPreview)
+template <>
+struct ChunkFields<BaseDocument>
 {
-  Long version = kVersionCurrent;
-  v.Long(version);
-  if constexpr (Visitor::kReading) {
-    if (v.Good())
-      v.File().SetFileVersion(version);
+  // The picture is read or written by the caller, behind the flag that announces it.
+  template <class Visitor>
+  static Bool VisitFileInfo(BaseDocument& document, Visitor& v, Bool& hasPreview)
+  {
+    Long version = kVersionCurrent;
+    v.Long(version);
+    if constexpr (Visitor::kReading) {
+      if (v.Good())
+        v.File().SetFileVersion(version);
+    }
+    if (v.Level() >= 1) {
+      if constexpr (Visitor::kReading)
+        v.Bool(document.legacyFlag_);
+      else
+        v.ConstantBool(false);
+    }
+    if (v.Level() >= 2)
+      v.Bool(hasPreview);
+    return v.Good();
   }
-  if (v.Level() >= 1) {
-    if constexpr (Visitor::kReading)
-      v.Bool(legacyFlag_);
-    else
+
+  template <class Visitor>
+  static Bool VisitState(BaseDocument& document, Visitor& v)
+  {
+    v.Time(document.time_);
+    v.Long(document.mode_);
+    Long oldTool = kOldToolConstant;
+    v.Long(oldTool);
+    if constexpr (Visitor::kReading) {
+      document.mode_ = CurrentMode(document.mode_, document.data_);
+      document.tool_ = CurrentTool(oldTool);
+    }
+    for (auto& row : document.axisLocks_) {
+      for (Bool& lock : row)
+        v.Bool(lock);
+    }
+    for (Long i = 0; i < 16; ++i)
       v.ConstantBool(false);
+    v.EmptyFilename();
+    v.ConstantBool(false);
+    v.ConstantLong(0);
+    v.EmptyFilename();
+    v.ConstantLong(0);
+    VisitOldSettings(document, v);
+    if (v.Level() >= 1 || v.VersionBelow(kVersionNodeHeader))
+      v.EmptyContainer();
+    for (Long i = 0; v.Level() >= 2 && i < 3; ++i)
+      v.ConstantVector(Vector());
+    if (v.Level() >= 3)
+      VisitEmptyNode(v);
+    return VisitNewerState(document, v);
   }
-  if (v.Level() >= 2)
-    v.Bool(hasPreview);
-  return v.Good();
-}
+
+  // The first four groups of settings are no longer written, but still read.
+  template <class Visitor>
+  static Bool VisitOldSettings(BaseDocument& document, Visitor& v)
+  {
+    for (Long i = 0; i < 4; ++i) {
+      if constexpr (Visitor::kReading)
+        v.Container(document.settings_[i]);
+      else
+        v.EmptyContainer();
+    }
+    v.EmptyContainer();
+    return v.Container(document.settings_[4]);
+  }
+
+  // A whole node that nothing uses.
+  template <class Visitor>
+  static Bool VisitEmptyNode(Visitor& v)
+  {
+    BaseList2D node;
+    if constexpr (Visitor::kReading)
+      return v.Note(v.Good() && node.ReadChunks(v.File(), true));
+    else
+      node.WriteAsChunk(v.File(), 0);
+    return v.Good();
+  }
+
+  template <class Visitor>
+  static Bool VisitNewerState(BaseDocument& document, Visitor& v)
+  {
+    if (v.Level() >= 4) {
+      v.ConstantBool(false);
+      v.ConstantLong(0);
+      v.ConstantLong(0);
+      v.ConstantReal(0.5);
+      v.ConstantReal(0.5);
+      v.ConstantBool(false);
+      v.ConstantBool(false);
+    }
+    if (v.Level() >= 5)
+      v.ConstantLong(0);
+    if (v.Level() >= 6)
+      v.ConstantBool(false);
+    if (v.Level() >= 7)
+      v.Container(document.settings_[5]);
+    if (v.Level() >= 8)
+      v.Long(document.tool_);
+    if (v.Level() >= 9) {
+      v.Long(document.viewNumber_);
+      for (Long i = 0; i < BaseDocument::kViewFlagCount - 1; ++i)
+        v.Bool(document.viewFlags_[i]);
+    }
+    // One level alone held a number here.
+    if (v.Level() == 10)
+      v.template Skip<Long>();
+    if (v.Level() >= 12)
+      v.Bool(document.viewFlags_[BaseDocument::kViewFlagCount - 1]);
+    return v.Good();
+  }
+};
 
 void BaseDocument::WriteFileInfo(HyperFile& file)
 {
   WriteChunk(file, kChunkFileInfo, kLevelFileInfo, [this](ChunkWriter& v) {
     Bool hasPreview = preview_.GetBw() >= 1;
-    VisitFileInfo(v, hasPreview);
+    ChunkFields<BaseDocument>::VisitFileInfo(*this, v, hasPreview);
     return !hasPreview || v.Note(v.Good() && v.File().WriteImage(&preview_, kImageFormatJpeg, nullptr, 0));
   });
 }
@@ -105,103 +200,12 @@ Bool BaseDocument::ReadFileInfo(HyperFile& file, Long level)
 {
   ChunkReader v(file, level);
   Bool hasPreview = false;
-  if (!VisitFileInfo(v, hasPreview))
+  if (!ChunkFields<BaseDocument>::VisitFileInfo(*this, v, hasPreview))
     return false;
   if (hasPreview && !ReadPreview(file))
     return false;
   // Whoever only wants the picture need not read another byte.
   return (loadFlags_ & LoadPreviewOnly) || file.SkipToEndChunk();
-}
-
-template <class Visitor>
-Bool BaseDocument::VisitState(Visitor& v)
-{
-  v.Time(time_);
-  v.Long(mode_);
-  Long oldTool = kOldToolConstant;
-  v.Long(oldTool);
-  if constexpr (Visitor::kReading) {
-    mode_ = CurrentMode(mode_, data_);
-    tool_ = CurrentTool(oldTool);
-  }
-  for (auto& row : axisLocks_) {
-    for (Bool& lock : row)
-      v.Bool(lock);
-  }
-  for (Long i = 0; i < 16; ++i)
-    v.ConstantBool(false);
-  v.EmptyFilename();
-  v.ConstantBool(false);
-  v.ConstantLong(0);
-  v.EmptyFilename();
-  v.ConstantLong(0);
-  VisitOldSettings(v);
-  if (v.Level() >= 1 || v.VersionBelow(kVersionNodeHeader))
-    v.EmptyContainer();
-  for (Long i = 0; v.Level() >= 2 && i < 3; ++i)
-    v.ConstantVector(Vector());
-  if (v.Level() >= 3)
-    VisitEmptyNode(v);
-  return VisitNewerState(v);
-}
-
-// The first four groups of settings are no longer written, but still read.
-template <class Visitor>
-Bool BaseDocument::VisitOldSettings(Visitor& v)
-{
-  for (Long i = 0; i < 4; ++i) {
-    if constexpr (Visitor::kReading)
-      v.Container(settings_[i]);
-    else
-      v.EmptyContainer();
-  }
-  v.EmptyContainer();
-  return v.Container(settings_[4]);
-}
-
-// A whole node that nothing uses.
-template <class Visitor>
-Bool BaseDocument::VisitEmptyNode(Visitor& v)
-{
-  BaseList2D node;
-  if constexpr (Visitor::kReading)
-    return v.Note(v.Good() && node.ReadChunks(v.File(), true));
-  else
-    node.WriteAsChunk(v.File(), 0);
-  return v.Good();
-}
-
-template <class Visitor>
-Bool BaseDocument::VisitNewerState(Visitor& v)
-{
-  if (v.Level() >= 4) {
-    v.ConstantBool(false);
-    v.ConstantLong(0);
-    v.ConstantLong(0);
-    v.ConstantReal(0.5);
-    v.ConstantReal(0.5);
-    v.ConstantBool(false);
-    v.ConstantBool(false);
-  }
-  if (v.Level() >= 5)
-    v.ConstantLong(0);
-  if (v.Level() >= 6)
-    v.ConstantBool(false);
-  if (v.Level() >= 7)
-    v.Container(settings_[5]);
-  if (v.Level() >= 8)
-    v.Long(tool_);
-  if (v.Level() >= 9) {
-    v.Long(viewNumber_);
-    for (Long i = 0; i < kViewFlagCount - 1; ++i)
-      v.Bool(viewFlags_[i]);
-  }
-  // One level alone held a number here.
-  if (v.Level() == 10)
-    v.template Skip<Long>();
-  if (v.Level() >= 12)
-    v.Bool(viewFlags_[kViewFlagCount - 1]);
-  return v.Good();
 }
 
 void BaseDocument::WriteChunks(HyperFile& file)
@@ -226,7 +230,8 @@ void BaseDocument::WriteChunks(HyperFile& file)
       root->WriteAsChunk(file, id);
   }
   pref_.WriteChunks(file);
-  WriteChunk(file, kChunkDocumentState, kLevelDocumentState, [this](ChunkWriter& v) { return VisitState(v); });
+  WriteChunk(file, kChunkDocumentState, kLevelDocumentState,
+             [this](ChunkWriter& v) { return ChunkFields<BaseDocument>::VisitState(*this, v); });
   file.WriteChunkEnd();
   file.LeaveLoop();
 }
@@ -260,7 +265,8 @@ Bool BaseDocument::ReadChunk(HyperFile& file, Long id, Long level)
   case kChunkDocumentPref:
     return pref_.ReadChunk(file, id, level);
   case kChunkDocumentState:
-    return ReadChunkBody(file, level, [this](ChunkReader& v) { return VisitState(v); });
+    return ReadChunkBody(file, level,
+                         [this](ChunkReader& v) { return ChunkFields<BaseDocument>::VisitState(*this, v); });
   default:
     return false;
   }

@@ -26,38 +26,44 @@ DocumentPref::DocumentPref()
   loopMax_ = maxTime_;
 }
 
-template <class Visitor>
-Bool DocumentPref::VisitBody(Visitor& v)
+template <>
+struct ChunkFields<DocumentPref>
 {
-  v.ConstantLong(0);
-  v.Long(fps_);
-  v.Time(minTime_);
-  v.Time(maxTime_);
-  v.Time(loopMin_);
-  v.Time(loopMax_);
-  for (Bool& flag : bools_)
-    v.Bool(flag);
-  if (v.Level() >= 1)
-    v.Real(real_);
-  if (v.Level() >= 2)
-    v.Bool(lastBool_);
-  if (v.Level() >= 3)
-    v.ConstantBool(false);
-  if (v.Level() >= 4)
-    v.ConstantBool(false);
-  return v.Good();
-}
+  template <class Visitor>
+  static Bool VisitBody(DocumentPref& pref, Visitor& v)
+  {
+    v.ConstantLong(0);
+    v.Long(pref.fps_);
+    v.Time(pref.minTime_);
+    v.Time(pref.maxTime_);
+    v.Time(pref.loopMin_);
+    v.Time(pref.loopMax_);
+    for (Bool& flag : pref.bools_)
+      v.Bool(flag);
+    if (v.Level() >= 1)
+      v.Real(pref.real_);
+    if (v.Level() >= 2)
+      v.Bool(pref.lastBool_);
+    if (v.Level() >= 3)
+      v.ConstantBool(false);
+    if (v.Level() >= 4)
+      v.ConstantBool(false);
+    return v.Good();
+  }
+};
 
 void DocumentPref::WriteChunks(HyperFile& file)
 {
-  WriteChunk(file, kChunkDocumentPref, kLevelDocumentPref, [this](ChunkWriter& v) { return VisitBody(v); });
+  WriteChunk(file, kChunkDocumentPref, kLevelDocumentPref,
+             [this](ChunkWriter& v) { return ChunkFields<DocumentPref>::VisitBody(*this, v); });
 }
 
 Bool DocumentPref::ReadChunk(HyperFile& file, Long id, Long level)
 {
   if (id != kChunkDocumentPref)
     return false;
-  Bool read = ReadChunkBody(file, level, [this](ChunkReader& v) { return VisitBody(v); });
+  Bool read =
+      ReadChunkBody(file, level, [this](ChunkReader& v) { return ChunkFields<DocumentPref>::VisitBody(*this, v); });
   if (minTime_ < EarliestTime())
     minTime_ = EarliestTime();
   return read;

@@ -18,24 +18,29 @@ Bool LayerObject::MakeChildList()
   return children_ != nullptr;
 }
 
-// The first flag stands behind the colour: it came last.
-template <class Visitor>
-Bool LayerObject::VisitBody(Visitor& v)
+template <>
+struct ChunkFields<LayerObject>
 {
-  for (Long i = 1; i < kLayerFlagCount; ++i)
-    v.Bool(flags_[i]);
-  v.Vector(color_);
-  if (v.Level() >= 1)
-    v.Bool(flags_[0]);
-  return v.Good();
-}
+  // The first flag stands behind the colour: it came last.
+  template <class Visitor>
+  static Bool VisitBody(LayerObject& layer, Visitor& v)
+  {
+    for (Long i = 1; i < kLayerFlagCount; ++i)
+      v.Bool(layer.flags_[i]);
+    v.Vector(layer.color_);
+    if (v.Level() >= 1)
+      v.Bool(layer.flags_[0]);
+    return v.Good();
+  }
+};
 
 void LayerObject::WriteChunks(HyperFile& file)
 {
   BaseList4D::WriteChunks(file);
   if (children_ && children_->HasContent())
     children_->WriteAsChunk(file, kChunkList);
-  WriteChunk(file, kChunkLayer, kLevelLayer, [this](ChunkWriter& v) { return VisitBody(v); });
+  WriteChunk(file, kChunkLayer, kLevelLayer,
+             [this](ChunkWriter& v) { return ChunkFields<LayerObject>::VisitBody(*this, v); });
 }
 
 Bool LayerObject::ReadChunk(HyperFile& file, Long id, Long level)
@@ -43,7 +48,7 @@ Bool LayerObject::ReadChunk(HyperFile& file, Long id, Long level)
   if (BaseList4D::ReadChunk(file, id, level))
     return true;
   if (id == kChunkLayer)
-    return ReadChunkBody(file, level, [this](ChunkReader& v) { return VisitBody(v); });
+    return ReadChunkBody(file, level, [this](ChunkReader& v) { return ChunkFields<LayerObject>::VisitBody(*this, v); });
   return id == kChunkList && MakeChildList() && children_->ReadChunks(file, false);
 }
 

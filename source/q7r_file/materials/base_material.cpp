@@ -38,29 +38,34 @@ BaseMaterial::BaseMaterial(Long type, Long pluginType) : BaseList2D(type), plugi
 
 Bool BaseMaterial::IsInstanceOf(Long type) const { return type == GetType() || BaseList2D::IsInstanceOf(type); }
 
-template <class Visitor>
-Bool BaseMaterial::VisitPreview(Visitor& v)
+template <>
+struct ChunkFields<BaseMaterial>
 {
-  if (v.VersionBelow(kVersionNodeHeader) || !Visitor::kReading)
-    v.String(name_);
-  else
-    v.EmptyString(); // the node's header has told it
-  // The preview, and two pictures that nothing holds any more.
-  if constexpr (Visitor::kReading) {
-    Bitmap dropped;
-    v.Note(v.Good() && v.File().ReadImage(preview_) && v.File().ReadImage(dropped) && v.File().ReadImage(dropped));
-  } else {
-    BaseContainer settings;
-    settings.SetLong(kImageJpegQuality, kPreviewQuality);
-    for (Bitmap* image : {&preview_, static_cast<Bitmap*>(nullptr), static_cast<Bitmap*>(nullptr)})
-      v.Note(v.Good() && v.File().WriteImage(image, kImageFormatJpeg, &settings, 0));
+  template <class Visitor>
+  static Bool VisitPreview(BaseMaterial& material, Visitor& v)
+  {
+    if (v.VersionBelow(kVersionNodeHeader) || !Visitor::kReading)
+      v.String(material.name_);
+    else
+      v.EmptyString(); // the node's header has told it
+    // The preview, and two pictures that nothing holds any more.
+    if constexpr (Visitor::kReading) {
+      Bitmap dropped;
+      v.Note(v.Good() && v.File().ReadImage(material.preview_) && v.File().ReadImage(dropped) &&
+             v.File().ReadImage(dropped));
+    } else {
+      BaseContainer settings;
+      settings.SetLong(kImageJpegQuality, kPreviewQuality);
+      for (Bitmap* image : {&material.preview_, static_cast<Bitmap*>(nullptr), static_cast<Bitmap*>(nullptr)})
+        v.Note(v.Good() && v.File().WriteImage(image, kImageFormatJpeg, &settings, 0));
+    }
+    if (v.Level() >= 1 && v.VersionBelow(kVersionNodeHeader))
+      v.template Skip<BaseContainer>();
+    if (v.Level() >= 2)
+      v.ConstantBool(false);
+    return v.Good();
   }
-  if (v.Level() >= 1 && v.VersionBelow(kVersionNodeHeader))
-    v.template Skip<BaseContainer>();
-  if (v.Level() >= 2)
-    v.ConstantBool(false);
-  return v.Good();
-}
+};
 
 Bool BaseMaterial::ReadPluginData(HyperFile& file, Long level)
 {
@@ -89,7 +94,8 @@ Bool BaseMaterial::ReadChunk(HyperFile& file, Long id, Long level)
   case kChunkPreview:
     if (level < 0)
       return file.SkipToEndChunk();
-    return ReadChunkBody(file, level, [this](ChunkReader& v) { return VisitPreview(v); });
+    return ReadChunkBody(file, level,
+                         [this](ChunkReader& v) { return ChunkFields<BaseMaterial>::VisitPreview(*this, v); });
   case kChunkNodeData:
     return ReadPluginData(file, level);
   default:
@@ -107,7 +113,8 @@ void BaseMaterial::WriteChunks(HyperFile& file)
   BaseList2D::WriteChunks(file);
   if (GetDiskType() == kMaterialPlugin)
     WritePluginData(file);
-  WriteChunk(file, kChunkPreview, kLevelPreview, [this](ChunkWriter& v) { return VisitPreview(v); });
+  WriteChunk(file, kChunkPreview, kLevelPreview,
+             [this](ChunkWriter& v) { return ChunkFields<BaseMaterial>::VisitPreview(*this, v); });
 }
 
 Bool BaseMaterial::CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation)

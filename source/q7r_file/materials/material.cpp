@@ -107,21 +107,25 @@ Bool Material::KeepChunk(HyperFile& file, Long id, Long level)
   return kept_ && kept_->places[readPlace_].Read(file, id, level);
 }
 
-// Each switch is followed by the channel's chunk.
-template <class Visitor>
-Bool Material::VisitChannels(Visitor& v)
+template <>
+struct ChunkFields<Material>
 {
-  for (Long i = 0; i < kMaterialChannelCount && v.Good(); ++i) {
-    if (i == kMaterialChannelCount - 1 && v.VersionBelow(kVersionLastChannel))
-      break;
-    v.Bool(channelState_[i]);
-    if constexpr (Visitor::kReading)
-      v.Note(v.Good() && ReadChannel(v.File(), i));
-    else
-      WriteChannel(v.File(), i);
+  // Each switch is followed by the channel's chunk.
+  template <class Visitor>
+  static Bool VisitChannels(Material& material, Visitor& v)
+  {
+    for (Long i = 0; i < kMaterialChannelCount && v.Good(); ++i) {
+      if (i == kMaterialChannelCount - 1 && v.VersionBelow(kVersionLastChannel))
+        break;
+      v.Bool(material.channelState_[i]);
+      if constexpr (Visitor::kReading)
+        v.Note(v.Good() && material.ReadChannel(v.File(), i));
+      else
+        material.WriteChannel(v.File(), i);
+    }
+    return v.Good();
   }
-  return v.Good();
-}
+};
 
 // Files below version 7500 hold the parameters of the surface here. Only the switches are taken from them: the
 // parameters keep their defaults, as do those that later versions stored with another meaning.
@@ -155,13 +159,14 @@ Bool Material::ReadChunk(HyperFile& file, Long id, Long level)
     return false;
   if (file.IsBefore7500())
     return ReadOldChannels(file, level);
-  return ReadChunkBody(file, level, [this](ChunkReader& v) { return VisitChannels(v); });
+  return ReadChunkBody(file, level, [this](ChunkReader& v) { return ChunkFields<Material>::VisitChannels(*this, v); });
 }
 
 void Material::WriteChunks(HyperFile& file)
 {
   BaseMaterial::WriteChunks(file);
-  WriteChunk(file, kChunkChannels, 0, [this](ChunkWriter& v) { return VisitChannels(v); });
+  WriteChunk(file, kChunkChannels, 0,
+             [this](ChunkWriter& v) { return ChunkFields<Material>::VisitChannels(*this, v); });
 }
 
 Bool Material::CopyKeptInChannels(Material& destination) const

@@ -70,74 +70,78 @@ Bool BaseList2D::CopyRoot(Root* Extras::*root, BaseList2D& target, ULong flags, 
   return true;
 }
 
-// The marker's block: a flag that says that one follows, and its 16 bytes.
-template <class Visitor>
-Bool BaseList2D::VisitMarker(Visitor& v)
+template <>
+struct ChunkFields<BaseList2D>
 {
-  v.ConstantUChar(1);
-  if constexpr (Visitor::kReading) {
-    UChar bytes[sizeof(NodeMarker)];
-    LLong size = 0;
-    if (v.Note(v.Good() && v.File().ReadMemoryInto(bytes, sizeof bytes, size)) && size > 0) {
-      if (size < static_cast<LLong>(sizeof bytes))
-        GetMarker(); // what the file doesn't tell stays drawn
-      std::memcpy(marker_.bytes, bytes, static_cast<std::size_t>(size < 16 ? size : 16));
-      markerDrawn_ = true;
+  // The marker's block: a flag that says that one follows, and its 16 bytes.
+  template <class Visitor>
+  static Bool VisitMarker(BaseList2D& node, Visitor& v)
+  {
+    v.ConstantUChar(1);
+    if constexpr (Visitor::kReading) {
+      UChar bytes[sizeof(NodeMarker)];
+      LLong size = 0;
+      if (v.Note(v.Good() && v.File().ReadMemoryInto(bytes, sizeof bytes, size)) && size > 0) {
+        if (size < static_cast<LLong>(sizeof bytes))
+          node.GetMarker(); // what the file doesn't tell stays drawn
+        std::memcpy(node.marker_.bytes, bytes, static_cast<std::size_t>(size < 16 ? size : 16));
+        node.markerDrawn_ = true;
+      }
+    } else {
+      v.Memory(node.GetMarker().bytes, sizeof(NodeMarker));
     }
-  } else {
-    v.Memory(GetMarker().bytes, sizeof(NodeMarker));
-  }
-  return v.Good();
-}
-
-template <class Visitor>
-Bool BaseList2D::VisitHeader(Visitor& v)
-{
-  v.LongInto(info_);
-  v.ConstantLong(0);
-  if (v.VersionBelow(kVersionNodeHeader))
     return v.Good();
-  v.Container(data_);
-  v.Goal(goal_);
-  v.String(name_);
-  if (v.Level() >= 1) {
-    const BaseContainer* parameters = Extra().dynamicParameters;
-    Long present = parameters && parameters->GetCount() > 0 ? 1 : 0;
-    v.Long(present);
-    if (present >= 1 && v.Good()) {
-      if (BaseContainer* list = NeedDynamicParameters())
-        v.Container(*list);
-      else
-        v.File().SetError(FILEERROR_MEMORY);
+  }
+
+  template <class Visitor>
+  static Bool VisitHeader(BaseList2D& node, Visitor& v)
+  {
+    v.LongInto(node.info_);
+    v.ConstantLong(0);
+    if (v.VersionBelow(kVersionNodeHeader))
+      return v.Good();
+    v.Container(node.data_);
+    v.Goal(node.goal_);
+    v.String(node.name_);
+    if (v.Level() >= 1) {
+      const BaseContainer* parameters = node.Extra().dynamicParameters;
+      Long present = parameters && parameters->GetCount() > 0 ? 1 : 0;
+      v.Long(present);
+      if (present >= 1 && v.Good()) {
+        if (BaseContainer* list = node.NeedDynamicParameters())
+          v.Container(*list);
+        else
+          v.File().SetError(FILEERROR_MEMORY);
+      }
     }
+    if (v.Level() >= 2) {
+      // A list that old programs kept here: always empty now, its chunks are passed over.
+      Long one = 1;
+      Long count = 0;
+      v.Long(one);
+      if (one == 1)
+        v.Long(count);
+      for (Long i = 0; i < count && v.Good(); ++i)
+        v.Note(node.SkipOneChunk(v.File()));
+    }
+    if (v.VersionBelow(kVersionTransform)) {
+      if (v.Level() >= 3)
+        v.template Skip<Long>();
+      Long count = 0;
+      if (v.Level() >= 4)
+        v.Long(count);
+      for (Long i = 0; i < count && v.Good(); ++i)
+        v.template Skip<Long>();
+    }
+    if (v.Level() >= 5)
+      v.Link(node.link_);
+    if (v.Level() >= 6)
+      VisitMarker(node, v);
+    if (v.Level() >= 7 && !Visitor::kReading)
+      v.ConstantBool(false);
+    return v.Good();
   }
-  if (v.Level() >= 2) {
-    // A list that old programs kept here: always empty now, its chunks are passed over.
-    Long one = 1;
-    Long count = 0;
-    v.Long(one);
-    if (one == 1)
-      v.Long(count);
-    for (Long i = 0; i < count && v.Good(); ++i)
-      v.Note(SkipOneChunk(v.File()));
-  }
-  if (v.VersionBelow(kVersionTransform)) {
-    if (v.Level() >= 3)
-      v.template Skip<Long>();
-    Long count = 0;
-    if (v.Level() >= 4)
-      v.Long(count);
-    for (Long i = 0; i < count && v.Good(); ++i)
-      v.template Skip<Long>();
-  }
-  if (v.Level() >= 5)
-    v.Link(link_);
-  if (v.Level() >= 6)
-    VisitMarker(v);
-  if (v.Level() >= 7 && !Visitor::kReading)
-    v.ConstantBool(false);
-  return v.Good();
-}
+};
 
 Bool BaseList2D::SkipOneChunk(HyperFile& file)
 {
@@ -188,7 +192,8 @@ void BaseList2D::WriteChunks(HyperFile& file)
 {
   if (GetFirstTrack())
     GetTrackRoot()->WriteAsChunk(file, kChunkTracks);
-  WriteChunk(file, kChunkNodeHeader, kLevelNodeHeader, [this](ChunkWriter& v) { return VisitHeader(v); });
+  WriteChunk(file, kChunkNodeHeader, kLevelNodeHeader,
+             [this](ChunkWriter& v) { return ChunkFields<BaseList2D>::VisitHeader(*this, v); });
   if (Extra().uniqueIds)
     WriteUniqueIds(file);
   GeListNode::WriteChunks(file);
@@ -201,7 +206,8 @@ Bool BaseList2D::ReadChunk(HyperFile& file, Long id, Long level)
     return true;
   switch (id) {
   case kChunkNodeHeader:
-    return ReadChunkBody(file, level, [this](ChunkReader& v) { return VisitHeader(v); });
+    return ReadChunkBody(file, level,
+                         [this](ChunkReader& v) { return ChunkFields<BaseList2D>::VisitHeader(*this, v); });
   case kChunkUniqueIds:
     return ReadUniqueIds(file);
   case kChunkShaders:
@@ -388,52 +394,6 @@ CTrack* BaseList2D::FindTrack(const ParameterPath& path) const
       return track;
   }
   return nullptr;
-}
-
-BaseList4D::~BaseList4D() { DeleteObj(children_); }
-
-void BaseList4D::SetDocument(BaseDocument* document)
-{
-  if (document_ == document)
-    return;
-  BaseList2D::SetDocument(document);
-  if (children_)
-    SetDocumentOfMembers(children_, document);
-}
-
-BaseList4D* BaseList4D::GetUp() const { return listHead_ ? NodeCast<BaseList4D>(listHead_->GetOwner()) : nullptr; }
-
-BaseList4D* BaseList4D::GetDown() const { return children_ ? NodeCast<BaseList4D>(children_->GetFirst()) : nullptr; }
-
-BaseList4D* BaseList4D::GetDownLast() const { return children_ ? NodeCast<BaseList4D>(children_->GetLast()) : nullptr; }
-
-void BaseList4D::InsertBefore(BaseList4D* reference)
-{
-  if (reference && reference->listHead_)
-    reference->listHead_->InsertBefore(this, reference);
-}
-
-void BaseList4D::InsertAfter(BaseList4D* reference)
-{
-  if (reference && reference->listHead_)
-    reference->listHead_->InsertAfter(this, reference);
-}
-
-RootList2D* BaseList4D::GetChildRoot()
-{
-  if (!children_ && (children_ = AllocChildRoot()))
-    children_->SetOwner(this);
-  return children_;
-}
-
-Bool BaseList4D::InsertUnder(BaseList4D* parent)
-{
-  return parent && parent->GetChildRoot() && parent->children_->InsertFirst(this);
-}
-
-Bool BaseList4D::InsertUnderLast(BaseList4D* parent)
-{
-  return parent && parent->GetChildRoot() && parent->children_->InsertLast(this);
 }
 
 } // namespace _torvane_

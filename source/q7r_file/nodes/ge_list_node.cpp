@@ -22,25 +22,29 @@ enum NBitMode : Long
 
 } // namespace
 
-template <class Visitor>
-Bool GeListNode::VisitNodeBits(Visitor& v)
+template <>
+struct ChunkFields<GeListNode>
 {
-  Long count = kWordCount;
-  v.Long(count);
-  for (Long i = 0; i < count && v.Good(); ++i) {
-    if (i < kWordCount)
-      v.LongInto(nbits_[i]);
-    else
-      v.template Skip<Long>();
+  template <class Visitor>
+  static Bool VisitNodeBits(GeListNode& node, Visitor& v)
+  {
+    Long count = kWordCount;
+    v.Long(count);
+    for (Long i = 0; i < count && v.Good(); ++i) {
+      if (i < kWordCount)
+        v.LongInto(node.nbits_[i]);
+      else
+        v.template Skip<Long>();
+    }
+    if (v.Level() >= 2) {
+      if (!Visitor::kReading && node.GoalIsWrittenElsewhere())
+        v.ConstantUChar(0);
+      else
+        v.Goal(node.goal_);
+    }
+    return v.Good();
   }
-  if (v.Level() >= 2) {
-    if (!Visitor::kReading && GoalIsWrittenElsewhere())
-      v.ConstantUChar(0);
-    else
-      v.Goal(goal_);
-  }
-  return v.Good();
-}
+};
 
 Bool GeListNode::ReadChunk(HyperFile& file, Long id, Long level)
 {
@@ -48,13 +52,15 @@ Bool GeListNode::ReadChunk(HyperFile& file, Long id, Long level)
     return true;
   if (id != kChunkNodeBits)
     return false;
-  return ReadChunkBody(file, level, [this](ChunkReader& v) { return VisitNodeBits(v); });
+  return ReadChunkBody(file, level,
+                       [this](ChunkReader& v) { return ChunkFields<GeListNode>::VisitNodeBits(*this, v); });
 }
 
 void GeListNode::WriteChunks(HyperFile& file)
 {
   PrivateChunk::WriteChunks(file);
-  WriteChunk(file, kChunkNodeBits, kLevelNodeBits, [this](ChunkWriter& v) { return VisitNodeBits(v); });
+  WriteChunk(file, kChunkNodeBits, kLevelNodeBits,
+             [this](ChunkWriter& v) { return ChunkFields<GeListNode>::VisitNodeBits(*this, v); });
 }
 
 Bool GeListNode::CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation)

@@ -9,14 +9,22 @@
 namespace _torvane_
 {
 
+void ReplaceNodeData(BaseList2D& node, NodeData*& place, NodeData* data)
+{
+  if (data == place)
+    return;
+  DeleteObj(place);
+  place = data;
+  if (data)
+    data->SetNode(&node);
+}
+
 Bool AttachNodeData(NodeData* data, NodeDataSlot slot)
 {
-  DeleteObj(slot.data);
+  ReplaceNodeData(slot.node, slot.data, data);
   slot.raw.Free();
   if (!data)
     return true;
-  data->SetNode(&slot.node);
-  slot.data = data;
   // The container was read or copied before: the defaults that Init puts there must not come over it.
   BaseContainer present(std::move(slot.node.GetDataInstance()));
   const Bool made = data->Init();

@@ -56,6 +56,9 @@ void WriteNodeDataBody(HyperFile& file, NodeData* data, const RawChunkBody& raw)
 // The level at which the chunk is to be written.
 Long NodeDataLevel(const NodeData* data, const RawChunkBody& raw);
 
+// Puts `data` (may be null) into a node's place for them, where the old ones are deleted.
+void ReplaceNodeData(BaseList2D& node, NodeData*& place, NodeData* data);
+
 // Puts `data` (may be null) into the slot in place of what was there and runs its Init; the node's container stays as
 // it is. A data object that Init refuses is deleted: false.
 Bool AttachNodeData(NodeData* data, NodeDataSlot slot);

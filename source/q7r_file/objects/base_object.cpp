@@ -2,23 +2,13 @@
 
 #include "k2v_file/stream/chunk_visitor.h"
 #include "q7r_file/nodes/node_data_chunk.h"
-#include "torvane/document/base_document.h"
 #include "torvane/hooks.h"
 #include "torvane/math/crc.h"
 #include "torvane/memory/assertion.h"
-#include "torvane/nodes/node_sink.h"
 #include "torvane/tags/base_tag.h"
 
 namespace _torvane_
 {
-
-namespace
-{
-
-// In matrices of old files an axis below this is a mirrored one.
-constexpr Real kMirroredBelow = -0.9;
-
-} // namespace
 
 BaseObject::BaseObject(Long type) : BaseList4D(type) { tags_.SetOwner(this); }
 
@@ -73,167 +63,7 @@ BaseTag* BaseObject::MakeTag(Long type)
   return tag;
 }
 
-void BaseObject::SetObjectData(NodeData* data)
-{
-  if (data == objectData_)
-    return;
-  DeleteObj(objectData_);
-  objectData_ = data;
-  if (data)
-    data->SetNode(this);
-}
-
-// The transform chunk. Files from kVersionTransform on hold every value; in older ones the level tells how far the
-// values reach.
-template <class Visitor>
-Bool BaseObject::VisitTransform(Visitor& v)
-{
-  const Bool old = v.VersionBelow(kVersionTransform);
-  const Bool oldest = v.VersionBelow(kVersionNodeHeader);
-  if (oldest)
-    v.Container(data_);
-  v.Vector(relPos_);
-  v.Vector(relScale_);
-  v.Vector(relRot_);
-  if (old)
-    VisitMirroring(v);
-  if (oldest)
-    v.String(name_);
-  if (!oldest || v.Level() >= 1) {
-    v.Long(editorMode_);
-    v.Long(renderMode_);
-    v.Long(disabled_);
-  }
-  if (oldest)
-    return v.Good();
-  VisitDisplay(v);
-  if (!old || v.Level() >= 6)
-    VisitFrozen(v);
-  if (old)
-    return v.Good();
-  if (v.Level() == 8)
-    v.template Skip<Long>(); // an order that only later levels mean
-  if (v.Level() >= 9)
-    v.Long(rotationOrder_);
-  return v.Good();
-}
-
-// What two old matrices tell of mirrored axes: the scale of old files has no sign. The z axis is looked for in the
-// second one.
-template <class Visitor>
-void BaseObject::VisitMirroring(Visitor& v)
-{
-  if constexpr (Visitor::kReading) {
-    Matrix local;
-    Matrix axes;
-    v.Matrix(local);
-    v.Matrix(axes);
-    if (axes.v1.x < kMirroredBelow)
-      relScale_.x = -relScale_.x;
-    if (axes.v2.y < kMirroredBelow)
-      relScale_.y = -relScale_.y;
-    if (axes.v2.z < kMirroredBelow)
-      relScale_.z = -relScale_.z;
-  }
-}
-
-template <class Visitor>
-void BaseObject::VisitDisplay(Visitor& v)
-{
-  const Bool old = v.VersionBelow(kVersionTransform);
-  auto holds = [&](Long level) { return !old || v.Level() >= level; };
-  DisplayPart part = Display();
-  if (holds(1)) {
-    v.Bool(part.flag);
-    if (old)
-      v.template Skip<Bool>();
-    v.Vector(part.color);
-  }
-  if (holds(2))
-    v.Long(part.colorMode);
-  if (holds(3)) {
-    v.Vector(part.storedVector);
-    v.Long(part.storedMode);
-  }
-  if (holds(4))
-    v.Matrix(part.storedMatrix);
-  if constexpr (Visitor::kReading) {
-    if (!SetDisplay(part)) {
-      v.File().SetError(FILEERROR_MEMORY);
-      v.Note(false);
-    }
-  }
-  if (holds(5)) {
-    VisitLegacyList(v, 0);
-    VisitLegacyList(v, 1);
-  }
-}
-
-// A list of objects that old files may hold here. It is never written.
-template <class Visitor>
-void BaseObject::VisitLegacyList(Visitor& v, Long number)
-{
-  if constexpr (Visitor::kReading) {
-    Bool present = false;
-    v.Bool(present);
-    if (!present)
-      return;
-    if (!legacyLists_)
-      legacyLists_ = NewObj<LegacyLists>();
-    RootObject* list = legacyLists_ ? legacyLists_->lists[number] : nullptr;
-    if (legacyLists_ && !list)
-      list = legacyLists_->lists[number] = AllocRootObject();
-    if (!list) {
-      v.File().SetError(FILEERROR_MEMORY);
-      v.Note(false);
-      return;
-    }
-    list->SetOwner(this);
-    v.Note(list->ReadChunks(v.File(), true));
-    if (NodeSink* sink = GetDocument() ? GetDocument()->GetNodeSink() : nullptr)
-      sink->TakeBack(); // these are no objects of the scene
-  } else {
-    v.ConstantBool(false);
-  }
-}
-
-template <class Visitor>
-void BaseObject::VisitFrozen(Visitor& v)
-{
-  v.ULong(frozenFlags_);
-  if (!HasFrozenTransform())
-    return;
-  FrozenPart* part = NeedFrozen();
-  if (!part) {
-    frozenFlags_ = 0;
-    v.File().SetError(FILEERROR_MEMORY);
-    v.Note(false);
-    return;
-  }
-  v.Vector(part->pos);
-  v.Vector(part->scale);
-  v.Vector(part->rot);
-  v.Vector(part->absPos);
-  v.Vector(part->absScale);
-  v.Vector(part->absRot);
-}
-
-Bool BaseObject::ReadTransform(HyperFile& file, Long level)
-{
-  ReadChunkBody(file, level, [this](ChunkReader& v) { return VisitTransform(v); });
-  const Bool hasOrder = file.GetFileVersion() >= kVersionTransform && level >= 8;
-  const Long order = hasOrder ? rotationOrder_ : kRotationOrderScene;
-  turnedIn_ = order;
-  if (HasFrozenTransform()) {
-    frozen_->matrix = AnglesToMatrix(frozen_->rot, order);
-    frozen_->inverse = Invert(frozen_->matrix);
-  } else if (frozen_) {
-    frozen_->matrix = Matrix();
-    frozen_->inverse = Matrix();
-    TakeRelAsAbs();
-  }
-  return true;
-}
+void BaseObject::SetObjectData(NodeData* data) { ReplaceNodeData(*this, objectData_, data); }
 
 RootList2D* BaseObject::AllocChildRoot() const { return AllocRootObject(); }
 
@@ -330,7 +160,7 @@ void BaseObject::WriteChunks(HyperFile& file)
     children_->WriteAsChunk(file, kChunkList);
   if (tags_.HasContent())
     tags_.WriteAsChunk(file, kChunkTags);
-  WriteChunk(file, kChunkTransform, kLevelTransform, [this](ChunkWriter& v) { return VisitTransform(v); });
+  WriteTransform(file);
   if (GetDataForm() == DataForm::kBeside)
     objectData_->WriteChunks(file);
 }

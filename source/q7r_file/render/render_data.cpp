@@ -114,25 +114,30 @@ Bool MultipassObject::CopyTo(PrivateChunk& destination, ULong flags, TransArray*
 
 BaseVideoPost::BaseVideoPost() : BaseList2D(kTypeVideoPost) {}
 
-template <class Visitor>
-Bool BaseVideoPost::VisitHead(Visitor& v)
+template <>
+struct ChunkFields<BaseVideoPost>
 {
-  v.Long(pluginId_);
-  v.ConstantLong(0);
-  if constexpr (Visitor::kReading) {
-    String name;
-    if (v.String(name) && !name_.Content())
-      name_ = name;
-  } else {
-    v.String(name_);
+  template <class Visitor>
+  static Bool VisitHead(BaseVideoPost& post, Visitor& v)
+  {
+    v.Long(post.pluginId_);
+    v.ConstantLong(0);
+    if constexpr (Visitor::kReading) {
+      String name;
+      if (v.String(name) && !post.name_.Content())
+        post.name_ = name;
+    } else {
+      v.String(post.name_);
+    }
+    return v.Good();
   }
-  return v.Good();
-}
+};
 
 void BaseVideoPost::WriteChunks(HyperFile& file)
 {
   BaseList2D::WriteChunks(file);
-  WriteChunk(file, kChunkNodeData, 0, [this](ChunkWriter& v) { return VisitHead(v); });
+  WriteChunk(file, kChunkNodeData, 0,
+             [this](ChunkWriter& v) { return ChunkFields<BaseVideoPost>::VisitHead(*this, v); });
   WriteChunk(file, kChunkVideoPostData, 0, [this](ChunkWriter& v) { return v.Container(settings_); });
 }
 
@@ -142,7 +147,8 @@ Bool BaseVideoPost::ReadChunk(HyperFile& file, Long id, Long level)
     return true;
   switch (id) {
   case kChunkNodeData:
-    return ReadChunkBody(file, level, [this](ChunkReader& v) { return VisitHead(v); });
+    return ReadChunkBody(file, level,
+                         [this](ChunkReader& v) { return ChunkFields<BaseVideoPost>::VisitHead(*this, v); });
   case kChunkVideoPostData:
     return ReadChunkBody(file, level, [this](ChunkReader& v) { return v.Container(settings_); });
   default:

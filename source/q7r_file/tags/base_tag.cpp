@@ -37,15 +37,7 @@ const void* BaseTag::GetEntryBytes(LLong& size) const
   return nullptr;
 }
 
-void BaseTag::SetNodeData(NodeData* data)
-{
-  if (data == nodeData_)
-    return;
-  DeleteObj(nodeData_);
-  nodeData_ = data;
-  if (data)
-    data->SetNode(this);
-}
+void BaseTag::SetNodeData(NodeData* data) { ReplaceNodeData(*this, nodeData_, data); }
 
 Bool BaseTag::ReadChunk(HyperFile& file, Long id, Long level)
 {

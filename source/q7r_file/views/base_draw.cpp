@@ -43,46 +43,52 @@ void BaseDraw::SetDocument(BaseDocument* document)
     editorCamera_->SetDocument(document);
 }
 
-template <class Visitor>
-Bool BaseDraw::VisitBody(Visitor& v)
+template <>
+struct ChunkFields<BaseDraw>
 {
-  if (!GetEditorCamera()) {
-    v.File().SetError(FILEERROR_MEMORY);
-    return v.Note(false);
+  template <class Visitor>
+  static Bool VisitBody(BaseDraw& draw, Visitor& v)
+  {
+    if (!draw.GetEditorCamera()) {
+      v.File().SetError(FILEERROR_MEMORY);
+      return v.Note(false);
+    }
+    BaseObject& camera = *draw.editorCamera_;
+    Vector pos = camera.GetRelPos();
+    Vector scale = camera.GetRelScale();
+    Vector rot = camera.GetRelRot();
+    v.EmptyString();
+    v.Container(camera.GetDataInstance());
+    v.Vector(pos);
+    v.Vector(scale);
+    v.Vector(rot);
+    if constexpr (Visitor::kReading) {
+      camera.SetRelPos(pos);
+      camera.SetRelScale(scale);
+      camera.SetRelRot(rot);
+    }
+    if (v.Level() >= 1)
+      v.Link(draw.sceneCamera_);
+    if (v.Level() >= 2)
+      v.EmptyLink();
+    return v.Good();
   }
-  BaseObject& camera = *editorCamera_;
-  Vector pos = camera.GetRelPos();
-  Vector scale = camera.GetRelScale();
-  Vector rot = camera.GetRelRot();
-  v.EmptyString();
-  v.Container(camera.GetDataInstance());
-  v.Vector(pos);
-  v.Vector(scale);
-  v.Vector(rot);
-  if constexpr (Visitor::kReading) {
-    camera.SetRelPos(pos);
-    camera.SetRelScale(scale);
-    camera.SetRelRot(rot);
-  }
-  if (v.Level() >= 1)
-    v.Link(sceneCamera_);
-  if (v.Level() >= 2)
-    v.EmptyLink();
-  return v.Good();
-}
+};
 
 void BaseDraw::WriteChunks(HyperFile& file)
 {
   BaseList2D::WriteChunks(file);
   pref_.WriteChunks(file);
-  WriteChunk(file, kChunkBaseDraw, kLevelBaseDraw, [this](ChunkWriter& v) { return VisitBody(v); });
+  WriteChunk(file, kChunkBaseDraw, kLevelBaseDraw,
+             [this](ChunkWriter& v) { return ChunkFields<BaseDraw>::VisitBody(*this, v); });
 }
 
 Bool BaseDraw::ReadChunk(HyperFile& file, Long id, Long level)
 {
   if (BaseList2D::ReadChunk(file, id, level))
     return true;
-  return id == kChunkBaseDraw && ReadChunkBody(file, level, [this](ChunkReader& v) { return VisitBody(v); });
+  return id == kChunkBaseDraw &&
+         ReadChunkBody(file, level, [this](ChunkReader& v) { return ChunkFields<BaseDraw>::VisitBody(*this, v); });
 }
 
 Bool BaseDraw::CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation)

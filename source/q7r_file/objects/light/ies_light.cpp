@@ -285,49 +285,54 @@ IESLight* CopyIESLight(const IESLight* source)
   return copy;
 }
 
-template <class Visitor>
-Bool IESLight::VisitStored(Visitor& v)
+template <>
+struct ChunkFields<IESLight>
 {
-  Long version = kRecordVersion;
-  Long verticalCount = GetVerticalCount();
-  Long horizontalCount = GetHorizontalCount();
-  v.Long(version);
-  v.Long(fileVersion);
-  v.Long(tiltMode);
-  VisitNumber(v, version, maxCandela);
-  v.Long(verticalCount);
-  v.Long(horizontalCount);
-  for (Long count : {verticalCount, horizontalCount})
-    v.Note(count >= 0 && count <= kMaxIESAngles);
-  if (!v.Good())
-    return false;
-  VisitTable(v, version, verticalAngles, verticalCount);
-  VisitTable(v, version, horizontalAngles, horizontalCount);
-  VisitTable(v, version, candela, verticalCount * horizontalCount);
-  if (version >= kVersionTexts) {
-    for (String* text : {&manufacturer, &luminaireCatalogue, &luminaire, &lampCatalogue, &lamp})
-      v.String(*text);
-    v.Long(shape);
-    v.Vector(size);
+  template <class Visitor>
+  static Bool VisitStored(IESLight& light, Visitor& v)
+  {
+    Long version = kRecordVersion;
+    Long verticalCount = light.GetVerticalCount();
+    Long horizontalCount = light.GetHorizontalCount();
+    v.Long(version);
+    v.Long(light.fileVersion);
+    v.Long(light.tiltMode);
+    VisitNumber(v, version, light.maxCandela);
+    v.Long(verticalCount);
+    v.Long(horizontalCount);
+    for (Long count : {verticalCount, horizontalCount})
+      v.Note(count >= 0 && count <= kMaxIESAngles);
+    if (!v.Good())
+      return false;
+    VisitTable(v, version, light.verticalAngles, verticalCount);
+    VisitTable(v, version, light.horizontalAngles, horizontalCount);
+    VisitTable(v, version, light.candela, verticalCount * horizontalCount);
+    if (version >= kVersionTexts) {
+      for (String* text :
+           {&light.manufacturer, &light.luminaireCatalogue, &light.luminaire, &light.lampCatalogue, &light.lamp})
+        v.String(*text);
+      v.Long(light.shape);
+      v.Vector(light.size);
+    }
+    Real flux = Visitor::kReading ? 0.0 : light.GetTotalFlux();
+    if (version < kVersionFlux)
+      light.FindMaximum();
+    else if (VisitNumber(v, version, flux))
+      light.SetTotalFlux(flux);
+    return v.Good();
   }
-  Real flux = Visitor::kReading ? 0.0 : GetTotalFlux();
-  if (version < kVersionFlux)
-    FindMaximum();
-  else if (VisitNumber(v, version, flux))
-    SetTotalFlux(flux);
-  return v.Good();
-}
+};
 
 Bool IESLight::Write(HyperFile& file)
 {
   ChunkWriter writer(file, 0);
-  return VisitStored(writer);
+  return ChunkFields<IESLight>::VisitStored(*this, writer);
 }
 
 Bool IESLight::Read(HyperFile& file)
 {
   ChunkReader reader(file, 0);
-  return VisitStored(reader);
+  return ChunkFields<IESLight>::VisitStored(*this, reader);
 }
 
 } // namespace _torvane_

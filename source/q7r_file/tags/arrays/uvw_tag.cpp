@@ -158,30 +158,34 @@ Bool UVWTag::ReadChunk(HyperFile& file, Long id, Long level)
   return true;
 }
 
-template <class Visitor>
-Bool UVWTag::VisitEntries(Visitor& v)
+template <>
+struct ChunkFields<UVWTag>
 {
-  Long count = count_;
-  if (!v.Long(count))
-    return false;
-  if constexpr (Visitor::kReading) {
-    void* block = nullptr;
-    if (!MakeEntries(v.File(), count, sizeof(PackedUVWQuad), block))
+  template <class Visitor>
+  static Bool VisitEntries(UVWTag& tag, Visitor& v)
+  {
+    Long count = tag.count_;
+    if (!v.Long(count))
       return false;
-    if (v.Note(v.File().ReadArray(block, kArrayLong, sizeof(ULong), LLong{count} * kWordsPerQuad)))
-      AdoptEntries(block, count);
-    else
-      GeFree(block);
-  } else {
-    v.Note(v.File().WriteArray(block_, kArrayLong, sizeof(ULong), LLong{count} * kWordsPerQuad));
+    if constexpr (Visitor::kReading) {
+      void* block = nullptr;
+      if (!tag.MakeEntries(v.File(), count, sizeof(PackedUVWQuad), block))
+        return false;
+      if (v.Note(v.File().ReadArray(block, kArrayLong, sizeof(ULong), LLong{count} * kWordsPerQuad)))
+        tag.AdoptEntries(block, count);
+      else
+        GeFree(block);
+    } else {
+      v.Note(v.File().WriteArray(tag.block_, kArrayLong, sizeof(ULong), LLong{count} * kWordsPerQuad));
+    }
+    return v.Good() && (v.Level() < kLevelParameter || v.Bool(tag.parameter_));
   }
-  return v.Good() && (v.Level() < kLevelParameter || v.Bool(parameter_));
-}
+};
 
 void UVWTag::WriteEntries(HyperFile& file)
 {
   ChunkWriter writer(file, kLevelUVW);
-  VisitEntries(writer);
+  ChunkFields<UVWTag>::VisitEntries(*this, writer);
 }
 
 Bool UVWTag::ReadEntries(HyperFile& file, Long level)
@@ -191,7 +195,7 @@ Bool UVWTag::ReadEntries(HyperFile& file, Long level)
     return ReadOldEntries(file, level) && (level < kLevelParameter || reader.Bool(parameter_));
   if (level == kLevelFloats)
     return ReadFloatEntries(file) && reader.Bool(parameter_);
-  const Bool read = VisitEntries(reader);
+  const Bool read = ChunkFields<UVWTag>::VisitEntries(*this, reader);
   if (!read)
     file.SetError(FILEERROR_MEMORY);
   return read;

@@ -111,24 +111,28 @@ void JointPairList::Flush()
   values.Flush();
 }
 
-template <class Visitor, class Runs>
-Bool WeightRuns::VisitRuns(Visitor& v, Runs& runs)
+template <>
+struct ChunkFields<WeightRuns>
 {
-  Long count = runs.runs_.GetCount();
-  v.Long(runs.head_[0]);
-  v.Long(runs.head_[1]);
-  v.Long(count);
-  return v.Good() && (count == 0 || VisitElements(v, runs.runs_, count, kArrayLong, 3));
-}
+  template <class Visitor, class Runs>
+  static Bool VisitRuns(Runs& runs, Visitor& v)
+  {
+    Long count = runs.runs_.GetCount();
+    v.Long(runs.head_[0]);
+    v.Long(runs.head_[1]);
+    v.Long(count);
+    return v.Good() && (count == 0 || VisitElements(v, runs.runs_, count, kArrayLong, 3));
+  }
 
-template <class Visitor, class Runs>
-Bool WeightRuns::VisitValues(Visitor& v, Runs& runs)
-{
-  if (runs.runs_.GetCount() == 0)
-    return v.Good();
-  Long count = runs.values_.GetCount();
-  return v.Long(count) && VisitElements(v, runs.values_, count, kArrayWord, 1);
-}
+  template <class Visitor, class Runs>
+  static Bool VisitValues(Runs& runs, Visitor& v)
+  {
+    if (runs.runs_.GetCount() == 0)
+      return v.Good();
+    Long count = runs.values_.GetCount();
+    return v.Long(count) && VisitElements(v, runs.values_, count, kArrayWord, 1);
+  }
+};
 
 // ---------------------------------------------------------------------------------------------------------------
 
@@ -212,7 +216,8 @@ Bool JointWeightTable::Read(HyperFile& file)
 Bool JointWeightTable::ReadContent(HyperFile& file)
 {
   ChunkReader reader(file, 0);
-  if (!WeightRuns::VisitRuns(reader, runs_) || !list_.Read(file) || !WeightRuns::VisitValues(reader, runs_))
+  if (!ChunkFields<WeightRuns>::VisitRuns(runs_, reader) || !list_.Read(file) ||
+      !ChunkFields<WeightRuns>::VisitValues(runs_, reader))
     return false;
   if (!runs_.AreSound()) {
     file.SetError(FILEERROR_WRONG_VALUE);
@@ -240,7 +245,8 @@ Bool JointWeightTable::Write(HyperFile& file) const
 Bool JointWeightTable::WriteContent(HyperFile& file, const WeightRuns& runs) const
 {
   ChunkWriter writer(file, 0);
-  return WeightRuns::VisitRuns(writer, runs) && list_.Write(file) && WeightRuns::VisitValues(writer, runs);
+  return ChunkFields<WeightRuns>::VisitRuns(runs, writer) && list_.Write(file) &&
+         ChunkFields<WeightRuns>::VisitValues(runs, writer);
 }
 
 // The two locks are entered in the order of their addresses, so that two copies in opposite directions end.
