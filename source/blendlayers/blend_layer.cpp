@@ -6,14 +6,35 @@
 namespace _torvane_
 {
 
+BlendFields BlendLayer::CommonFields() const
+{
+  auto& layer = const_cast<BlendLayer&>(*this);
+  return {{layer.isOpen_, 0},
+          {layer.selected_, kBlendSelected},
+          {layer.enabled_, kBlendEnabled},
+          {layer.layerId_, 0},
+          {layer.blendMode_, kBlendMode}};
+}
+
 BlendFields BlendLayer::FieldsOf() const { return const_cast<BlendLayer*>(this)->Fields(); }
 
 // What goes down through folders in folders asks for one setting at a time: all of them in the frame of each level
 // would take most of a stack.
 [[gnu::noinline]] BlendField BlendLayer::FieldAt(Long index) const
 {
-  const BlendFields all = FieldsOf();
-  return index < all.count ? all.fields[index] : BlendField();
+  const Bool isCommon = index < kCommonFields;
+  const BlendFields all = isCommon ? CommonFields() : FieldsOf();
+  const Long place = isCommon ? index : index - kCommonFields;
+  return place < all.count ? all.fields[place] : BlendField();
+}
+
+BlendField BlendLayer::FindField(Long id) const
+{
+  for (Long place = 0;; ++place) {
+    const BlendField field = FieldAt(place);
+    if (!field.value || (id != 0 && field.id == id))
+      return field;
+  }
 }
 
 Bool BlendLayer::CopyLayerTo(BlendLayer& destination, TransArray* translation) const
@@ -23,11 +44,6 @@ Bool BlendLayer::CopyLayerTo(BlendLayer& destination, TransArray* translation) c
   if (&destination == this)
     return true;
   destination.name_ = name_;
-  destination.isOpen_ = isOpen_;
-  destination.selected_ = selected_;
-  destination.enabled_ = enabled_;
-  destination.layerId_ = layerId_;
-  destination.blendMode_ = blendMode_;
   Bool copied = true;
   for (Long i = 0; copied && FieldAt(i).value; ++i)
     copied = CopyField(FieldAt(i), destination.FieldAt(i), translation);
@@ -37,7 +53,7 @@ Bool BlendLayer::CopyLayerTo(BlendLayer& destination, TransArray* translation) c
 Bool BlendLayer::ReadLayer(HyperFile& file, Long level)
 {
   Bool read = true;
-  for (Long i = 0; FieldAt(i).value; ++i)
+  for (Long i = kCommonFields; FieldAt(i).value; ++i)
     read = ReadField(file, level, FieldAt(i)) && read;
   return read;
 }
@@ -45,16 +61,14 @@ Bool BlendLayer::ReadLayer(HyperFile& file, Long level)
 Bool BlendLayer::WriteLayer(HyperFile& file) const
 {
   Bool written = true;
-  for (Long i = 0; FieldAt(i).value; ++i)
+  for (Long i = kCommonFields; FieldAt(i).value; ++i)
     written = WriteField(file, FieldAt(i)) && written;
   return written;
 }
 
 Bool BlendLayer::LayersDiffer(const BlendLayer& other) const
 {
-  if (layerType_ != other.layerType_ || !(name_ == other.name_) || isOpen_ != other.isOpen_ ||
-      selected_ != other.selected_ || enabled_ != other.enabled_ || layerId_ != other.layerId_ ||
-      blendMode_ != other.blendMode_ || layerMark_ != other.layerMark_)
+  if (layerType_ != other.layerType_ || !(name_ == other.name_) || layerMark_ != other.layerMark_)
     return true;
   Bool differ = false;
   for (Long i = 0; !differ && FieldAt(i).value; ++i)
@@ -69,46 +83,14 @@ Bool BlendLayer::LayersEqualIgnoringFlags(const BlendLayer& other, Long) const
 
 Bool BlendLayer::GetLayerParameter(Long id, GeData& value) const
 {
-  switch (id) {
-  case kBlendEnabled:
-    value = GeData(enabled_);
-    return true;
-  case kBlendSelected:
-    value = GeData(selected_);
-    return true;
-  case kBlendMode:
-    value = GeData(blendMode_);
-    return true;
-  default:
-    break;
-  }
-  for (const BlendField& field : FieldsOf()) {
-    if (field.id == id)
-      return GetField(field, value);
-  }
-  return false;
+  const BlendField field = FindField(id);
+  return field.value && GetField(field, value);
 }
 
 Bool BlendLayer::SetLayerParameter(Long id, const GeData& value)
 {
-  switch (id) {
-  case kBlendEnabled:
-    enabled_ = value.GetBool();
-    return true;
-  case kBlendSelected:
-    selected_ = value.GetBool();
-    return true;
-  case kBlendMode:
-    blendMode_ = value.GetLong();
-    return true;
-  default:
-    break;
-  }
-  for (const BlendField& field : Fields()) {
-    if (field.id == id)
-      return SetField(field, value);
-  }
-  return false;
+  const BlendField field = FindField(id);
+  return field.value && SetField(field, value);
 }
 
 Bool BlendLayer::GetLayerValue(Long sub, const ParameterPath& path, GeData& value, ULong& flags) const

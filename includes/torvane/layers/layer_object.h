@@ -33,9 +33,9 @@ class LayerObject : public BaseList4D
   LayerObject* GetDown() const { return NodeCast<LayerObject>(BaseList4D::GetDown()); }
   LayerObject* GetNext() const { return NodeCast<LayerObject>(BaseList4D::GetNext()); }
 
-  Bool GetFlag(Long index) const { return flags_[index]; } // 0 to 8
-  void SetFlag(Long index, Bool value) { flags_[index] = value; }
-  const Vector& GetColor() const { return color_; }
+  Bool GetFlag(Long index) const { return look_.flags[index]; } // 0 to 8
+  void SetFlag(Long index, Bool value) { look_.flags[index] = value; }
+  const Vector& GetColor() const { return look_.color; }
 
  protected:
   GeListNode* MakeEmpty() const override { return NewObj<LayerObject>(); }
@@ -45,8 +45,13 @@ class LayerObject : public BaseList4D
 
   Bool MakeChildList();
 
-  Bool flags_[kLayerFlagCount] = {false, true, true, true, false, true, true, true, true};
-  Vector color_ = Vector(1.0, 1.0, 1.0);
+  struct Look
+  {
+    Bool flags[kLayerFlagCount] = {false, true, true, true, false, true, true, true, true};
+    Vector color = Vector(1.0, 1.0, 1.0);
+  };
+
+  Look look_;
 };
 
 // A new layer that the caller owns; null when memory is short.

@@ -173,13 +173,18 @@ class BlendLayer : public GeMemory
  protected:
   // The class's own settings, in file order. Pointers lead into this layer.
   virtual BlendFields Fields() = 0;
-  // One of them; without a value behind the last.
+  // The settings that every layer has, and then those; without a value behind the last.
   BlendField FieldAt(Long index) const;
+  // The one with a parameter's id; without a value for an id that the layer lacks.
+  BlendField FindField(Long id) const;
 
  private:
   friend class CBlendLayers;
 
-  BlendFields FieldsOf() const; // what Fields gives, for reading
+  static constexpr Long kCommonFields = 5;
+
+  BlendFields CommonFields() const; // a file holds them around the class's own
+  BlendFields FieldsOf() const;     // what Fields gives, for reading
 
   CBlendLayers* parent_ = nullptr; // not owned
   Long layerType_;

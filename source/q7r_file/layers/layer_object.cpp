@@ -26,10 +26,10 @@ struct ChunkFields<LayerObject>
   static Bool VisitBody(LayerObject& layer, Visitor& v)
   {
     for (Long i = 1; i < kLayerFlagCount; ++i)
-      v.Bool(layer.flags_[i]);
-    v.Vector(layer.color_);
+      v.Bool(layer.look_.flags[i]);
+    v.Vector(layer.look_.color);
     if (v.Level() >= 1)
-      v.Bool(layer.flags_[0]);
+      v.Bool(layer.look_.flags[0]);
     return v.Good();
   }
 };
@@ -61,9 +61,7 @@ Bool LayerObject::CopyTo(PrivateChunk& destination, ULong flags, TransArray* tra
     return true;
   if (!BaseList4D::CopyTo(destination, flags, translation))
     return false;
-  for (Long i = 0; i < kLayerFlagCount; ++i)
-    target->flags_[i] = flags_[i];
-  target->color_ = color_;
+  target->look_ = look_;
   if ((flags & kCopyNoChildren) || !children_)
     return true;
   for (LayerObject* child = GetDown(); child; child = child->GetNext()) {
@@ -82,20 +80,20 @@ Bool LayerObject::GetParameter(const ParameterPath& path, GeData& value)
 {
   Long id = path[0].id;
   if (id >= kLayerFirstFlag && id < kLayerFirstFlag + kLayerFlagCount) {
-    value = GeData(flags_[id - kLayerFirstFlag]);
+    value = GeData(look_.flags[id - kLayerFirstFlag]);
     return true;
   }
-  return id == kLayerColor ? GetVectorParameter(color_, path, value) : BaseList4D::GetParameter(path, value);
+  return id == kLayerColor ? GetVectorParameter(look_.color, path, value) : BaseList4D::GetParameter(path, value);
 }
 
 Bool LayerObject::SetParameter(const ParameterPath& path, const GeData& value)
 {
   Long id = path[0].id;
   if (id >= kLayerFirstFlag && id < kLayerFirstFlag + kLayerFlagCount) {
-    flags_[id - kLayerFirstFlag] = value.GetBool();
+    look_.flags[id - kLayerFirstFlag] = value.GetBool();
     return true;
   }
-  return id == kLayerColor ? SetVectorParameter(color_, path, value) : BaseList4D::SetParameter(path, value);
+  return id == kLayerColor ? SetVectorParameter(look_.color, path, value) : BaseList4D::SetParameter(path, value);
 }
 
 LayerObject* AllocLayer() { return NewObj<LayerObject>(); }
