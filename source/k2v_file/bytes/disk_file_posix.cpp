@@ -9,6 +9,7 @@
 #include <sys/stat.h>
 #include <unistd.h>
 
+#include "k2v_file/text/utf8.h"
 #include "torvane/bytes/base_file.h"
 #include "torvane/memory/memory.h"
 
@@ -43,28 +44,6 @@ class SystemPath
   const char* text_ = nullptr;
 };
 
-// Writes the UTF-8 form of a code point and gives the place behind it.
-char* PutUtf8(char* place, ULong code)
-{
-  auto put = [&place](ULong byte) { *place++ = static_cast<char>(static_cast<UChar>(byte)); };
-  if (code < 0x80) {
-    put(code);
-  } else if (code < 0x800) {
-    put(0xC0 | code >> 6);
-    put(0x80 | (code & 0x3F));
-  } else if (code < 0x10000) {
-    put(0xE0 | code >> 12);
-    put(0x80 | (code >> 6 & 0x3F));
-    put(0x80 | (code & 0x3F));
-  } else {
-    put(0xF0 | code >> 18);
-    put(0x80 | (code >> 12 & 0x3F));
-    put(0x80 | (code >> 6 & 0x3F));
-    put(0x80 | (code & 0x3F));
-  }
-  return place;
-}
-
 SystemPath::SystemPath(const String& path)
 {
   const Long length = path.GetLength();
@@ -83,7 +62,7 @@ SystemPath::SystemPath(const String& path)
       return;
     if (IsHighSurrogate(from[i]) && i + 1 < length && IsLowSurrogate(from[i + 1]))
       code = 0x10000 + ((code & 0x3FF) << 10) + (from[++i] & 0x3FFU);
-    place = PutUtf8(place, code);
+    place += PutUtf8(place, code);
   }
   *place = 0;
   text_ = start;

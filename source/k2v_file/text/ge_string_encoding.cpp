@@ -3,6 +3,7 @@
 
 #include <cstring>
 
+#include "k2v_file/text/utf8.h"
 #include "torvane/memory/memory.h"
 
 namespace _torvane_
@@ -54,23 +55,6 @@ void PutHex(char* place, UniChar c)
   constexpr char kDigits[] = "0123456789ABCDEF";
   for (int shift = 12; shift >= 0; shift -= 4)
     *place++ = kDigits[(c >> shift) & 15];
-}
-
-Long PutUtf8(char* form, UniChar c)
-{
-  if (c < 0x80) {
-    form[0] = static_cast<char>(c);
-    return 1;
-  }
-  if (c < 0x800) {
-    form[0] = static_cast<char>(0xC0 | c >> 6);
-    form[1] = static_cast<char>(0x80 | (c & 0x3F));
-    return 2;
-  }
-  form[0] = static_cast<char>(0xE0 | c >> 12);
-  form[1] = static_cast<char>(0x80 | (c >> 6 & 0x3F));
-  form[2] = static_cast<char>(0x80 | (c & 0x3F));
-  return 3;
 }
 
 // Writes the form of one character and gives its length.
