@@ -22,7 +22,7 @@ BaseObject* NextDepthFirst(BaseObject* object)
 
 } // namespace
 
-Long GetLayerId(const BaseObject& object) { return object.GetDataInstance().GetLong(kLayerIdKey, kNoLayerId); }
+Long GetLayerId(const BaseObject& object) { return object.GetDataInstance().GetLong(kKeyLayerId, kNoLayerId); }
 
 BaseObject* FindLayerObject(BaseObject* first, Long layerId)
 {

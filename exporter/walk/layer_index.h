@@ -10,8 +10,6 @@
 namespace exporter
 {
 
-// The entry of an object's container that holds the id of its layer in the host.
-inline constexpr _torvane_::Long kLayerIdKey = 1027565;
 inline constexpr _torvane_::Long kNoLayerId = -1;
 
 // The layer id that an object carries; kNoLayerId without one.

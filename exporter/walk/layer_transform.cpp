@@ -239,7 +239,7 @@ void LayerTransform::SetLayerId()
   AEGP_LayerIDVal id = kNoLayerId;
   if (!host_(&AEGP_LayerSuite13::AEGP_GetLayerID, context_.layer, &id))
     return;
-  object_.GetDataInstance().SetLong(kLayerIdKey, id);
+  object_.GetDataInstance().SetLong(kKeyLayerId, id);
   context_.layers.Add(id, &object_);
 }
 

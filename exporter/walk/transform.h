@@ -18,7 +18,7 @@ inline constexpr _torvane_::Long kExportRotationOrder = 2;
 // The inner cone angle in radians of a light with an outer angle in degrees and a feather in percent.
 constexpr Real InnerAngle(Real outerDegrees, Real feather)
 {
-  return (1.0 - feather / 100.0) * outerDegrees * _torvane_::kPi / 180.0;
+  return _torvane_::DegreesToRadians((1.0 - feather / 100.0) * outerDegrees);
 }
 
 // Film sizes and focus distances: host pixels at 72 to the inch.

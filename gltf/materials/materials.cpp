@@ -18,9 +18,6 @@ using namespace _torvane_;
 namespace
 {
 
-constexpr Long kColorBrightness = 2101;
-constexpr Long kColorMix = 2102;
-constexpr Long kColorMixMode = 2103;
 constexpr Long kAlphaChannel = 8; // on in every new material, without a meaning of its own
 constexpr Long kProjectionUVW = 6;
 constexpr Vector kGrey(0.8, 0.8, 0.8);
@@ -113,10 +110,10 @@ Materials::Paint Materials::ReadPaint(const BaseMaterial& base)
     return paint; // black
   const BaseContainer& settings = material->GetDataInstance();
   paint.color = settings.GetVector(kMaterialColor, kGrey);
-  paint.brightness = Finite(settings.GetReal(kColorBrightness, 1.0));
+  paint.brightness = Finite(settings.GetReal(kMaterialColorBrightness, 1.0));
   if (const BaseShader* shader = material->ChannelShaderOf(kMaterialColorShader))
     TakePicture(*shader, paint);
-  const bool isMixed = settings.GetReal(kColorMix, 1.0) < 1.0 || settings.GetLong(kColorMixMode) != 0;
+  const bool isMixed = settings.GetReal(kMaterialColorMix, 1.0) < 1.0 || settings.GetLong(kMaterialColorMixMode) != 0;
   if (paint.picture.image != kNone && isMixed)
     account.Tell(Loss::kMixing);
   return paint;

@@ -16,8 +16,7 @@ using namespace _torvane_;
 namespace
 {
 
-constexpr Long kKeyLayerId = 1027565; // of an object's container: the host's number of the layer
-constexpr Long kFlagLocked = 4;       // of a scene layer
+constexpr Long kFlagLocked = 4; // of a scene layer
 constexpr Real kDefaultUnit = 0.01;
 
 const LayerObject* LayerOf(const BaseObject& object)

@@ -1,6 +1,7 @@
 #include "gltf/shapes/meshes.h"
 
 #include "gltf/text.h"
+#include "torvane/objects/plane_parameters.h"
 #include "torvane/objects/point_object.h"
 #include "torvane/tags/value_tags.h"
 
@@ -11,11 +12,6 @@ using namespace _torvane_;
 
 namespace
 {
-
-constexpr Long kPlaneWidth = 1230;
-constexpr Long kPlaneHeight = 1231;
-constexpr Long kPlaneAxis = 1300;
-constexpr Long kAxisTowardsViewer = 5;
 
 // The last tag that covers the whole object, or null.
 const TextureTag* LastTextureTag(const BaseObject& object, bool& hasTags)
@@ -52,7 +48,7 @@ std::size_t Meshes::FindQuad(BaseObject& object)
     return kNone; // a nested composition: what it shows is under it
   const BaseContainer& settings = object.GetDataInstance();
   Output& output = context_.output;
-  if (settings.GetLong(kPlaneAxis, kAxisTowardsViewer) != kAxisTowardsViewer)
+  if (settings.GetLong(kPlaneAxis, kPlaneTowardsViewer) != kPlaneTowardsViewer)
     output.account.Tell(Loss::kPlaneAxis);
   materials_.TellTagLosses(object);
   const Surface surface = materials_.Find(tag, true);

@@ -21,8 +21,6 @@ using namespace _torvane_;
 namespace
 {
 
-constexpr Long kTagSmoothing = 5612;
-
 // What is told apart at a corner beside its point.
 struct Corner
 {

@@ -37,6 +37,7 @@ inline constexpr Long kObjectSkin = 1019363;
 // Tag types.
 inline constexpr Long kTagPoint = 5600;
 inline constexpr Long kTagPolygon = 5604;
+inline constexpr Long kTagSmoothing = 5612;
 inline constexpr Long kTagDisplay = 5613;
 inline constexpr Long kTagTexture = 5616;
 inline constexpr Long kTagTangent = 5617;
@@ -106,8 +107,9 @@ constexpr Bool IsLibraryChunk(Long id) { return (id >= 110000 && id < 111000) ||
 inline constexpr Long kChunkLayer = 110313;
 inline constexpr Long kLevelLayer = 1;
 
-// Keys of node containers that the library itself writes.
+// Keys of node containers.
 inline constexpr Long kKeyModelCheckSum = 1020800; // of an object: the check sum of its geometry at the last write
+inline constexpr Long kKeyLayerId = 1027565;       // of an exported object: the host's number of its layer
 
 // Flags of CopyTo and MakeClone.
 inline constexpr ULong kCopyNoTranslation = 1; // no private translation array: the caller translates

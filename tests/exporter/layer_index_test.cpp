@@ -61,7 +61,7 @@ class Walk
     BaseObject* object = AllocObject(kObjectNull);
     document_->InsertObject(object);
     if (id >= 0) {
-      object->GetDataInstance().SetLong(exporter::kLayerIdKey, id);
+      object->GetDataInstance().SetLong(kKeyLayerId, id);
       index_.Add(id, object);
     }
     return object;
@@ -144,7 +144,7 @@ TEST(LayerIndex, SearchesADocumentThatItDoesNotKnow)
   BaseDocument* document = BaseDocument::Alloc();
   BaseObject* object = AllocObject(kObjectNull);
   document->InsertObject(object);
-  object->GetDataInstance().SetLong(exporter::kLayerIdKey, 7);
+  object->GetDataInstance().SetLong(kKeyLayerId, 7);
   LayerIndex index;
   EXPECT_EQ(index.Find(object, 7), nullptr);
   index.Distrust();

@@ -18,6 +18,9 @@ inline constexpr Long kLastChannel = 12;
 // Parameters of the colour channel, 0.
 inline constexpr Long kColorChannel = 0;
 inline constexpr Long kMaterialColor = 2100;
+inline constexpr Long kMaterialColorBrightness = 2101;
+inline constexpr Long kMaterialColorMix = 2102; // Real: how much of the shader
+inline constexpr Long kMaterialColorMixMode = 2103;
 inline constexpr Long kMaterialColorShader = 8000;
 
 inline constexpr Long kNodeChannel = 5899;     // the node type of a channel, and its chunk

@@ -8,14 +8,16 @@ namespace _torvane_
 
 inline constexpr Long kPlaneWidth = 1230;  // Real, in the document's unit
 inline constexpr Long kPlaneHeight = 1231; // Real
+inline constexpr Long kPlaneAxis = 1300;   // Long: which way it faces
+inline constexpr Long kPlaneTowardsViewer = 5;
 
-// Known by number alone.
+// What exported planes have besides. The other two are known by number alone.
 struct PlaneSetting
 {
   Long id;
-  Long value; // in exported scenes
+  Long value;
 };
 
-inline constexpr PlaneSetting kPlaneSettings[] = {{1233, 1}, {1232, 1}, {1300, 5}};
+inline constexpr PlaneSetting kPlaneSettings[] = {{1233, 1}, {1232, 1}, {kPlaneAxis, kPlaneTowardsViewer}};
 
 } // namespace _torvane_

@@ -10,7 +10,7 @@ Bool HyperFile::WriteChunkStart(Long id, Long level)
   if (error_ != FILEERROR_NONE)
     return false;
   LLong start = file_.GetPosition();
-  UChar raw[9];
+  UChar raw[StoredSize(kTagChunkStart)];
   UChar* place = TakeRoom(raw, sizeof raw);
   place[0] = kTagChunkStart;
   bytes::PutBig(place + 1, static_cast<ULong>(id));

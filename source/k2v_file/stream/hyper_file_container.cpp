@@ -6,6 +6,7 @@
 #include "k2v_file/stream/write_in_memory.h"
 #include "k2v_file/values/container_defaults.h"
 #include "k2v_file/values/container_index.h"
+#include "torvane/ids.h"
 #include "torvane/memory/spin_lock.h"
 #include "torvane/stream/prepared_record.h"
 #include "torvane/values/base_container.h"
@@ -16,8 +17,6 @@ namespace _torvane_
 namespace
 {
 
-constexpr Long kContainerChunk = 132;
-constexpr Long kContainerLevel = 1;
 constexpr LLong kElementTicks = 3;     // written: of its id, its type and its value
 constexpr LLong kReadElementTicks = 2; // the id's goes uncounted
 constexpr Long kMostExpected = 64;     // elements that get room before they are read
@@ -117,7 +116,7 @@ Bool HyperFile::WriteContainer(const BaseContainer& container)
 {
   if (!EnterLoop())
     return false;
-  WriteChunkStart(kContainerChunk, kContainerLevel);
+  WriteChunkStart(kChunkContainer, kLevelContainer);
   WriteLong(container.GetId());
   if (!container.IsShared() || !WriteShared(container))
     WriteElements(container);
@@ -215,9 +214,9 @@ Bool HyperFile::ReadContainerChunk(ContainerIndex& target, Bool flush, Long expe
   Long level = 0;
   if (!ReadChunkHead(id, level))
     return false;
-  if (id != kContainerChunk)
+  if (id != kChunkContainer)
     return Fail(FILEERROR_WRONG_VALUE, start);
-  if (level < kContainerLevel)
+  if (level < kLevelContainer)
     return true;
   if (!ReadLong(id))
     return false;
@@ -261,8 +260,8 @@ Bool HyperFile::MayHoldShared(const BaseContainer& container) const
       !TakesRecords(kReadElementTicks * (container.GetCount() + 1)) || !LearnDefaults(*container.defaults_))
     return false;
   const UChar* head = file_.ReadWindow(kHead);
-  return head && head[0] == kTagChunkStart && bytes::GetBig<ULong>(head + 1) == kContainerChunk &&
-         bytes::GetBig<ULong>(head + 5) == kContainerLevel && head[PreparedRecord::kHeadSize] == kTagLong;
+  return head && head[0] == kTagChunkStart && bytes::GetBig<ULong>(head + 1) == kChunkContainer &&
+         bytes::GetBig<ULong>(head + 5) == kLevelContainer && head[PreparedRecord::kHeadSize] == kTagLong;
 }
 
 // Passes over elements that stand in the file as the container shares them, and reads those of them that have other

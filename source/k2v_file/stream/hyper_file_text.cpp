@@ -1,6 +1,7 @@
 // Values with a length: text, memory blocks, pictures.
 #include <cstring>
 
+#include "k2v_file/stream/value_forms.h"
 #include "torvane/pictures/bitmap.h"
 #include "torvane/stream/hyper_file.h"
 
@@ -14,7 +15,7 @@ constexpr LLong kTextPiece = 512;          // characters that are converted at a
 constexpr LLong kFirstStep = 65536;        // first allocation for a block whose size can't be checked
 constexpr LLong kLargestShort = INT32_MAX; // larger memory blocks have a 64-bit length
 constexpr LLong kSmallBlock = 64;
-constexpr LLong kBlockHead = 5; // a tag, and a 32-bit length
+constexpr LLong kBlockHead = StoredSize(kTagMemory); // a tag, and a 32-bit length
 
 void PackText(UChar* place, const UniChar* text, LLong count)
 {

@@ -1,6 +1,7 @@
 #include "q7r_file/materials/material_defaults.h"
 
 #include "k2v_file/values/container_defaults.h"
+#include "torvane/materials/material.h"
 
 namespace _torvane_
 {
@@ -54,9 +55,15 @@ constexpr ContainerDefault kMaterialDefaults[] = {
 };
 
 constexpr ChannelParameters kChannels[] = {
-    {0, 2100, 0.8, 2101, 2102, 2103, 0}, {1, 2300, 1.0, 2301, 2302, 2303, 0}, {2, 2400, 1.0, 2401, 2402, 2403, 0},
-    {3, 2500, 1.0, 2501, 2502, 2503, 0}, {4, 2600, 1.0, 2601, 2602, 2603, 3}, {5, 2700, 1.0, 2701, 0, 0, 0},
-    {7, 2900, 1.0, 0, 0, 0, 0},          {9, 3100, 1.0, 3101, 3102, 3103, 0}, {10, 3200, 1.0, 3201, 0, 0, 0},
+    {0, kMaterialColor, 0.8, kMaterialColorBrightness, kMaterialColorMix, kMaterialColorMixMode, 0},
+    {1, 2300, 1.0, 2301, 2302, 2303, 0},
+    {2, 2400, 1.0, 2401, 2402, 2403, 0},
+    {3, 2500, 1.0, 2501, 2502, 2503, 0},
+    {4, 2600, 1.0, 2601, 2602, 2603, 3},
+    {5, 2700, 1.0, 2701, 0, 0, 0},
+    {7, 2900, 1.0, 0, 0, 0, 0},
+    {9, 3100, 1.0, 3101, 3102, 3103, 0},
+    {10, 3200, 1.0, 3201, 0, 0, 0},
     {12, 0, 0.0, 2200, 2201, 2202, 0},
 };
 
