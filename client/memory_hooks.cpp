@@ -1,9 +1,14 @@
 // The memory hooks: the heap of the C library.
+#include <atomic>
 #include <cstdint>
 #include <cstdlib>
 
 #ifdef __linux__
 #include <sys/mman.h>
+#include <unistd.h>
+#endif
+#ifdef __GLIBC__
+#include <malloc.h>
 #endif
 
 #include "torvane/hooks.h"
@@ -14,18 +19,64 @@ namespace _torvane_
 namespace
 {
 
-// Asks for large pages under what is large: the points of a mesh then come in tens of pages, not in thousands. Only a
-// wish, whose failure changes nothing.
-void* InLargePages([[maybe_unused]] void* block, [[maybe_unused]] LLong size)
+#ifdef __linux__
+
+constexpr std::uintptr_t kLargePage = std::uintptr_t{1} << 21;
+
+// Asks for large pages wherever they fit between two addresses. Only a wish, whose failure changes nothing.
+void AskForLargePages(std::uintptr_t start, std::uintptr_t end)
+{
+  const std::uintptr_t first = (start + kLargePage - 1) / kLargePage * kLargePage;
+  const std::uintptr_t last = end / kLargePage * kLargePage;
+  if (first < last)
+    ::madvise(reinterpret_cast<void*>(first), last - first, MADV_HUGEPAGE);
+}
+
+#endif
+
+#ifdef __GLIBC__
+
+// How far the heap of small blocks may grow before it gets large pages: most programs need no more. Later it grows by
+// steps, and not by the usual 132 KiB, into which no large page fits.
+constexpr std::uintptr_t kPlainHeap = 3 * kLargePage;
+constexpr std::uintptr_t kHeapStep = 8 * kLargePage;
+
+// Where the part of the heap ends that was looked after; 0 before the first block.
+std::atomic<std::uintptr_t> gHeapEnd{0};
+
+// Called for a block that ends behind gHeapEnd. Those of other heaps, which threads have, lie behind the end of all.
+void LookAfterHeap(std::uintptr_t end)
+{
+  const auto heapEnd = reinterpret_cast<std::uintptr_t>(::sbrk(0));
+  if (end > heapEnd)
+    return;
+  static const std::uintptr_t plainEnd = heapEnd + kPlainHeap;
+  if (end <= plainEnd) {
+    gHeapEnd.store(plainEnd, std::memory_order_relaxed);
+    return;
+  }
+  static const bool growsInSteps = ::mallopt(M_MMAP_THRESHOLD, static_cast<int>(2 * kLargePage)) != 0 &&
+                                   ::mallopt(M_TRIM_THRESHOLD, static_cast<int>(2 * kHeapStep)) != 0 &&
+                                   ::mallopt(M_TOP_PAD, static_cast<int>(kHeapStep)) != 0;
+  const std::uintptr_t known = gHeapEnd.exchange(heapEnd, std::memory_order_relaxed);
+  if (growsInSteps)
+    AskForLargePages(known / kLargePage * kLargePage, heapEnd);
+}
+
+#endif
+
+// The points of a mesh then come in tens of pages, not in thousands, and so do the nodes of a large scene.
+void* InLargePages(void* block, [[maybe_unused]] LLong size)
 {
 #ifdef __linux__
-  constexpr std::uintptr_t kLargePage = std::uintptr_t{1} << 21;
-  if (block && size >= static_cast<LLong>(2 * kLargePage)) {
-    const std::uintptr_t start = reinterpret_cast<std::uintptr_t>(block);
-    const std::uintptr_t first = (start + kLargePage - 1) / kLargePage * kLargePage;
-    const std::uintptr_t last = (start + static_cast<std::uintptr_t>(size)) / kLargePage * kLargePage;
-    ::madvise(reinterpret_cast<void*>(first), last - first, MADV_HUGEPAGE);
-  }
+  const auto start = reinterpret_cast<std::uintptr_t>(block);
+  const std::uintptr_t end = start + static_cast<std::uintptr_t>(size);
+  if (block && size >= static_cast<LLong>(2 * kLargePage))
+    AskForLargePages(start, end);
+#ifdef __GLIBC__
+  else if (block && end > gHeapEnd.load(std::memory_order_relaxed))
+    LookAfterHeap(end);
+#endif
 #endif
   return block;
 }

@@ -36,7 +36,7 @@ Bool KeyList::TakeRecords(HyperFile& file)
   if (!record)
     return false;
   LLong begun = PreparedRecord::kHeadSize;
-  while (const UChar* place = file.NextRecord(record->GetRecord(), begun)) {
+  while (const UChar* place = file.NextRecord(record->GetRecord(), record->GetRecord().GetRest(begun))) {
     PlainKey key;
     record->Take(place, begun, key);
     if (!IsKeyTime(key.row.time))
@@ -45,7 +45,7 @@ Bool KeyList::TakeRecords(HyperFile& file)
       break;
     if (!rows_.Insert(rows_.GetCount(), key))
       break;
-    file.PassRecord(record->GetRecord(), begun);
+    file.PassRecord(record->GetRecord(), record->GetRecord().GetRest(begun));
     begun = 0;
   }
   return begun == 0;

@@ -1,11 +1,9 @@
 #include "q7r_ccurve/key_record.h"
 
-#include <atomic>
-#include <bit>
 #include <cstring>
 
+#include "k2v_file/stream/learned_once.h"
 #include "torvane/bytes/base_file.h"
-#include "torvane/memory/spin_lock.h"
 
 namespace _torvane_
 {
@@ -94,22 +92,6 @@ Bool KeyRecord::Learn()
   return found;
 }
 
-const KeyRecord* KeyRecord::Get()
-{
-  static KeyRecord record;
-  static std::atomic<Bool> ready{false};
-  static ReadWriteSpinLock lock;
-  if (ready.load(std::memory_order_acquire))
-    return &record;
-  const WriteGuard guard(lock);
-  if (!ready.load(std::memory_order_relaxed)) {
-    KeyRecord made;
-    if (!made.Learn())
-      return nullptr;
-    record = made;
-    ready.store(true, std::memory_order_release);
-  }
-  return &record;
-}
+const KeyRecord* KeyRecord::Get() { return GetLearned<KeyRecord>(); }
 
 } // namespace _torvane_

@@ -10,8 +10,10 @@ namespace _torvane_
 class KeyRecord
 {
  public:
-  // The one of this process, made when it is first asked for; null when memory is short. Any thread may ask.
+  // The one of this process; null when memory is short.
   static const KeyRecord* Get();
+  // For Get alone.
+  Bool Learn();
 
   const PreparedRecord& GetRecord() const { return record_; }
   // The fields into the bytes of a record, and out of those behind its first `begun` ones, which hold none.
@@ -21,8 +23,6 @@ class KeyRecord
  private:
   static constexpr Long kReals = 9;
   static constexpr Long kLongs = 5;
-
-  Bool Learn();
 
   PreparedRecord record_;
   LLong reals_[kReals] = {}; // where the fields are, in the order of the functions in the source file

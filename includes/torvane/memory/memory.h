@@ -43,7 +43,8 @@ inline void GeCopyFewBytes(void* destination, const void* source, LLong size) no
 namespace detail
 {
 void FreeBlock(void* block) noexcept;
-}
+extern constinit thread_local ULong failedAllocations;
+} // namespace detail
 
 template <class T>
 void GeFree(T*& block) noexcept
@@ -79,7 +80,7 @@ void DeleteObj(T*& object) noexcept
 
 // How many allocations of the calling thread the client's hooks have refused since it began. Sizes that are turned down
 // before the hooks are asked don't count.
-ULong CountFailedAllocations() noexcept;
+inline ULong CountFailedAllocations() noexcept { return detail::failedAllocations; }
 
 // Tells whether an allocation of this thread failed since the watch began. What is built of many parts (a load, a copy,
 // a node with its defaults) asks it at its end: a part that came out empty somewhere below then makes the whole fail,

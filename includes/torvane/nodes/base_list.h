@@ -178,6 +178,7 @@ class BaseList2D : public GeListNode
   Part* NeedExtra(Part* Extras::*part);
   BaseContainer* NeedDynamicParameters();
 
+  Bool ReadHeader(HyperFile& file, Long level);
   template <class Root>
   Root* NeedRoot(Root* Extras::*root);
   template <class Root>

@@ -85,6 +85,7 @@ class RootList2D : public PrivateChunk
 
  private:
   Bool Takes(const BaseList2D& node) const;
+  void Add(BaseList2D& node, Bool setListHead);
   void Enter(BaseList2D& node, Bool setListHead);
   void BeginList();
   NodeSink* GetSink();

@@ -230,6 +230,7 @@ class BaseObject : public BaseList4D
   void SetGlobalAngles(const Vector& value);
   Vector TakeDisplayColor();
   void WriteTransform(HyperFile& file);
+  Bool ReadPlainTransform(HyperFile& file, Long level);
   Bool ReadTransform(HyperFile& file, Long level);
   Bool ReadObjectData(HyperFile& file, Long id, Long level);
   void StoreModelCheckSum();

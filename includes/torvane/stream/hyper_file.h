@@ -20,6 +20,7 @@ class Bitmap;
 class ContainerIndex;
 class GeData;
 class PreparedRecord;
+struct RecordPart;
 class TransArray;
 struct ValueForm;
 
@@ -256,6 +257,8 @@ class HyperFile : public GeMemory
 
   // The next tag, whatever it is.
   Bool ReadValueHeader(UChar& tag);
+  // The next tag, and the chunk's id and level if it opens one.
+  Bool ReadHeaderOrStart(UChar& tag, ChunkPlace& chunk);
   // Reads a tag and fails with FILEERROR_WRONG_VALUE if it isn't `tag`.
   Bool ExpectTag(UChar tag);
   // A chunk's id and level, after its tag was read.
@@ -276,12 +279,13 @@ class HyperFile : public GeMemory
 
   // The quick way for records that are alike (prepared_record.h). BeginRecord gives a place with a copy of the record,
   // whose fields are then to be set, and EndRecord writes it; `spare` has room for the record and may be the place.
-  // NextRecord gives what comes next if it is a record, of which `begun` bytes were read before, and PassRecord moves
-  // over it. Null: the general way is to be taken.
+  // NextRecord gives what comes next if it is that part of a record, and PassRecord moves over it. Null: the general
+  // way is to be taken. MayHoldRecords is to be asked before a record is learned: where it is learned it gives false.
   UChar* BeginRecord(const PreparedRecord& record, UChar* spare);
   Bool EndRecord(const PreparedRecord& record, const UChar* place, const UChar* spare);
-  const UChar* NextRecord(const PreparedRecord& record, LLong begun) const;
-  void PassRecord(const PreparedRecord& record, LLong begun);
+  Bool MayHoldRecords() const;
+  const UChar* NextRecord(const PreparedRecord& record, const RecordPart& part) const;
+  void PassRecord(const PreparedRecord& record, const RecordPart& part);
   // How many such records may stand in a row, as far as the buffer goes; the first of them has begun so far.
   LLong CountRecords(const PreparedRecord& record, LLong begun) const;
   // Values since progress was last told.
@@ -450,6 +454,20 @@ inline Bool HyperFile::ReadValueHeader(UChar& tag)
   tag = place[0];
   file_.CommitRead(1);
   chunkDepth_ += (tag == kTagChunkStart ? 1 : 0) - (tag == kTagChunkEnd ? 1 : 0);
+  return true;
+}
+
+inline Bool HyperFile::ReadHeaderOrStart(UChar& tag, ChunkPlace& chunk)
+{
+  constexpr LLong kStart = 1 + sizeof(ChunkPlace);
+  const UChar* place = error_ == FILEERROR_NONE ? file_.ReadWindow(kStart) : nullptr;
+  if (!place || place[0] != kTagChunkStart || chunkDepth_ < 0 || chunkDepth_ >= chunkRoom_)
+    return ReadValueHeader(tag) && (tag != kTagChunkStart || ReadChunkStart(chunk.id, chunk.level));
+  tag = kTagChunkStart;
+  chunk = {static_cast<Long>(bytes::GetBig<ULong>(place + 1)), static_cast<Long>(bytes::GetBig<ULong>(place + 5))};
+  chunks_[chunkDepth_++] = chunk;
+  file_.CommitRead(kStart);
+  TickRead();
   return true;
 }
 

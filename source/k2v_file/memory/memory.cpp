@@ -7,15 +7,15 @@
 namespace _torvane_
 {
 
+constinit thread_local ULong detail::failedAllocations = 0;
+
 namespace
 {
-
-thread_local ULong gFailedAllocations = 0;
 
 void* Counted(void* block) noexcept
 {
   if (!block)
-    ++gFailedAllocations;
+    ++detail::failedAllocations;
   return block;
 }
 
@@ -26,8 +26,6 @@ void* GeAlloc(LLong size) noexcept { return size > 0 ? Counted(MemAllocClear(siz
 void* GeAllocNC(LLong size) noexcept { return size > 0 ? Counted(MemAlloc(size)) : nullptr; }
 
 void* GeRealloc(void* block, LLong size) noexcept { return size > 0 ? Counted(MemRealloc(block, size)) : nullptr; }
-
-ULong CountFailedAllocations() noexcept { return gFailedAllocations; }
 
 void GeCopyMem(void* destination, const void* source, LLong size) noexcept
 {

@@ -267,7 +267,11 @@ Bool HyperFile::ExpectTag(UChar tag)
   UChar found = 0;
   if (!ReadValueHeader(found))
     return false;
-  return found == tag || Fail(FILEERROR_WRONG_VALUE, start);
+  if (found == tag)
+    return true;
+  if (found == kTagChunkStart)
+    --chunkDepth_; // nobody knows its id
+  return Fail(FILEERROR_WRONG_VALUE, start);
 }
 
 Bool HyperFile::PutSlow(UChar tag, ULLong bits, LLong size)

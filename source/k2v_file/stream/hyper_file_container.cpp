@@ -72,7 +72,10 @@ LLong GetNumberElement(const UChar* next, Long& id, GeData& number)
 // How many of the first bytes are the same.
 LLong CountSame(const UChar* a, const UChar* b, LLong count)
 {
+  constexpr LLong kRun = 32;
   LLong same = 0;
+  for (; same + kRun <= count && std::memcmp(a + same, b + same, kRun) == 0; same += kRun) {
+  }
   for (; same + 8 <= count && std::memcmp(a + same, b + same, 8) == 0; same += 8) {
   }
   while (same < count && a[same] == b[same])

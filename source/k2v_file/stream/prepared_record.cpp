@@ -1,6 +1,5 @@
 #include "torvane/stream/prepared_record.h"
 
-#include <atomic>
 #include <cstring>
 
 #include "k2v_file/stream/write_in_memory.h"
@@ -12,10 +11,26 @@ namespace _torvane_
 namespace
 {
 
-std::atomic<Bool> gEnabled{true};
+// The values that have been read up to each byte behind the header.
+struct TickCounter
+{
+  const HyperFile& file;
+  LLong header;
+  UChar counts[PreparedRecord::kLargest + 1] = {};
+
+  static void Note(Long, void* counter)
+  {
+    auto& [file, header, counts] = *static_cast<TickCounter*>(counter);
+    ++counts[file.GetPosition() - header];
+  }
+};
+
+} // namespace
+
+void PreparedRecord::SetEnabled(Bool enabled) { enabled_.store(enabled, std::memory_order_relaxed); }
 
 // Reads the one chunk of a file in memory into `copy`, and counts the values.
-Bool CountReadTicks(const UChar* file, LLong size, PrivateChunk& copy, LLong& ticks)
+Bool PreparedRecord::CountReadTicks(const UChar* file, LLong size, LLong header, PrivateChunk& copy)
 {
   Filename source;
   source.SetMemoryRead(file, size);
@@ -25,16 +40,14 @@ Bool CountReadTicks(const UChar* file, LLong size, PrivateChunk& copy, LLong& ti
   Long level = 0;
   if (!reader.Open(kSceneIdent, source, kHyperFileRead))
     return false;
-  ticks = 0;
-  reader.SetReadProgress([](Long, void* count) { ++*static_cast<LLong*>(count); }, &ticks); // at every value
-  return reader.ReadValueHeader(tag) && reader.ReadChunkStart(id, level) && copy.ReadChunkLoop(reader, true);
+  TickCounter counter{reader, header};
+  reader.SetReadProgress(TickCounter::Note, &counter); // at every value
+  if (!reader.ReadValueHeader(tag) || !reader.ReadChunkStart(id, level) || !copy.ReadChunkLoop(reader, true))
+    return false;
+  for (LLong i = 1; i <= size - header; ++i)
+    readTicks_[i] = static_cast<UChar>(readTicks_[i - 1] + counter.counts[i]);
+  return true;
 }
-
-} // namespace
-
-void PreparedRecord::SetEnabled(Bool enabled) { gEnabled.store(enabled, std::memory_order_relaxed); }
-
-Bool PreparedRecord::IsEnabled() { return gEnabled.load(std::memory_order_relaxed); }
 
 Bool PreparedRecord::Learn(PrivateChunk& sample, PrivateChunk& copy, Long label)
 {
@@ -44,7 +57,7 @@ Bool PreparedRecord::Learn(PrivateChunk& sample, PrivateChunk& copy, Long label)
   };
   return WriteInMemory(write, [&](const UChar* file, LLong fileSize, LLong header) {
     const LLong size = fileSize - header;
-    if (size > kLargest || !CountReadTicks(file, fileSize, copy, readTicks_))
+    if (size > kLargest || !CountReadTicks(file, fileSize, header, copy))
       return false;
     size_ = size;
     std::memcpy(bytes_, file + header, static_cast<std::size_t>(size));
@@ -68,23 +81,37 @@ LLong PreparedRecord::TakeField(const void* mark, LLong size)
   return place;
 }
 
-// Eight bytes at a time; the last eight may overlap those before them.
-Bool PreparedRecord::Matches(const UChar* place, LLong begun) const
+LLong PreparedRecord::FindChunk(Long id) const
 {
-  constexpr LLong kWord = sizeof(ULLong);
+  UChar head[1 + sizeof(Long)] = {kTagChunkStart};
+  bytes::PutBig(head + 1, static_cast<ULong>(id));
+  for (LLong i = 0; i + kHeadSize <= size_; ++i) {
+    if (std::memcmp(bytes_ + i, head, sizeof head) == 0)
+      return i + kHeadSize;
+  }
+  return -1;
+}
+
+// Sixteen bytes at a time; the last sixteen may overlap those before them.
+Bool PreparedRecord::Matches(const UChar* place, const RecordPart& part) const
+{
+  using Lanes = ULLong __attribute__((vector_size(2 * sizeof(ULLong))));
+  constexpr LLong kStep = sizeof(Lanes);
   const auto word = [](const UChar* from) {
-    ULLong bytes = 0;
-    std::memcpy(&bytes, from, sizeof bytes);
-    return bytes;
+    Lanes taken;
+    std::memcpy(&taken, from, sizeof taken);
+    return taken;
   };
-  const LLong count = size_ - begun;
-  if (count < kWord)
+  const LLong count = part.to - part.from;
+  if (count < kStep)
     return false;
-  const auto differs = [&](LLong i) { return (word(place + i) ^ word(bytes_ + begun + i)) & word(fixed_ + begun + i); };
-  ULLong different = differs(count - kWord);
-  for (LLong i = 0; i + kWord <= count; i += kWord)
+  const UChar* known = bytes_ + part.from;
+  const UChar* fixed = fixed_ + part.from;
+  const auto differs = [&](LLong i) { return (word(place + i) ^ word(known + i)) & word(fixed + i); };
+  Lanes different = differs(count - kStep);
+  for (LLong i = 0; i + kStep <= count; i += kStep)
     different |= differs(i);
-  return different == 0;
+  return (different[0] | different[1]) == 0;
 }
 
 LLong PreparedRecord::CountHeads(const UChar* place, LLong size) const
@@ -126,18 +153,21 @@ Bool HyperFile::EndRecord(const PreparedRecord& record, const UChar* place, cons
   return true;
 }
 
-const UChar* HyperFile::NextRecord(const PreparedRecord& record, LLong begun) const
+Bool HyperFile::MayHoldRecords() const { return version_ >= kVersionCurrent && TakesRecords(1); }
+
+const UChar* HyperFile::NextRecord(const PreparedRecord& record, const RecordPart& part) const
 {
-  if (version_ < kVersionCurrent || !TakesRecords(record.GetReadTicks()))
+  if (version_ < kVersionCurrent || !TakesRecords(record.GetReadTicks(part)))
     return nullptr;
-  const UChar* place = file_.ReadWindow(record.GetSize() - begun);
-  return place && record.Matches(place, begun) ? place : nullptr;
+  const UChar* place = file_.ReadWindow(part.to - part.from);
+  return place && record.Matches(place, part) ? place : nullptr;
 }
 
-void HyperFile::PassRecord(const PreparedRecord& record, LLong begun)
+void HyperFile::PassRecord(const PreparedRecord& record, const RecordPart& part)
 {
-  file_.CommitRead(record.GetSize() - begun);
-  TickMany(record.GetReadTicks() - (begun > 0 ? 1 : 0)); // the chunk start's
+  file_.CommitRead(part.to - part.from);
+  chunkDepth_ -= part.closes;
+  TickMany(record.GetReadTicks(part));
 }
 
 LLong HyperFile::CountRecords(const PreparedRecord& record, LLong begun) const

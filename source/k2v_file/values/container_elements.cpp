@@ -137,6 +137,10 @@ void BaseContainer::Flush()
 // Containers that lie in containers are put into a list and freed one after the other, however deep they are nested.
 void BaseContainer::FreeElements()
 {
+  if (!blocks_) {
+    defaults_ = nullptr;
+    return;
+  }
   BaseContainer* pending = nullptr;
   DropElements(pending);
   while (pending) {

@@ -3,6 +3,7 @@
 #include <cstring>
 
 #include "k2v_file/stream/chunk_visitor.h"
+#include "q7r_file/nodes/node_record.h"
 #include "torvane/animation/ctrack.h"
 #include "torvane/layers/layer_object.h"
 #include "torvane/shaders/base_shader.h"
@@ -96,13 +97,28 @@ struct ChunkFields<BaseList2D>
   template <class Visitor>
   static Bool VisitHeader(BaseList2D& node, Visitor& v)
   {
+    VisitHeaderStart(node, v);
+    if (v.VersionBelow(kVersionNodeHeader))
+      return v.Good();
+    v.String(node.name_);
+    return VisitHeaderRest(node, v);
+  }
+
+  // What stands in front of the name.
+  template <class Visitor>
+  static Bool VisitHeaderStart(BaseList2D& node, Visitor& v)
+  {
     v.LongInto(node.info_);
     v.ConstantLong(0);
     if (v.VersionBelow(kVersionNodeHeader))
       return v.Good();
     v.Container(node.data_);
-    v.Goal(node.goal_);
-    v.String(node.name_);
+    return v.Goal(node.goal_);
+  }
+
+  template <class Visitor>
+  static Bool VisitHeaderRest(BaseList2D& node, Visitor& v)
+  {
     if (v.Level() >= 1) {
       const BaseContainer* parameters = node.Extra().dynamicParameters;
       Long present = parameters && parameters->GetCount() > 0 ? 1 : 0;
@@ -142,6 +158,34 @@ struct ChunkFields<BaseList2D>
     return v.Good();
   }
 };
+
+// Takes the stretches of the header that are as in most nodes in one piece each; the second of them ends behind the
+// chunk of node bits.
+Bool BaseList2D::ReadHeader(HyperFile& file, Long level)
+{
+  const NodeRecord* record = level == kLevelNodeHeader && file.MayHoldRecords() ? NodeRecord::Get() : nullptr;
+  using Fields = ChunkFields<BaseList2D>;
+  if (!record)
+    return ReadChunkBody(file, level, [this](ChunkReader& v) { return Fields::VisitHeader(*this, v); });
+  ChunkReader v(file, level);
+  NodeRecord::Start start;
+  if (record->TakeStart(file, start)) {
+    info_ = start.info;
+    data_.Flush();
+    data_.SetId(start.containerId);
+  } else {
+    Fields::VisitHeaderStart(*this, v);
+  }
+  NodeRecord::Rest rest;
+  if (!v.String(name_) || !record->TakeRest(file, rest))
+    return Fields::VisitHeaderRest(*this, v) && file.SkipToEndChunk();
+  if (file.GetTranslator())
+    link_.ClearLink();
+  marker_ = rest.marker;
+  markerDrawn_ = true;
+  std::memcpy(nbits_, rest.nbits, sizeof nbits_);
+  return true;
+}
 
 Bool BaseList2D::SkipOneChunk(HyperFile& file)
 {
@@ -202,12 +246,9 @@ void BaseList2D::WriteChunks(HyperFile& file)
 
 Bool BaseList2D::ReadChunk(HyperFile& file, Long id, Long level)
 {
-  if (GeListNode::ReadChunk(file, id, level))
-    return true;
   switch (id) {
   case kChunkNodeHeader:
-    return ReadChunkBody(file, level,
-                         [this](ChunkReader& v) { return ChunkFields<BaseList2D>::VisitHeader(*this, v); });
+    return ReadHeader(file, level);
   case kChunkUniqueIds:
     return ReadUniqueIds(file);
   case kChunkShaders:
@@ -215,7 +256,7 @@ Bool BaseList2D::ReadChunk(HyperFile& file, Long id, Long level)
   case kChunkTracks:
     return ReadRoot(&Extras::tracks, file);
   default:
-    return false;
+    return GeListNode::ReadChunk(file, id, level);
   }
 }
 

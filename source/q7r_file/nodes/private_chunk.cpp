@@ -106,7 +106,8 @@ Bool PrivateChunk::EndLoopChunk(HyperFile& file, Loop& loop)
 Bool PrivateChunk::ReadOneChunk(HyperFile& file, Loop& loop)
 {
   UChar tag = 0;
-  if (!file.ReadValueHeader(tag))
+  ChunkPlace chunk;
+  if (!file.ReadHeaderOrStart(tag, chunk))
     return false;
   if (tag == kTagChunkEnd)
     return EndLoopChunk(file, loop);
@@ -114,10 +115,7 @@ Bool PrivateChunk::ReadOneChunk(HyperFile& file, Loop& loop)
     file.SetError(FILEERROR_CHUNK_STRUCTURE);
     return loop.End(false);
   }
-  Long id = 0;
-  Long level = 0;
-  if (!file.ReadChunkStart(id, level))
-    return false;
+  const auto [id, level] = chunk;
   if (EntersChunk(id)) {
     ++loop.inside;
     return true;

@@ -50,9 +50,14 @@ Bool RootList2D::Append(BaseList2D* node, Bool setListHead)
 {
   if (!Takes(*node))
     return false;
-  list_.InsertLast(node);
-  Enter(*node, setListHead);
+  Add(*node, setListHead);
   return true;
+}
+
+void RootList2D::Add(BaseList2D& node, Bool setListHead)
+{
+  list_.InsertLast(&node);
+  Enter(node, setListHead);
 }
 
 void RootList2D::Enter(BaseList2D& node, Bool setListHead)
@@ -189,8 +194,10 @@ Bool RootList2D::ReadMember(HyperFile& file, BaseList2D* member, Bool setListHea
     return false;
   }
   NodeSink* sink = GetSink();
-  if (!sink)
-    return Append(member, setListHead);
+  if (!sink) {
+    Add(*member, setListHead);
+    return true;
+  }
   sink->Take(*member);
   *PassedOn() = true;
   DeleteObj(member);

@@ -79,8 +79,6 @@ Bool BaseObject::ReadObjectData(HyperFile& file, Long id, Long level)
 
 Bool BaseObject::ReadChunk(HyperFile& file, Long id, Long level)
 {
-  if (BaseList4D::ReadChunk(file, id, level))
-    return true;
   switch (id) {
   case kChunkList:
     return !GetChildRoot() || children_->ReadChunks(file, false);
@@ -91,6 +89,8 @@ Bool BaseObject::ReadChunk(HyperFile& file, Long id, Long level)
   case kChunkNodeData:
     return ReadObjectData(file, id, level);
   default:
+    if (BaseList4D::ReadChunk(file, id, level))
+      return true;
     break;
   }
   // Polygon objects keep their own chunks beside the others.

@@ -1,5 +1,6 @@
 // The transform of an object in a file, with how the editor shows it.
 #include "k2v_file/stream/chunk_visitor.h"
+#include "q7r_file/objects/transform_record.h"
 #include "torvane/document/base_document.h"
 #include "torvane/hooks.h"
 #include "torvane/nodes/node_sink.h"
@@ -161,9 +162,31 @@ void BaseObject::WriteTransform(HyperFile& file)
              [this](ChunkWriter& v) { return ChunkFields<BaseObject>::VisitTransform(*this, v); });
 }
 
+// The chunk of an object without anything unusual, in one piece. False if it is another one.
+Bool BaseObject::ReadPlainTransform(HyperFile& file, Long level)
+{
+  const Bool isCurrent = level == kLevelTransform && file.MayHoldRecords();
+  const TransformRecord* record = isCurrent ? TransformRecord::Get() : nullptr;
+  TransformRecord::Fields fields;
+  if (!record || !record->Take(file, fields))
+    return false;
+  const auto& [vectors, numbers] = fields;
+  relPos_ = vectors[0];
+  relScale_ = vectors[1];
+  relRot_ = vectors[2];
+  editorMode_ = numbers[0];
+  renderMode_ = numbers[1];
+  disabled_ = numbers[2];
+  rotationOrder_ = numbers[3];
+  frozenFlags_ = 0;
+  SetDisplay(kPlainDisplay);
+  return true;
+}
+
 Bool BaseObject::ReadTransform(HyperFile& file, Long level)
 {
-  ReadChunkBody(file, level, [this](ChunkReader& v) { return ChunkFields<BaseObject>::VisitTransform(*this, v); });
+  if (!ReadPlainTransform(file, level))
+    ReadChunkBody(file, level, [this](ChunkReader& v) { return ChunkFields<BaseObject>::VisitTransform(*this, v); });
   const Bool hasOrder = file.GetFileVersion() >= kVersionTransform && level >= 8;
   const Long order = hasOrder ? rotationOrder_ : kRotationOrderScene;
   turnedIn_ = order;

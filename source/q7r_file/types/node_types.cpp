@@ -195,8 +195,29 @@ constexpr Bool IsAscending()
 }
 static_assert(IsAscending(), "the search halves the table");
 
+// The rows of the numbers that most nodes have, by number.
+struct RowsByNumber
+{
+  static constexpr Long kFirst = 5100;
+  static constexpr Long kLast = 5699;
+
+  const NodeType* rows[kLast - kFirst + 1] = {};
+
+  constexpr RowsByNumber()
+  {
+    for (const NodeType& row : kNodeTypes) {
+      for (Long number = std::max(row.first, kFirst); number <= std::min(row.last, kLast); ++number)
+        rows[number - kFirst] = &row;
+    }
+  }
+};
+
+constexpr RowsByNumber kRowsByNumber;
+
 const NodeType* FindRow(Long number)
 {
+  if (number >= RowsByNumber::kFirst && number <= RowsByNumber::kLast)
+    return kRowsByNumber.rows[number - RowsByNumber::kFirst];
   const NodeType* row = std::lower_bound(std::begin(kNodeTypes), std::end(kNodeTypes), number,
                                          [](const NodeType& each, Long wanted) { return each.last < wanted; });
   return row != std::end(kNodeTypes) && row->first <= number ? row : nullptr;

@@ -1,0 +1,99 @@
+#include "q7r_file/nodes/node_record.h"
+
+#include <cstring>
+
+#include "k2v_file/stream/learned_once.h"
+#include "k2v_file/stream/value_forms.h"
+
+namespace _torvane_
+{
+
+namespace
+{
+
+// Texts and numbers like no other in a node.
+constexpr UniChar kNameMark[] = {0xA1B2, 0xC3D4, 0xE5F6, 0xA7B8};
+constexpr ULong kNumberMark = 0x5AC3E200; // with the number of the field in the low byte
+constexpr UChar kByteMark = 0xA0;
+
+// A node whose fields can be set.
+class MarkedNode : public BaseList2D
+{
+ public:
+  void Set(const NodeRecord::Start& start, const NodeRecord::Rest& rest)
+  {
+    info_ = start.info;
+    data_.SetId(start.containerId);
+    name_ = String::Constant(kNameMark);
+    marker_ = rest.marker;
+    markerDrawn_ = true;
+    std::memcpy(nbits_, rest.nbits, sizeof nbits_);
+  }
+};
+
+} // namespace
+
+const NodeRecord* NodeRecord::Get() { return GetLearned<NodeRecord>(); }
+
+Bool NodeRecord::Learn()
+{
+  const Start start = {kNumberMark, static_cast<Long>(kNumberMark + 1)};
+  Rest rest = {{}, {kNumberMark + 2, kNumberMark + 3, kNumberMark + 4, kNumberMark + 5}};
+  for (UChar& byte : rest.marker.bytes)
+    byte = static_cast<UChar>(kByteMark + (&byte - rest.marker.bytes));
+  MarkedNode sample;
+  MarkedNode copy;
+  sample.Set(start, rest);
+  return record_.Learn(sample, copy, kObjectGeneric) && FindFields(start, rest);
+}
+
+Bool NodeRecord::FindFields(const Start& start, const Rest& rest)
+{
+  UChar name[sizeof kNameMark];
+  for (std::size_t i = 0; i < std::size(kNameMark); ++i)
+    bytes::PutBig(name + 2 * i, kNameMark[i]);
+  const LLong namePlace = record_.TakeField(name, sizeof name);
+  start_ = {record_.FindChunk(kChunkNodeHeader), namePlace - StoredSize(kTagString)};
+  rest_ = {namePlace + static_cast<LLong>(sizeof name), record_.GetSize() - StoredSize(kTagChunkEnd), 1};
+  Bool found = namePlace >= 0 && start_.from >= 0;
+  const auto find = [&](const void* mark, LLong size, const RecordPart& part) {
+    const LLong place = record_.TakeField(mark, size);
+    found = found && place >= part.from && place + size <= part.to;
+    return place - part.from;
+  };
+  const auto findNumber = [&](ULong mark, const RecordPart& part) {
+    UChar number[sizeof mark];
+    bytes::PutBig(number, mark);
+    return find(number, sizeof number, part);
+  };
+  info_ = findNumber(start.info, start_);
+  containerId_ = findNumber(static_cast<ULong>(start.containerId), start_);
+  for (std::size_t i = 0; i < std::size(nbits_); ++i)
+    nbits_[i] = findNumber(rest.nbits[i], rest_);
+  marker_ = find(rest.marker.bytes, sizeof rest.marker.bytes, rest_);
+  return found;
+}
+
+Bool NodeRecord::TakeStart(HyperFile& file, Start& start) const
+{
+  const UChar* place = file.NextRecord(record_, start_);
+  if (!place)
+    return false;
+  start = {bytes::GetBig<ULong>(place + info_), static_cast<Long>(bytes::GetBig<ULong>(place + containerId_))};
+  file.PassRecord(record_, start_);
+  return true;
+}
+
+Bool NodeRecord::TakeRest(HyperFile& file, Rest& rest) const
+{
+  const UChar* place = file.NextRecord(record_, rest_);
+  if (!place)
+    return false;
+  std::memcpy(rest.marker.bytes, place + marker_, sizeof rest.marker.bytes);
+  for (std::size_t i = 0; i < std::size(nbits_); ++i)
+    rest.nbits[i] = bytes::GetBig<ULong>(place + nbits_[i]);
+  file.PassRecord(record_, rest_);
+  return true;
+}
+
+} // namespace _torvane_

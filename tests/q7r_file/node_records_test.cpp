@@ -1,0 +1,132 @@
+// Nodes that are read in prepared stretches against the general way.
+#include "support/full_scene.h"
+#include "torvane/memory/owned.h"
+#include "torvane/stream/prepared_record.h"
+#include "torvane/tags/texture_tag.h"
+#include "torvane/time/reproducible_run.h"
+
+namespace
+{
+
+using namespace _torvane_;
+using FileBytes = std::vector<std::uint8_t>;
+using ObjectPtr = Owned<BaseObject>;
+
+class NodeRecords : public testing::Test
+{
+ protected:
+  ~NodeRecords() override { PreparedRecord::SetEnabled(true); }
+};
+
+// Children with a texture tag each, of which every one has something that another one lacks.
+ObjectPtr MakeTree(Long count)
+{
+  const ReproducibleRun run(1, DateTime()); // each of them has the same link numbers and markers
+  ObjectPtr root(AllocObject(kObjectNull));
+  for (Long i = 0; i < count; ++i) {
+    BaseObject* object = AllocObject(i % 8 == 7 ? kObjectCamera : kObjectNull);
+    object->InsertUnderLast(root.get());
+    object->SetName(i % 4 == 1 ? String() : String("object"));
+    object->SetRelPos(Vector(i, 0.5, -i));
+    object->SetRotationOrder(i % 7);
+    auto* tag = static_cast<TextureTag*>(object->MakeTag(kTagTexture));
+    tag->GetDataInstance().SetLink(kTextureMaterial, i % 2 ? root.get() : nullptr);
+    tag->GetDataInstance().SetLong(kTextureProjection, i % 3);
+    if (i % 5 == 2)
+      object->SetFrozenPos(Vector(1, 2, 3));
+    if (i % 5 == 3)
+      object->SetParameterById(kObjectDisplayColor, GeData(Vector(0, 1, 0)));
+    if (i % 5 == 4) {
+      object->AddDynamicParameter(MakeDynamicSettings(kDataReal, "number"));
+      object->AddUniqueID(7, "seven", 5);
+      object->GetLinkInstance().SetLink(root.get());
+      object->ChangeNBit(i, 1);
+    }
+  }
+  return root;
+}
+
+FileBytes BytesOfTree(BaseObject& root, Bool withHeader = false)
+{
+  return WriteToMemory([&](HyperFile& file) { root.WriteAsChunk(file, kObjectGeneric); }, withHeader);
+}
+
+// What is told of a reading, and what was read.
+auto ReadOnto(const FileBytes& bytes, Bool generally, BaseObject& target)
+{
+  const ReproducibleRun run(2, DateTime());
+  PreparedRecord::SetEnabled(!generally);
+  MemoryReadFile memory(bytes);
+  UChar tag = 0;
+  Long id = 0;
+  Long level = 0;
+  memory.file.ReadValueHeader(tag);
+  memory.file.ReadChunkStart(id, level);
+  const Bool read = target.ReadChunkLoop(memory.file, true);
+  const FileProblem problem = memory.file.GetProblem();
+  const Long depth = memory.file.GetChunkDepth();
+  memory.file.Close(); // links that lead nowhere become empty
+  PreparedRecord::SetEnabled(true);
+  return std::tuple(read, depth, problem.code, problem.position, problem.depth,
+                    std::vector<Long>(std::begin(problem.chunks), std::end(problem.chunks)), BytesOfTree(target));
+}
+
+void ExpectSame(const FileBytes& bytes)
+{
+  const ObjectPtr targets[] = {ObjectPtr(AllocObject(kObjectNull)), ObjectPtr(AllocObject(kObjectNull))};
+  ASSERT_TRUE(ReadOnto(bytes, false, *targets[0]) == ReadOnto(bytes, true, *targets[1]));
+}
+
+} // namespace
+
+TEST_F(NodeRecords, AreReadAsInTheGeneralWayWholeAndDamaged)
+{
+  const FileBytes tree = BytesOfTree(*MakeTree(40), true);
+  ASSERT_NO_FATAL_FAILURE(ExpectSame(tree));
+  const FileBytes bytes = BytesOfTree(*MakeTree(1), true);
+  for (std::size_t place = 22; place < bytes.size(); ++place) {
+    SCOPED_TRACE(place);
+    ASSERT_NO_FATAL_FAILURE(ExpectSame({bytes.begin(), bytes.begin() + static_cast<std::ptrdiff_t>(place)}));
+    for (const int change : {0x01, 0x02, 0x80}) {
+      FileBytes damaged = bytes;
+      damaged[place] = static_cast<std::uint8_t>(damaged[place] ^ change);
+      ASSERT_NO_FATAL_FAILURE(ExpectSame(damaged));
+    }
+  }
+}
+
+// What an object had before is gone, or stays, alike.
+TEST_F(NodeRecords, AreReadOntoNodesThatHaveContent)
+{
+  const FileBytes plain = BytesOfTree(*MakeTree(1), true);
+  for (Long other = 0; other < 8; ++other) {
+    const ObjectPtr trees[] = {MakeTree(8), MakeTree(8)};
+    BaseObject* targets[] = {trees[0]->GetDown(), trees[1]->GetDown()};
+    for (Long i = 0; i < other; ++i) {
+      targets[0] = targets[0]->GetNext();
+      targets[1] = targets[1]->GetNext();
+    }
+    ASSERT_TRUE(ReadOnto(plain, false, *targets[0]) == ReadOnto(plain, true, *targets[1])) << other;
+  }
+}
+
+TEST_F(NodeRecords, TellProgressAtTheSamePlaces)
+{
+  const FileBytes bytes = BytesOfTree(*MakeTree(2000), true);
+  std::vector<Long> told[2];
+  for (const bool generally : {false, true}) {
+    PreparedRecord::SetEnabled(!generally);
+    MemoryReadFile memory(bytes);
+    memory.file.SetReadProgress(
+        [](Long number, void* list) { static_cast<std::vector<Long>*>(list)->push_back(number); }, &told[generally]);
+    const ObjectPtr root(AllocObject(kObjectNull));
+    UChar tag = 0;
+    Long id = 0;
+    Long level = 0;
+    memory.file.ReadValueHeader(tag);
+    memory.file.ReadChunkStart(id, level);
+    EXPECT_TRUE(root->ReadChunkLoop(memory.file, true));
+  }
+  EXPECT_GE(told[0].size(), 50U);
+  EXPECT_EQ(told[0], told[1]);
+}
