@@ -73,27 +73,9 @@ struct PrivateChunk::Loop
   }
 };
 
-Bool PrivateChunk::ReadChunkLoop(HyperFile& file, Bool keepGoing, Bool)
-{
-  if (file.GetError() != FILEERROR_NONE)
-    return false;
-  LoopScope scope(file, *this);
-  if (!scope.Entered())
-    return false;
-  Loop loop{keepGoing};
-  do {
-    ReadOneChunk(file, loop);
-    if (loop.finished)
-      return loop.result;
-  } while (file.GetError() == FILEERROR_NONE && file.GetPosition() < file.GetLength());
-  // A loop that merely met the end of the file leaves the error clear.
-  if (file.GetError() != FILEERROR_NONE)
-    file.SetError(FILEERROR_PREMATURE_END);
-  return false;
-}
-
-// An end mark: that of a chunk that the loop had entered, or that of the loop.
-Bool PrivateChunk::EndLoopChunk(HyperFile& file, Loop& loop)
+// An end mark: that of a chunk that the loop had entered, or that of the loop. It is inline, as what follows, since a
+// scene holds little else than small chunks.
+inline Bool PrivateChunk::EndLoopChunk(HyperFile& file, Loop& loop)
 {
   const Bool read = file.ReadChunkEndMark();
   if (loop.inside == 0 || !read)
@@ -103,7 +85,7 @@ Bool PrivateChunk::EndLoopChunk(HyperFile& file, Loop& loop)
 }
 
 // One round of the loop.
-Bool PrivateChunk::ReadOneChunk(HyperFile& file, Loop& loop)
+inline Bool PrivateChunk::ReadOneChunk(HyperFile& file, Loop& loop)
 {
   UChar tag = 0;
   ChunkPlace chunk;
@@ -135,6 +117,25 @@ Bool PrivateChunk::ReadOneChunk(HyperFile& file, Loop& loop)
   if (EndsPartialLoad(file, id, level))
     return loop.End(true);
   return file.HasMemory() || loop.End(false);
+}
+
+Bool PrivateChunk::ReadChunkLoop(HyperFile& file, Bool keepGoing, Bool)
+{
+  if (file.GetError() != FILEERROR_NONE)
+    return false;
+  LoopScope scope(file, *this);
+  if (!scope.Entered())
+    return false;
+  Loop loop{keepGoing};
+  do {
+    ReadOneChunk(file, loop);
+    if (loop.finished)
+      return loop.result;
+  } while (file.GetError() == FILEERROR_NONE && file.GetPosition() < file.GetLength());
+  // A loop that merely met the end of the file leaves the error clear.
+  if (file.GetError() != FILEERROR_NONE)
+    file.SetError(FILEERROR_PREMATURE_END);
+  return false;
 }
 
 // Reads the start of a chunk; an end mark passes.
