@@ -38,8 +38,8 @@ void AskForLargePages(std::uintptr_t start, std::uintptr_t end)
 
 // How far the heap of small blocks may grow before it gets large pages: most programs need no more. Later it grows by
 // steps, and not by the usual 132 KiB, into which no large page fits.
-constexpr std::uintptr_t kPlainHeap = 3 * kLargePage;
-constexpr std::uintptr_t kHeapStep = 8 * kLargePage;
+constexpr std::uintptr_t kPlainHeap = kLargePage;
+constexpr std::uintptr_t kHeapStep = 16 * kLargePage;
 
 // Where the part of the heap ends that was looked after; 0 before the first block.
 std::atomic<std::uintptr_t> gHeapEnd{0};
