@@ -21,6 +21,7 @@ bool IsWindowsPath(const std::string& path)
   return hasDrive || path.starts_with("\\\\");
 }
 
+// Data inside of a composition file have the item's id in the place of a path.
 bool HasPath(const host::Item& item)
 {
   return item.kind == host::ItemKind::kFootage && !item.path.empty() && item.path != item.id;

@@ -320,8 +320,4 @@ Bool GeFExist(const Filename& name, Bool directory = false);
 // True when a file exists under that name: what the exporter asks before it replaces one.
 inline Bool GeFileExists(const Filename& name) { return GeFExist(name, false); }
 
-// True when `name` holds a scene file: its first number is one of the six magics and its second the scene ident.
-// `flags` without bit 1 gives false. The file is closed in any case.
-Bool IdentifyFile(const Filename& name, ULong flags);
-
 } // namespace _torvane_

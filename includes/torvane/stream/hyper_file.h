@@ -40,6 +40,10 @@ inline constexpr ULong kBugsIdent = FourCharacters("bugs");         // asks a wr
 // True for one of the six numbers that a file may begin with.
 Bool IsFileMagic(ULong magic);
 
+// True when `name` holds a scene file: its first number is one of the six magics and its second the scene ident.
+// `flags` without bit 1 gives false. The file is closed in any case.
+Bool IdentifyFile(const Filename& name, ULong flags);
+
 // What opens each value.
 enum ValueTag : UChar
 {

@@ -1,6 +1,5 @@
 #include "k2v_file/bytes/disk_file.h"
 #include "torvane/bytes/base_file.h"
-#include "torvane/stream/hyper_file.h"
 
 namespace _torvane_
 {
@@ -29,18 +28,6 @@ Bool GeFExist(const Filename& name, Bool directory)
     return LookUpDrive(path) == PathKind::kDirectory;
 #endif
   return LookUpPath(path) == (directory ? PathKind::kDirectory : PathKind::kFile);
-}
-
-Bool IdentifyFile(const Filename& name, ULong flags)
-{
-  constexpr ULong kIdentifyScenes = 1;
-  if ((flags & kIdentifyScenes) == 0)
-    return false;
-  BaseFile file;
-  ULong magic = 0;
-  ULong ident = 0;
-  return file.Open(name, kFileRead) && file.GetLength() > 0 && file.ReadULong(magic) && file.ReadULong(ident) &&
-         IsFileMagic(magic) && ident == kSceneIdent;
 }
 
 } // namespace _torvane_

@@ -28,4 +28,16 @@ const FileMagic* FindFileMagic(ULong number)
 
 Bool IsFileMagic(ULong magic) { return FindFileMagic(magic) != nullptr; }
 
+Bool IdentifyFile(const Filename& name, ULong flags)
+{
+  constexpr ULong kIdentifyScenes = 1;
+  if ((flags & kIdentifyScenes) == 0)
+    return false;
+  BaseFile file;
+  ULong magic = 0;
+  ULong ident = 0;
+  return file.Open(name, kFileRead) && file.GetLength() > 0 && file.ReadULong(magic) && file.ReadULong(ident) &&
+         IsFileMagic(magic) && ident == kSceneIdent;
+}
+
 } // namespace _torvane_

@@ -11,21 +11,10 @@ using namespace _torvane_;
 namespace
 {
 
-void TellNumbers(ValueSink& sink, const Real* numbers, Long count)
-{
-  NumberRows rows;
-  rows.entries = numbers;
-  rows.count = count;
-  rows.whole = false;
-  rows.lasts = true;
-  rows.get = [](const void* all, long long index, double* row) { *row = static_cast<const Real*>(all)[index]; };
-  sink.Rows(rows);
-}
-
 void TellNumbers(ValueSink& sink, const char* name, const GeTempDynArray<Real>& numbers)
 {
   sink.Key(name);
-  TellNumbers(sink, numbers.Data(), numbers.GetCount());
+  TellReals(sink, numbers.Data(), numbers.GetCount(), true);
 }
 
 } // namespace
@@ -49,7 +38,7 @@ void TellIES(ValueSink& sink, const IESLight& light)
   sink.Key("candela");
   sink.BeginArray();
   for (Long i = 0; light.IsComplete() && i < light.GetHorizontalCount(); ++i)
-    TellNumbers(sink, light.candela.Data() + i * light.GetVerticalCount(), light.GetVerticalCount());
+    TellReals(sink, light.candela.Data() + i * light.GetVerticalCount(), light.GetVerticalCount(), true);
   sink.EndArray();
   sink.Member("maxCandela", light.maxCandela);
   sink.Member("totalFlux", light.GetTotalFlux());

@@ -19,18 +19,6 @@ using namespace _torvane_;
 namespace
 {
 
-void GetReals(const void* entries, long long index, double* row) { *row = static_cast<const Real*>(entries)[index]; }
-
-void TellReals(ValueSink& sink, const Real* numbers, int count)
-{
-  NumberRows rows;
-  rows.entries = numbers;
-  rows.count = count;
-  rows.whole = false;
-  rows.get = GetReals;
-  sink.Rows(rows);
-}
-
 // The ids of a container that came already. They ascend nearly always: then there is nothing to remember.
 class SeenIds
 {
@@ -150,6 +138,17 @@ std::string HexText(unsigned long long number)
   for (auto place = text.rbegin(); place != text.rend(); ++place, number >>= 4)
     *place = kDigits[number & 15];
   return text;
+}
+
+void TellReals(ValueSink& sink, const Real* numbers, long long count, bool lasts)
+{
+  NumberRows rows;
+  rows.entries = numbers;
+  rows.count = count;
+  rows.whole = false;
+  rows.lasts = lasts;
+  rows.get = [](const void* all, long long index, double* row) { *row = static_cast<const Real*>(all)[index]; };
+  sink.Rows(rows);
 }
 
 void Tell(ValueSink& sink, const Vector& vector)

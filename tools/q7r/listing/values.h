@@ -10,6 +10,8 @@
 namespace q7r
 {
 
+// Plain numbers; `lasts` as in NumberRows.
+void TellReals(ValueSink& sink, const _torvane_::Real* numbers, long long count, bool lasts = false);
 // Vectors and matrices are arrays of numbers, a time is its numerator and denominator.
 void Tell(ValueSink& sink, const _torvane_::Vector& vector);
 void Tell(ValueSink& sink, const _torvane_::Matrix& matrix);
