@@ -44,7 +44,25 @@ inline constexpr ULong kFrozenPos = 2;
 inline constexpr ULong kFrozenRot = 4;
 inline constexpr ULong kFrozenScale = 8;
 
-class BaseObject : public BaseList4D
+// Where an object stands in its parent, what of that is frozen, and whether it shows: a copy takes it over in one
+// piece.
+class ObjectPlacement
+{
+ protected:
+  static constexpr Long kNotTurned = -1;
+
+  Vector relPos_;
+  Vector relRot_;
+  Vector relScale_ = Vector(1.0, 1.0, 1.0);
+  Long rotationOrder_ = kRotationOrderScene;
+  Long turnedIn_ = kNotTurned; // the order in which `relRot_` turns the object; kNotTurned: it doesn't
+  Long editorMode_ = kObjectModeUndefined;
+  Long renderMode_ = kObjectModeUndefined;
+  Long disabled_ = 0;
+  ULong frozenFlags_ = 0;
+};
+
+class BaseObject : public BaseList4D, protected ObjectPlacement
 {
  public:
   static constexpr NodeKindOf<BaseObject> kNodeKind{"object", &BaseList4D::kNodeKind};
@@ -177,19 +195,10 @@ class BaseObject : public BaseList4D
     RootObject* lists[2] = {};
   };
 
-  RawChunkBody raw_; // of the chunk kChunkNodeData, when there is no object data
-  Vector relPos_;
-  Vector relRot_;
-  Vector relScale_ = Vector(1.0, 1.0, 1.0);
+  RawChunkBody raw_;               // of the chunk kChunkNodeData, when there is no object data
   FrozenPart* frozen_ = nullptr;   // owned; made with the first frozen value
   DisplayPart* display_ = nullptr; // owned; made with the first value that isn't the default
-  ULong frozenFlags_ = 0;
-  Long rotationOrder_ = kRotationOrderScene;
   RootTag tags_;
-  Long editorMode_ = kObjectModeUndefined;
-  Long renderMode_ = kObjectModeUndefined;
-  Long disabled_ = 0;
-  Long turnedIn_ = kNotTurned;         // the order in which `relRot_` turns the object; kNotTurned: it doesn't
   LegacyLists* legacyLists_ = nullptr; // owned; made when an old file has one
   NodeData* objectData_ = nullptr;     // owned
 
@@ -204,8 +213,6 @@ class BaseObject : public BaseList4D
   struct VectorParameter;
   static const LongParameter kLongParameters[];
   static const VectorParameter kVectorParameters[];
-
-  static constexpr Long kNotTurned = -1;
 
   Bool IsProtected() const { return GetTag(kTagProtection) != nullptr; }
   Bool HasFrozenTransform() const { return (frozenFlags_ & (kFrozenPos | kFrozenRot | kFrozenScale)) != 0; }

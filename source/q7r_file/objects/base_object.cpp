@@ -187,14 +187,6 @@ Bool BaseObject::CopyObjectData(BaseObject& destination, ULong flags, TransArray
 // False when memory is short: the destination then holds a part.
 Bool BaseObject::CopyTransform(BaseObject& destination) const
 {
-  destination.editorMode_ = editorMode_;
-  destination.renderMode_ = renderMode_;
-  destination.disabled_ = disabled_;
-  destination.turnedIn_ = turnedIn_;
-  destination.relPos_ = relPos_;
-  destination.relRot_ = relRot_;
-  destination.relScale_ = relScale_;
-  destination.rotationOrder_ = rotationOrder_;
   if (!frozen_) {
     DeleteObj(destination.frozen_);
   } else {
@@ -203,7 +195,7 @@ Bool BaseObject::CopyTransform(BaseObject& destination) const
       return false;
     *part = *frozen_;
   }
-  destination.frozenFlags_ = frozenFlags_;
+  static_cast<ObjectPlacement&>(destination) = *this;
   return destination.SetDisplay(Display());
 }
 
