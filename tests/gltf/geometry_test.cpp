@@ -149,7 +149,8 @@ TEST_F(GltfGeometry, SplinesAreLines)
   document->InsertObject(curve);
   for (Long i = 0; i < 5; ++i)
     GetPointTag(*curve)->GetArray()[i] = Vector(100 * i, 0, 0);
-  GetTangentTag(*curve)->GetArray()[0].right = Vector(0, 100, 0);
+  for (const Long bent : {0, 3}) // the second closes its loop
+    GetTangentTag(*curve)->GetArray()[bent].right = Vector(0, 100, 0);
   GetSegmentTag(*curve)->GetArray()[0] = {2, 0};
   GetSegmentTag(*curve)->GetArray()[1] = {2, 1};
   GetSegmentTag(*curve)->GetArray()[2] = {1, 0};
@@ -164,7 +165,9 @@ TEST_F(GltfGeometry, SplinesAreLines)
   ASSERT_EQ(line.size(), 3U * 17);
   // Half way: a quarter of both ends, and three eighths of each control point.
   ExpectNear(std::vector<double>(line.begin() + 24, line.begin() + 27), {0.5, 0.375, 0}, 1e-6);
-  EXPECT_EQ(scene.Numbers(scene.Primitive("curve", 1)["attributes"]["POSITION"]).size(), 6U);
+  const std::vector<double> loop = scene.Numbers(scene.Primitive("curve", 1)["attributes"]["POSITION"]);
+  ASSERT_EQ(loop.size(), 3U * 17);
+  ExpectNear(std::vector<double>(loop.begin() + 27, loop.begin() + 30), {2.5, 0.375, 0}, 1e-6);
   EXPECT_EQ(scene.Numbers(scene.Primitive("other")["attributes"]["POSITION"]).size(), 9U);
   EXPECT_EQ(scene.Lost(Loss::kSplineType), 1U);
 }

@@ -178,11 +178,12 @@ TEST(StringEncoding, WritesEachCharacterInTheFormOfItsEncoding)
 TEST(StringEncoding, NeverWritesPastATinyBuffer)
 {
   const std::tuple<StringEncoding, std::u16string, Long, std::string> rows[] = {
-      {STRINGENCODING_UTF8, u"\u00E9", 2, ""},       {STRINGENCODING_UTF8, u"\u00E9", 3, "\xC3\xA9"},
-      {STRINGENCODING_UTF8, u"\u00E9x", 2, "x"},     {STRINGENCODING_UTF8, u"\u4E2Dab", 3, "ab"},
-      {STRINGENCODING_ESCAPED, u"\u00E9b", 3, "_b"}, {STRINGENCODING_ESCAPED, u"\u00E9b", 7, "\\u00E9"},
-      {STRINGENCODING_XML, u"\u00E9", 8, "_"},       {STRINGENCODING_XML, u"\u00E9", 9, "&#x00E9;"},
-      {STRINGENCODING_DEFAULT, u"abcd", 3, "ab"},    {STRINGENCODING_DEFAULT, u"abcd", 1, ""},
+      {STRINGENCODING_UTF8, u"\u00E9", 2, ""},         {STRINGENCODING_UTF8, u"\u00E9", 3, "\xC3\xA9"},
+      {STRINGENCODING_UTF8, u"\u00E9x", 2, "x"},       {STRINGENCODING_UTF8, u"\u4E2Dab", 3, "ab"},
+      {STRINGENCODING_UTF8, u"\u07FF", 3, "\xDF\xBF"}, {STRINGENCODING_UTF8, u"\u0800", 4, "\xE0\xA0\x80"},
+      {STRINGENCODING_ESCAPED, u"\u00E9b", 3, "_b"},   {STRINGENCODING_ESCAPED, u"\u00E9b", 7, "\\u00E9"},
+      {STRINGENCODING_XML, u"\u00E9", 8, "_"},         {STRINGENCODING_XML, u"\u00E9", 9, "&#x00E9;"},
+      {STRINGENCODING_DEFAULT, u"abcd", 3, "ab"},      {STRINGENCODING_DEFAULT, u"abcd", 1, ""},
   };
   for (const auto& [encoding, text, size, bytes] : rows) {
     std::vector<char> buffer(static_cast<std::size_t>(size)); // exact, so that an overrun is seen

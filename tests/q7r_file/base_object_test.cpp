@@ -178,7 +178,8 @@ TEST(BaseObject, PolygonChunksStandBesideTheTransformAndReachTheData)
   for (const auto& [type, beside] : {std::tuple<Long, bool>{kObjectPolygon, true}, {kObjectJoint, false}}) {
     BaseObject object(type);
     auto* data = NewObj<PolygonLikeData>();
-    object.SetObjectData(data);
+    for (int i = 0; i < 2; ++i)
+      object.SetObjectData(data); // the second time nothing changes
     EXPECT_EQ(object.GetDiskType(), kObjectPolygonLabel);
     const std::string hex = ToHex(BytesOf(object));
     const std::size_t place = hex.find(own);
@@ -343,8 +344,10 @@ TEST(BaseObject, ClonesTakeTagsTransformAndChildrenAlong)
   EXPECT_FALSE(clone->GetBit(2));
 
   BaseObject other(kObjectCamera);
-  EXPECT_TRUE(BaseObject(kObjectNull).CopyTo(other, 0, nullptr));
-  EXPECT_EQ(CountReports(), 1) << "a copy onto another type";
+  for (const ULong flags : {kCopyNoBranches, kCopyNoGoal}) {
+    EXPECT_TRUE(BaseObject(kObjectNull).CopyTo(other, flags, nullptr));
+    EXPECT_EQ(CountReports(), flags == kCopyNoBranches ? 0 : 1) << "a copy onto another type";
+  }
   DeleteObj(clone);
   DeleteObj(source);
 }

@@ -123,6 +123,7 @@ TEST(Tree, ShowsLightsCamerasAndViews)
   BaseObject* measured = eye->GetNext();
   BaseObject* spot = measured->GetNext();
   document->SetSceneCamera(eye);
+  eye->SetParameterById(kCameraApertureWidth, GeData(18.0));
   spot->SetParameterById(kLightType, GeData(static_cast<Long>(kLightSpot)));
   spot->SetParameterById(kLightShadow, GeData(Long{1}));
   spot->SetParameterById(kLightShadowDensity, GeData(0.4));
@@ -135,7 +136,7 @@ TEST(Tree, ShowsLightsCamerasAndViews)
 
   const RunResult text = RunQ7r("tree " + Quoted(path));
   EXPECT_EQ(text.status, 0) << text.err;
-  ExpectParts(text.out, {"perspective, focal length 36 mm, aperture 36 mm, field of view 53.1301 degrees, focus 2000",
+  ExpectParts(text.out, {"perspective, focal length 36 mm, aperture 18 mm, field of view 28.0725 degrees, focus 2000",
                          "spot, color (1, 1, 1), intensity 100 %, shadow 40 %, inner 0 degrees, outer 30 degrees",
                          "measured, color (1, 1, 1), intensity 100 %, distribution \"Disc \"A\"\", output 125664 lm "
                          "times the power in watts",
