@@ -283,9 +283,13 @@ TEST(BaseObject, HandsItsDocumentToAllThatItHolds)
 
 TEST(BaseObject, MakesTheTypesOfItsTable)
 {
-  for (Long type : {5104, 5126, 5128, 5137, 5140, 5154, 5159, 5168, 5186, 1001003, 1011146, 1019363, 200000118}) {
+  const std::set<Long> opaque = {kObjectSky, kObjectCloudGroup, kObjectCloud, kObjectJoint, kObjectSkin};
+  std::set<Long> types = {5104, 5126, 5128, 5137, 5140, 5154, 5159, 5168, 5186, 1001003, 200000118};
+  types.insert(opaque.begin(), opaque.end());
+  for (Long type : types) {
     BaseObject* object = AllocObject(type);
     ASSERT_NE(object, nullptr) << type;
+    EXPECT_EQ(NodeCast<OpaqueObjectData>(object->GetObjectData()) != nullptr, opaque.contains(type)) << type;
     EXPECT_EQ(object->GetObjectData() == nullptr, type == kObjectGeneric) << type;
     if (object->GetObjectData()) {
       EXPECT_EQ(object->GetObjectData()->GetNode(), object) << type;

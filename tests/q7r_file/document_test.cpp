@@ -223,12 +223,16 @@ TEST(Document, TellsWhoMadeItAndWhen)
   EXPECT_EQ(text(kDocumentCreatorText), "Me (#7)");
   data.SetLong(kInfoCreatorId, 0);
   EXPECT_EQ(text(kDocumentCreatorText), "Me");
-  EXPECT_EQ(text(kDocumentSaveText), "none");
-  const Real day = GetJulianDay({2001, 2, 3, 4, 5, 6});
-  LLong bits = 0;
-  std::memcpy(&bits, &day, sizeof bits);
-  data.SetLLong(kInfoSaveDate, bits);
-  EXPECT_EQ(text(kDocumentSaveText), "2001/02/03 04:05:06");
+  for (const auto& [date, parameter, year] : {std::tuple<Long, Long, Long>{kInfoSaveDate, kDocumentSaveText, 2001},
+                                              {kInfoCreationDate, kDocumentCreationText, 1999}}) {
+    data.RemoveData(date);
+    EXPECT_EQ(text(parameter), "none");
+    const Real day = GetJulianDay({year, 2, 3, 4, 5, 6});
+    LLong bits = 0;
+    std::memcpy(&bits, &day, sizeof bits);
+    data.SetLLong(date, bits);
+    EXPECT_EQ(text(parameter), std::to_string(year) + "/02/03 04:05:06");
+  }
   EXPECT_FALSE(document->SetParameterById(kDocumentSaveText, GeData(String("no"))));
 }
 
