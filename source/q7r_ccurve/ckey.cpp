@@ -104,12 +104,7 @@ Bool CKey::CopyTo(PrivateChunk& destination, ULong flags, TransArray* translatio
     return false;
   if (!target->SetTime(time_))
     return false;
-  target->value_ = value_;
-  target->leftValue_ = leftValue_;
-  target->rightValue_ = rightValue_;
-  target->leftTime_ = leftTime_;
-  target->rightTime_ = rightTime_;
-  target->interpolation_ = interpolation_;
+  static_cast<KeyShape&>(*target) = *this;
   return target->keyData_.CopyFrom(keyData_, flags, translation) && BaseList2D::CopyTo(destination, flags, translation);
 }
 
@@ -216,17 +211,13 @@ void CKey::SetRight(const BaseTime& time, Real value)
 
 void CKey::Reset()
 {
-  value_ = leftValue_ = rightValue_ = 0.0;
-  leftTime_ = rightTime_ = BaseTime();
-  interpolation_ = kInterpolationSpline;
+  static_cast<KeyShape&>(*this) = KeyShape();
   keyData_.Free();
 }
 
 Bool CKey::IsEqual(const CKey& other) const
 {
-  return time_ == other.time_ && value_ == other.value_ && leftValue_ == other.leftValue_ &&
-         rightValue_ == other.rightValue_ && leftTime_ == other.leftTime_ && rightTime_ == other.rightTime_ &&
-         interpolation_ == other.interpolation_ && keyData_.IsEqual(other.keyData_);
+  return time_ == other.time_ && static_cast<const KeyShape&>(*this) == other && keyData_.IsEqual(other.keyData_);
 }
 
 Bool CKey::ToPlain(PlainKey& key) const

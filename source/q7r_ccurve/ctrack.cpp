@@ -232,13 +232,7 @@ Bool CTrack::CopyTo(PrivateChunk& destination, ULong flags, TransArray* translat
   }
   if (!trackLink_.CopyLinkTo(&target->trackLink_, translation))
     return false;
-  target->path_ = path_;
-  target->before_ = before_;
-  target->after_ = after_;
-  target->id_ = id_;
-  for (Long i = 0; i < kExtraNumbers; ++i)
-    target->extra_[i] = extra_[i];
-  target->kind_ = kind_;
+  static_cast<TrackSettings&>(*target) = *this;
   return !watch.Failed();
 }
 

@@ -32,7 +32,22 @@ inline constexpr ULong kKeyMaskAutomatic = 0x4000;  // tangents follow the neigh
 inline constexpr ULong kKeyMaskZeroValue = 0x10000; // the tangents' value parts are zero
 inline constexpr ULong kKeyMaskZero = 0x20000;      // the tangents are zero
 
-class CKey : public BaseList2D
+// What a key has besides its time and its data, which are copied, compared and reset in one piece.
+class KeyShape
+{
+ public:
+  bool operator==(const KeyShape&) const = default;
+
+ protected:
+  Real value_ = 0.0;
+  Real leftValue_ = 0.0;
+  Real rightValue_ = 0.0;
+  BaseTime leftTime_;
+  BaseTime rightTime_;
+  Long interpolation_ = kInterpolationSpline;
+};
+
+class CKey : public BaseList2D, protected KeyShape
 {
  public:
   static constexpr NodeKindOf<CKey> kNodeKind{"key", &BaseList2D::kNodeKind};
@@ -91,12 +106,6 @@ class CKey : public BaseList2D
   friend struct ChunkFields<CKey>;
 
   BaseTime time_;
-  Real value_ = 0.0;
-  Real leftValue_ = 0.0;
-  Real rightValue_ = 0.0;
-  BaseTime leftTime_;
-  BaseTime rightTime_;
-  Long interpolation_ = kInterpolationSpline;
   GeData keyData_;
 };
 

@@ -22,7 +22,21 @@ inline constexpr Long kTrackAfter = 911;
 inline constexpr Long kCurveFirst = 2; // numbers of the extra curves
 inline constexpr Long kCurveLast = 10;
 
-class CTrack : public BaseList2D
+// What a track has besides its curves and its link: a copy takes it over in one piece.
+class TrackSettings
+{
+ protected:
+  static constexpr Long kExtraNumbers = 4;
+
+  ParameterPath path_;
+  Long before_ = 1;
+  Long after_ = 1;
+  Long id_ = -1;
+  ULong extra_[kExtraNumbers] = {~0U, ~0U, ~0U, ~0U};
+  Long kind_ = 0;
+};
+
+class CTrack : public BaseList2D, protected TrackSettings
 {
  public:
   static constexpr NodeKindOf<CTrack> kNodeKind{"track", &BaseList2D::kNodeKind};
@@ -66,17 +80,10 @@ class CTrack : public BaseList2D
   CCurve** SlotOf(Long number);
 
   static constexpr Long kExtraCurves = 9;
-  static constexpr Long kExtraNumbers = 4;
 
   CCurve curve_;
   CCurve* extraCurves_[kExtraCurves] = {}; // owned, made on demand
-  ParameterPath path_;
-  Long before_ = 1;
-  Long after_ = 1;
   GeAliasLink trackLink_;
-  Long id_ = -1;
-  ULong extra_[kExtraNumbers] = {~0U, ~0U, ~0U, ~0U};
-  Long kind_ = 0;
 };
 
 } // namespace _torvane_

@@ -57,8 +57,22 @@ class BaseMaterial;
 class NodeSink;
 class ViewPanel;
 
+// What the preferences hold: a copy takes it over in one piece.
+class DocumentPrefValues
+{
+ protected:
+  Long fps_ = 30;
+  BaseTime minTime_;
+  BaseTime maxTime_;
+  BaseTime loopMin_;
+  BaseTime loopMax_;
+  Bool bools_[4] = {true, true, true, true};
+  Real real_ = 1.0;
+  Bool lastBool_ = false;
+};
+
 // Frame rate and time range of a document.
-class DocumentPref : public GeListNode
+class DocumentPref : public GeListNode, protected DocumentPrefValues
 {
  public:
   static constexpr NodeKindOf<DocumentPref> kNodeKind{"document preferences", &GeListNode::kNodeKind};
@@ -97,15 +111,6 @@ class DocumentPref : public GeListNode
   friend struct ChunkFields<DocumentPref>;
 
   void BringIntoRange(BaseTime& time) const;
-
-  Long fps_ = 30;
-  BaseTime minTime_;
-  BaseTime maxTime_;
-  BaseTime loopMin_;
-  BaseTime loopMax_;
-  Bool bools_[4] = {true, true, true, true};
-  Real real_ = 1.0;
-  Bool lastBool_ = false;
 };
 
 class BaseDocument : public BaseList2D

@@ -34,7 +34,19 @@ struct JointEntry
 
 inline constexpr ULong kJointSelected = 1; // bit of JointRecord::flags
 
-struct JointRecord
+// What a joint has besides its links, weights and lists: a copy takes it over in one piece.
+struct JointPose
+{
+  Matrix bindMatrix; // the joint's global matrix in the bind pose
+  Matrix bindInverse;
+  Matrix restMatrix; // of a second pose
+  Matrix restInverse;
+  Real length = 0.0;
+  ULong flags = 0;
+  Long index = -1; // for the use of an application; not in a file
+};
+
+struct JointRecord : JointPose
 {
   JointRecord() = default;
   ~JointRecord();
@@ -54,14 +66,7 @@ struct JointRecord
 
   GeAliasLink* joint = nullptr;  // owned
   GeAliasLink* second = nullptr; // owned
-  Matrix bindMatrix;             // the joint's global matrix in the bind pose
-  Matrix bindInverse;
-  Matrix restMatrix; // of a second pose
-  Matrix restInverse;
-  Real length = 0.0;
   JointWeightTable weights;
-  ULong flags = 0;
-  Long index = -1; // for the use of an application; not in a file
   JointPairList pairs;
   GeTempDynArray<JointEntry*> entries; // owned
   BaseObject* object = nullptr;        // what the joint link was set to; used only while it still names that

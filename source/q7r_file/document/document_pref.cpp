@@ -74,15 +74,7 @@ Bool DocumentPref::CopyTo(PrivateChunk& destination, ULong flags, TransArray* tr
   auto* target = NodeCast<DocumentPref>(&destination);
   if (!target)
     return false;
-  target->fps_ = fps_;
-  target->minTime_ = minTime_;
-  target->maxTime_ = maxTime_;
-  target->loopMin_ = loopMin_;
-  target->loopMax_ = loopMax_;
-  for (Long i = 0; i < 4; ++i)
-    target->bools_[i] = bools_[i];
-  target->real_ = real_;
-  target->lastBool_ = lastBool_;
+  static_cast<DocumentPrefValues&>(*target) = *this;
   return GeListNode::CopyTo(destination, flags, translation);
 }
 

@@ -48,13 +48,7 @@ void JointRecord::FlushEntries()
 
 Bool JointRecord::CopyTo(JointRecord& destination, TransArray* translation) const
 {
-  destination.bindMatrix = bindMatrix;
-  destination.bindInverse = bindInverse;
-  destination.restMatrix = restMatrix;
-  destination.restInverse = restInverse;
-  destination.length = length;
-  destination.flags = flags;
-  destination.index = index;
+  static_cast<JointPose&>(destination) = *this;
   if (!CopyLink(joint, destination.joint, translation) || !CopyLink(second, destination.second, translation) ||
       !weights.CopyTo(destination.weights) || !pairs.CopyTo(destination.pairs))
     return false;
