@@ -1,5 +1,6 @@
 // What this machine can do at best: the plainest code for the same kind of work. Each is measured once, when first
-// asked for, as the best of three runs after one that touches the memory.
+// asked for, as the best of three: runs of one process after a first one that touches the memory, or, where memory is
+// to be fresh, runs of a process each, as the compared work has.
 #pragma once
 
 namespace benchmarks

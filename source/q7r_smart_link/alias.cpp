@@ -117,14 +117,22 @@ void GeAliasXLink::Detach()
 
 GeAliasGoal* GeAliasXLink::GetGoal() const { return trunk ? trunk->goal : nullptr; }
 
-AliasTrunk::AliasTrunk(GeAliasGoal& trunkGoal) : goal(&trunkGoal), id(TakeTrunkId()) {}
+AliasTrunk::AliasTrunk(GeAliasGoal& trunkGoal)
+    : goal(&trunkGoal), id(TakeTrunkId() & ((GeAliasID{1} << kIdBits) - 1)), inTranslation(0), inPage(0), place(0)
+{}
 
-AliasTrunk::~AliasTrunk()
+void AliasTrunk::Empty()
 {
   while (iterators)
     iterators->Leave();
   while (GeAliasXLink* xlink = xlinks.GetFirst())
     xlink->Detach();
+}
+
+void AliasTrunk::MoveLinksTo(AliasTrunk& destination)
+{
+  while (GeAliasXLink* xlink = xlinks.GetFirst())
+    xlink->Attach(destination);
 }
 
 void GoalIterator::Enter(AliasTrunk& trunk)
@@ -171,14 +179,16 @@ void GeAliasLink::SetLink(GeListNode* node) { SetLinkGoal(node ? &node->GetGoal(
 
 Bool GeAliasLink::SetLinkGoal(GeAliasGoal* goal)
 {
-  if (!goal) {
-    ClearLink();
-    return true;
-  }
-  AliasTrunk* trunk = goal->NeedTrunk();
+  AliasTrunk* trunk = goal ? goal->NeedTrunk() : nullptr;
+  return SetTrunk(trunk) && (trunk || !goal);
+}
+
+// Goes to the end of its list; null clears. False when memory is short: the link is empty then.
+Bool GeAliasLink::SetTrunk(AliasTrunk* trunk)
+{
   if (!trunk || !NeedXLink()) {
     ClearLink();
-    return false;
+    return !trunk;
   }
   xlink_->Attach(*trunk);
   return true;
@@ -194,8 +204,8 @@ GeAliasGoal* GeAliasLink::GetLinkGoal() const { return xlink_ ? xlink_->GetGoal(
 
 GeAliasID GeAliasLink::GetTargetId() const
 {
-  GeAliasGoal* goal = GetLinkGoal();
-  return goal ? goal->GetGoalId() : 0;
+  const AliasTrunk* trunk = GetTrunk();
+  return trunk ? trunk->id : 0;
 }
 
 void GeAliasLink::ClearLink()
@@ -231,8 +241,7 @@ Bool GeAliasLink::CopyLinkTo(GeAliasLink* destination, TransArray* translation) 
 {
   if (!destination || destination == this)
     return true;
-  Bool done = translation ? translation->RegisterLink(GetTargetId(), *destination, GetLinkGoal())
-                          : destination->SetLinkGoal(GetLinkGoal());
+  const Bool done = translation ? translation->RegisterCopy(*this, *destination) : destination->SetTrunk(GetTrunk());
   const String* name = GetName();
   const Bool named = name && name->Content();
   destination->SetName(named ? *name : String());
@@ -303,7 +312,12 @@ AliasTrunk* GeAliasGoal::NeedTrunk()
 void GeAliasGoal::DropLinks()
 {
   AliasTrunk* old = std::exchange(trunk, nullptr);
-  DeleteObj(old);
+  if (!old || !old->inTranslation) {
+    AliasTrunk::Delete(old);
+    return;
+  }
+  old->Empty();
+  old->goal = nullptr;
 }
 
 Bool GeAliasGoal::HasLinks() const { return trunk && !trunk->xlinks.IsEmpty(); }
@@ -342,8 +356,7 @@ void GeAliasGoal::MoveLinksTo(GeAliasGoal& destination)
     trunk = nullptr;
     return;
   }
-  while (GeAliasXLink* xlink = trunk->xlinks.GetFirst())
-    xlink->Attach(*destination.trunk);
+  trunk->MoveLinksTo(*destination.trunk);
   DropLinks();
 }
 

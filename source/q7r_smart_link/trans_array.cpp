@@ -1,3 +1,4 @@
+#include "q7r_smart_link/trunk_page.h"
 #include "torvane/links/alias.h"
 #include "torvane/memory/assertion.h"
 
@@ -11,106 +12,92 @@ constexpr const char* kModule = "q7r_smart_link";
 // What readers of the log know these reports by.
 constexpr Long kLineOfGoal = 794;
 constexpr Long kLineOfLink = 843;
-constexpr LLong kFirstTable = 16;
-constexpr Long kFirstBlock = 8;
-constexpr Long kLargestBlock = 1024;
+// Pages are made from this count of trunks on. One stays as long as any trunk in it: too much for what is copied alone.
+constexpr LLong kFewTrunks = 256;
+// A larger id wasn't counted but is, say, an address.
+constexpr GeAliasID kCountedIds = 1 << 23;
+constexpr GeAliasID kLeafEntries = 512;
+constexpr GeAliasID kLeafIds = kLeafEntries * TrunkPage::kTrunks;
+constexpr GeAliasID kLeaves = kCountedIds / kLeafIds;
 
-// Spreads an id over 64 bits.
-ULLong Mix(ULLong value)
+// A zeroed array; null when memory is short.
+template <class T>
+T* NewArray(GeAliasID count)
 {
-  value = (value ^ (value >> 30)) * 0xBF58476D1CE4E5B9;
-  value = (value ^ (value >> 27)) * 0x94D049BB133111EB;
-  return value ^ (value >> 31);
+  return static_cast<T*>(GeAlloc(static_cast<LLong>(count * sizeof(T))));
 }
 
 } // namespace
 
-// What is known of one id. The two links lie in the entry itself, so that a registration takes no memory for them.
-struct TransEntry
+TrunkPage* TrunkPage::Make()
 {
-  GeAliasGoal placeholder; // the target of links whose goal hasn't turned up
-  GeAliasXLink current;    // stands on the goal that links of this id are to have
-  GeAliasXLink origin;     // in a copy, stands on the goal that the source links have
-};
-
-// The entries follow.
-struct TransArray::Block
-{
-  Block* next;
-  Long capacity;
-  Long used;
-
-  TransEntry* Entries() { return reinterpret_cast<TransEntry*>(this + 1); }
-};
-
-// The slot of an id: the one that holds it or the free one where it belongs. The table is never full. Its address takes
-// part, so that nobody can make up a file of ids that all fall into one slot.
-TransArray::Slot& TransArray::SlotOf(GeAliasID id) const
-{
-  ULLong mask = static_cast<ULLong>(capacity_) - 1;
-  ULLong index = Mix(id ^ reinterpret_cast<std::uintptr_t>(table_)) & mask;
-  while (table_[index].entry && table_[index].id != id)
-    index = (index + 1) & mask;
-  return table_[index];
+  constexpr LLong kSize = static_cast<LLong>(sizeof(TrunkPage) + kTrunks * sizeof(AliasTrunk));
+  void* place = GeAllocNC(kSize);
+  return place ? ::new (place) TrunkPage{0} : nullptr;
 }
 
-// Keeps a quarter of the slots free.
-Bool TransArray::GrowTable()
+void AliasTrunk::Delete(AliasTrunk* trunk)
 {
-  if (count_ < capacity_ / 4 * 3)
-    return true;
-  LLong newCapacity = capacity_ ? capacity_ * 2 : kFirstTable;
-  Slot* newTable = static_cast<Slot*>(GeAlloc(newCapacity * static_cast<LLong>(sizeof(Slot))));
-  if (!newTable)
-    return false;
-  Slot* oldTable = table_;
-  LLong oldCapacity = capacity_;
-  table_ = newTable;
-  capacity_ = newCapacity;
-  for (LLong i = 0; i < oldCapacity; ++i) {
-    if (oldTable[i].entry)
-      SlotOf(oldTable[i].id) = oldTable[i];
+  if (!trunk || !trunk->inPage) {
+    DeleteObj(trunk);
+    return;
   }
-  GeFree(oldTable);
-  return true;
+  TrunkPage* page = reinterpret_cast<TrunkPage*>(trunk - trunk->place) - 1;
+  trunk->~AliasTrunk();
+  if (--page->live == 0)
+    GeFree(page);
 }
 
-// Where the next entry is to be made; null when memory is short.
-TransEntry* TransArray::NextPlace()
+// The entry of the page that an id belongs to, or null.
+TransArray::Entry* TransArray::FindEntry(GeAliasID id) const
 {
-  if (!blocks_ || blocks_->used == blocks_->capacity) {
-    Long capacity = blocks_ ? blocks_->capacity * 2 : kFirstBlock;
-    if (capacity > kLargestBlock)
-      capacity = kLargestBlock;
-    LLong size = static_cast<LLong>(sizeof(Block)) + capacity * static_cast<LLong>(sizeof(TransEntry));
-    void* place = GeAllocNC(size);
-    if (!place)
-      return nullptr;
-    blocks_ = ::new (place) Block{blocks_, capacity, 0};
+  Entry* leaf = leaves_ && id < kCountedIds ? leaves_[id / kLeafIds] : nullptr;
+  return leaf ? leaf + id / TrunkPage::kTrunks % kLeafEntries : nullptr;
+}
+
+// The same, with a page in it; null when memory is short.
+TransArray::Entry* TransArray::NeedEntry(GeAliasID id)
+{
+  if (!leaves_)
+    leaves_ = NewArray<Entry*>(kLeaves);
+  if (leaves_ && !leaves_[id / kLeafIds])
+    leaves_[id / kLeafIds] = NewArray<Entry>(kLeafEntries);
+  Entry* entry = FindEntry(id);
+  if (entry && !entry->page)
+    entry->page = TrunkPage::Make();
+  return entry && entry->page ? entry : nullptr;
+}
+
+// The trunk of an id; a new one for `goal`. Null, with nothing changed, when memory is short.
+AliasTrunk* TransArray::NeedTrunk(GeAliasID id, GeAliasGoal& goal)
+{
+  const Entry* entry = FindEntry(id);
+  const ULong place = id % TrunkPage::kTrunks;
+  return entry && (entry->made >> place & 1) != 0 ? entry->page->Trunks() + place : FindOrMakeTrunk(id, goal);
+}
+
+// The same for one that isn't in a page yet.
+AliasTrunk* TransArray::FindOrMakeTrunk(GeAliasID id, GeAliasGoal& goal)
+{
+  if (AliasTrunk* trunk = single_.Find(id))
+    return trunk;
+  AliasTrunk* trunk = nullptr;
+  if (count_ < kFewTrunks || id >= kCountedIds) {
+    trunk = NewObj<AliasTrunk>(goal);
+    if (trunk && !single_.Add(id, *trunk))
+      DeleteObj(trunk);
+  } else if (Entry* entry = NeedEntry(id)) {
+    const ULong place = id % TrunkPage::kTrunks;
+    entry->made |= ULong{1} << place;
+    trunk = ::new (static_cast<void*>(entry->page->Trunks() + place)) AliasTrunk(goal);
+    trunk->place = place % TrunkPage::kTrunks;
+    trunk->inPage = 1;
   }
-  return blocks_->Entries() + blocks_->used;
-}
-
-TransEntry* TransArray::Find(GeAliasID id) const { return table_ ? SlotOf(id).entry : nullptr; }
-
-// An entry for a new id. Its links go to `goal`, or to the entry's placeholder when that is null. Null, with nothing
-// changed, when memory is short.
-TransEntry* TransArray::Insert(GeAliasID id, GeAliasGoal* goal)
-{
-  TransEntry* place = GrowTable() ? NextPlace() : nullptr;
-  if (!place)
+  if (!trunk)
     return nullptr;
-  TransEntry* entry = ::new (static_cast<void*>(place)) TransEntry;
-  AliasTrunk* trunk = (goal ? goal : &entry->placeholder)->NeedTrunk();
-  if (!trunk) {
-    entry->~TransEntry();
-    return nullptr;
-  }
-  entry->current.Attach(*trunk);
-  SlotOf(id) = {id, entry};
-  ++blocks_->used;
+  trunk->inTranslation = 1;
   ++count_;
-  return entry;
+  return trunk;
 }
 
 Bool TransArray::RegisterGoal(GeAliasID id, GeAliasGoal& goal)
@@ -118,90 +105,132 @@ Bool TransArray::RegisterGoal(GeAliasID id, GeAliasGoal& goal)
   goal.DropLinks();
   if (id == 0)
     return true;
-  TransEntry* entry = Find(id);
-  if (!entry)
-    return Insert(id, &goal) != nullptr;
-  if (GeAliasGoal* present = entry->current.GetGoal())
-    present->MoveLinksTo(goal);
-  else
+  AliasTrunk* trunk = NeedTrunk(id, goal);
+  if (!trunk)
+    return false;
+  if (!trunk->goal) {
     ReportAssertion(kModule, kLineOfGoal, "the goal of this id has gone");
+    return true;
+  }
+  trunk->goal->trunk = nullptr;
+  trunk->goal = &goal;
+  goal.trunk = trunk;
   return true;
 }
 
 Bool TransArray::RegisterLink(GeAliasID id, GeAliasLink& link, GeAliasGoal* sourceGoal)
 {
+  AliasTrunk* source = sourceGoal ? sourceGoal->NeedTrunk() : nullptr;
+  return Register(id, link, source) && (source || !sourceGoal);
+}
+
+Bool TransArray::RegisterCopy(const GeAliasLink& source, GeAliasLink& copy)
+{
+  return Register(source.GetTargetId(), copy, source.GetTrunk());
+}
+
+Bool TransArray::Register(GeAliasID id, GeAliasLink& link, AliasTrunk* source)
+{
   link.ClearLink();
   if (id == 0)
     return true;
-  TransEntry* entry = Find(id);
-  if (!entry)
-    entry = Insert(id, nullptr);
-  if (!entry)
+  AliasTrunk* trunk = NeedTrunk(id, awaited_);
+  if (!trunk)
     return false;
-  GeAliasGoal* goal = entry->current.GetGoal();
-  if (!goal) {
+  if (!trunk->goal) {
     ReportAssertion(kModule, kLineOfLink, "the goal of this id has gone");
     return true;
   }
-  if (!link.SetLinkGoal(goal))
-    return false;
-  entry->origin.Detach();
-  AliasTrunk* source = sourceGoal ? sourceGoal->NeedTrunk() : nullptr;
-  if (source)
-    entry->origin.Attach(*source);
-  return source || !sourceGoal;
+  return link.SetTrunk(trunk) && (trunk->goal != &awaited_ || SetOrigin(id, source));
 }
 
-// Moves the slots whose goal never came, and whose links have a target to go back to, to the front of the table, which
-// is of no other use after that.
-LLong TransArray::CollectUnresolved()
+// What the links that wait under this id go back to; null for nothing. False when memory is short.
+Bool TransArray::SetOrigin(GeAliasID id, AliasTrunk* source)
 {
-  LLong found = 0;
-  for (LLong i = 0; i < capacity_; ++i) {
-    TransEntry* entry = table_[i].entry;
-    if (entry && entry->current.GetGoal() == &entry->placeholder && entry->origin.GetGoal())
-      table_[found++] = table_[i];
+  GeAliasXLink* origin = origins_.Find(id);
+  if (!source) {
+    if (origin)
+      origin->Detach();
+    return true;
   }
-  return found;
+  if (!origin) {
+    origin = NewObj<GeAliasXLink>();
+    if (origin && !origins_.Add(id, *origin))
+      DeleteObj(origin);
+    if (!origin)
+      return false;
+  }
+  origin->Attach(*source);
+  return true;
+}
+
+void TransArray::ReturnToOrigins()
+{
+  using Origin = IdTable<GeAliasXLink>::Slot;
+  // In the order of the ids: it is also the order in which links enter the list of a common target.
+  class ById : public GeSortAndSearch
+  {
+    Long Compare(const void* a, const void* b) override
+    {
+      const GeAliasID left = static_cast<const Origin*>(a)->id;
+      const GeAliasID right = static_cast<const Origin*>(b)->id;
+      return left < right ? -1 : left > right ? 1 : 0;
+    }
+  };
+  // To the front, where they need no place of their own any more.
+  Origin* end = origins_.begin();
+  for (Origin& origin : origins_) {
+    if (origin.item && origin.item->trunk && NeedTrunk(origin.id, awaited_)->goal == &awaited_)
+      std::swap(*end++, origin);
+  }
+  ById().Sort(origins_.begin(), static_cast<Long>(end - origins_.begin()), static_cast<Long>(sizeof(Origin)));
+  for (Origin* origin = origins_.begin(); origin != end; ++origin)
+    NeedTrunk(origin->id, awaited_)->MoveLinksTo(*origin->item->trunk);
 }
 
 void TransArray::FinishTranslation(Bool keepToOrigin)
 {
-  if (keepToOrigin && table_) {
-    // In the order of the ids: it is also the order in which links enter the list of a common target.
-    class ById : public GeSortAndSearch
-    {
-      Long Compare(const void* a, const void* b) override
-      {
-        GeAliasID left = static_cast<const Slot*>(a)->id;
-        GeAliasID right = static_cast<const Slot*>(b)->id;
-        return left < right ? -1 : left > right ? 1 : 0;
-      }
-    };
-    LLong unresolved = CollectUnresolved();
-    ById().Sort(table_, static_cast<Long>(unresolved), static_cast<Long>(sizeof(Slot)));
-    for (LLong i = 0; i < unresolved; ++i) {
-      TransEntry* entry = table_[i].entry;
-      GeAliasGoal* target = entry->origin.GetGoal();
-      if (target && target->HasLinks())
-        entry->placeholder.MoveLinksTo(*target);
-    }
+  if (keepToOrigin)
+    ReturnToOrigins();
+  for (auto& [id, origin] : origins_)
+    DeleteObj(origin);
+  origins_.Clear();
+  for (auto& [id, trunk] : single_) {
+    if (trunk)
+      Release(trunk);
   }
-  Clear();
+  single_.Clear();
+  for (GeAliasID i = 0; leaves_ && i < kLeaves; ++i) {
+    ReleaseLeaf(leaves_[i]);
+    GeFree(leaves_[i]);
+  }
+  GeFree(leaves_);
+  count_ = 0;
 }
 
-void TransArray::Clear()
+void TransArray::ReleaseLeaf(Entry* leaf)
 {
-  while (blocks_) {
-    Block* block = blocks_;
-    blocks_ = block->next;
-    for (Long i = 0; i < block->used; ++i)
-      block->Entries()[i].~TransEntry();
-    GeFree(block);
+  for (Entry* entry = leaf; leaf && entry != leaf + kLeafEntries; ++entry) {
+    if (!entry->page)
+      continue;
+    entry->page->live = 1; // it stays until all are told
+    for (ULong place = 0; place < TrunkPage::kTrunks; ++place) {
+      if ((entry->made >> place & 1) == 0)
+        continue;
+      ++entry->page->live;
+      Release(entry->page->Trunks() + place);
+    }
+    if (--entry->page->live == 0)
+      GeFree(entry->page);
   }
-  GeFree(table_);
-  capacity_ = 0;
-  count_ = 0;
+}
+
+// The translation leads to the trunk no more: without a goal it goes.
+void TransArray::Release(AliasTrunk* trunk)
+{
+  trunk->inTranslation = 0;
+  if (!trunk->goal || trunk->goal == &awaited_)
+    AliasTrunk::Delete(trunk);
 }
 
 // ---------------------------------------------------------------------------------------------------------------

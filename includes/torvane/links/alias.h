@@ -6,6 +6,7 @@
 // None of this is locked: a document with its links belongs to one thread at a time.
 #pragma once
 
+#include "torvane/links/id_table.h"
 #include "torvane/memory/memory.h"
 #include "torvane/memory/private_ge_mtools.h"
 #include "torvane/text/ge_string.h"
@@ -19,11 +20,7 @@ class GeListNode;
 class HyperFile;
 class TransArray;
 struct AliasTrunk;
-struct TransEntry;
-
-// Names a goal within one file; 0 means no link. A trunk takes its number from a process-wide counter that starts
-// at 1, so that the same run writes the same bytes.
-using GeAliasID = ULLong;
+struct TrunkPage;
 
 // What a link that isn't empty has: its place in the list of a trunk, and what travels with it.
 class GeAliasXLink : public GeTempPublicNode2D<GeAliasXLink>
@@ -78,7 +75,7 @@ class GeAliasLink
   Bool CopyLinkTo(GeAliasLink* destination, TransArray* translation) const;
 
   // True when both reach the same goal, or both are empty.
-  Bool IsEqual(const GeAliasLink& other) const { return GetLinkGoal() == other.GetLinkGoal(); }
+  Bool IsEqual(const GeAliasLink& other) const { return GetTrunk() == other.GetTrunk(); }
 
   // One Memory value: "alias2", the id, and the label if there is one.
   Bool WriteLink(HyperFile& file) const;
@@ -89,6 +86,10 @@ class GeAliasLink
   Bool SetLinkGoal(GeAliasGoal* goal);
 
  private:
+  friend class TransArray;
+
+  AliasTrunk* GetTrunk() const { return xlink_ ? xlink_->trunk : nullptr; }
+  Bool SetTrunk(AliasTrunk* trunk);
   GeAliasID GetTargetId() const;
   Bool ReadName(const UChar* bytes, LLong size);
   GeAliasXLink* NeedXLink();
@@ -164,25 +165,40 @@ class GeAliasGoal : public GeMemory
   Bool resolvable = true;      // when false a link gives null for this goal, though it stays attached
 };
 
-// The meeting point of a goal and its links. It lives until its goal goes.
+// The meeting point of a goal and its links. It lives until its goal goes, or until the end of the translation that
+// made it if that is later.
 struct AliasTrunk
 {
   explicit AliasTrunk(GeAliasGoal& trunkGoal);
-  ~AliasTrunk();
+  ~AliasTrunk() { Empty(); }
 
-  GeAliasGoal* goal;
-  GeAliasID id;
+  static constexpr int kIdBits = 57;
+
+  // Deletes a trunk that no translation leads to. Null does nothing.
+  static void Delete(AliasTrunk* trunk);
+  // All links become empty.
+  void Empty();
+  // Moves every link to the end of another list, in order.
+  void MoveLinksTo(AliasTrunk& destination);
+
+  GeAliasGoal* goal; // null when it has gone before the end of the translation
+  GeAliasID id : kIdBits;
+  GeAliasID inTranslation : 1; // a TransArray leads here
+  GeAliasID inPage : 1;        // lies among those of a translation's page, else in a block of its own
+  GeAliasID place : 5;         // there
   GeTempPublicList2D<GeAliasXLink> xlinks;
   GoalIterator* iterators = nullptr; // those that stand on this trunk
 };
 
-// Carries ids across one read or one copy. Entries keep their place in memory, so links may sit on an entry's
-// placeholder; registering n links and goals costs O(n log n) in whatever order they come.
+// Carries ids across one read or one copy. The first registration under an id makes a trunk, on which links wait until
+// the goal comes and takes it over. n registrations take O(n), in whatever order they come: where there are many, and
+// the ids were counted, as a writer like this one does, an id leads straight to its trunk, in a page of those of the
+// ids beside it; the first ones and scattered ids are found through a table.
 class TransArray : public GeMemory
 {
  public:
   TransArray() = default;
-  ~TransArray() { Clear(); } // what is left unresolved becomes empty
+  ~TransArray() { FinishTranslation(false); } // what is left unresolved becomes empty
   TransArray(const TransArray&) = delete;
   TransArray& operator=(const TransArray&) = delete;
 
@@ -192,6 +208,8 @@ class TransArray : public GeMemory
   // `link` is to point at the goal of that id. In a copy `sourceGoal` is what the source link points at. Id 0 only
   // clears the link. False when memory is short.
   Bool RegisterLink(GeAliasID id, GeAliasLink& link, GeAliasGoal* sourceGoal);
+  // The same for a copy of `source`, whose own target may still be awaited by another translation.
+  Bool RegisterCopy(const GeAliasLink& source, GeAliasLink& copy);
 
   // Ends the translation and empties the array: a link whose goal never came becomes empty, or, with `keepToOrigin`,
   // goes back to the goal that its source points at if that has links of its own.
@@ -200,24 +218,27 @@ class TransArray : public GeMemory
   LLong GetCount() const { return count_; }
 
  private:
-  struct Slot
+  // What is known of a page.
+  struct Entry
   {
-    GeAliasID id;
-    TransEntry* entry; // null in a free slot
+    TrunkPage* page; // null as long as none of its ids turned up
+    ULong made;      // a bit for each trunk in it that is there; asked before the page itself is looked at
   };
-  struct Block; // a run of entries, which never move
 
-  TransEntry* Find(GeAliasID id) const;
-  TransEntry* Insert(GeAliasID id, GeAliasGoal* goal);
-  TransEntry* NextPlace();
-  Bool GrowTable();
-  Slot& SlotOf(GeAliasID id) const;
-  LLong CollectUnresolved();
-  void Clear();
+  Entry* FindEntry(GeAliasID id) const;
+  Entry* NeedEntry(GeAliasID id);
+  AliasTrunk* NeedTrunk(GeAliasID id, GeAliasGoal& goal);
+  AliasTrunk* FindOrMakeTrunk(GeAliasID id, GeAliasGoal& goal);
+  Bool Register(GeAliasID id, GeAliasLink& link, AliasTrunk* source);
+  Bool SetOrigin(GeAliasID id, AliasTrunk* source);
+  void ReturnToOrigins();
+  void ReleaseLeaf(Entry* leaf);
+  void Release(AliasTrunk* trunk);
 
-  Slot* table_ = nullptr;   // open addressing, a power of two; the entries belong to the blocks
-  Block* blocks_ = nullptr; // the newest first
-  LLong capacity_ = 0;
+  GeAliasGoal awaited_;           // the goal of trunks whose own hasn't turned up
+  IdTable<AliasTrunk> single_;    // trunks outside of pages
+  Entry** leaves_ = nullptr;      // the entries of all pages, in runs that are made when they are needed
+  IdTable<GeAliasXLink> origins_; // in a copy, stand on the trunk of the goal that the source links have; owned
   LLong count_ = 0;
 };
 
