@@ -84,8 +84,9 @@ Bool CCurve::GetKeyValues(Long index, KeyValues& values) const
   if (HasRows()) {
     const KeyRow& row = keyRoot_.GetRows()[index];
     const KeyRowTangents tangents = keyRoot_.GetRows().GetTangents(index);
+    const KeyRowBits bits = keyRoot_.GetRows().GetBits(index);
     values = {row.time,           tangents.leftTime,   tangents.rightTime, row.value,
-              tangents.leftValue, tangents.rightValue, row.interpolation,  row.switches};
+              tangents.leftValue, tangents.rightValue, bits.interpolation, bits.nbits[1]};
   } else {
     const CKey& key = *NodeAt(index);
     values = {key.GetTime(),      key.GetLeftTime(),   key.GetRightTime(),     key.GetValue(),
@@ -113,9 +114,9 @@ Bool CCurve::SetKeyValue(const BaseTime& time, Real value, ULong switches)
 {
   KeyRows& rows = keyRoot_.GetRows();
   const Long count = rows.GetCount();
-  const Bool isLast = count > 0 && rows[count - 1].time < time && keyRoot_.IsEmpty();
+  const Bool isLast = count > 0 && rows[count - 1].time < time; // there is no node then
   if (isLast && IsKeyTime(time))
-    return rows.Append({time, value, kInterpolationSpline, switches});
+    return rows.Append({time, value}, {.nbits = {0, switches, 0}});
   KeyValues values;
   values.time = time;
   values.value = value;
@@ -126,12 +127,14 @@ Bool CCurve::SetKeyValue(const BaseTime& time, Real value, ULong switches)
 Bool CCurve::SetRowValues(Long place, const KeyValues& values, Bool isNew)
 {
   KeyRows& rows = keyRoot_.GetRows();
-  PlainKey key = {{values.time, values.value, values.interpolation, values.switches},
+  PlainKey key = {{values.time, values.value},
                   {values.leftTime, values.rightTime, values.leftValue, values.rightValue},
-                  {}};
+                  isNew ? KeyRowBits() : rows.GetBits(place),
+                  isNew ? NodeMarker() : rows.GetMarker(place)};
+  key.bits.interpolation = values.interpolation;
+  key.bits.nbits[1] = values.switches;
   if (isNew)
     return rows.Insert(place, key);
-  key.node = rows.Get(place).node;
   return rows.Set(place, key);
 }
 

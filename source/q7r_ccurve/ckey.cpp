@@ -224,28 +224,26 @@ Bool CKey::ToPlain(PlainKey& key) const
 {
   if (!IsBare() || keyData_.GetRawType() != kDataNil || nbits_[3] != 0 || !IsKeyTime(time_))
     return false;
-  key.row = {time_, value_, interpolation_, nbits_[1]};
+  key.row = {time_, value_};
   key.tangents = {leftTime_, rightTime_, leftValue_, rightValue_};
-  key.node = {{}, info_, {nbits_[0], nbits_[2]}, markerDrawn_ ? 1U : 0U};
-  if (markerDrawn_)
-    key.node.marker = marker_;
+  key.bits = {interpolation_, info_, {nbits_[0], nbits_[1], nbits_[2]}, markerDrawn_ ? 1U : 0U};
+  key.marker = markerDrawn_ ? marker_ : NodeMarker();
   return true;
 }
 
 void CKey::FromPlain(const PlainKey& key)
 {
-  const auto& [row, tangents, node] = key;
+  const auto& [row, tangents, bits, marker] = key;
   time_ = row.time;
   value_ = row.value;
-  interpolation_ = row.interpolation;
+  interpolation_ = bits.interpolation;
   SetLeft(tangents.leftTime, tangents.leftValue);
   SetRight(tangents.rightTime, tangents.rightValue);
-  marker_ = node.marker;
-  markerDrawn_ = node.markerDrawn != 0;
-  info_ = node.info;
-  nbits_[0] = node.nbits[0];
-  nbits_[1] = row.switches;
-  nbits_[2] = node.nbits[1];
+  marker_ = marker;
+  markerDrawn_ = bits.markerDrawn != 0;
+  info_ = bits.info;
+  for (Long i = 0; i < 3; ++i)
+    nbits_[i] = bits.nbits[i];
 }
 
 } // namespace _torvane_

@@ -3,7 +3,6 @@
 #include "q7r_ccurve/key_record.h"
 #include "q7r_ccurve/key_times.h"
 #include "torvane/stream/hyper_file.h"
-#include "torvane/time/uuid.h"
 
 namespace _torvane_
 {
@@ -75,16 +74,12 @@ Bool KeyList::ReadKey(HyperFile& file)
 void KeyList::WriteMembers(HyperFile& file)
 {
   const KeyRecord* record = GetRowCount() > 0 ? KeyRecord::Get() : nullptr;
+  if (!rows_.DrawMarkers()) {
+    file.SetError(FILEERROR_MEMORY);
+    return;
+  }
   for (Long i = 0; i < GetRowCount(); ++i) {
-    PlainKey plain = rows_.Get(i);
-    if (plain.node.markerDrawn == 0) {
-      CreateUuid(plain.node.marker.bytes);
-      plain.node.markerDrawn = 1;
-      if (!rows_.Set(i, plain)) {
-        file.SetError(FILEERROR_MEMORY);
-        return;
-      }
-    }
+    const PlainKey plain = rows_.Get(i);
     UChar spare[PreparedRecord::kLargest];
     if (UChar* place = record ? file.BeginRecord(record->GetRecord(), spare) : nullptr) {
       record->Put(place, plain);

@@ -20,7 +20,7 @@ constexpr UChar kMarkerMark = 0xA0;
 
 void KeyRecord::Put(UChar* place, const PlainKey& key) const
 {
-  const auto& [row, tangents, node] = key;
+  const auto& [row, tangents, bits, marker] = key;
   const Real reals[kReals] = {row.time.GetNumerator(),
                               row.time.GetDenominator(),
                               tangents.leftTime.GetNumerator(),
@@ -30,13 +30,13 @@ void KeyRecord::Put(UChar* place, const PlainKey& key) const
                               row.value,
                               tangents.leftValue,
                               tangents.rightValue};
-  const ULong longs[kLongs] = {static_cast<ULong>(row.interpolation), node.info, node.nbits[0], row.switches,
-                               node.nbits[1]};
+  const ULong longs[kLongs] = {static_cast<ULong>(bits.interpolation), bits.info, bits.nbits[0], bits.nbits[1],
+                               bits.nbits[2]};
   for (Long i = 0; i < kReals; ++i)
     bytes::PutBig(place + reals_[i], bytes::CleanBits(reals[i]));
   for (Long i = 0; i < kLongs; ++i)
     bytes::PutBig(place + longs_[i], longs[i]);
-  std::memcpy(place + marker_, node.marker.bytes, sizeof node.marker.bytes);
+  std::memcpy(place + marker_, marker.bytes, sizeof marker.bytes);
 }
 
 void KeyRecord::Take(const UChar* place, LLong begun, PlainKey& key) const
@@ -47,11 +47,11 @@ void KeyRecord::Take(const UChar* place, LLong begun, PlainKey& key) const
     reals[i] = bytes::CleanReal(bytes::GetBig<ULLong>(place + (reals_[i] - begun)));
   for (Long i = 0; i < kLongs; ++i)
     longs[i] = bytes::GetBig<ULong>(place + (longs_[i] - begun));
-  auto& [row, tangents, node] = key;
-  row = {BaseTime::Raw(reals[0], reals[1]), reals[6], static_cast<Long>(longs[0]), longs[3]};
+  auto& [row, tangents, bits, marker] = key;
+  row = {BaseTime::Raw(reals[0], reals[1]), reals[6]};
   tangents = {BaseTime::Raw(reals[2], reals[3]), BaseTime::Raw(reals[4], reals[5]), reals[7], reals[8]};
-  node = {{}, longs[1], {longs[2], longs[4]}, 1};
-  std::memcpy(node.marker.bytes, place + (marker_ - begun), sizeof node.marker.bytes);
+  bits = {static_cast<Long>(longs[0]), longs[1], {longs[2], longs[3], longs[4]}, 1};
+  std::memcpy(marker.bytes, place + (marker_ - begun), sizeof marker.bytes);
 }
 
 // A key with a mark in each field, written in the general way.

@@ -1,73 +1,91 @@
-#include <bit>
-#include <iterator>
-
 #include "torvane/animation/key_list.h"
+#include "torvane/time/uuid.h"
 
 namespace _torvane_
 {
 
-namespace
-{
-
-// Whether it is anything else than a new part: by the bits, since what isn't kept must come back as it was.
 template <class Part>
-Bool HasContent(const Part& part)
+Bool KeyParts<Part>::Prepare(const Part& part, Long rows, Long capacity)
 {
-  struct Words
-  {
-    ULong each[sizeof(Part) / sizeof(ULong)];
-  };
-  static_assert(sizeof(Words) == sizeof(Part));
-  constexpr Words kNone = std::bit_cast<Words>(Part());
-  const auto words = std::bit_cast<Words>(part);
-  ULong difference = 0;
-  for (std::size_t i = 0; i < std::size(words.each); ++i)
-    difference |= words.each[i] ^ kNone.each[i];
-  return difference != 0;
+  if (each_.GetCount() > 0)
+    return each_.Reserve(capacity);
+  if (rows == 0 || IsSame(part, common_))
+    return true;
+  if (!each_.Reserve(capacity) || !each_.SetCount(rows))
+    return false;
+  for (Part& each : each_)
+    each = common_;
+  isNew_ = false;
+  return true;
 }
 
-} // namespace
-
-// Makes the parts of all rows if this one needs room. False when memory is short.
 template <class Part>
-Bool KeyRows::Need(GeTempDynArray<Part>& parts, const Part& part)
+void KeyParts<Part>::Put(Long index, const Part& part)
 {
-  if (parts.GetCount() > 0 || rows_.GetCount() == 0 || !HasContent(part))
-    return true;
-  if (!parts.Reserve(rows_.GetCapacity()) || !parts.SetCount(rows_.GetCount()))
-    return false;
-  for (Part& each : parts)
-    each = Part();
-  return true;
+  if (each_.GetCount() > 0)
+    each_[index] = part;
+}
+
+template <class Part>
+void KeyParts<Part>::Insert(Long index, const Part& part, Long rows)
+{
+  if (rows == 0) {
+    common_ = part;
+    isNew_ = IsSame(part, Part());
+  } else if (each_.GetCount() > 0) {
+    static_cast<void>(index == rows ? each_.Append(part) : each_.Insert(index, part)); // there is room
+  }
+}
+
+template <class Part>
+void KeyParts<Part>::Flush()
+{
+  each_.Flush();
+  common_ = Part();
+  isNew_ = true;
+}
+
+template <class Part>
+Bool KeyParts<Part>::CopyTo(KeyParts& destination) const
+{
+  destination.common_ = common_;
+  destination.isNew_ = isNew_;
+  return each_.CopyTo(destination.each_);
+}
+
+// Room for the parts of a key.
+Bool KeyRows::Prepare(const PlainKey& key)
+{
+  const Long rows = rows_.GetCount();
+  const Long capacity = rows_.GetCapacity();
+  return tangents_.Prepare(key.tangents, rows, capacity) && bits_.Prepare(key.bits, rows, capacity) &&
+         markers_.Prepare(key.marker, rows, capacity);
 }
 
 Bool KeyRows::Set(Long index, const PlainKey& key)
 {
-  if (!Need(tangents_, key.tangents) || !Need(nodes_, key.node))
+  if (!Prepare(key))
     return false;
   rows_[index] = key.row;
-  if (tangents_.GetCount() > 0)
-    tangents_[index] = key.tangents;
-  if (nodes_.GetCount() > 0)
-    nodes_[index] = key.node;
+  tangents_.Put(index, key.tangents);
+  bits_.Put(index, key.bits);
+  markers_.Put(index, key.marker);
   return true;
 }
 
 Bool KeyRows::Insert(Long index, const PlainKey& key)
 {
-  if (!(index == rows_.GetCount() ? rows_.Append(key.row) : rows_.Insert(index, key.row)))
+  constexpr Long kFirstRoom = 16;
+  const Long rows = rows_.GetCount();
+  if (rows == rows_.GetCapacity() && !ReserveMore(rows > kFirstRoom ? rows : kFirstRoom))
     return false;
-  const Long count = rows_.GetCount();
-  // Parts that other rows have get one more; parts that only this row has are made for all.
-  if ((tangents_.GetCount() == 0 || tangents_.Insert(index, key.tangents)) &&
-      (nodes_.GetCount() == 0 || nodes_.Insert(index, key.node)) && Set(index, key))
-    return true;
-  if (tangents_.GetCount() == count)
-    tangents_.Remove(index);
-  if (nodes_.GetCount() == count)
-    nodes_.Remove(index);
-  rows_.Remove(index);
-  return false;
+  if (!Prepare(key))
+    return false;
+  static_cast<void>(index == rows ? rows_.Append(key.row) : rows_.Insert(index, key.row)); // there is room
+  tangents_.Insert(index, key.tangents, rows);
+  bits_.Insert(index, key.bits, rows);
+  markers_.Insert(index, key.marker, rows);
+  return true;
 }
 
 // At least half as many again as there are, so that many small requests don't move them each time.
@@ -78,48 +96,66 @@ Bool KeyRows::ReserveMore(LLong count)
   if (present + count <= rows_.GetCapacity())
     return true;
   const LLong wanted = present + (count > present / 2 ? count : present / 2);
-  return wanted <= kMost && rows_.Reserve(static_cast<Long>(wanted)) &&
-         (nodes_.GetCount() == 0 || nodes_.Reserve(static_cast<Long>(wanted)));
+  if (wanted > kMost)
+    return false;
+  const Long capacity = static_cast<Long>(wanted);
+  return rows_.Reserve(capacity) && tangents_.Reserve(capacity) && bits_.Reserve(capacity) &&
+         markers_.Reserve(capacity);
+}
+
+Bool KeyRows::DrawMarkers()
+{
+  for (Long i = 0; i < rows_.GetCount(); ++i) {
+    if (bits_.Get(i).markerDrawn != 0)
+      continue;
+    NodeMarker marker;
+    CreateUuid(marker.bytes);
+    if (!markers_.Prepare(marker, rows_.GetCount(), rows_.GetCapacity()))
+      return false;
+    markers_.Put(i, marker);
+  }
+  bits_.ForEach([](KeyRowBits& bits) { bits.markerDrawn = 1; });
+  return true;
 }
 
 Bool KeyRows::CopyTo(KeyRows& destination, ULong flags) const
 {
   destination.Flush();
   if (!rows_.CopyTo(destination.rows_) || !tangents_.CopyTo(destination.tangents_) ||
-      !nodes_.CopyTo(destination.nodes_)) {
+      !bits_.CopyTo(destination.bits_)) {
     destination.Flush();
     return false;
   }
-  for (KeyRowNode& node : destination.nodes_) {
-    node.marker = NodeMarker(); // a copy is never the same node
-    node.markerDrawn = 0;
+  destination.bits_.ForEach([flags](KeyRowBits& bits) {
+    bits.markerDrawn = 0; // a copy is never the same node
     if (flags & kCopyNoInfo)
-      node.info = 0;
-  }
+      bits.info = 0;
+  });
   return true;
 }
 
 void KeyRows::Remove(Long index)
 {
   rows_.Remove(index);
-  if (tangents_.GetCount() > 0)
-    tangents_.Remove(index);
-  if (nodes_.GetCount() > 0)
-    nodes_.Remove(index);
+  tangents_.Remove(index);
+  bits_.Remove(index);
+  markers_.Remove(index);
 }
 
 void KeyRows::Flush()
 {
   rows_.Flush();
   tangents_.Flush();
-  nodes_.Flush();
+  bits_.Flush();
+  markers_.Flush();
 }
 
 void KeyRows::Trim()
 {
   rows_.Trim();
   tangents_.Trim();
-  nodes_.Trim();
+  bits_.Trim();
+  markers_.Trim();
 }
 
 } // namespace _torvane_

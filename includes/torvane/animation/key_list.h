@@ -2,6 +2,8 @@
 // as nodes.
 #pragma once
 
+#include <cstring>
+
 #include "torvane/animation/ckey.h"
 
 namespace _torvane_
@@ -26,10 +28,8 @@ struct KeyRow
 {
   BaseTime time;
   Real value = 0.0;
-  Long interpolation = kInterpolationSpline;
-  ULong switches = 0; // node bits 32 to 63
 };
-static_assert(sizeof(KeyRow) <= 32);
+static_assert(sizeof(KeyRow) <= 24);
 
 struct KeyRowTangents
 {
@@ -39,60 +39,98 @@ struct KeyRowTangents
   Real rightValue = 0.0;
 };
 
-// What a key has as a node: nothing that a new one needs before it is written.
-struct KeyRowNode
+// What most keys of a curve have in common.
+struct KeyRowBits
 {
-  NodeMarker marker = {};
+  Long interpolation = kInterpolationSpline;
   ULong info = 0;
-  ULong nbits[2] = {0, 0}; // node bits 0 to 31 and 64 to 95
-  ULong markerDrawn = 0;   // 1 once there is a marker
+  ULong nbits[3] = {0, 0, 0}; // node bits 0 to 95
+  ULong markerDrawn = 0;      // 1 once there is a marker: a new node needs none before it is written
 };
-static_assert(sizeof(KeyRow) + sizeof(KeyRowNode) <= 64);
 
 // All of a plain key.
 struct PlainKey
 {
   KeyRow row;
   KeyRowTangents tangents;
-  KeyRowNode node;
+  KeyRowBits bits;
+  NodeMarker marker = {};
 };
 
-// Rows in the order of the list. Tangents, and what keys have as nodes, take room only when a key of the list has any.
+// One part of all rows. As long as it is the same in all of them it takes no room.
+template <class Part>
+class KeyParts
+{
+ public:
+  Part Get(Long index) const { return each_.GetCount() > 0 ? each_[index] : common_; }
+  Bool IsNew() const { return isNew_; } // all are as a new key has them
+  Bool IsCommon(const Part& part) const { return each_.GetCount() == 0 && IsSame(part, common_); }
+
+  // Makes ready for `part` to be put or inserted beside those of `rows` rows, with room for `capacity`. False, with
+  // nothing changed, when memory is short.
+  Bool Prepare(const Part& part, Long rows, Long capacity);
+  void Put(Long index, const Part& part);
+  void Insert(Long index, const Part& part, Long rows);
+  void Remove(Long index) { each_.Remove(index); }
+  // Changes all of them.
+  template <class Change>
+  void ForEach(Change&& change)
+  {
+    change(common_);
+    for (Part& part : each_)
+      change(part);
+    isNew_ = each_.GetCount() == 0 && IsSame(common_, Part());
+  }
+
+  Bool Reserve(Long capacity) { return each_.GetCount() == 0 || each_.Reserve(capacity); }
+  void Trim() { each_.Trim(); }
+  void Flush();
+  Bool CopyTo(KeyParts& destination) const;
+
+ private:
+  // By the bits, since what isn't kept must come back as it was.
+  static Bool IsSame(const Part& a, const Part& b) { return std::memcmp(&a, &b, sizeof(Part)) == 0; }
+
+  Part common_ = {};
+  GeTempDynArray<Part> each_; // empty while all are `common_`
+  Bool isNew_ = true;
+};
+
+// Rows in the order of the list. Tangents, markers and bits take room only where the keys of the list differ in them.
 class KeyRows
 {
  public:
   Long GetCount() const { return rows_.GetCount(); }
   const KeyRow& operator[](Long index) const { return rows_[index]; }
-  PlainKey Get(Long index) const { return {rows_[index], At(tangents_, index), At(nodes_, index)}; }
-  KeyRowTangents GetTangents(Long index) const { return At(tangents_, index); }
+  PlainKey Get(Long index) const { return {rows_[index], tangents_.Get(index), bits_.Get(index), markers_.Get(index)}; }
+  KeyRowTangents GetTangents(Long index) const { return tangents_.Get(index); }
+  KeyRowBits GetBits(Long index) const { return bits_.Get(index); }
+  NodeMarker GetMarker(Long index) const { return markers_.Get(index); }
   // These are false, with nothing changed, when memory is short.
   Bool Set(Long index, const PlainKey& key);
   Bool Insert(Long index, const PlainKey& key);
-  Bool Append(const KeyRow& row)
+  // A key without tangents behind all others.
+  Bool Append(const KeyRow& row, const KeyRowBits& bits)
   {
-    const Bool isBare = tangents_.GetCount() == 0 && nodes_.GetCount() == 0;
-    return isBare ? rows_.Append(row) : Insert(GetCount(), {row, {}, {}});
+    const Bool isRowAlone = GetCount() > 0 && tangents_.IsNew() && markers_.IsNew() && bits_.IsCommon(bits);
+    return isRowAlone ? rows_.Append(row) : Insert(GetCount(), {row, {}, bits, {}});
   }
   // Makes room for `count` more.
   Bool ReserveMore(LLong count);
+  // Gives a marker to each key that has none yet. False when memory is short.
+  Bool DrawMarkers();
   Bool CopyTo(KeyRows& destination, ULong flags) const; // with the markers still to be drawn
   void Remove(Long index);
   void Flush();
   void Trim();
 
  private:
-  // Parts that keys rarely have: as many as rows, or none.
-  template <class Part>
-  static Part At(const GeTempDynArray<Part>& parts, Long index)
-  {
-    return parts.GetCount() > 0 ? parts[index] : Part();
-  }
-  template <class Part>
-  Bool Need(GeTempDynArray<Part>& parts, const Part& part);
+  Bool Prepare(const PlainKey& key);
 
   GeTempDynArray<KeyRow> rows_;
-  GeTempDynArray<KeyRowTangents> tangents_;
-  GeTempDynArray<KeyRowNode> nodes_;
+  KeyParts<KeyRowTangents> tangents_;
+  KeyParts<KeyRowBits> bits_;
+  KeyParts<NodeMarker> markers_;
 };
 
 class KeyList : public RootCKey
