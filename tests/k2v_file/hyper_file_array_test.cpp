@@ -167,6 +167,51 @@ TEST(HyperFileArray, RefusesACountOrLengthThatDoesNotMatch)
               }).empty());
 }
 
+TEST(HyperFileArray, TakesLongColumnsTogetherAsOneByOne)
+{
+  constexpr LLong kRows = 100000;
+  std::vector<Vector> points(kRows);
+  for (std::size_t i = 0; i < points.size(); ++i)
+    points[i] = {std::sin(double(i)), double(i), i % 1000 == 0 ? std::nan("") : -1.5 * double(i)};
+  const Bytes whole = WithHeader(WriteToMemory([&](HyperFile& file) {
+    file.WriteChar(1);
+    for (Real* first : {&points[0].x, &points[0].y, &points[0].z})
+      file.WriteArray(first, kArrayReal, sizeof(Vector), kRows);
+    file.WriteLong(5);
+  }));
+  const std::size_t last = whole.size() - 5 - (6 + 8 * kRows); // where the last column begins
+  const TempFolder folder;
+  // What is damaged, by how much, and how many bytes are left of the file.
+  for (const auto& [place, change, left] : {std::tuple<std::size_t, int, std::size_t>{last, 0, whole.size()},
+                                            {last, 1, whole.size()},
+                                            {last + 4, 8, whole.size()},
+                                            {last + 5, -1, whole.size()},
+                                            {last, 0, last + 400000},
+                                            {last, 0, last + 3}}) {
+    SCOPED_TRACE(::testing::Message() << place << ' ' << change << ' ' << left);
+    Bytes bytes(whole.begin(), whole.begin() + static_cast<std::ptrdiff_t>(left));
+    if (place < left)
+      bytes[place] = static_cast<std::uint8_t>(bytes[place] + change);
+    WriteWholeFile(folder / "columns.q7r", bytes);
+    const Filename path((folder / "columns.q7r").c_str());
+    std::vector<Vector> together(kRows);
+    std::vector<Vector> single(kRows);
+    HyperFile files[2];
+    for (HyperFile& file : files) {
+      Char one = 0;
+      ASSERT_TRUE(file.Open(kSceneIdent, path, kHyperFileRead) && file.ReadChar(one));
+    }
+    const Bool read = files[0].ReadColumns(together.data(), kArrayReal, sizeof(Vector), kRows, 3, sizeof(Real));
+    for (Real* first : {&single[0].x, &single[0].y, &single[0].z})
+      files[1].ReadArray(first, kArrayReal, sizeof(Vector), kRows);
+    EXPECT_EQ(files[0].GetError(), files[1].GetError());
+    EXPECT_EQ(files[0].GetProblem().position, files[1].GetProblem().position);
+    EXPECT_EQ(read, change == 0 && left == whole.size());
+    Long five = 0;
+    EXPECT_TRUE(!read || (together == single && files[0].ReadLong(five) && five == 5));
+  }
+}
+
 TEST(HyperFileArray, PassesLargeArraysThroughPiecesOnDisk)
 {
   TempFolder folder;

@@ -241,6 +241,9 @@ class HyperFile : public GeMemory
   // Fails with FILEERROR_WRONG_VALUE unless the file holds exactly `count` elements of that type; floats and doubles
   // are converted into one another.
   Bool ReadArray(void* data, Long type, LLong stride, LLong count);
+  // `columns` such values, one behind the other. The first element of each lies `step` bytes behind that of the one
+  // before.
+  Bool ReadColumns(void* data, Long type, LLong stride, LLong count, Long columns, LLong step);
 
   // Chunk 132: the container's id and its elements; pointers are left out.
   Bool WriteContainer(const BaseContainer& container);
@@ -381,6 +384,8 @@ class HyperFile : public GeMemory
   Bool ReadHeader(ULong ident);
   void EndTranslation();
   Bool ReadElements(void* data, Long type, Long storedType, LLong stride, LLong count);
+  Bool MayTakeColumns(LLong size);
+  Bool TakeColumns(UChar* first, Long type, LLong stride, LLong count, Long columns, LLong step);
   struct LegacyArrayForm
   {
     Long type;            // of the elements in memory, an ArrayType

@@ -1,6 +1,9 @@
 // Array values: many elements behind one tag, converted a piece at a time.
+#include <cstring>
+
 #include "k2v_file/stream/array_elements.h"
 #include "k2v_file/stream/value_forms.h"
+#include "torvane/memory/owned.h"
 #include "torvane/stream/hyper_file.h"
 
 namespace _torvane_
@@ -11,6 +14,8 @@ namespace
 
 constexpr LLong kPieceSize = 65536;     // converted on the way
 constexpr LLong kInPlacePiece = 524288; // more than the buffer of a file, so that it is passed by
+constexpr LLong kColumnPiece = 327680;  // the same; with the rows that it goes to it stays in a processor's cache
+constexpr LLong kArrayHead = 6;         // tag, length and type
 constexpr LLong kLargestArray = UINT32_MAX - 1;
 
 Bool IsFloatType(Long type) { return type == kArraySReal || type == kArrayLReal; }
@@ -21,6 +26,13 @@ LLong PieceOf(LLong count, LLong size, LLong left)
 {
   const LLong piece = left >= size ? left / size : left > 0 ? 1 : kPieceSize / size;
   return piece < count ? piece : count;
+}
+
+void PutArrayHead(UChar (&head)[kArrayHead], Long type, LLong size)
+{
+  head[0] = kTagArray;
+  bytes::PutBig(head + 1, static_cast<ULong>(size + 1));
+  head[kArrayHead - 1] = static_cast<UChar>(type);
 }
 
 Long PlainType(Long type) { return type == kArrayReal ? static_cast<Long>(kArrayLReal) : type; }
@@ -105,6 +117,61 @@ Bool HyperFile::ReadElements(void* data, Long type, Long storedType, LLong strid
     count -= now;
     TickMany(now);
   }
+  return true;
+}
+
+Bool HyperFile::ReadColumns(void* data, Long type, LLong stride, LLong count, Long columns, LLong step)
+{
+  UChar* first = static_cast<UChar*>(data);
+  if (TakeColumns(first, type, stride, count, columns, step))
+    return true;
+  for (Long column = 0; error_ == FILEERROR_NONE && column < columns; ++column)
+    ReadArray(first + column * step, type, stride, count);
+  return error_ == FILEERROR_NONE;
+}
+
+// Whether so many bytes are there, in a file in which one may go to and fro.
+Bool HyperFile::MayTakeColumns(LLong size)
+{
+  const Filename& name = file_.GetName();
+  const Bool moves = !name.GetStream() && !name.GetIpConnection();
+  return error_ == FILEERROR_NONE && version_ >= kVersionArrayOrder && moves && !HasHook() &&
+         file_.GetRemaining() >= size;
+}
+
+// Long columns a stretch of each in turn, so that rows are filled while they are at hand. False, with nothing read, for
+// what isn't that plain: what is wrong then the other way tells.
+Bool HyperFile::TakeColumns(UChar* first, Long type, LLong stride, LLong count, Long columns, LLong step)
+{
+  type = PlainType(type);
+  const LLong size = GetElementSize(type);
+  if (size == 0 || columns < 2 || count < 2 * kColumnPiece / size || count > kLargestArray / size)
+    return false;
+  const LLong columnSize = kArrayHead + count * size;
+  if (!MayTakeColumns(columns * columnSize))
+    return false;
+  const Owned<UChar> block(static_cast<UChar*>(GeAllocNC(kArrayHead + kColumnPiece)));
+  if (!block)
+    return false;
+  UChar head[kArrayHead];
+  PutArrayHead(head, type, count * size);
+  const UnpackElements unpack = FindUnpackElements(type, type);
+  const LLong start = file_.GetPosition();
+  for (LLong done = 0, rows = kColumnPiece / size; done < count; done += rows) {
+    const LLong now = rows < count - done ? rows : count - done;
+    const LLong before = done == 0 ? kArrayHead : 0; // the first stretch is read with the head
+    for (Long column = 0; column < columns; ++column) {
+      const LLong place = start + column * columnSize + kArrayHead - before + done * size;
+      if (!file_.Seek(place) || file_.ReadBytes(block.get(), before + now * size) == 0)
+        return FailFromFile(place);
+      if (before > 0 && std::memcmp(block.get(), head, kArrayHead) != 0) {
+        file_.Seek(start);
+        return false;
+      }
+      unpack(first + column * step + done * stride, block.get() + before, stride, now);
+    }
+  }
+  TickMany(columns * count);
   return true;
 }
 

@@ -123,14 +123,12 @@ namespace
 template <class Visitor>
 Bool VisitColumns(Visitor& v, const ColumnLayout& layout, void* block, LLong count)
 {
-  const LLong elements = count * layout.elementsPerEntry;
-  for (Long column = 0; v.Good() && column < layout.columns; ++column) {
-    UChar* first = static_cast<UChar*>(block) + column * layout.step;
-    if constexpr (Visitor::kReading)
-      v.Note(v.File().ReadArray(first, layout.elementType, layout.stride, elements));
-    else
-      v.Note(v.File().WriteArray(first, layout.elementType, layout.stride, elements));
-  }
+  const auto& [type, columns, step, stride, perEntry, least] = layout;
+  const LLong elements = count * perEntry;
+  if constexpr (Visitor::kReading)
+    v.Note(v.File().ReadColumns(block, type, stride, elements, columns, step));
+  for (Long column = 0; !Visitor::kReading && v.Good() && column < columns; ++column)
+    v.Note(v.File().WriteArray(static_cast<UChar*>(block) + column * step, type, stride, elements));
   return v.Good();
 }
 
