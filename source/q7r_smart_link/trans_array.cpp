@@ -24,6 +24,7 @@ constexpr GeAliasID kLeaves = kCountedIds / kLeafIds;
 template <class T>
 T* NewArray(GeAliasID count)
 {
+  // NOLINTNEXTLINE(bugprone-sizeof-expression): T may be a pointer
   return static_cast<T*>(GeAlloc(static_cast<LLong>(count * sizeof(T))));
 }
 

@@ -89,7 +89,10 @@ class KeyParts
 
  private:
   // By the bits, since what isn't kept must come back as it was.
-  static Bool IsSame(const Part& a, const Part& b) { return std::memcmp(&a, &b, sizeof(Part)) == 0; }
+  static Bool IsSame(const Part& a, const Part& b)
+  {
+    return std::memcmp(&a, &b, sizeof a) == 0; // NOLINT(bugprone-suspicious-memory-comparison)
+  }
 
   Part common_ = {};
   GeTempDynArray<Part> each_; // empty while all are `common_`
