@@ -88,14 +88,14 @@ Bool KeyRows::Insert(Long index, const PlainKey& key)
   return true;
 }
 
-// At least half as many again as there are, so that many small requests don't move them each time.
+// At least as many again as there are: memory that isn't used yet costs less than moving what is large.
 Bool KeyRows::ReserveMore(LLong count)
 {
   constexpr LLong kMost = 0x7FFFFFFF;
   const LLong present = rows_.GetCount();
   if (present + count <= rows_.GetCapacity())
     return true;
-  const LLong wanted = present + (count > present / 2 ? count : present / 2);
+  const LLong wanted = present + (count > present ? count : present);
   if (wanted > kMost)
     return false;
   const Long capacity = static_cast<Long>(wanted);
