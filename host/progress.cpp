@@ -1,10 +1,10 @@
 #include "host/progress.h"
 
-#include "host/model/layer_streams.h"
-#include "host/model/timing.h"
-
 #include <algorithm>
 #include <unordered_map>
+
+#include "host/model/layer_streams.h"
+#include "host/model/timing.h"
 
 namespace host
 {

@@ -1,11 +1,11 @@
 #include "host/standalone_host.h"
 
-#include "host/suites/host_state.h"
-#include "host/text.h"
-
 #include <algorithm>
 #include <new>
 #include <utility>
+
+#include "host/suites/host_state.h"
+#include "host/text.h"
 
 namespace host
 {

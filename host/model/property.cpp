@@ -1,9 +1,9 @@
 #include "host/model/property.h"
 
-#include "host/model/turning.h"
-
 #include <algorithm>
 #include <cmath>
+
+#include "host/model/turning.h"
 
 namespace host
 {

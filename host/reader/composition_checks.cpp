@@ -1,9 +1,9 @@
 #include "host/reader/composition_checks.h"
 
-#include "host/text.h"
-
 #include <algorithm>
 #include <unordered_map>
+
+#include "host/text.h"
 
 namespace host
 {

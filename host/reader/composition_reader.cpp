@@ -1,6 +1,12 @@
 // Reads a composition file into a project.
 #include "host/reader/composition_reader.h"
 
+#include <algorithm>
+#include <cmath>
+#include <optional>
+#include <unordered_map>
+#include <unordered_set>
+
 #include "host/model/timing.h"
 #include "host/reader/composition_checks.h"
 #include "host/reader/item_reader.h"
@@ -9,12 +15,6 @@
 #include "host/reader/warnings.h"
 #include "host/text.h"
 
-#include <algorithm>
-#include <cmath>
-#include <optional>
-#include <unordered_map>
-#include <unordered_set>
-
 namespace host
 {
 
@@ -22,6 +22,7 @@ namespace
 {
 
 constexpr double kLargestFrame = 1e9; // so that rounding fits; times are tested exactly
+constexpr const char* kUncountable = "beyond what the host can count";
 
 // The layers of a composition as the file lists them.
 struct LayerList
@@ -87,16 +88,16 @@ CompositionReader::Frames CompositionReader::ReadFrames(const Json& start, const
   const double first = document_.Number(start), last = document_.Number(end);
   for (const Json* json : {&start, &end})
     if (std::abs(document_.Number(*json)) > kLargestFrame)
-      document_.Refuse(*json, "beyond what the host can count");
+      document_.Refuse(*json, kUncountable);
   if (last < first || (last == first && !mayBeEmpty))
     document_.Refuse(end, "the end is not after the start");
   const std::int64_t from = std::llround(first), to = std::llround(last);
   const std::optional<A_Time> begin = FramesToTime(from, project_.frameDuration);
   const std::optional<A_Time> duration = FramesToTime(to - from, project_.frameDuration);
   if (!begin)
-    document_.Refuse(start, "beyond what the host can count");
+    document_.Refuse(start, kUncountable);
   if (!duration)
-    document_.Refuse(end, "beyond what the host can count");
+    document_.Refuse(end, kUncountable);
   return {*begin, *duration};
 }
 

@@ -1,12 +1,12 @@
 #include "host/reader/json_document.h"
 
-#include "host/model/composition.h"
-#include "host/text.h"
-
 #include <algorithm>
 #include <cmath>
 #include <cstdlib>
 #include <vector>
+
+#include "host/model/composition.h"
+#include "host/text.h"
 
 namespace host
 {

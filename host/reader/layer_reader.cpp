@@ -1,12 +1,12 @@
 #include "host/reader/layer_reader.h"
 
-#include "host/model/layer_streams.h"
-#include "host/reader/composition_keys.h"
-#include "host/reader/property_reader.h"
-
 #include <algorithm>
 #include <cmath>
 #include <limits>
+
+#include "host/model/layer_streams.h"
+#include "host/reader/composition_keys.h"
+#include "host/reader/property_reader.h"
 
 namespace host
 {

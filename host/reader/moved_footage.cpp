@@ -1,9 +1,9 @@
 #include "host/reader/moved_footage.h"
 
-#include "host/text.h"
-
 #include <algorithm>
 #include <unordered_map>
+
+#include "host/text.h"
 
 namespace host
 {

@@ -1,5 +1,8 @@
 #include "host/reader/project_file.h"
 
+#include <algorithm>
+#include <unordered_map>
+
 #include "host/file_bytes.h"
 #include "host/model/layer_streams.h"
 #include "host/model/timing.h"
@@ -10,9 +13,6 @@
 #include "host/reader/unfolded_layers.h"
 #include "host/reader/warnings.h"
 #include "host/text.h"
-
-#include <algorithm>
-#include <unordered_map>
 
 namespace host
 {

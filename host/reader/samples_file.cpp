@@ -1,12 +1,12 @@
 #include "host/reader/samples_file.h"
 
+#include <algorithm>
+
 #include "host/file_bytes.h"
 #include "host/model/ratio.h"
 #include "host/reader/composition_reader.h"
 #include "host/reader/warnings.h"
 #include "host/text.h"
-
-#include <algorithm>
 
 namespace host
 {

@@ -1,15 +1,15 @@
 #include "host/writer/composition_writer.h"
 
+#include <algorithm>
+#include <cmath>
+#include <unordered_map>
+#include <unordered_set>
+
 #include "host/model/layer_streams.h"
 #include "host/model/timing.h"
 #include "host/reader/composition_keys.h"
 #include "host/text.h"
 #include "host/writer/property_writer.h"
-
-#include <algorithm>
-#include <cmath>
-#include <unordered_map>
-#include <unordered_set>
 
 namespace host
 {

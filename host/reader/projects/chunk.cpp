@@ -1,10 +1,10 @@
 #include "host/reader/projects/chunk.h"
 
-#include "host/model/composition.h"
-#include "host/text.h"
-
 #include <algorithm>
 #include <map>
+
+#include "host/model/composition.h"
+#include "host/text.h"
 
 namespace host::projects
 {

@@ -1,14 +1,14 @@
 #include "host/reader/projects/composition_builder.h"
 
+#include <algorithm>
+#include <unordered_set>
+
 #include "host/model/layer_streams.h"
 #include "host/model/timing.h"
 #include "host/reader/composition_checks.h"
 #include "host/reader/item_reader.h"
 #include "host/reader/projects/layouts.h"
 #include "host/reader/warnings.h"
-
-#include <algorithm>
-#include <unordered_set>
 
 namespace host::projects
 {

@@ -1,8 +1,8 @@
 #include "host/reader/projects/composition_settings.h"
 
-#include "host/reader/projects/layouts.h"
-
 #include <cmath>
+
+#include "host/reader/projects/layouts.h"
 
 namespace host::projects
 {

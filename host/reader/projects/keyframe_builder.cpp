@@ -1,10 +1,10 @@
 #include "host/reader/projects/keyframe_builder.h"
 
-#include "host/reader/projects/layouts.h"
-#include "host/reader/projects/roving.h"
-
 #include <algorithm>
 #include <cmath>
+
+#include "host/reader/projects/layouts.h"
+#include "host/reader/projects/roving.h"
 
 namespace host::projects
 {

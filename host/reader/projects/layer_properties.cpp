@@ -1,10 +1,10 @@
 #include "host/reader/projects/layer_properties.h"
 
-#include "host/model/layer_streams.h"
-#include "host/reader/projects/layouts.h"
-
 #include <algorithm>
 #include <limits>
+
+#include "host/model/layer_streams.h"
+#include "host/reader/projects/layouts.h"
 
 namespace host::projects
 {

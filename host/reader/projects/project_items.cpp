@@ -1,10 +1,10 @@
 #include "host/reader/projects/project_items.h"
 
-#include "host/reader/projects/layouts.h"
-#include "host/text.h"
-
 #include <nlohmann/json.hpp>
 #include <utf8.h>
+
+#include "host/reader/projects/layouts.h"
+#include "host/text.h"
 
 #include <algorithm>
 

@@ -1,10 +1,10 @@
 #include "host/reader/projects/property_chunks.h"
 
-#include "host/reader/projects/layouts.h"
-#include "host/reader/projects/project_items.h"
-
 #include <algorithm>
 #include <cmath>
+
+#include "host/reader/projects/layouts.h"
+#include "host/reader/projects/project_items.h"
 
 namespace host::projects
 {

@@ -1,9 +1,9 @@
 #include "host/reader/projects/xml_tree.h"
 
-#include "host/model/composition.h"
-
 #include <nlohmann/json.hpp>
 #include <pugixml.hpp>
+
+#include "host/model/composition.h"
 
 #include <algorithm>
 #include <limits>

@@ -1,8 +1,8 @@
 #include "torvane/tags/joint_weight_table.h"
 
-#include "torvane/memory/owned.h"
-
 #include <cmath>
+
+#include "torvane/memory/owned.h"
 
 #include "k2v_file/stream/array_elements.h"
 #include "k2v_file/stream/chunk_visitor.h"
