@@ -186,7 +186,7 @@ TEST(Alias, TakesAnIdOnlyFromAGoalBlockOfExactSize)
   }
 }
 
-// A link in a container is stored by copy while it sits on its placeholder, and the container may be copied then too.
+// A link in a container is stored by copy while it waits for its goal, and the container may be copied then too.
 TEST(Alias, ResolvesAContainersLinkThatIsReadBeforeItsGoal)
 {
   ByteWriter bytes;
