@@ -40,6 +40,7 @@ class MarkedObject : public BaseObject
     renderMode_ = fields.numbers[1];
     disabled_ = fields.numbers[2];
     rotationOrder_ = fields.numbers[3];
+    markerDrawn_ = true; // none is taken from the run that happens to come first
   }
 };
 
