@@ -23,13 +23,14 @@ namespace
 
 constexpr std::uintptr_t kLargePage = std::uintptr_t{1} << 21;
 
-// Asks for large pages wherever they fit between two addresses. Only a wish, whose failure changes nothing.
+// Asks for large pages wherever they fit between two addresses. Only a wish, whose failure changes nothing. It is asked
+// for all of a block: one that is half of the one kind and half of the other can't grow without a copy.
 void AskForLargePages(std::uintptr_t start, std::uintptr_t end)
 {
-  const std::uintptr_t first = (start + kLargePage - 1) / kLargePage * kLargePage;
-  const std::uintptr_t last = end / kLargePage * kLargePage;
-  if (first < last)
-    ::madvise(reinterpret_cast<void*>(first), last - first, MADV_HUGEPAGE);
+  static const auto page = static_cast<std::uintptr_t>(::sysconf(_SC_PAGESIZE));
+  const std::uintptr_t first = start / page * page;
+  const std::uintptr_t last = (end + page - 1) / page * page;
+  ::madvise(reinterpret_cast<void*>(first), last - first, MADV_HUGEPAGE);
 }
 
 #endif
@@ -60,7 +61,7 @@ void LookAfterHeap(std::uintptr_t end)
                                    ::mallopt(M_TOP_PAD, static_cast<int>(kHeapStep)) != 0;
   const std::uintptr_t known = gHeapEnd.exchange(heapEnd, std::memory_order_relaxed);
   if (growsInSteps)
-    AskForLargePages(known / kLargePage * kLargePage, heapEnd);
+    AskForLargePages(known, heapEnd);
 }
 
 #endif
