@@ -1,23 +1,24 @@
 #include "gltf/file/byte_buffer.h"
 
 #include <algorithm>
-#include <cstring>
+#include <string_view>
 
 namespace gltf
 {
 
 void ByteBuffer::Append(const void* data, std::size_t size)
 {
-  const auto* bytes = static_cast<const std::uint8_t*>(data);
-  while (size > 0) {
-    if (size_ % kBlock == 0)
+  std::string_view bytes(static_cast<const char*>(data), size);
+  while (!bytes.empty()) {
+    if (size_ % kBlock == 0) {
+      if (size_ > kKeptInMemory)
+        blocks_.back().PutBy(store_);
       blocks_.emplace_back();
-    std::vector<std::uint8_t>& block = blocks_.back();
-    const std::size_t part = std::min(size, kBlock - block.size());
-    block.insert(block.end(), bytes, bytes + part);
-    bytes += part;
-    size -= part;
-    size_ += part;
+    }
+    const std::string_view part = bytes.substr(0, kBlock - blocks_.back().Size());
+    blocks_.back().Append(part);
+    bytes.remove_prefix(part.size());
+    size_ += part.size();
   }
 }
 
@@ -31,15 +32,15 @@ bool ByteBuffer::Holds(std::size_t offset, const void* data, std::size_t size) c
 {
   if (offset > size_ || size > size_ - offset)
     return false;
-  const auto* bytes = static_cast<const std::uint8_t*>(data);
-  while (size > 0) {
+  std::string_view bytes(static_cast<const char*>(data), size);
+  std::string buffer;
+  while (!bytes.empty()) {
     const std::size_t inBlock = offset % kBlock;
-    const std::size_t part = std::min(size, kBlock - inBlock);
-    if (std::memcmp(blocks_[offset / kBlock].data() + inBlock, bytes, part) != 0)
+    const std::string_view part = bytes.substr(0, kBlock - inBlock);
+    if (blocks_[offset / kBlock].Get(inBlock, part.size(), buffer) != part)
       return false;
-    offset += part;
-    bytes += part;
-    size -= part;
+    offset += part.size();
+    bytes.remove_prefix(part.size());
   }
   return true;
 }

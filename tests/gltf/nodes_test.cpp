@@ -241,7 +241,7 @@ TEST_F(GltfHidden, HiddenCamerasStayAndHiddenPartsCanBeKept)
 }
 
 // What lies in a temporary file comes back, in its place, also when more follows.
-TEST(GltfLongText, IsWholeWhereverItLies)
+TEST(GltfLongParts, AreWholeWhereverTheyLie)
 {
   gltf::LongText text;
   std::string expected = "before";
@@ -260,6 +260,17 @@ TEST(GltfLongText, IsWholeWhereverItLies)
   }
   EXPECT_EQ(text.Size(), expected.size());
   EXPECT_TRUE(text.Joined() == expected);
+
+  gltf::ByteBuffer bytes;
+  bytes.Append(expected.data(), expected.size());
+  for (const std::size_t offset : {0U, 500'000U, 1'000'000U, 3'000'000U}) {
+    EXPECT_TRUE(bytes.Holds(offset, expected.data() + offset, 1'500'000)) << offset;
+    EXPECT_FALSE(bytes.Holds(offset, expected.data() + offset + 1, 1'500'000)) << offset;
+  }
+  bytes.Pad(16);
+  std::string whole;
+  bytes.ForEachBlock([&](const std::uint8_t* data, std::size_t size) { whole.append(data, data + size); });
+  EXPECT_TRUE(whole == expected + std::string((16 - expected.size() % 16) % 16, '\0'));
 }
 
 } // namespace
