@@ -103,8 +103,10 @@ Model Convert(BaseDocument& document, const Options& options)
 
   TrackSet none;
   const std::size_t camera = tree.SceneCamera();
-  if (camera != kNone) // many viewers take the first one
-    AddCamera(context, *tree[camera].object, tracks.tracks[camera] ? *tracks.tracks[camera] : none);
+  if (camera != kNone) { // many viewers take the first one
+    TrackSet* const own = tracks.tracks[camera];
+    AddCamera(context, *tree[camera].object, own ? *own : none);
+  }
   Nodes(context, targets, tracks.motions, tracks.tracks).Write();
 
   const Real offset = timeline.Offset();

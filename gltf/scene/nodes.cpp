@@ -75,7 +75,8 @@ void Nodes::WriteNode(std::size_t index)
   if (!name.empty())
     node["name"] = name;
   TrackSet none;
-  TrackSet& tracks = tracks_[index] ? *tracks_[index] : none;
+  TrackSet* const own = tracks_[index];
+  TrackSet& tracks = own ? *own : none;
   const Parts parts = PartsOf(index, tracks);
   AddChildren(index, entry.hidden && parts.IsSeen() ? HiddenPart(parts) : kNone, node);
   AddPlace(index, node);
