@@ -11,7 +11,7 @@
 namespace gltf
 {
 
-inline constexpr std::size_t kKeptInMemory = std::size_t{1} << 20; // bytes of something long that aren't put by
+inline constexpr std::size_t kKeptInMemory = std::size_t{1} << 18; // bytes of something long that aren't put by
 
 // Nameless: the system removes it when it is closed, however the program ends.
 class TemporaryStore

@@ -1,5 +1,8 @@
 #include "gltf/scene/nodes.h"
 
+#include <algorithm>
+#include <utility>
+
 #include "gltf/motion/animation.h"
 #include "gltf/scene/camera.h"
 #include "gltf/scene/light.h"
@@ -34,15 +37,24 @@ bool IsIdentity(const Quaternion& q) { return q.x == 0.0 && q.y == 0.0 && q.z ==
 
 } // namespace
 
+// False for one that is taken.
+bool UniqueNames::Enter(const std::string& name)
+{
+  const std::size_t hash = std::max<std::size_t>(std::hash<std::string>()(name), 1);
+  std::size_t place = hash;
+  while (taken_[place %= taken_.size()] != 0 && taken_[place] != hash)
+    ++place;
+  return std::exchange(taken_[place], hash) == 0;
+}
+
 std::string UniqueNames::Take(const std::string& name)
 {
-  const std::hash<std::string> hashOf;
-  if (name.empty() || taken_.insert(hashOf(name)).second)
+  if (name.empty() || Enter(name))
     return name;
   int& number = next_.try_emplace(name, 2).first->second;
   for (;; ++number) {
     std::string other = name + "." + std::to_string(number);
-    if (taken_.insert(hashOf(other)).second)
+    if (Enter(other))
       return other;
   }
 }

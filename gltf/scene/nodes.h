@@ -1,9 +1,11 @@
 // Objects as nodes, with what hangs on them.
 #pragma once
 
+#include <bit>
+#include <cstddef>
 #include <string>
 #include <unordered_map>
-#include <unordered_set>
+#include <vector>
 
 #include "gltf/context.h"
 #include "gltf/scene/targets.h"
@@ -16,11 +18,16 @@ namespace gltf
 class UniqueNames
 {
  public:
-  explicit UniqueNames(std::size_t count) { taken_.reserve(count); }
+  // For so many names.
+  explicit UniqueNames(std::size_t count) : taken_(std::bit_ceil(count + count / 2 + 1)) {}
   std::string Take(const std::string& name); // an empty one stays so
 
  private:
-  std::unordered_set<std::size_t> taken_;     // by their hashes: who meets the hash of another name gives way too
+  bool Enter(const std::string& name);
+
+  // By their hashes, each at the first free place from its own on, 0 where none is: a scene has many names. Who meets
+  // the hash of another name gives way too.
+  std::vector<std::size_t> taken_;
   std::unordered_map<std::string, int> next_; // the number to try for a name that is taken
 };
 

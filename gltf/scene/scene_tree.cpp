@@ -42,6 +42,24 @@ void TakeIfUsable(const BaseContainer& settings, Long id, Real& value)
     value = number;
 }
 
+// In the order of the tree; null behind the last.
+BaseObject* NextOf(BaseObject* object)
+{
+  if (BaseObject* child = object->GetDown())
+    return child;
+  while (object && !object->GetNext())
+    object = object->GetUp();
+  return object ? object->GetNext() : nullptr;
+}
+
+std::size_t CountAll(BaseObject* first)
+{
+  std::size_t count = 0;
+  for (BaseObject* object = first; object; object = NextOf(object))
+    ++count;
+  return count;
+}
+
 } // namespace
 
 bool StandsForLayer(const BaseObject& object) { return object.GetDataInstance().FindData(kKeyLayerId) != nullptr; }
@@ -55,7 +73,10 @@ SceneTree::SceneTree(BaseDocument& document)
 // Without a recursion: chains of parents are as long as their makers like.
 void SceneTree::AddAll(BaseObject* first)
 {
+  const std::size_t count = CountAll(first); // a list that grows is there twice, now and then
+  objects_.reserve(count);
   std::vector<std::size_t> offLayer; // by object: the nearest ancestor that isn't on its scene layer, or kNone
+  offLayer.reserve(count);
   std::size_t parent = kNone;
   std::size_t before = kNone; // the sibling before
   for (BaseObject* object = first; object;) {
@@ -76,7 +97,6 @@ void SceneTree::AddAll(BaseObject* first)
     }
     object = object->GetNext();
   }
-  objects_.shrink_to_fit();
 }
 
 std::size_t SceneTree::Add(BaseObject& object, std::size_t parent, std::vector<std::size_t>& offLayer)
