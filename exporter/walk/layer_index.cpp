@@ -2,25 +2,12 @@
 
 #include <new>
 
+#include "torvane/objects/object_walk.h"
+
 namespace exporter
 {
 
 using namespace _torvane_;
-
-namespace
-{
-
-// The object behind this one, depth first; null at the end.
-BaseObject* NextDepthFirst(BaseObject* object)
-{
-  if (BaseObject* child = object->GetDown())
-    return child;
-  while (object && !object->GetNext())
-    object = object->GetUp();
-  return object ? object->GetNext() : nullptr;
-}
-
-} // namespace
 
 Long GetLayerId(const BaseObject& object) { return object.GetDataInstance().GetLong(kKeyLayerId, kNoLayerId); }
 
@@ -28,7 +15,7 @@ BaseObject* FindLayerObject(BaseObject* first, Long layerId)
 {
   if (layerId == kNoLayerId)
     return nullptr;
-  for (BaseObject* object = first; object; object = NextDepthFirst(object)) {
+  for (BaseObject* object = first; object; object = GetNextDepthFirst(object)) {
     if (GetLayerId(*object) == layerId)
       return object;
   }

@@ -4,6 +4,7 @@
 #include <cmath>
 
 #include "torvane/ids.h"
+#include "torvane/objects/object_walk.h"
 #include "torvane/objects/unit_factors.h"
 #include "torvane/render/render_data.h"
 #include "torvane/views/base_draw.h"
@@ -42,20 +43,10 @@ void TakeIfUsable(const BaseContainer& settings, Long id, Real& value)
     value = number;
 }
 
-// In the order of the tree; null behind the last.
-BaseObject* NextOf(BaseObject* object)
-{
-  if (BaseObject* child = object->GetDown())
-    return child;
-  while (object && !object->GetNext())
-    object = object->GetUp();
-  return object ? object->GetNext() : nullptr;
-}
-
 std::size_t CountAll(BaseObject* first)
 {
   std::size_t count = 0;
-  for (BaseObject* object = first; object; object = NextOf(object))
+  for (BaseObject* object = first; object; object = GetNextDepthFirst(object))
     ++count;
   return count;
 }

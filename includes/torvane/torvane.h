@@ -39,6 +39,7 @@
 #include "torvane/objects/ies_light.h"
 #include "torvane/objects/light_object_data.h"
 #include "torvane/objects/light_parameters.h"
+#include "torvane/objects/object_walk.h"
 #include "torvane/objects/plane_parameters.h"
 #include "torvane/objects/point_object.h"
 #include "torvane/objects/point_object_data.h"
