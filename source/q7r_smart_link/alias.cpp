@@ -23,14 +23,8 @@ constexpr LLong kRecordSize = kMarkSize + static_cast<LLong>(sizeof(GeAliasID));
 constexpr LLong kNameLengthSize = 4;
 constexpr LLong kValueHead = StoredSize(kTagMemory); // in front of a record
 
+constexpr GeAliasID kLot = 64; // of numbers
 std::atomic<GeAliasID> gNextTrunkId{1};
-
-GeAliasID TakeTrunkId()
-{
-  if (ReproducibleRun* run = ReproducibleRun::GetCurrent())
-    return run->TakeLinkId();
-  return gNextTrunkId.fetch_add(1, std::memory_order_relaxed);
-}
 
 // What FirstLinkOfGoal gives for a link without an owner.
 constexpr struct EmptyOwner
@@ -117,8 +111,33 @@ void GeAliasXLink::Detach()
 
 GeAliasGoal* GeAliasXLink::GetGoal() const { return trunk ? trunk->goal : nullptr; }
 
-AliasTrunk::AliasTrunk(GeAliasGoal& trunkGoal)
-    : goal(&trunkGoal), id(TakeTrunkId() & ((GeAliasID{1} << kIdBits) - 1)), inTranslation(0), inPage(0), place(0)
+GeAliasID TrunkIds::TakeOne()
+{
+  ReproducibleRun* run = ReproducibleRun::GetCurrent();
+  return run ? run->TakeLinkId() : gNextTrunkId.fetch_add(1, std::memory_order_relaxed);
+}
+
+GeAliasID TrunkIds::Take()
+{
+  if (ReproducibleRun* run = ReproducibleRun::GetCurrent())
+    return run->TakeLinkId();
+  if (next_ == end_) {
+    next_ = gNextTrunkId.fetch_add(kLot, std::memory_order_relaxed);
+    end_ = next_ + kLot;
+  }
+  return next_++;
+}
+
+void TrunkIds::GiveBack()
+{
+  GeAliasID end = end_;
+  if (next_ < end_)
+    gNextTrunkId.compare_exchange_strong(end, next_, std::memory_order_relaxed);
+  next_ = end_ = 0;
+}
+
+AliasTrunk::AliasTrunk(GeAliasGoal& trunkGoal, GeAliasID trunkId)
+    : goal(&trunkGoal), id(trunkId & ((GeAliasID{1} << kIdBits) - 1)), inTranslation(0), inPage(0), place(0)
 {}
 
 void AliasTrunk::Empty()
@@ -293,9 +312,14 @@ Bool GeAliasLink::ReadLink(HyperFile& file)
   GeAliasID id = 0;
   if (!GetRecord(record.Bytes(), record.Size(), kLinkMark, id))
     return true;
+  return CheckMemory(file, ReadName(record.Bytes() + kRecordSize, record.Size() - kRecordSize)) &&
+         TakeTargetId(file, id);
+}
+
+Bool GeAliasLink::TakeTargetId(HyperFile& file, GeAliasID id)
+{
   TransArray* translation = file.GetTranslator();
-  return CheckMemory(file, ReadName(record.Bytes() + kRecordSize, record.Size() - kRecordSize) &&
-                               (!translation || translation->RegisterLink(id, *this, nullptr)));
+  return !translation || CheckMemory(file, translation->RegisterLink(id, *this, nullptr));
 }
 
 // ---------------------------------------------------------------------------------------------------------------
@@ -305,7 +329,7 @@ GeAliasGoal::~GeAliasGoal() { DropLinks(); }
 AliasTrunk* GeAliasGoal::NeedTrunk()
 {
   if (!trunk)
-    trunk = NewObj<AliasTrunk>(*this);
+    trunk = NewObj<AliasTrunk>(*this, TrunkIds::TakeOne());
   return trunk;
 }
 

@@ -84,13 +84,13 @@ AliasTrunk* TransArray::FindOrMakeTrunk(GeAliasID id, GeAliasGoal& goal)
     return trunk;
   AliasTrunk* trunk = nullptr;
   if (count_ < kFewTrunks || id >= kCountedIds) {
-    trunk = NewObj<AliasTrunk>(goal);
+    trunk = NewObj<AliasTrunk>(goal, ids_.Take());
     if (trunk && !single_.Add(id, *trunk))
       DeleteObj(trunk);
   } else if (Entry* entry = NeedEntry(id)) {
     const ULong place = id % TrunkPage::kTrunks;
-    entry->made |= ULong{1} << place;
-    trunk = ::new (static_cast<void*>(entry->page->Trunks() + place)) AliasTrunk(goal);
+    entry->made |= ULLong{1} << place;
+    trunk = ::new (static_cast<void*>(entry->page->Trunks() + place)) AliasTrunk(goal, ids_.Take());
     trunk->place = place % TrunkPage::kTrunks;
     trunk->inPage = 1;
   }
@@ -206,6 +206,7 @@ void TransArray::FinishTranslation(Bool keepToOrigin)
     GeFree(leaves_[i]);
   }
   GeFree(leaves_);
+  ids_.GiveBack();
   count_ = 0;
 }
 

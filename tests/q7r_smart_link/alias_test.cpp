@@ -1,4 +1,7 @@
+#include <set>
+
 #include "support/library.h"
+#include "torvane/time/reproducible_run.h"
 
 namespace
 {
@@ -50,6 +53,46 @@ TEST(Alias, FollowsItsGoalUntilThatGoes)
   EXPECT_EQ(link.GetLink(), FakeNode(3));
   link.ClearLink();
   EXPECT_FALSE(later.HasLinks());
+}
+
+// A translation takes numbers by the lot, and gives back what it didn't use if it can.
+TEST(Alias, TargetsAreNumberedInARowWhoeverMakesThem)
+{
+  const auto takeNumber = [] {
+    GeAliasGoal goal(FakeNode(1));
+    GeAliasLink link;
+    link.SetLinkGoal(&goal);
+    return goal.GetGoalId();
+  };
+  GeAliasID last = takeNumber();
+  for (const std::size_t count : {1, 63, 64, 65, 1000}) {
+    for (const bool meanwhile : {false, true}) {
+      std::vector<GeAliasGoal> goals(count);
+      std::vector<GeAliasLink> links(count);
+      std::set<GeAliasID> numbers{last};
+      TransArray translation;
+      for (std::size_t i = 0; i < count; ++i) {
+        translation.RegisterGoal(i + 1, goals[i]);
+        translation.RegisterLink(i + 1, links[i], nullptr);
+        numbers.insert(goals[i].GetGoalId());
+        if (meanwhile)
+          numbers.insert(takeNumber());
+      }
+      if (const ReproducibleRun run(1, DateTime()); meanwhile) {
+        GeAliasGoal late;
+        GeAliasLink link;
+        translation.RegisterGoal(count + 1, late);
+        translation.RegisterLink(count + 1, link, nullptr);
+        EXPECT_EQ(late.GetGoalId(), GeAliasID{1} << 32);
+      }
+      translation.FinishTranslation(false);
+      EXPECT_EQ(numbers.size(), 1 + count + (meanwhile ? count : 0));
+      EXPECT_TRUE(meanwhile || *numbers.rbegin() == last + count);
+      const GeAliasID next = takeNumber();
+      EXPECT_TRUE(next > *numbers.rbegin() && (meanwhile || next == last + count + 1)) << count;
+      last = next;
+    }
+  }
 }
 
 TEST(Alias, CopiesTargetAndLabelWithoutATranslation)

@@ -80,6 +80,8 @@ class GeAliasLink
   // One Memory value: "alias2", the id, and the label if there is one.
   Bool WriteLink(HyperFile& file) const;
   Bool ReadLink(HyperFile& file);
+  // What ReadLink does with the id that it read. False, with the file's error, when memory is short.
+  Bool TakeTargetId(HyperFile& file, GeAliasID id);
 
   // Points at a goal directly, making its trunk if needed; null clears. False when memory is short: the link is empty
   // then.
@@ -165,14 +167,35 @@ class GeAliasGoal : public GeMemory
   Bool resolvable = true;      // when false a link gives null for this goal, though it stays attached
 };
 
+// Where the numbers of trunks come from: the reproducible run of the thread, or the counter of the process. One that
+// takes many takes them from the counter by the lot, since all threads have to wait for each other there.
+class TrunkIds
+{
+ public:
+  TrunkIds() = default;
+  ~TrunkIds() { GiveBack(); }
+  TrunkIds(const TrunkIds&) = delete;
+  TrunkIds& operator=(const TrunkIds&) = delete;
+
+  // One that belongs to no lot.
+  static GeAliasID TakeOne();
+  GeAliasID Take();
+  // What is left of a lot goes back to the counter if nobody took any since; else the numbers stay unused.
+  void GiveBack();
+
+ private:
+  GeAliasID next_ = 0;
+  GeAliasID end_ = 0; // of the lot in hand
+};
+
 // The meeting point of a goal and its links. It lives until its goal goes, or until the end of the translation that
 // made it if that is later.
 struct AliasTrunk
 {
-  explicit AliasTrunk(GeAliasGoal& trunkGoal);
+  AliasTrunk(GeAliasGoal& trunkGoal, GeAliasID trunkId);
   ~AliasTrunk() { Empty(); }
 
-  static constexpr int kIdBits = 57;
+  static constexpr int kIdBits = 56;
 
   // Deletes a trunk that no translation leads to. Null does nothing.
   static void Delete(AliasTrunk* trunk);
@@ -185,7 +208,7 @@ struct AliasTrunk
   GeAliasID id : kIdBits;
   GeAliasID inTranslation : 1; // a TransArray leads here
   GeAliasID inPage : 1;        // lies among those of a translation's page, else in a block of its own
-  GeAliasID place : 5;         // there
+  GeAliasID place : 6;         // there
   GeTempPublicList2D<GeAliasXLink> xlinks;
   GoalIterator* iterators = nullptr; // those that stand on this trunk
 };
@@ -222,7 +245,7 @@ class TransArray : public GeMemory
   struct Entry
   {
     TrunkPage* page; // null as long as none of its ids turned up
-    ULong made;      // a bit for each trunk in it that is there; asked before the page itself is looked at
+    ULLong made;     // a bit for each trunk in it that is there; asked before the page itself is looked at
   };
 
   Entry* FindEntry(GeAliasID id) const;
@@ -240,6 +263,7 @@ class TransArray : public GeMemory
   Entry** leaves_ = nullptr;      // the entries of all pages, in runs that are made when they are needed
   IdTable<GeAliasXLink> origins_; // in a copy, stand on the trunk of the goal that the source links have; owned
   LLong count_ = 0;
+  TrunkIds ids_;
 };
 
 // Owns a TransArray for the length of one copy.
