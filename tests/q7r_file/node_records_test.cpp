@@ -95,6 +95,29 @@ TEST_F(NodeRecords, AreReadAsInTheGeneralWayWholeAndDamaged)
   }
 }
 
+TEST_F(NodeRecords, ATextureTagThatOnlyTellsItsMaterialIsReadInOnePiece)
+{
+  const Owned<BaseMaterial> material(AllocMaterial());
+  for (const bool plain : {true, false}) {
+    TextureTag tag;
+    tag.SetMaterial(material.get());
+    tag.SetName(String()); // as files hold them
+    if (!plain)
+      tag.GetDataInstance().SetLong(kTextureProjection, 2);
+    MemoryReadFile memory(WriteToMemory([&](HyperFile& file) { tag.WriteAsChunk(file, kTagTexture); }, true));
+    UChar mark = 0;
+    Long id = 0;
+    Long level = 0;
+    memory.file.ReadValueHeader(mark);
+    memory.file.ReadChunkStart(id, level);
+    const LLong start = memory.file.GetPosition();
+    TextureTag copy;
+    EXPECT_EQ(copy.ReadInOnePiece(memory.file), plain);
+    EXPECT_EQ(memory.file.GetPosition(), plain ? memory.file.GetLength() : start);
+    EXPECT_EQ(memory.file.GetError(), FILEERROR_NONE);
+  }
+}
+
 // What an object had before is gone, or stays, alike.
 TEST_F(NodeRecords, AreReadOntoNodesThatHaveContent)
 {

@@ -60,6 +60,10 @@ class BaseList2D : public GeListNode
 
   Bool IsInstanceOf(Long type) const override { return type == type_ || type == 0; }
   Bool ReadChunk(HyperFile& file, Long id, Long level) override;
+  // Called for a new node that a file is to fill: reads all of its chunks, and the end mark behind them, where they
+  // stand as in most nodes of its class. False, with nothing read, where they don't, and with the file's error without
+  // memory.
+  virtual Bool ReadInOnePiece(HyperFile&) { return false; }
   Long GetType() const override { return type_; }
   void WriteChunks(HyperFile& file) override;
   // Keeps what other programs put among the node's chunks: WriteChunks writes it behind those of this class. Chunks of

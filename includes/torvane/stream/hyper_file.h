@@ -145,7 +145,12 @@ class HyperFile : public GeMemory
   // False once a part of what was read or written since Open could not be held in memory, which then is the error of
   // the file, or after any other error. Loops over chunks ask it behind each chunk, so that nothing is left out of a
   // file without an error.
-  Bool HasMemory();
+  Bool HasMemory()
+  {
+    if (error_ == FILEERROR_NONE && memory_.Failed())
+      Fail(FILEERROR_MEMORY, file_.GetPosition());
+    return error_ == FILEERROR_NONE;
+  }
   // Why and where the stream failed first. Code 0 while all is well.
   const FileProblem& GetProblem() const { return problem_; }
 
@@ -373,7 +378,14 @@ class HyperFile : public GeMemory
   void CallWriteHook();
   void CallReadHook();
   // The ticks of `count` values at once. None but the last of them may be due for a hook that is set.
-  void TickMany(LLong count);
+  void TickMany(LLong count)
+  {
+    if (ticks_ + count <= GetTickThreshold())
+      ticks_ += count;
+    else
+      TickManySlow(count);
+  }
+  void TickManySlow(LLong count);
   // How many of the coming `limit` values may go by before TickMany must be called.
   LLong LimitToTick(LLong limit) const;
   LLong GetTicksToDue() const;
@@ -473,8 +485,10 @@ inline Bool HyperFile::ReadHeaderOrStart(UChar& tag, ChunkPlace& chunk)
   if (!place || place[0] != kTagChunkStart || chunkDepth_ < 0 || chunkDepth_ >= chunkRoom_)
     return ReadValueHeader(tag) && (tag != kTagChunkStart || ReadChunkStart(chunk.id, chunk.level));
   tag = kTagChunkStart;
-  chunk = {static_cast<Long>(bytes::GetBig<ULong>(place + 1)), static_cast<Long>(bytes::GetBig<ULong>(place + 5))};
-  chunks_[chunkDepth_++] = chunk;
+  const ChunkPlace start = {static_cast<Long>(bytes::GetBig<ULong>(place + 1)),
+                            static_cast<Long>(bytes::GetBig<ULong>(place + 5))};
+  chunks_[chunkDepth_++] = start;
+  chunk = start;
   file_.CommitRead(kStart);
   TickRead();
   return true;

@@ -24,15 +24,16 @@ struct RecordPart
 class PreparedRecord
 {
  public:
-  static constexpr LLong kLargest = 480; // bytes: files below 500 tell their progress at every value, which is counted
-  static constexpr LLong kHeadSize = 9;  // of the chunk start that opens a record
+  // In bytes: files below 500, their header of 13 included, tell their progress at every value, which is counted.
+  static constexpr LLong kLargest = 486;
+  static constexpr LLong kHeadSize = 9; // of the chunk start that opens a record
 
   // Writes `sample`, a node, as a chunk of that label, and reads it back into `copy` to learn what reading takes.
   // False when it doesn't fit and when memory is short.
   Bool Learn(PrivateChunk& sample, PrivateChunk& copy, Long label);
-  // The place of the one run of bytes that is equal to `mark`; they are a field from now on. -1 if they stand there
-  // not once, or more than once.
-  LLong TakeField(const void* mark, LLong size);
+  // The place of the one run of bytes that is equal to `mark`; from its first `head` bytes on they are a field from now
+  // on, whose place is given. -1 if they stand there not once, or more than once.
+  LLong TakeField(const void* mark, LLong size, LLong head = 0);
   // Where the body of the first chunk of that id begins; -1 without one.
   LLong FindChunk(Long id) const;
 

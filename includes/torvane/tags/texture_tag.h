@@ -51,6 +51,7 @@ class TextureTag : public BaseTag
   ~TextureTag() override;
 
   Bool ReadChunk(HyperFile& file, Long id, Long level) override;
+  Bool ReadInOnePiece(HyperFile& file) override;
   // The matrix of the destination is computed anew.
   Bool CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation) override;
   Bool GetParameter(const ParameterPath& path, GeData& value) override;

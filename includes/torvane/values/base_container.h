@@ -62,6 +62,9 @@ class BaseContainer
   const GeData& GetData(Long id) const;
   GeData* FindData(Long id); // null when absent
   const GeData* FindData(Long id) const;
+  // A value that a file is to fill, nil, in the place of a shared one of that id that the container hasn't changed.
+  // Null when memory is short, and when too many were changed to do so for one more.
+  GeData* ReplaceShared(Long id);
 
   // Replaces the destination's id and elements by copies; each element removed and each one added counts as a change
   // there. False when memory is short: the destination is then unchanged.

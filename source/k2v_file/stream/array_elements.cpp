@@ -3,6 +3,7 @@
 #include <cstring>
 #include <type_traits>
 
+#include "k2v_file/stream/wide_registers.h"
 #include "torvane/stream/hyper_file.h"
 
 namespace _torvane_
@@ -46,14 +47,6 @@ void UnpackOne(UChar* memory, const UChar* packed)
 
 // Elements that stand close are taken 256 bytes at a time where the machine has registers that shuffle bytes: a loop of
 // fixed length over a block, which compilers turn into a few instructions.
-#if defined(__x86_64__) && defined(__GNUC__)
-#define WITH_WIDE_REGISTERS __attribute__((target("avx2")))
-Bool HasWideRegisters() { return __builtin_cpu_supports("avx2") != 0; }
-#else
-#define WITH_WIDE_REGISTERS
-Bool HasWideRegisters() { return false; }
-#endif
-
 constexpr UChar Swap(UChar bits) { return bits; }
 constexpr UWord Swap(UWord bits) { return static_cast<UWord>(bits >> 8 | bits << 8); }
 constexpr ULong Swap(ULong bits) { return __builtin_bswap32(bits); }
@@ -109,8 +102,6 @@ void Unpack(UChar* memory, const UChar* packed, LLong stride, LLong count)
   for (; i < count; ++i)
     UnpackOne<Value, Stored>(memory + i * stride, packed + i * kSize);
 }
-
-#undef WITH_WIDE_REGISTERS
 
 struct ElementType
 {

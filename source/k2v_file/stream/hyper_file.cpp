@@ -162,13 +162,6 @@ void HyperFile::NotePath()
     problem_.chunks[i] = chunks_[i < kKept / 2 ? i : i + left].id;
 }
 
-Bool HyperFile::HasMemory()
-{
-  if (error_ == FILEERROR_NONE && memory_.Failed())
-    Fail(FILEERROR_MEMORY, file_.GetPosition());
-  return error_ == FILEERROR_NONE;
-}
-
 Bool HyperFile::FailFromFile(LLong position, Long line)
 {
   Long error = file_.GetError();
@@ -224,7 +217,7 @@ LLong HyperFile::LimitToTick(LLong limit) const
   return due < limit ? due : limit;
 }
 
-void HyperFile::TickMany(LLong count)
+void HyperFile::TickManySlow(LLong count)
 {
   if (count <= 0)
     return;

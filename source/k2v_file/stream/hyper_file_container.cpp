@@ -293,12 +293,11 @@ Bool HyperFile::ReadShared(BaseContainer& container)
     if (!next || next[0] != kTagLong || static_cast<Long>(bytes::GetBig<ULong>(next + 1)) != place->id ||
         !container.TakesChange())
       break;
-    auto* own = container.NewOwn(place->id);
-    if (!own)
+    GeData* value = container.ReplaceShared(place->id);
+    if (!value)
       return Fail(FILEERROR_MEMORY, file_.GetPosition());
-    container.Link(own);
     file_.CommitRead(kElementType);
-    read = own->value.Read(*this);
+    read = value->Read(*this);
     before = defaults.ends[count++];
     place = place->next;
   }

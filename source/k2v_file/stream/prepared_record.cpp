@@ -2,6 +2,7 @@
 
 #include <cstring>
 
+#include "k2v_file/stream/wide_registers.h"
 #include "k2v_file/stream/write_in_memory.h"
 #include "torvane/nodes/private_chunk.h"
 
@@ -24,6 +25,38 @@ struct TickCounter
     ++counts[file.GetPosition() - header];
   }
 };
+
+using Row = ULLong __attribute__((vector_size(16)));
+using WideRow = ULLong __attribute__((vector_size(32)));
+
+// True if the bytes that `fixed` has set are the same, a row at a time. The last row may overlap the one before it, so
+// there must be enough for one.
+template <class R>
+inline __attribute__((always_inline)) Bool AreSame(const UChar* place, const UChar* known, const UChar* fixed,
+                                                   LLong count)
+{
+  constexpr LLong kSize = sizeof(R);
+  R different = {};
+  for (LLong i = 0; i < count; i += kSize) {
+    const LLong from = i + kSize <= count ? i : count - kSize;
+    R a;
+    R b;
+    R mask;
+    std::memcpy(&a, place + from, sizeof a);
+    std::memcpy(&b, known + from, sizeof b);
+    std::memcpy(&mask, fixed + from, sizeof mask);
+    different |= (a ^ b) & mask;
+  }
+  ULLong any = 0;
+  for (std::size_t i = 0; i < sizeof(R) / sizeof any; ++i)
+    any |= different[i];
+  return any == 0;
+}
+
+WITH_WIDE_REGISTERS Bool AreSameInWideRows(const UChar* place, const UChar* known, const UChar* fixed, LLong count)
+{
+  return AreSame<WideRow>(place, known, fixed, count);
+}
 
 } // namespace
 
@@ -66,7 +99,7 @@ Bool PreparedRecord::Learn(PrivateChunk& sample, PrivateChunk& copy, Long label)
   });
 }
 
-LLong PreparedRecord::TakeField(const void* mark, LLong size)
+LLong PreparedRecord::TakeField(const void* mark, LLong size, LLong head)
 {
   LLong place = -1;
   for (LLong i = 0; i + size <= size_; ++i) {
@@ -76,9 +109,10 @@ LLong PreparedRecord::TakeField(const void* mark, LLong size)
       return -1;
     place = i;
   }
-  if (place >= 0)
-    std::memset(fixed_ + place, 0, static_cast<std::size_t>(size));
-  return place;
+  if (place < 0)
+    return -1;
+  std::memset(fixed_ + place + head, 0, static_cast<std::size_t>(size - head));
+  return place + head;
 }
 
 LLong PreparedRecord::FindChunk(Long id) const
@@ -92,26 +126,14 @@ LLong PreparedRecord::FindChunk(Long id) const
   return -1;
 }
 
-// Sixteen bytes at a time; the last sixteen may overlap those before them.
 Bool PreparedRecord::Matches(const UChar* place, const RecordPart& part) const
 {
-  using Lanes = ULLong __attribute__((vector_size(2 * sizeof(ULLong))));
-  constexpr LLong kStep = sizeof(Lanes);
-  const auto word = [](const UChar* from) {
-    Lanes taken;
-    std::memcpy(&taken, from, sizeof taken);
-    return taken;
-  };
   const LLong count = part.to - part.from;
-  if (count < kStep)
-    return false;
   const UChar* known = bytes_ + part.from;
   const UChar* fixed = fixed_ + part.from;
-  const auto differs = [&](LLong i) { return (word(place + i) ^ word(known + i)) & word(fixed + i); };
-  Lanes different = differs(count - kStep);
-  for (LLong i = 0; i + kStep <= count; i += kStep)
-    different |= differs(i);
-  return (different[0] | different[1]) == 0;
+  if (count >= static_cast<LLong>(sizeof(WideRow)) && HasWideRegisters())
+    return AreSameInWideRows(place, known, fixed, count);
+  return count >= static_cast<LLong>(sizeof(Row)) && AreSame<Row>(place, known, fixed, count);
 }
 
 LLong PreparedRecord::CountHeads(const UChar* place, LLong size) const

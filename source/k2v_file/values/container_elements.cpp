@@ -53,6 +53,15 @@ Bool BaseContainer::TakesChange() const
   return IsShared() && count < kMostChanged;
 }
 
+GeData* BaseContainer::ReplaceShared(Long id)
+{
+  Element* own = TakesChange() ? NewOwn(id) : nullptr;
+  if (!own)
+    return nullptr;
+  Link(own);
+  return &own->value;
+}
+
 // Makes the first of the shared elements the container's own, and shares no others. What was its own before is among
 // them and stays where it lies. False, with nothing changed, when memory is short.
 Bool BaseContainer::TakeFirst(Long count)

@@ -176,14 +176,11 @@ Bool BaseList2D::ReadHeader(HyperFile& file, Long level)
   } else {
     Fields::VisitHeaderStart(*this, v);
   }
-  NodeRecord::Rest rest;
-  if (!v.String(name_) || !record->TakeRest(file, rest))
+  if (!v.String(name_) || !record->TakeRest(file, marker_, nbits_))
     return Fields::VisitHeaderRest(*this, v) && file.SkipToEndChunk();
   if (file.GetTranslator())
     link_.ClearLink();
-  marker_ = rest.marker;
   markerDrawn_ = true;
-  std::memcpy(nbits_, rest.nbits, sizeof nbits_);
   return true;
 }
 

@@ -19,7 +19,7 @@ void ReplaceNodeData(BaseList2D& node, NodeData*& place, NodeData* data)
     data->SetNode(&node);
 }
 
-Bool AttachNodeData(NodeData* data, NodeDataSlot slot)
+Bool AttachNodeData(NodeData* data, const NodeDataSlot& slot)
 {
   ReplaceNodeData(slot.node, slot.data, data);
   slot.raw.Free();
@@ -52,7 +52,7 @@ namespace
 
 // A hook knows the type and gives nothing. That is a failure; but what the file holds stays in the node, for where the
 // failure passes for one that can be skipped. The end tag stays to be read.
-void KeepUnreadBody(HyperFile& file, Long level, Long type, NodeDataSlot slot)
+void KeepUnreadBody(HyperFile& file, Long level, Long type, const NodeDataSlot& slot)
 {
   const Bool isPolygon = type == kObjectPolygon && NodeCast<BaseObject>(&slot.node);
   AttachNodeData(isPolygon ? NewObj<PolygonObjectData>() : nullptr, slot);
@@ -62,7 +62,7 @@ void KeepUnreadBody(HyperFile& file, Long level, Long type, NodeDataSlot slot)
 
 } // namespace
 
-Bool ReadNodeDataBody(HyperFile& file, Long id, Long level, Long type, NodeDataSlot slot)
+Bool ReadNodeDataBody(HyperFile& file, Long id, Long level, Long type, const NodeDataSlot& slot)
 {
   Bool known = false;
   NodeData* data = AllocNodeDataFor(slot.node, type, known);

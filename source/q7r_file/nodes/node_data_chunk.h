@@ -48,7 +48,7 @@ NodeData* AllocNodeDataFor(const BaseList2D& node, Long type, Bool& known);
 // Reads the rest of the chunk behind its opening values, the end tag included, into a NodeData of `type` that the
 // client makes, or as bytes if the client doesn't know the type. What was there before goes. False when a NodeData
 // can't be made or doesn't take the content: the stream then stands inside the chunk, for the caller to skip.
-Bool ReadNodeDataBody(HyperFile& file, Long id, Long level, Long type, NodeDataSlot slot);
+Bool ReadNodeDataBody(HyperFile& file, Long id, Long level, Long type, const NodeDataSlot& slot);
 
 // Writes what stands behind the opening values.
 void WriteNodeDataBody(HyperFile& file, NodeData* data, const RawChunkBody& raw);
@@ -61,6 +61,6 @@ void ReplaceNodeData(BaseList2D& node, NodeData*& place, NodeData* data);
 
 // Puts `data` (may be null) into the slot in place of what was there and runs its Init; the node's container stays as
 // it is. A data object that Init refuses is deleted: false.
-Bool AttachNodeData(NodeData* data, NodeDataSlot slot);
+Bool AttachNodeData(NodeData* data, const NodeDataSlot& slot);
 
 } // namespace _torvane_

@@ -20,14 +20,14 @@ constexpr UChar kByteMark = 0xA0;
 class MarkedNode : public BaseList2D
 {
  public:
-  void Set(const NodeRecord::Start& start, const NodeRecord::Rest& rest)
+  void Set(const NodeRecord::Start& start, const NodeMarker& marker, const NodeRecord::NodeBits& nbits)
   {
     info_ = start.info;
     data_.SetId(start.containerId);
     name_ = String::Constant(kNameMark);
-    marker_ = rest.marker;
+    marker_ = marker;
     markerDrawn_ = true;
-    std::memcpy(nbits_, rest.nbits, sizeof nbits_);
+    std::memcpy(nbits_, nbits, sizeof nbits_);
   }
 };
 
@@ -38,16 +38,17 @@ const NodeRecord* NodeRecord::Get() { return GetLearned<NodeRecord>(); }
 Bool NodeRecord::Learn()
 {
   const Start start = {kNumberMark, static_cast<Long>(kNumberMark + 1)};
-  Rest rest = {{}, {kNumberMark + 2, kNumberMark + 3, kNumberMark + 4, kNumberMark + 5}};
-  for (UChar& byte : rest.marker.bytes)
-    byte = static_cast<UChar>(kByteMark + (&byte - rest.marker.bytes));
+  const NodeBits nbits = {kNumberMark + 2, kNumberMark + 3, kNumberMark + 4, kNumberMark + 5};
+  NodeMarker marker;
+  for (UChar& byte : marker.bytes)
+    byte = static_cast<UChar>(kByteMark + (&byte - marker.bytes));
   MarkedNode sample;
   MarkedNode copy;
-  sample.Set(start, rest);
-  return record_.Learn(sample, copy, kObjectGeneric) && FindFields(start, rest);
+  sample.Set(start, marker, nbits);
+  return record_.Learn(sample, copy, kObjectGeneric) && FindFields(start, marker, nbits);
 }
 
-Bool NodeRecord::FindFields(const Start& start, const Rest& rest)
+Bool NodeRecord::FindFields(const Start& start, const NodeMarker& marker, const NodeBits& nbits)
 {
   UChar name[sizeof kNameMark];
   for (std::size_t i = 0; i < std::size(kNameMark); ++i)
@@ -69,8 +70,8 @@ Bool NodeRecord::FindFields(const Start& start, const Rest& rest)
   info_ = findNumber(start.info, start_);
   containerId_ = findNumber(static_cast<ULong>(start.containerId), start_);
   for (std::size_t i = 0; i < std::size(nbits_); ++i)
-    nbits_[i] = findNumber(rest.nbits[i], rest_);
-  marker_ = find(rest.marker.bytes, sizeof rest.marker.bytes, rest_);
+    nbits_[i] = findNumber(nbits[i], rest_);
+  marker_ = find(marker.bytes, sizeof marker.bytes, rest_);
   return found;
 }
 
@@ -84,14 +85,14 @@ Bool NodeRecord::TakeStart(HyperFile& file, Start& start) const
   return true;
 }
 
-Bool NodeRecord::TakeRest(HyperFile& file, Rest& rest) const
+Bool NodeRecord::TakeRest(HyperFile& file, NodeMarker& marker, NodeBits& nbits) const
 {
   const UChar* place = file.NextRecord(record_, rest_);
   if (!place)
     return false;
-  std::memcpy(rest.marker.bytes, place + marker_, sizeof rest.marker.bytes);
+  std::memcpy(marker.bytes, place + marker_, sizeof marker.bytes);
   for (std::size_t i = 0; i < std::size(nbits_); ++i)
-    rest.nbits[i] = bytes::GetBig<ULong>(place + nbits_[i]);
+    nbits[i] = bytes::GetBig<ULong>(place + nbits_[i]);
   file.PassRecord(record_, rest_);
   return true;
 }

@@ -11,29 +11,26 @@ namespace _torvane_
 class NodeRecord
 {
  public:
-  // What the two parts tell.
+  // What the first part tells.
   struct Start
   {
     ULong info;
     Long containerId;
   };
-  struct Rest
-  {
-    NodeMarker marker;
-    ULong nbits[4];
-  };
+  using NodeBits = ULong[4];
 
   // The one of this process; null when memory is short.
   static const NodeRecord* Get();
   // For Get alone.
   Bool Learn();
 
-  // Pass over a part and give what it tells; false, and nothing is read, if something else comes.
+  // Pass over a part and give what it tells; false, and nothing is read, if something else comes. The rest goes
+  // straight to its place: a copy of fields put together a moment ago makes the processor wait.
   Bool TakeStart(HyperFile& file, Start& start) const;
-  Bool TakeRest(HyperFile& file, Rest& rest) const;
+  Bool TakeRest(HyperFile& file, NodeMarker& marker, NodeBits& nbits) const;
 
  private:
-  Bool FindFields(const Start& start, const Rest& rest);
+  Bool FindFields(const Start& start, const NodeMarker& marker, const NodeBits& nbits);
 
   PreparedRecord record_;
   RecordPart start_;

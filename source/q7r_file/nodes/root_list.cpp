@@ -188,7 +188,7 @@ Bool RootList2D::ReadMember(HyperFile& file, BaseList2D* member, Bool setListHea
   if (!member)
     return false;
   member->SetDocument(GetDocument());
-  if (!Takes(*member) || !member->ReadChunkLoop(file, true)) {
+  if (!Takes(*member) || (!member->ReadInOnePiece(file) && !member->ReadChunkLoop(file, true))) {
     DeleteObj(member);
     TakeBack(); // its children
     return false;

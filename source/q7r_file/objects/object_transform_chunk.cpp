@@ -167,17 +167,9 @@ Bool BaseObject::ReadPlainTransform(HyperFile& file, Long level)
 {
   const Bool isCurrent = level == kLevelTransform && file.MayHoldRecords();
   const TransformRecord* record = isCurrent ? TransformRecord::Get() : nullptr;
-  TransformRecord::Fields fields;
-  if (!record || !record->Take(file, fields))
+  if (!record || !record->Take(file, {{&relPos_, &relScale_, &relRot_},
+                                      {&editorMode_, &renderMode_, &disabled_, &rotationOrder_}}))
     return false;
-  const auto& [vectors, numbers] = fields;
-  relPos_ = vectors[0];
-  relScale_ = vectors[1];
-  relRot_ = vectors[2];
-  editorMode_ = numbers[0];
-  renderMode_ = numbers[1];
-  disabled_ = numbers[2];
-  rotationOrder_ = numbers[3];
   frozenFlags_ = 0;
   SetDisplay(kPlainDisplay);
   return true;

@@ -33,13 +33,13 @@ class MarkedObject : public BaseObject
   MarkedObject() : BaseObject(kObjectGeneric) {}
   void Set(const TransformRecord::Fields& fields)
   {
-    relPos_ = fields.vectors[0];
-    relScale_ = fields.vectors[1];
-    relRot_ = fields.vectors[2];
-    editorMode_ = fields.numbers[0];
-    renderMode_ = fields.numbers[1];
-    disabled_ = fields.numbers[2];
-    rotationOrder_ = fields.numbers[3];
+    relPos_ = *fields.vectors[0];
+    relScale_ = *fields.vectors[1];
+    relRot_ = *fields.vectors[2];
+    editorMode_ = *fields.numbers[0];
+    renderMode_ = *fields.numbers[1];
+    disabled_ = *fields.numbers[2];
+    rotationOrder_ = *fields.numbers[3];
     markerDrawn_ = true; // none is taken from the run that happens to come first
   }
 };
@@ -51,8 +51,9 @@ const TransformRecord* TransformRecord::Get() { return GetLearned<TransformRecor
 // Numbers like no other in an object.
 Bool TransformRecord::Learn()
 {
-  const Fields marks = {{{1.25e101, 2, 3}, {1.25e102, 2, 3}, {1.25e103, 2, 3}},
-                        {0x5AC3E300, 0x5AC3E301, 0x5AC3E302, 0x5AC3E303}};
+  Vector vectors[] = {{1.25e101, 2, 3}, {1.25e102, 2, 3}, {1.25e103, 2, 3}};
+  Long numbers[] = {0x5AC3E300, 0x5AC3E301, 0x5AC3E302, 0x5AC3E303};
+  const Fields marks = {{&vectors[0], &vectors[1], &vectors[2]}, {&numbers[0], &numbers[1], &numbers[2], &numbers[3]}};
   MarkedObject sample;
   MarkedObject copy;
   sample.Set(marks);
@@ -70,25 +71,25 @@ Bool TransformRecord::FindFields(const Fields& fields)
   };
   UChar mark[kVectorSize];
   for (std::size_t i = 0; i < std::size(vectors_); ++i) {
-    PutVector(mark, fields.vectors[i]);
+    PutVector(mark, *fields.vectors[i]);
     vectors_[i] = find(mark, kVectorSize);
   }
   for (std::size_t i = 0; i < std::size(numbers_); ++i) {
-    bytes::PutBig(mark, static_cast<ULong>(fields.numbers[i]));
+    bytes::PutBig(mark, static_cast<ULong>(*fields.numbers[i]));
     numbers_[i] = find(mark, sizeof(ULong));
   }
   return found;
 }
 
-Bool TransformRecord::Take(HyperFile& file, Fields& fields) const
+Bool TransformRecord::Take(HyperFile& file, const Fields& fields) const
 {
   const UChar* place = file.NextRecord(record_, body_);
   if (!place)
     return false;
   for (std::size_t i = 0; i < std::size(vectors_); ++i)
-    fields.vectors[i] = GetVector(place + vectors_[i]);
+    *fields.vectors[i] = GetVector(place + vectors_[i]);
   for (std::size_t i = 0; i < std::size(numbers_); ++i)
-    fields.numbers[i] = static_cast<Long>(bytes::GetBig<ULong>(place + numbers_[i]));
+    *fields.numbers[i] = static_cast<Long>(bytes::GetBig<ULong>(place + numbers_[i]));
   file.PassRecord(record_, body_);
   return true;
 }

@@ -4,6 +4,7 @@
 
 #include "k2v_file/values/container_defaults.h"
 #include "q7r_file/tags/tag_entries.h"
+#include "q7r_file/tags/texture_tag_record.h"
 #include "torvane/materials/base_material.h"
 #include "torvane/math/ge_math.h"
 
@@ -289,6 +290,25 @@ void TextureTag::ReadOldAspects(ChunkReader& v)
     return;
   data_.SetReal(kTextureFilmAspect, QuotientOrOne(width, height));
   data_.SetReal(kTexturePixelAspect, QuotientOrOne(pixelWidth, pixelHeight));
+}
+
+// A tag that only tells its material, as nearly all do.
+Bool TextureTag::ReadInOnePiece(HyperFile& file)
+{
+  const TextureTagRecord* record = file.MayHoldRecords() ? TextureTagRecord::Get() : nullptr;
+  GeAliasID material = 0;
+  if (!record || !record->Take(file, marker_, material))
+    return false;
+  markerDrawn_ = true;
+  name_ = String::Constant(kNewName);
+  if (material == 0)
+    return true;
+  GeData* entry = data_.ReplaceShared(kTextureMaterial);
+  if (!entry || !entry->SetType(kDataLink)) {
+    file.SetError(FILEERROR_MEMORY);
+    return false;
+  }
+  return entry->GetAliasLink()->TakeTargetId(file, material);
 }
 
 // Into the link of that entry; a file may have put something else there, or nothing.
