@@ -38,8 +38,8 @@ class PrivateChunk : public GeTempPublicNode2D<PrivateChunk>
   // consumed with its end.
   virtual Bool KeepChunk(HyperFile&, Long, Long) { return false; }
   virtual Bool IsRootList() const { return false; }
-  // Called in a loop for each chunk start. True: the chunk only holds more of what this loop reads, which then goes on
-  // inside of it. A root list enters its own chunks so, which keeps a chain of objects to one loop each.
+  // Called in the loop of a root list for each chunk start. True: the chunk only holds more of what this loop reads,
+  // which then goes on inside of it. A list enters its own chunks so, which keeps a chain of objects to one loop each.
   virtual Bool EntersChunk(Long) { return false; }
   virtual Long GetType() const { return 0; }
   // Writes the chunks of this node, those of the base class first. Failures show in the file's error.

@@ -20,11 +20,12 @@ class RawChunkBody
   RawChunkBody(const RawChunkBody&) = delete; // use CopyTo
   RawChunkBody& operator=(const RawChunkBody&) = delete;
 
-  const void* GetData() const { return data_; } // null when there are no bytes
-  LLong GetSize() const { return size_; }
+  const void* GetData() const { return content_ ? content_->data : nullptr; } // null when there are no bytes
+  LLong GetSize() const { return content_ ? content_->size : 0; }
   // The level of the chunk that the bytes came from.
-  Long GetLevel() const { return level_; }
-  void SetLevel(Long level) { level_ = level; }
+  Long GetLevel() const { return content_ ? content_->level : 0; }
+  // For a body that is to be filled. Without memory the level stays: an AllocationWatch tells.
+  void SetLevel(Long level);
 
   Bool IsEqual(const RawChunkBody& other) const;
 
@@ -38,9 +39,15 @@ class RawChunkBody
   Bool CopyTo(RawChunkBody& destination) const;
 
  private:
-  void* data_ = nullptr;
-  LLong size_ = 0;
-  Long level_ = 0;
+  struct Content
+  {
+    void* data; // owned
+    LLong size;
+    Long level;
+  };
+  Bool Keep(void* data, LLong size, Long level);
+
+  Content* content_ = nullptr; // owned; null for no bytes at level 0, as of nearly all nodes
 };
 
 } // namespace _torvane_

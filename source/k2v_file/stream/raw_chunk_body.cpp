@@ -10,40 +10,64 @@ namespace _torvane_
 
 Bool RawChunkBody::IsEqual(const RawChunkBody& other) const
 {
-  return level_ == other.level_ && size_ == other.size_ &&
-         (size_ == 0 || std::memcmp(data_, other.data_, static_cast<std::size_t>(size_)) == 0);
+  const LLong size = GetSize();
+  return GetLevel() == other.GetLevel() && size == other.GetSize() &&
+         (size == 0 || std::memcmp(GetData(), other.GetData(), static_cast<std::size_t>(size)) == 0);
+}
+
+void RawChunkBody::SetLevel(Long level)
+{
+  if (content_)
+    content_->level = level;
+  else
+    Keep(nullptr, 0, level);
 }
 
 void RawChunkBody::Free()
 {
-  GeFree(data_);
-  size_ = 0;
-  level_ = 0;
+  if (!content_)
+    return;
+  GeFree(content_->data);
+  GeFree(content_);
+}
+
+// Takes bytes over. False when memory is short: they are freed, and there are none.
+Bool RawChunkBody::Keep(void* data, LLong size, Long level)
+{
+  Free();
+  if (!data && level == 0)
+    return true;
+  content_ = static_cast<Content*>(GeAllocNC(sizeof *content_));
+  if (content_)
+    *content_ = {data, size, level};
+  else
+    GeFree(data);
+  return content_ != nullptr;
 }
 
 Bool RawChunkBody::Read(HyperFile& file, Long level)
 {
-  Free();
-  level_ = level;
-  return file.ReadRawChunk(data_, size_, true) && ModernizeValues(data_, size_, file);
+  void* data = nullptr;
+  LLong size = 0;
+  const Bool read = file.ReadRawChunk(data, size, true) && ModernizeValues(data, size, file);
+  if (Keep(data, size, level))
+    return read;
+  file.SetError(FILEERROR_MEMORY);
+  return false;
 }
 
-void RawChunkBody::Write(HyperFile& file) const { file.WriteRawChunk(data_, size_, true); }
+void RawChunkBody::Write(HyperFile& file) const { file.WriteRawChunk(GetData(), GetSize(), true); }
 
 Bool RawChunkBody::CopyTo(RawChunkBody& destination) const
 {
   if (&destination == this)
     return true;
   destination.Free();
-  destination.level_ = level_;
-  if (size_ <= 0)
-    return true;
-  destination.data_ = GeAllocNC(size_);
-  if (!destination.data_)
-    return false;
-  GeCopyMem(destination.data_, data_, size_);
-  destination.size_ = size_;
-  return true;
+  const LLong size = GetSize();
+  void* copy = size > 0 ? GeAllocNC(size) : nullptr;
+  GeCopyMem(copy, GetData(), size);
+  const Bool copied = copy || size <= 0;
+  return destination.Keep(copy, copied ? size : 0, GetLevel()) && copied;
 }
 
 } // namespace _torvane_

@@ -61,6 +61,7 @@ Bool PrivateChunk::SetParameter(const ParameterPath&, const GeData&) { return fa
 struct PrivateChunk::Loop
 {
   Bool keepGoing;
+  Bool isOfList;         // the chunks are those of a root list
   Long inside = 0;       // chunks that were entered and not yet left
   Bool finished = false; // the loop ends with `result`
   Bool result = false;
@@ -98,7 +99,7 @@ inline Bool PrivateChunk::ReadOneChunk(HyperFile& file, Loop& loop)
     return loop.End(false);
   }
   const auto [id, level] = chunk;
-  if (EntersChunk(id)) {
+  if (loop.isOfList && EntersChunk(id)) {
     ++loop.inside;
     return true;
   }
@@ -126,7 +127,7 @@ Bool PrivateChunk::ReadChunkLoop(HyperFile& file, Bool keepGoing, Bool)
   LoopScope scope(file, *this);
   if (!scope.Entered())
     return false;
-  Loop loop{keepGoing};
+  Loop loop{keepGoing, IsRootList()};
   do {
     ReadOneChunk(file, loop);
     if (loop.finished)
