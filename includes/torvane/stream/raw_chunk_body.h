@@ -24,13 +24,13 @@ class RawChunkBody
   LLong GetSize() const { return content_ ? content_->size : 0; }
   // The level of the chunk that the bytes came from.
   Long GetLevel() const { return content_ ? content_->level : 0; }
-  // For a body that is to be filled. Without memory the level stays: an AllocationWatch tells.
-  void SetLevel(Long level);
 
   Bool IsEqual(const RawChunkBody& other) const;
 
   // Drops the bytes and sets the level to 0.
   void Free();
+  // Drops the bytes and sets the level. Without memory that is 0: an AllocationWatch tells.
+  void SetEmpty(Long level) { Keep(nullptr, 0, level); }
   // Replaces the content by the rest of the chunk that the stream stands in, whose end tag is consumed.
   Bool Read(HyperFile& file, Long level);
   // Writes the bytes; the caller opens the chunk, with GetLevel, and closes it.

@@ -85,7 +85,7 @@ class OpaqueCustomData : public ListedCustomData
   static constexpr NodeKindOf<OpaqueCustomData> kNodeKind{"opaque value", &CustomData::kNodeKind};
   const NodeKind& GetNodeKind() const override { return kNodeKind; }
 
-  explicit OpaqueCustomData(const CustomDataType& type) : ListedCustomData(type) { body_.SetLevel(type.level); }
+  explicit OpaqueCustomData(const CustomDataType& type) : ListedCustomData(type) { body_.SetEmpty(type.level); }
 
   Long GetChunkLevel() const override { return body_.GetLevel(); }
   Bool IsEqual(const CustomData& other) const override;

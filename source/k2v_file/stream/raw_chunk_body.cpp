@@ -15,14 +15,6 @@ Bool RawChunkBody::IsEqual(const RawChunkBody& other) const
          (size == 0 || std::memcmp(GetData(), other.GetData(), static_cast<std::size_t>(size)) == 0);
 }
 
-void RawChunkBody::SetLevel(Long level)
-{
-  if (content_)
-    content_->level = level;
-  else
-    Keep(nullptr, 0, level);
-}
-
 void RawChunkBody::Free()
 {
   if (!content_)

@@ -77,10 +77,8 @@ Bool UnitScaleData::Read(HyperFile& file, Long level)
   static_cast<UnitScale&>(*this) = UnitScale();
   if (!OpaqueCustomData::Read(file, level))
     return false;
-  if (TakeBody()) {
-    body_.Free();
-    body_.SetLevel(type_.level);
-  }
+  if (TakeBody())
+    body_.SetEmpty(type_.level);
   return true;
 }
 

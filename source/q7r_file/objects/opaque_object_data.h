@@ -15,7 +15,7 @@ class OpaqueObjectData : public NodeData
   const NodeKind& GetOwnerKind() const override;
 
   // `type` is that of the owner object; `level` and an empty body are what a new object writes.
-  OpaqueObjectData(Long type, Long level, Long diskType) : type_(type), diskType_(diskType) { body_.SetLevel(level); }
+  OpaqueObjectData(Long type, Long level, Long diskType) : type_(type), diskType_(diskType) { body_.SetEmpty(level); }
 
   Bool IsInstanceOf(Long type) const override { return type == type_ || NodeData::IsInstanceOf(type); }
   Long GetDiskType() const override { return diskType_; }
