@@ -64,8 +64,9 @@ TEST(Alias, TargetsAreNumberedInARowWhoeverMakesThem)
     link.SetLinkGoal(&goal);
     return goal.GetGoalId();
   };
+  constexpr std::size_t kCounts[] = {1, 63, 64, 65, 1000};
   GeAliasID last = takeNumber();
-  for (const std::size_t count : {1, 63, 64, 65, 1000}) {
+  for (const std::size_t count : kCounts) {
     for (const bool meanwhile : {false, true}) {
       std::vector<GeAliasGoal> goals(count);
       std::vector<GeAliasLink> links(count);
