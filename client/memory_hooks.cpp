@@ -1,4 +1,5 @@
 // The memory hooks: the heap of the C library.
+#include <algorithm>
 #include <atomic>
 #include <cstdint>
 #include <cstdlib>
@@ -42,26 +43,23 @@ void AskForLargePages(std::uintptr_t start, std::uintptr_t end)
 constexpr std::uintptr_t kPlainHeap = kLargePage;
 constexpr std::uintptr_t kHeapStep = 16 * kLargePage;
 
-// Where the part of the heap ends that was looked after; 0 before the first block.
+std::uintptr_t GetHeapEnd() { return reinterpret_cast<std::uintptr_t>(::sbrk(0)); }
+
+// Where the heap ended when it was last looked after.
 std::atomic<std::uintptr_t> gHeapEnd{0};
 
-// Called for a block that ends behind gHeapEnd. Those of other heaps, which threads have, lie behind the end of all.
+// Called when the heap has grown, or given memory back.
 void LookAfterHeap(std::uintptr_t end)
 {
-  const auto heapEnd = reinterpret_cast<std::uintptr_t>(::sbrk(0));
-  if (end > heapEnd)
+  static const std::uintptr_t plainEnd = end + kPlainHeap;
+  const std::uintptr_t known = gHeapEnd.exchange(end, std::memory_order_relaxed);
+  if (end <= plainEnd)
     return;
-  static const std::uintptr_t plainEnd = heapEnd + kPlainHeap;
-  if (end <= plainEnd) {
-    gHeapEnd.store(plainEnd, std::memory_order_relaxed);
-    return;
-  }
   static const bool growsInSteps = ::mallopt(M_MMAP_THRESHOLD, static_cast<int>(2 * kLargePage)) != 0 &&
                                    ::mallopt(M_TRIM_THRESHOLD, static_cast<int>(2 * kHeapStep)) != 0 &&
                                    ::mallopt(M_TOP_PAD, static_cast<int>(kHeapStep)) != 0;
-  const std::uintptr_t known = gHeapEnd.exchange(heapEnd, std::memory_order_relaxed);
-  if (growsInSteps)
-    AskForLargePages(known, heapEnd);
+  if (growsInSteps && end > known)
+    AskForLargePages(std::max(known, plainEnd), end);
 }
 
 #endif
@@ -70,12 +68,13 @@ void LookAfterHeap(std::uintptr_t end)
 void* InLargePages(void* block, [[maybe_unused]] LLong size)
 {
 #ifdef __linux__
-  const auto start = reinterpret_cast<std::uintptr_t>(block);
-  const std::uintptr_t end = start + static_cast<std::uintptr_t>(size);
-  if (block && size >= static_cast<LLong>(2 * kLargePage))
-    AskForLargePages(start, end);
+  if (block && size >= static_cast<LLong>(2 * kLargePage)) {
+    const auto start = reinterpret_cast<std::uintptr_t>(block);
+    AskForLargePages(start, start + static_cast<std::uintptr_t>(size));
+    return block;
+  }
 #ifdef __GLIBC__
-  else if (block && end > gHeapEnd.load(std::memory_order_relaxed))
+  if (const std::uintptr_t end = GetHeapEnd(); end != gHeapEnd.load(std::memory_order_relaxed))
     LookAfterHeap(end);
 #endif
 #endif
