@@ -95,7 +95,7 @@ void Export(BaseDocument& document)
 // The same work with a host that has the composition. It is made by the process that measures: what it leaves of memory
 // in this one would pass to those of all later benchmarks.
 template <typename Work>
-auto WithHost(const std::string& composition, Work&& work)
+auto WithHost(const std::string& composition, Work work)
 {
   return [&composition, work] {
     host::StandaloneHost host(host::LoadCompositionText(composition, "benchmark.json", "/"));

@@ -217,19 +217,17 @@ LLong HyperFile::LimitToTick(LLong limit) const
   return due < limit ? due : limit;
 }
 
+// At least one tick is due, unless there are none at all.
 void HyperFile::TickManySlow(LLong count)
 {
   if (count <= 0)
     return;
-  LLong due = GetTicksToDue();
-  if (count < due) {
-    ticks_ += count;
-  } else if (HasHook()) {
+  if (HasHook()) {
     ticks_ += count - 1;
     mode_ == kHyperFileWrite ? TickWrite() : TickRead();
   } else {
     LLong period = GetTickThreshold() > 0 ? GetTickThreshold() : 1;
-    ticks_ = 1 + (count - due) % period;
+    ticks_ = 1 + (count - GetTicksToDue()) % period;
   }
 }
 

@@ -1,6 +1,7 @@
 #include "q7r_file/tags/texture_tag_record.h"
 
 #include <cstring>
+#include <utility>
 
 #include "k2v_file/stream/learned_once.h"
 #include "k2v_file/stream/write_in_memory.h"
