@@ -48,9 +48,12 @@ std::uintptr_t GetHeapEnd() { return reinterpret_cast<std::uintptr_t>(::sbrk(0))
 // Where the heap ended when it was last looked after.
 std::atomic<std::uintptr_t> gHeapEnd{0};
 
-// Called when the heap has grown, or given memory back.
-void LookAfterHeap(std::uintptr_t end)
+// Looks whether the heap has grown, or given memory back.
+void LookAfterHeap()
 {
+  const std::uintptr_t end = GetHeapEnd();
+  if (end == gHeapEnd.load(std::memory_order_relaxed))
+    return;
   static const std::uintptr_t plainEnd = end + kPlainHeap;
   const std::uintptr_t known = gHeapEnd.exchange(end, std::memory_order_relaxed);
   if (end <= plainEnd)
@@ -60,6 +63,15 @@ void LookAfterHeap(std::uintptr_t end)
                                    ::mallopt(M_TOP_PAD, static_cast<int>(kHeapStep)) != 0;
   if (growsInSteps && end > known)
     AskForLargePages(std::max(known, plainEnd), end);
+}
+
+// The first block in what the heap has grown by begins on the page before, since the heap ends on a page's border with
+// a few bytes of its own; so all others need no look at the heap's end.
+Bool ReachesNextPage(std::uintptr_t block, std::uintptr_t size)
+{
+  constexpr std::uintptr_t kSmallestPage = 4096;
+  constexpr std::uintptr_t kOfHeap = 2 * sizeof(std::size_t); // the head of what comes next
+  return block / kSmallestPage != (block + size + kOfHeap) / kSmallestPage;
 }
 
 #endif
@@ -74,8 +86,8 @@ void* InLargePages(void* block, [[maybe_unused]] LLong size)
     return block;
   }
 #ifdef __GLIBC__
-  if (const std::uintptr_t end = GetHeapEnd(); end != gHeapEnd.load(std::memory_order_relaxed))
-    LookAfterHeap(end);
+  if (ReachesNextPage(reinterpret_cast<std::uintptr_t>(block), static_cast<std::uintptr_t>(size)))
+    LookAfterHeap();
 #endif
 #endif
   return block;
