@@ -85,6 +85,14 @@ TEST(BaseObject, WritesItsChunksByteForByteAndTheCheckSumOneWriteLater)
   SetCountingMarker(*object);
   EXPECT_EQ(ToHex(BytesOf(*object)), ToHex(NullBytes("")));
   EXPECT_EQ(ToHex(BytesOf(*object)), ToHex(NullBytes("L1020800 L15 L0 ")));
+  object->GetDataInstance().SetLong(7, 1);
+  EXPECT_EQ(ToHex(BytesOf(*object)), ToHex(NullBytes("L1020800 L15 L0 L7 L15 L1 ")));
+  for (const Real stored : {0.5, 0.0}) { // what is stored as a Real stays one
+    object->GetDataInstance().Flush();
+    object->GetDataInstance().SetReal(kKeyModelCheckSum, stored);
+    BytesOf(*object);
+    EXPECT_EQ(ToHex(BytesOf(*object)), ToHex(NullBytes("L1020800 L19 R0 ")));
+  }
   DeleteObj(object);
 }
 

@@ -18,20 +18,23 @@ class NodeRecords : public testing::Test
   ~NodeRecords() override { PreparedRecord::SetEnabled(true); }
 };
 
-// Children with a texture tag each, of which every one has something that another one lacks.
-ObjectPtr MakeTree(Long count)
+// Children, of which every one has something that another one lacks. The first has a name and a plain tag, number 5
+// neither.
+ObjectPtr MakeTree(Long count, Long first = 0)
 {
   const ReproducibleRun run(1, DateTime()); // each of them has the same link numbers and markers
   ObjectPtr root(AllocObject(kObjectNull));
-  for (Long i = 0; i < count; ++i) {
+  for (Long i = first; i < first + count; ++i) {
     BaseObject* object = AllocObject(i % 8 == 7 ? kObjectCamera : kObjectNull);
     object->InsertUnderLast(root.get());
     object->SetName(i % 4 == 1 ? String() : String("object"));
     object->SetRelPos(Vector(i, 0.5, -i));
     object->SetRotationOrder(i % 7);
-    auto* tag = static_cast<TextureTag*>(object->MakeTag(kTagTexture));
-    tag->GetDataInstance().SetLink(kTextureMaterial, i % 2 ? root.get() : nullptr);
-    tag->GetDataInstance().SetLong(kTextureProjection, i % 3);
+    if (i % 6 != 5) {
+      auto* tag = static_cast<TextureTag*>(object->MakeTag(kTagTexture));
+      tag->GetDataInstance().SetLink(kTextureMaterial, i % 2 ? root.get() : nullptr);
+      tag->GetDataInstance().SetLong(kTextureProjection, i % 3);
+    }
     if (i % 5 == 2)
       object->SetFrozenPos(Vector(1, 2, 3));
     if (i % 5 == 3)
@@ -79,21 +82,52 @@ void ExpectSame(const FileBytes& bytes)
 
 } // namespace
 
+// The second write of a tree has the check sums of the first.
 TEST_F(NodeRecords, AreReadAsInTheGeneralWayWholeAndDamaged)
 {
-  const FileBytes tree = BytesOfTree(*MakeTree(40), true);
-  ASSERT_NO_FATAL_FAILURE(ExpectSame(tree));
-  const FileBytes bytes = BytesOfTree(*MakeTree(1), true);
-  for (std::size_t place = 22; place < bytes.size(); ++place) {
-    SCOPED_TRACE(place);
-    ASSERT_NO_FATAL_FAILURE(ExpectSame({bytes.begin(), bytes.begin() + static_cast<std::ptrdiff_t>(place)}));
-    for (const int change : {0x01, 0x02, 0x80}) {
-      FileBytes damaged = bytes;
-      damaged[place] = static_cast<std::uint8_t>(damaged[place] ^ change);
-      ASSERT_NO_FATAL_FAILURE(ExpectSame(damaged));
+  const ObjectPtr tree = MakeTree(40);
+  for (int write = 0; write < 2; ++write)
+    ASSERT_NO_FATAL_FAILURE(ExpectSame(BytesOfTree(*tree, true)));
+  for (const auto& [child, writes] : {std::pair(0L, 1), std::pair(0L, 2), std::pair(5L, 1), std::pair(5L, 2)}) {
+    const ObjectPtr one = MakeTree(1, static_cast<Long>(child));
+    FileBytes bytes;
+    for (int write = 0; write < writes; ++write)
+      bytes = BytesOfTree(*one, true);
+    for (std::size_t place = 22; place < bytes.size(); ++place) {
+      SCOPED_TRACE(testing::Message() << child << ' ' << writes << ' ' << place);
+      ASSERT_NO_FATAL_FAILURE(ExpectSame({bytes.begin(), bytes.begin() + static_cast<std::ptrdiff_t>(place)}));
+      for (const int change : {0x01, 0x02, 0x80}) {
+        FileBytes damaged = bytes;
+        damaged[place] = static_cast<std::uint8_t>(damaged[place] ^ change);
+        ASSERT_NO_FATAL_FAILURE(ExpectSame(damaged));
+      }
     }
   }
 }
+
+namespace
+{
+
+// Whether the node, written `writes` times, is then read in one piece; if not, nothing may be read.
+template <class Node>
+void ExpectInOnePiece(Node& node, Node&& copy, Long label, bool whole, int writes = 1)
+{
+  FileBytes bytes;
+  for (int write = 0; write < writes; ++write)
+    bytes = WriteToMemory([&](HyperFile& file) { node.WriteAsChunk(file, label); }, true);
+  MemoryReadFile memory(bytes);
+  UChar mark = 0;
+  Long id = 0;
+  Long level = 0;
+  memory.file.ReadValueHeader(mark);
+  memory.file.ReadChunkStart(id, level);
+  const LLong start = memory.file.GetPosition();
+  EXPECT_EQ(copy.ReadInOnePiece(memory.file), whole);
+  EXPECT_EQ(memory.file.GetPosition(), whole ? memory.file.GetLength() : start);
+  EXPECT_EQ(memory.file.GetError(), FILEERROR_NONE);
+}
+
+} // namespace
 
 TEST_F(NodeRecords, ATextureTagThatOnlyTellsItsMaterialIsReadInOnePiece)
 {
@@ -104,18 +138,37 @@ TEST_F(NodeRecords, ATextureTagThatOnlyTellsItsMaterialIsReadInOnePiece)
     tag.SetName(String()); // as files hold them
     if (!plain)
       tag.GetDataInstance().SetLong(kTextureProjection, 2);
-    MemoryReadFile memory(WriteToMemory([&](HyperFile& file) { tag.WriteAsChunk(file, kTagTexture); }, true));
-    UChar mark = 0;
-    Long id = 0;
-    Long level = 0;
-    memory.file.ReadValueHeader(mark);
-    memory.file.ReadChunkStart(id, level);
-    const LLong start = memory.file.GetPosition();
-    TextureTag copy;
-    EXPECT_EQ(copy.ReadInOnePiece(memory.file), plain);
-    EXPECT_EQ(memory.file.GetPosition(), plain ? memory.file.GetLength() : start);
-    EXPECT_EQ(memory.file.GetError(), FILEERROR_NONE);
+    ExpectInOnePiece(tag, TextureTag(), kTagTexture, plain);
   }
+}
+
+TEST_F(NodeRecords, AnObjectWithoutAnythingUnusualIsReadInOnePiece)
+{
+  using Change = void (*)(BaseObject&);
+  const std::tuple<const char*, bool, Change> rows[] = {
+      {"bare", true, [](BaseObject&) {}},
+      {"tag", true, [](BaseObject& object) { object.MakeTag(kTagTexture)->SetName(String()); }},
+      {"named tag", false, [](BaseObject& object) { object.MakeTag(kTagTexture)->SetName(String("name")); }},
+      {"two tags", false,
+       [](BaseObject& object) {
+         object.MakeTag(kTagTexture)->SetName(String());
+         object.MakeTag(kTagTexture)->SetName(String());
+       }},
+      {"child", false, [](BaseObject& object) { AllocObject(kObjectNull)->InsertUnderLast(&object); }},
+      {"parameter", false, [](BaseObject& object) { object.GetDataInstance().SetLong(7, 1); }},
+      {"frozen", false, [](BaseObject& object) { object.SetFrozenPos(Vector(1, 2, 3)); }},
+  };
+  for (const auto& [name, whole, change] : rows) {
+    for (const int writes : {1, 2}) {
+      SCOPED_TRACE(testing::Message() << name << ' ' << writes);
+      BaseObject object(kObjectNull);
+      object.SetName(String("a name that is not short"));
+      change(object);
+      ExpectInOnePiece(object, BaseObject(kObjectNull), kObjectGeneric, whole, writes);
+    }
+  }
+  const ObjectPtr camera(AllocObject(kObjectCamera));
+  ExpectInOnePiece(*camera, BaseObject(kObjectNull), kObjectGeneric, false);
 }
 
 // What an object had before is gone, or stays, alike.

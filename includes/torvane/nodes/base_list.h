@@ -48,6 +48,8 @@ class UniqueIDArray : public GeTempDynSortSearchArray<UniqueIDEntry, Long, GeMem
   void FreeEntries();
 };
 
+class NodeRecord;
+
 // A node with a name, parameters, tracks, shaders and identifiers.
 class BaseList2D : public GeListNode
 {
@@ -145,6 +147,9 @@ class BaseList2D : public GeListNode
  protected:
   void SetType(Long type) { type_ = type; }
   static void SetDocumentOfMembers(RootList2D* root, BaseDocument* document); // null: does nothing
+  // What such a part of a header at `place` tells, see node_record.h.
+  void TakeHeaderStart(const NodeRecord& record, const UChar* place);
+  void TakeHeaderRest(const HyperFile& file, const NodeRecord& record, const UChar* place);
   // True for a node with neither a name, parameters, a layer, shaders, tracks, identifiers besides the marker, chunks
   // of others, nor links that lead to it.
   Bool IsBare() const;

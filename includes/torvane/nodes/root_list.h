@@ -13,6 +13,7 @@ class BaseObject;
 class BaseDocument;
 class BaseTag;
 class NodeSink;
+class TextureTagRecord;
 struct NodeType;
 
 class RootList2D : public PrivateChunk
@@ -121,6 +122,9 @@ class RootTag : public RootList2D
  public:
   const NodeKind& GetMemberKind() const override;
   Bool ReadChunk(HyperFile& file, Long id, Long level) override;
+  // Appends a texture tag, which a file's record of such a tag at `place` tells. False, with the file's error, when
+  // memory is short.
+  Bool TakeTextureTag(HyperFile& file, const TextureTagRecord& record, const UChar* place);
 
  protected:
   void OnEnter(BaseList2D& tag) override; // sets the tag's object

@@ -11,6 +11,7 @@ namespace _torvane_
 {
 
 class BaseTag;
+class TransformRecord;
 
 // Parameters of every object.
 inline constexpr Long kObjectEditorMode = 901;
@@ -33,6 +34,9 @@ inline constexpr Long kObjectAbsPos = 925;
 inline constexpr Long kObjectAbsRot = 926;
 inline constexpr Long kObjectAbsScale = 927;
 inline constexpr Long kObjectRotationOrder = 928;
+
+// The check sum of an object without geometry.
+inline constexpr Long kSumOfNothing = 0;
 
 // Editor and render modes.
 inline constexpr Long kObjectModeOn = 0;
@@ -74,6 +78,7 @@ class BaseObject : public BaseList4D, protected ObjectPlacement
 
   Bool IsInstanceOf(Long type) const override;
   Bool ReadChunk(HyperFile& file, Long id, Long level) override;
+  Bool ReadInOnePiece(HyperFile& file) override;
   void WriteChunks(HyperFile& file) override;
   Bool CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation) override;
   Bool GetParameter(const ParameterPath& path, GeData& value) override;
@@ -238,9 +243,12 @@ class BaseObject : public BaseList4D, protected ObjectPlacement
   Vector TakeDisplayColor();
   void WriteTransform(HyperFile& file);
   Bool ReadPlainTransform(HyperFile& file, Long level);
+  void TakePlainTransform(const TransformRecord& record, const UChar* place);
+  void TurnIn(Long order);
   Bool ReadTransform(HyperFile& file, Long level);
   Bool ReadObjectData(HyperFile& file, Long id, Long level);
   void StoreModelCheckSum();
+  void SetModelCheckSum(Long sum);
   enum class DataForm;
   DataForm GetDataForm() const;
   void WriteObjectData(HyperFile& file);

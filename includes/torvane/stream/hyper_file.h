@@ -180,6 +180,8 @@ class HyperFile : public GeMemory
 
   void SetReadProgress(ReadProgressHook hook, void* userData);
   void SetWriteProgress(WriteProgressHook hook, void* userData);
+  // Reading tells its progress at every value, and not some 500 times.
+  void TellEveryValue() { readTicks_ = 0; }
 
   Bool WriteChunkStart(Long id, Long level);
   Bool WriteChunkEnd();
@@ -291,12 +293,13 @@ class HyperFile : public GeMemory
 
   // The quick way for records that are alike (prepared_record.h). BeginRecord gives a place with a copy of the record,
   // whose fields are then to be set, and EndRecord writes it; `spare` has room for the record and may be the place.
-  // NextRecord gives what comes next if it is that part of a record, and PassRecord moves over it. Null: the general
-  // way is to be taken. MayHoldRecords is to be asked before a record is learned: where it is learned it gives false.
+  // NextRecord gives what comes next, or `ahead` bytes later, if it is that part of a record, and PassRecord moves over
+  // it. Null: the general way is to be taken. MayHoldRecords is to be asked before a record is learned: where it is
+  // learned it gives false; it gives true if so many values can go by at once.
   UChar* BeginRecord(const PreparedRecord& record, UChar* spare);
   Bool EndRecord(const PreparedRecord& record, const UChar* place, const UChar* spare);
-  Bool MayHoldRecords() const;
-  const UChar* NextRecord(const PreparedRecord& record, const RecordPart& part) const;
+  Bool MayHoldRecords(LLong ticks = 1) const;
+  const UChar* NextRecord(const PreparedRecord& record, const RecordPart& part, LLong ahead = 0) const;
   void PassRecord(const PreparedRecord& record, const RecordPart& part);
   // How many such records may stand in a row, as far as the buffer goes; the first of them has begun so far.
   LLong CountRecords(const PreparedRecord& record, LLong begun) const;

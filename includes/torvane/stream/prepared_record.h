@@ -19,14 +19,15 @@ struct RecordPart
   LLong from = 0;
   LLong to = 0;
   Long closes = 0; // chunks that began before it and end in it
+
+  LLong GetSize() const { return to - from; }
 };
 
 class PreparedRecord
 {
  public:
-  // In bytes: files below 500, their header of 13 included, tell their progress at every value, which is counted.
-  static constexpr LLong kLargest = 486;
-  static constexpr LLong kHeadSize = 9; // of the chunk start that opens a record
+  static constexpr LLong kLargest = 1200; // in bytes
+  static constexpr LLong kHeadSize = 9;   // of the chunk start that opens a record
 
   // Writes `sample`, a node, as a chunk of that label, and reads it back into `copy` to learn what reading takes.
   // False when it doesn't fit and when memory is short.
@@ -34,6 +35,11 @@ class PreparedRecord
   // The place of the one run of bytes that is equal to `mark`; from its first `head` bytes on they are a field from now
   // on, whose place is given. -1 if they stand there not once, or more than once.
   LLong TakeField(const void* mark, LLong size, LLong head = 0);
+  // Four bytes at `place`, a number's, are a field from now on.
+  void SetNumberField(LLong place);
+  // What is a field in that part of another record is one from `place` on. False if this record holds anything else
+  // there.
+  Bool TakeFieldsOf(const PreparedRecord& other, const RecordPart& part, LLong place);
   // Where the body of the first chunk of that id begins; -1 without one.
   LLong FindChunk(Long id) const;
 

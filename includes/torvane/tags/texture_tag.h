@@ -41,6 +41,8 @@ inline constexpr Long kTexturePixelAspectPreset = 10001;
 // The layout of old files; the present one has no chunk of the tag's own.
 inline constexpr Long kChunkOldTexture = 110010;
 
+class TextureTagRecord;
+
 class TextureTag : public BaseTag
 {
  public:
@@ -52,6 +54,8 @@ class TextureTag : public BaseTag
 
   Bool ReadChunk(HyperFile& file, Long id, Long level) override;
   Bool ReadInOnePiece(HyperFile& file) override;
+  // Becomes what a record of such a tag at `place` tells. False, with the file's error, when memory is short.
+  Bool TakeRecord(HyperFile& file, const TextureTagRecord& record, const UChar* place);
   // The matrix of the destination is computed anew.
   Bool CopyTo(PrivateChunk& destination, ULong flags, TransArray* translation) override;
   Bool GetParameter(const ParameterPath& path, GeData& value) override;

@@ -29,6 +29,20 @@ struct TickCounter
 using Row = ULLong __attribute__((vector_size(16)));
 using WideRow = ULLong __attribute__((vector_size(32)));
 
+// Notes which bits of a row differ, of the bytes that `fixed` has set.
+template <class R>
+inline __attribute__((always_inline)) void CompareRow(R& different, LLong from, const UChar* place, const UChar* known,
+                                                      const UChar* fixed)
+{
+  R a;
+  R b;
+  R mask;
+  std::memcpy(&a, place + from, sizeof a);
+  std::memcpy(&b, known + from, sizeof b);
+  std::memcpy(&mask, fixed + from, sizeof mask);
+  different |= (a ^ b) & mask;
+}
+
 // True if the bytes that `fixed` has set are the same, a row at a time. The last row may overlap the one before it, so
 // there must be enough for one.
 template <class R>
@@ -36,20 +50,21 @@ inline __attribute__((always_inline)) Bool AreSame(const UChar* place, const UCh
                                                    LLong count)
 {
   constexpr LLong kSize = sizeof(R);
+  constexpr LLong kRows = 4; // in a round
+  LLong i = 0;
   R different = {};
-  for (LLong i = 0; i < count; i += kSize) {
-    const LLong from = i + kSize <= count ? i : count - kSize;
-    R a;
-    R b;
-    R mask;
-    std::memcpy(&a, place + from, sizeof a);
-    std::memcpy(&b, known + from, sizeof b);
-    std::memcpy(&mask, fixed + from, sizeof mask);
-    different |= (a ^ b) & mask;
+  for (; i + kRows * kSize <= count; i += kRows * kSize) {
+    CompareRow(different, i, place, known, fixed);
+    CompareRow(different, i + kSize, place, known, fixed);
+    CompareRow(different, i + 2 * kSize, place, known, fixed);
+    CompareRow(different, i + 3 * kSize, place, known, fixed);
   }
+  for (; i + kSize <= count; i += kSize)
+    CompareRow(different, i, place, known, fixed);
+  CompareRow(different, count - kSize, place, known, fixed);
   ULLong any = 0;
-  for (std::size_t i = 0; i < sizeof(R) / sizeof any; ++i)
-    any |= different[i];
+  for (std::size_t part = 0; part < sizeof(R) / sizeof any; ++part)
+    any |= different[part];
   return any == 0;
 }
 
@@ -74,7 +89,8 @@ Bool PreparedRecord::CountReadTicks(const UChar* file, LLong size, LLong header,
   if (!reader.Open(kSceneIdent, source, kHyperFileRead))
     return false;
   TickCounter counter{reader, header};
-  reader.SetReadProgress(TickCounter::Note, &counter); // at every value
+  reader.SetReadProgress(TickCounter::Note, &counter);
+  reader.TellEveryValue();
   if (!reader.ReadValueHeader(tag) || !reader.ReadChunkStart(id, level) || !copy.ReadChunkLoop(reader, true))
     return false;
   for (LLong i = 1; i <= size - header; ++i)
@@ -115,6 +131,16 @@ LLong PreparedRecord::TakeField(const void* mark, LLong size, LLong head)
   return place + head;
 }
 
+void PreparedRecord::SetNumberField(LLong place) { std::memset(fixed_ + place, 0, sizeof(ULong)); }
+
+Bool PreparedRecord::TakeFieldsOf(const PreparedRecord& other, const RecordPart& part, LLong place)
+{
+  if (place < 0 || place + part.GetSize() > size_ || !other.Matches(bytes_ + place, part))
+    return false;
+  std::memcpy(fixed_ + place, other.fixed_ + part.from, static_cast<std::size_t>(part.GetSize()));
+  return true;
+}
+
 LLong PreparedRecord::FindChunk(Long id) const
 {
   UChar head[1 + sizeof(Long)] = {kTagChunkStart};
@@ -128,7 +154,7 @@ LLong PreparedRecord::FindChunk(Long id) const
 
 Bool PreparedRecord::Matches(const UChar* place, const RecordPart& part) const
 {
-  const LLong count = part.to - part.from;
+  const LLong count = part.GetSize();
   const UChar* known = bytes_ + part.from;
   const UChar* fixed = fixed_ + part.from;
   if (count >= static_cast<LLong>(sizeof(WideRow)) && HasWideRegisters())
@@ -175,19 +201,19 @@ Bool HyperFile::EndRecord(const PreparedRecord& record, const UChar* place, cons
   return true;
 }
 
-Bool HyperFile::MayHoldRecords() const { return version_ >= kVersionCurrent && TakesRecords(1); }
+Bool HyperFile::MayHoldRecords(LLong ticks) const { return version_ >= kVersionCurrent && TakesRecords(ticks); }
 
-const UChar* HyperFile::NextRecord(const PreparedRecord& record, const RecordPart& part) const
+const UChar* HyperFile::NextRecord(const PreparedRecord& record, const RecordPart& part, LLong ahead) const
 {
-  if (version_ < kVersionCurrent || !TakesRecords(record.GetReadTicks(part)))
+  if (!MayHoldRecords(record.GetReadTicks(part)))
     return nullptr;
-  const UChar* place = file_.ReadWindow(part.to - part.from);
-  return place && record.Matches(place, part) ? place : nullptr;
+  const UChar* place = file_.ReadWindow(ahead + part.GetSize());
+  return place && record.Matches(place + ahead, part) ? place + ahead : nullptr;
 }
 
 void HyperFile::PassRecord(const PreparedRecord& record, const RecordPart& part)
 {
-  file_.CommitRead(part.to - part.from);
+  file_.CommitRead(part.GetSize());
   chunkDepth_ -= part.closes;
   TickMany(record.GetReadTicks(part));
 }

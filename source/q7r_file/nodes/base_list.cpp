@@ -168,20 +168,35 @@ Bool BaseList2D::ReadHeader(HyperFile& file, Long level)
   if (!record)
     return ReadChunkBody(file, level, [this](ChunkReader& v) { return Fields::VisitHeader(*this, v); });
   ChunkReader v(file, level);
-  NodeRecord::Start start;
-  if (record->TakeStart(file, start)) {
-    info_ = start.info;
-    data_.Flush();
-    data_.SetId(start.containerId);
+  const PreparedRecord& known = record->GetRecord();
+  if (const UChar* start = file.NextRecord(known, record->GetStartPart())) {
+    TakeHeaderStart(*record, start);
+    file.PassRecord(known, record->GetStartPart());
   } else {
     Fields::VisitHeaderStart(*this, v);
   }
-  if (!v.String(name_) || !record->TakeRest(file, marker_, nbits_))
+  const UChar* rest = v.String(name_) ? file.NextRecord(known, record->GetRestPart()) : nullptr;
+  if (!rest)
     return Fields::VisitHeaderRest(*this, v) && file.SkipToEndChunk();
+  TakeHeaderRest(file, *record, rest);
+  file.PassRecord(known, record->GetRestPart());
+  return true;
+}
+
+void BaseList2D::TakeHeaderStart(const NodeRecord& record, const UChar* place)
+{
+  const NodeRecord::Start start = record.GetStart(place);
+  info_ = start.info;
+  data_.Flush();
+  data_.SetId(start.containerId);
+}
+
+void BaseList2D::TakeHeaderRest(const HyperFile& file, const NodeRecord& record, const UChar* place)
+{
+  record.GetRest(place, marker_, nbits_);
+  markerDrawn_ = true;
   if (file.GetTranslator())
     link_.ClearLink();
-  markerDrawn_ = true;
-  return true;
 }
 
 Bool BaseList2D::SkipOneChunk(HyperFile& file)

@@ -75,26 +75,16 @@ Bool NodeRecord::FindFields(const Start& start, const NodeMarker& marker, const 
   return found;
 }
 
-Bool NodeRecord::TakeStart(HyperFile& file, Start& start) const
+NodeRecord::Start NodeRecord::GetStart(const UChar* place) const
 {
-  const UChar* place = file.NextRecord(record_, start_);
-  if (!place)
-    return false;
-  start = {bytes::GetBig<ULong>(place + info_), static_cast<Long>(bytes::GetBig<ULong>(place + containerId_))};
-  file.PassRecord(record_, start_);
-  return true;
+  return {bytes::GetBig<ULong>(place + info_), static_cast<Long>(bytes::GetBig<ULong>(place + containerId_))};
 }
 
-Bool NodeRecord::TakeRest(HyperFile& file, NodeMarker& marker, NodeBits& nbits) const
+void NodeRecord::GetRest(const UChar* place, NodeMarker& marker, NodeBits& nbits) const
 {
-  const UChar* place = file.NextRecord(record_, rest_);
-  if (!place)
-    return false;
   std::memcpy(marker.bytes, place + marker_, sizeof marker.bytes);
   for (std::size_t i = 0; i < std::size(nbits_); ++i)
     nbits[i] = bytes::GetBig<ULong>(place + nbits_[i]);
-  file.PassRecord(record_, rest_);
-  return true;
 }
 
 } // namespace _torvane_

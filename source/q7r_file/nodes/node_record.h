@@ -24,10 +24,16 @@ class NodeRecord
   // For Get alone.
   Bool Learn();
 
-  // Pass over a part and give what it tells; false, and nothing is read, if something else comes. The rest goes
-  // straight to its place: a copy of fields put together a moment ago makes the processor wait.
-  Bool TakeStart(HyperFile& file, Start& start) const;
-  Bool TakeRest(HyperFile& file, NodeMarker& marker, NodeBits& nbits) const;
+  const PreparedRecord& GetRecord() const { return record_; }
+  // What stands in front of the name, from the begin of the header's body, and what stands behind it.
+  const RecordPart& GetStartPart() const { return start_; }
+  const RecordPart& GetRestPart() const { return rest_; }
+  // As much of the start as holds its fields.
+  RecordPart GetFieldsPart() const { return {start_.from, start_.from + containerId_ + LLong{sizeof(Long)}}; }
+  // What a part at `place` tells. The rest goes straight to where it belongs: a copy of fields put together a moment
+  // ago makes the processor wait.
+  Start GetStart(const UChar* place) const;
+  void GetRest(const UChar* place, NodeMarker& marker, NodeBits& nbits) const;
 
  private:
   Bool FindFields(const Start& start, const NodeMarker& marker, const NodeBits& nbits);

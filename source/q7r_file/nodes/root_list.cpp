@@ -12,6 +12,7 @@
 #include "torvane/render/render_data.h"
 #include "torvane/shaders/base_shader.h"
 #include "torvane/tags/base_tag.h"
+#include "torvane/tags/texture_tag.h"
 #include "torvane/views/base_draw.h"
 
 namespace _torvane_
@@ -254,6 +255,20 @@ Bool RootTag::ReadChunk(HyperFile& file, Long id, Long level)
   }
   tag->PrepareToRead();
   return ReadMember(file, tag, false);
+}
+
+Bool RootTag::TakeTextureTag(HyperFile& file, const TextureTagRecord& record, const UChar* place)
+{
+  auto* tag = NodeCast<TextureTag>(MakeTag(kTagTexture));
+  if (!tag) {
+    file.SetError(FILEERROR_MEMORY);
+    return false;
+  }
+  tag->SetDocument(GetDocument());
+  if (tag->TakeRecord(file, record, place))
+    return Append(tag, false);
+  DeleteObj(tag);
+  return false;
 }
 
 void RootTag::OnEnter(BaseList2D& tag) { NodeCast<BaseTag>(&tag)->SetObject(NodeCast<BaseObject>(GetOwner())); }

@@ -1,6 +1,9 @@
 #include "torvane/objects/base_object.h"
 
+#include <utility>
+
 #include "k2v_file/stream/chunk_visitor.h"
+#include "k2v_file/values/container_defaults.h"
 #include "q7r_file/nodes/node_data_chunk.h"
 #include "torvane/hooks.h"
 #include "torvane/math/crc.h"
@@ -9,6 +12,13 @@
 
 namespace _torvane_
 {
+
+namespace
+{
+
+constexpr ContainerDefault kSumsOfNothing[] = {{kKeyModelCheckSum, DefaultForm::kLong, kSumOfNothing}};
+
+} // namespace
 
 BaseObject::BaseObject(Long type) : BaseList4D(type) { tags_.SetOwner(this); }
 
@@ -134,7 +144,19 @@ void BaseObject::StoreModelCheckSum()
       }
     }
   }
-  data_.SetLong(kKeyModelCheckSum, static_cast<Long>(sum.GetCrc()));
+  SetModelCheckSum(static_cast<Long>(sum.GetCrc()));
+}
+
+// A container that holds no more than the sum of nothing, as most do, shares it.
+void BaseObject::SetModelCheckSum(Long sum)
+{
+  const GeData* present = std::as_const(data_).FindData(kKeyModelCheckSum);
+  if (present && present->GetRawType() == kDataLong && present->GetLong() == sum)
+    return;
+  if (sum == kSumOfNothing && data_.GetCount() == 0)
+    data_.SetDefaults(DefaultsOf<kSumsOfNothing>());
+  else
+    data_.SetLong(kKeyModelCheckSum, sum);
 }
 
 void BaseObject::WriteObjectData(HyperFile& file)

@@ -167,20 +167,35 @@ Bool BaseObject::ReadPlainTransform(HyperFile& file, Long level)
 {
   const Bool isCurrent = level == kLevelTransform && file.MayHoldRecords();
   const TransformRecord* record = isCurrent ? TransformRecord::Get() : nullptr;
-  if (!record || !record->Take(file, {{&relPos_, &relScale_, &relRot_},
-                                      {&editorMode_, &renderMode_, &disabled_, &rotationOrder_}}))
+  const UChar* place = record ? file.NextRecord(record->GetRecord(), record->GetBody()) : nullptr;
+  if (!place)
     return false;
+  TakePlainTransform(*record, place);
+  file.PassRecord(record->GetRecord(), record->GetBody());
+  return true;
+}
+
+void BaseObject::TakePlainTransform(const TransformRecord& record, const UChar* place)
+{
+  record.Get(place, {{&relPos_, &relScale_, &relRot_}, {&editorMode_, &renderMode_, &disabled_, &rotationOrder_}});
   frozenFlags_ = 0;
   SetDisplay(kPlainDisplay);
-  return true;
+  TurnIn(rotationOrder_);
 }
 
 Bool BaseObject::ReadTransform(HyperFile& file, Long level)
 {
-  if (!ReadPlainTransform(file, level))
-    ReadChunkBody(file, level, [this](ChunkReader& v) { return ChunkFields<BaseObject>::VisitTransform(*this, v); });
+  if (ReadPlainTransform(file, level))
+    return true;
+  ReadChunkBody(file, level, [this](ChunkReader& v) { return ChunkFields<BaseObject>::VisitTransform(*this, v); });
   const Bool hasOrder = file.GetFileVersion() >= kVersionTransform && level >= 8;
-  const Long order = hasOrder ? rotationOrder_ : kRotationOrderScene;
+  TurnIn(hasOrder ? rotationOrder_ : kRotationOrderScene);
+  return true;
+}
+
+// What follows from the values that were read.
+void BaseObject::TurnIn(Long order)
+{
   turnedIn_ = order;
   if (HasFrozenTransform()) {
     frozen_->matrix = AnglesToMatrix(frozen_->rot, order);
@@ -190,7 +205,6 @@ Bool BaseObject::ReadTransform(HyperFile& file, Long level)
     frozen_->inverse = Matrix();
     TakeRelAsAbs();
   }
-  return true;
 }
 
 } // namespace _torvane_

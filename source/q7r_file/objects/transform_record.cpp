@@ -81,17 +81,12 @@ Bool TransformRecord::FindFields(const Fields& fields)
   return found;
 }
 
-Bool TransformRecord::Take(HyperFile& file, const Fields& fields) const
+void TransformRecord::Get(const UChar* place, const Fields& fields) const
 {
-  const UChar* place = file.NextRecord(record_, body_);
-  if (!place)
-    return false;
   for (std::size_t i = 0; i < std::size(vectors_); ++i)
     *fields.vectors[i] = GetVector(place + vectors_[i]);
   for (std::size_t i = 0; i < std::size(numbers_); ++i)
     *fields.numbers[i] = static_cast<Long>(bytes::GetBig<ULong>(place + numbers_[i]));
-  file.PassRecord(record_, body_);
-  return true;
 }
 
 } // namespace _torvane_

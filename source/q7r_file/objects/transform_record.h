@@ -27,9 +27,11 @@ class TransformRecord
   // For Get alone.
   Bool Learn();
 
-  // Passes over the chunk, whose start was read, and sets what it tells; false, and nothing is read, if it is another
-  // one.
-  Bool Take(HyperFile& file, const Fields& fields) const;
+  const PreparedRecord& GetRecord() const { return record_; }
+  // The chunk without its start.
+  const RecordPart& GetBody() const { return body_; }
+  // Sets what a body at `place` tells.
+  void Get(const UChar* place, const Fields& fields) const;
 
  private:
   Bool FindFields(const Fields& fields);

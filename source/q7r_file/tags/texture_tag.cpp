@@ -296,9 +296,17 @@ void TextureTag::ReadOldAspects(ChunkReader& v)
 Bool TextureTag::ReadInOnePiece(HyperFile& file)
 {
   const TextureTagRecord* record = file.MayHoldRecords() ? TextureTagRecord::Get() : nullptr;
-  GeAliasID material = 0;
-  if (!record || !record->Take(file, marker_, material))
+  const UChar* place = record ? file.NextRecord(record->GetRecord(), record->GetBody()) : nullptr;
+  if (!place)
     return false;
+  file.PassRecord(record->GetRecord(), record->GetBody());
+  return TakeRecord(file, *record, place);
+}
+
+Bool TextureTag::TakeRecord(HyperFile& file, const TextureTagRecord& record, const UChar* place)
+{
+  GeAliasID material = 0;
+  record.Get(place, marker_, material);
   markerDrawn_ = true;
   name_ = String::Constant(kNewName);
   if (material == 0)

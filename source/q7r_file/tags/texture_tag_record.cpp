@@ -39,7 +39,7 @@ Bool TextureTagRecord::Learn()
   if (!record_.Learn(sample, copy, kTagTexture))
     return false;
   const NodeMarker& marker = sample.GetMarker();
-  marker_ = record_.TakeField(marker.bytes, sizeof marker.bytes);
+  marker_ = record_.TakeField(marker.bytes, sizeof marker.bytes) - PreparedRecord::kHeadSize;
   // The entry of a link ends with its id.
   const auto writeEntry = [&sample](HyperFile& file) {
     file.WriteLong(kTextureMaterial);
@@ -47,21 +47,16 @@ Bool TextureTagRecord::Learn()
   };
   return marker_ >= 0 && WriteInMemory(writeEntry, [this](const UChar* file, LLong fileSize, LLong header) {
            const LLong size = fileSize - header;
-           material_ = record_.TakeField(file + header, size, size - static_cast<LLong>(sizeof(GeAliasID)));
+           material_ = record_.TakeField(file + header, size, size - static_cast<LLong>(sizeof(GeAliasID))) -
+                       PreparedRecord::kHeadSize;
            return material_ >= 0;
          });
 }
 
-Bool TextureTagRecord::Take(HyperFile& file, NodeMarker& marker, GeAliasID& material) const
+void TextureTagRecord::Get(const UChar* place, NodeMarker& marker, GeAliasID& material) const
 {
-  const RecordPart body = record_.GetRest(PreparedRecord::kHeadSize);
-  const UChar* place = file.NextRecord(record_, body);
-  if (!place)
-    return false;
-  std::memcpy(marker.bytes, place + marker_ - body.from, sizeof marker.bytes);
-  std::memcpy(&material, place + material_ - body.from, sizeof material); // in memory order, as links are written
-  file.PassRecord(record_, body);
-  return true;
+  std::memcpy(marker.bytes, place + marker_, sizeof marker.bytes);
+  std::memcpy(&material, place + material_, sizeof material); // in memory order, as links are written
 }
 
 } // namespace _torvane_

@@ -15,13 +15,15 @@ class TextureTagRecord
   // For Get alone.
   Bool Learn();
 
-  // Passes over the rest of a tag's chunk, whose start was read, and gives what it tells; false, and nothing is read,
-  // if it tells more.
-  Bool Take(HyperFile& file, NodeMarker& marker, GeAliasID& material) const;
+  const PreparedRecord& GetRecord() const { return record_; }
+  // The tag's chunk without its start.
+  RecordPart GetBody() const { return record_.GetRest(PreparedRecord::kHeadSize); }
+  // What a body at `place` tells.
+  void Get(const UChar* place, NodeMarker& marker, GeAliasID& material) const;
 
  private:
   PreparedRecord record_;
-  LLong marker_ = 0; // where the fields are, from the begin of the record
+  LLong marker_ = 0; // where the fields are, from the begin of the body
   LLong material_ = 0;
 };
 
