@@ -1,6 +1,12 @@
 // Array values, and the arrays of old files.
 #include "support/library.h"
 
+#ifndef _WIN32
+#include <sys/stat.h>
+#endif
+
+#include <future>
+
 namespace
 {
 
@@ -167,7 +173,7 @@ TEST(HyperFileArray, RefusesACountOrLengthThatDoesNotMatch)
               }).empty());
 }
 
-TEST(HyperFileArray, TakesLongColumnsTogetherAsOneByOne)
+TEST(HyperFileArray, PutsAndTakesLongColumnsTogetherAsOneByOne)
 {
   constexpr LLong kRows = 100000;
   std::vector<Vector> points(kRows);
@@ -179,8 +185,31 @@ TEST(HyperFileArray, TakesLongColumnsTogetherAsOneByOne)
       file.WriteArray(first, kArrayReal, sizeof(Vector), kRows);
     file.WriteLong(5);
   }));
-  const std::size_t last = whole.size() - 5 - (6 + 8 * kRows); // where the last column begins
   const TempFolder folder;
+  std::vector<std::string> paths = {folder / "columns.q7r", folder / "told.q7r"}; // the second tells its progress
+#ifndef _WIN32
+  paths.push_back(folder / "pipe");
+  paths.push_back("/dev/full");
+  ASSERT_EQ(mkfifo(paths[2].c_str(), 0600), 0);
+  auto piped = std::async(std::launch::async, [&] { return ReadWholeFile(paths[2]); });
+#endif
+  for (std::size_t i = 0; i < paths.size(); ++i) {
+    SCOPED_TRACE(paths[i]);
+    HyperFile file;
+    ASSERT_TRUE(file.Open(kSceneIdent, Filename(paths[i].c_str()), kHyperFileWrite));
+    if (i == 1)
+      file.SetWriteProgress([](Long, void*) {}, nullptr);
+    file.WriteChar(1);
+    const Bool written = file.WriteColumns(points.data(), kArrayReal, sizeof(Vector), kRows, 3, sizeof(Real));
+    EXPECT_EQ(file.WriteLong(5) && file.Close(), i < 3);
+    EXPECT_EQ(written, i < 3);
+    EXPECT_EQ(file.GetError(), i < 3 ? FILEERROR_NONE : FILEERROR_WRITE);
+    EXPECT_TRUE(i > 1 || ReadWholeFile(paths[i]) == whole);
+  }
+#ifndef _WIN32
+  EXPECT_TRUE(piped.get() == whole);
+#endif
+  const std::size_t last = whole.size() - 5 - (6 + 8 * kRows); // where the last column begins
   // What is damaged, by how much, and how many bytes are left of the file.
   for (const auto& [place, change, left] : {std::tuple<std::size_t, int, std::size_t>{last, 0, whole.size()},
                                             {last, 1, whole.size()},

@@ -154,6 +154,10 @@ class BaseFile : public GeMemory
   // is. Moving by 0 is true at once, whatever the state.
   Bool Seek(LLong offset, Long mode = kSeekStart);
 
+  // Whether one may write behind the end of what is written and fill the hole later at no cost: on disks, where the
+  // system has files with holes, but not to a pipe. Sets no error.
+  Bool MayLeaveHoles();
+
   LLong GetPosition() const { return windowPosition_ + (cursor_ - window_); }
 
   // The length in bytes; reading modes only (any other sets FILEERROR_INVALID and gives 0). A disk file that is only

@@ -245,11 +245,13 @@ class HyperFile : public GeMemory
 
   // `count` elements, `stride` bytes apart in memory, in one bulk value.
   Bool WriteArray(const void* data, Long type, LLong stride, LLong count);
+  // `columns` such values, one behind the other. The first element of each lies `step` bytes behind that of the one
+  // before.
+  Bool WriteColumns(const void* data, Long type, LLong stride, LLong count, Long columns, LLong step);
   // Fails with FILEERROR_WRONG_VALUE unless the file holds exactly `count` elements of that type; floats and doubles
   // are converted into one another.
   Bool ReadArray(void* data, Long type, LLong stride, LLong count);
-  // `columns` such values, one behind the other. The first element of each lies `step` bytes behind that of the one
-  // before.
+  // What WriteColumns writes.
   Bool ReadColumns(void* data, Long type, LLong stride, LLong count, Long columns, LLong step);
 
   // Chunk 132: the container's id and its elements; pointers are left out.
@@ -399,6 +401,7 @@ class HyperFile : public GeMemory
   Bool ReadHeader(ULong ident);
   void EndTranslation();
   Bool ReadElements(void* data, Long type, Long storedType, LLong stride, LLong count);
+  Bool PutColumns(const UChar* first, Long type, LLong stride, LLong count, Long columns, LLong step);
   Bool MayTakeColumns(LLong size);
   Bool TakeColumns(UChar* first, Long type, LLong stride, LLong count, Long columns, LLong step);
   struct LegacyArrayForm

@@ -2,6 +2,7 @@
 
 #include <limits>
 
+#include "k2v_file/bytes/disk_file.h"
 #include "torvane/bytes/file_stream.h"
 #include "torvane/memory/assertion.h"
 
@@ -284,6 +285,11 @@ Long BaseFile::SeekTarget(LLong position)
     break;
   }
   return FILEERROR_INVALID;
+}
+
+Bool BaseFile::MayLeaveHoles()
+{
+  return kFilesHaveHoles && target_ == Target::kDisk && mode_ == kFileWrite && SeekDiskFile(handle_, handlePosition_);
 }
 
 LLong BaseFile::GetLength()

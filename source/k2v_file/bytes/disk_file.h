@@ -23,6 +23,14 @@ inline std::FILE* RefusePath()
   return nullptr;
 }
 
+// Whether what lies between a file's end and a place behind it that is written to costs nothing. Windows fills it with
+// zeros.
+#ifdef _WIN32
+inline constexpr Bool kFilesHaveHoles = false;
+#else
+inline constexpr Bool kFilesHaveHoles = true;
+#endif
+
 // Positions the stream, from its start.
 Bool SeekDiskFile(std::FILE* file, LLong position);
 

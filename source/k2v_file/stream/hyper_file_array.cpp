@@ -35,6 +35,12 @@ void PutArrayHead(UChar (&head)[kArrayHead], Long type, LLong size)
   head[kArrayHead - 1] = static_cast<UChar>(type);
 }
 
+// Columns that are worth being taken together.
+Bool AreLongColumns(LLong size, LLong count, Long columns)
+{
+  return size > 0 && columns >= 2 && count >= 2 * kColumnPiece / size && count <= kLargestArray / size;
+}
+
 Long PlainType(Long type) { return type == kArrayReal ? static_cast<Long>(kArrayLReal) : type; }
 
 } // namespace
@@ -65,6 +71,46 @@ Bool HyperFile::WriteArray(const void* data, Long type, LLong stride, LLong coun
     count -= now;
     TickMany(now);
   }
+  return true;
+}
+
+Bool HyperFile::WriteColumns(const void* data, Long type, LLong stride, LLong count, Long columns, LLong step)
+{
+  const auto* first = static_cast<const UChar*>(data);
+  if (PutColumns(first, type, stride, count, columns, step))
+    return true;
+  for (Long column = 0; error_ == FILEERROR_NONE && column < columns; ++column)
+    WriteArray(first + column * step, type, stride, count);
+  return error_ == FILEERROR_NONE;
+}
+
+// Long columns a stretch of each in turn, so that rows are taken while they are at hand. False, with nothing written,
+// for what isn't that plain, and after a failure.
+Bool HyperFile::PutColumns(const UChar* first, Long type, LLong stride, LLong count, Long columns, LLong step)
+{
+  type = PlainType(type);
+  const LLong size = GetElementSize(type);
+  if (!AreLongColumns(size, count, columns) || error_ != FILEERROR_NONE || HasHook() || !file_.MayLeaveHoles())
+    return false;
+  UChar head[kArrayHead];
+  PutArrayHead(head, type, count * size);
+  const PackElements pack = FindPackElements(type);
+  const LLong start = file_.GetPosition();
+  const LLong columnSize = kArrayHead + count * size;
+  for (LLong done = 0, rows = kPieceSize / size; done < count; done += rows) {
+    const LLong now = rows < count - done ? rows : count - done;
+    for (Long column = 0; column < columns; ++column) {
+      const LLong place = start + column * columnSize + (done == 0 ? 0 : kArrayHead + done * size);
+      UChar buffer[kPieceSize];
+      if (!file_.Seek(place) || (done == 0 && !file_.WriteBytes(head, kArrayHead)))
+        return FailFromFile(place);
+      UChar* room = TakeRoom(buffer, now * size);
+      pack(room, first + column * step + done * stride, stride, now);
+      if (!FinishRoom(room, buffer, now * size))
+        return FailFromFile(place);
+    }
+  }
+  TickMany(columns * count);
   return true;
 }
 
@@ -145,7 +191,7 @@ Bool HyperFile::TakeColumns(UChar* first, Long type, LLong stride, LLong count, 
 {
   type = PlainType(type);
   const LLong size = GetElementSize(type);
-  if (size == 0 || columns < 2 || count < 2 * kColumnPiece / size || count > kLargestArray / size)
+  if (!AreLongColumns(size, count, columns))
     return false;
   const LLong columnSize = kArrayHead + count * size;
   if (!MayTakeColumns(columns * columnSize))

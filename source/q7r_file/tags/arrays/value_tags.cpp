@@ -127,8 +127,8 @@ Bool VisitColumns(Visitor& v, const ColumnLayout& layout, void* block, LLong cou
   const LLong elements = count * perEntry;
   if constexpr (Visitor::kReading)
     v.Note(v.File().ReadColumns(block, type, stride, elements, columns, step));
-  for (Long column = 0; !Visitor::kReading && v.Good() && column < columns; ++column)
-    v.Note(v.File().WriteArray(static_cast<UChar*>(block) + column * step, type, stride, elements));
+  else
+    v.Note(v.Good() && v.File().WriteColumns(block, type, stride, elements, columns, step));
   return v.Good();
 }
 
