@@ -1,7 +1,6 @@
 #include "checks/scene_checks.h"
 
 #include <algorithm>
-#include <cstdio>
 #include <string_view>
 #include <unordered_map>
 
@@ -9,6 +8,7 @@
 #include "listing/node_path.h"
 #include "listing/parameter_names.h"
 #include "listing/scene_teller.h"
+#include "output/number_text.h"
 #include "scene_file.h"
 #include "torvane/layers/layer_object.h"
 #include "torvane/shaders/base_shader.h"
@@ -40,12 +40,7 @@ unsigned long long NumberBehind(const StreamValue& value, std::string_view mark)
   return number;
 }
 
-std::string NumberText(double number)
-{
-  char text[40];
-  std::snprintf(text, sizeof text, "%.6g", number);
-  return text;
-}
+constexpr int kLimitDigits = 6;
 
 // "from 0 to 1", "above 0".
 std::string RangeText(const ParameterRow& row)
@@ -53,8 +48,8 @@ std::string RangeText(const ParameterRow& row)
   constexpr double kAny = std::numeric_limits<double>::infinity();
   if (row.least == std::numeric_limits<double>::min())
     return "above 0";
-  const std::string least = row.least > -kAny ? "from " + NumberText(row.least) : std::string();
-  const std::string most = row.most < kAny ? "to " + NumberText(row.most) : std::string();
+  const std::string least = row.least > -kAny ? "from " + NumberText(row.least, kLimitDigits) : std::string();
+  const std::string most = row.most < kAny ? "to " + NumberText(row.most, kLimitDigits) : std::string();
   return least.empty() || most.empty() ? (least.empty() ? most : least + " up") : least + " " + most;
 }
 
@@ -98,8 +93,8 @@ class Search
   {
     if (number < row.least || number > row.most)
       Warn("range", path,
-           std::string(row.name) + " (" + std::to_string(row.id) + ") is " + NumberText(number) + ": it goes " +
-               RangeText(row));
+           std::string(row.name) + " (" + std::to_string(row.id) + ") is " + NumberText(number, kLimitDigits) +
+               ": it goes " + RangeText(row));
   }
 
   void Ranges(BaseList2D& node, const std::string& path)

@@ -2,22 +2,15 @@
 
 #include <algorithm>
 #include <cmath>
-#include <cstdio>
 
 #include "listing/json_text.h"
+#include "output/number_text.h"
 
 namespace q7r
 {
 
 namespace
 {
-
-std::string NumberText(double number)
-{
-  char text[40];
-  std::snprintf(text, sizeof text, "%.10g", number + 0.0); // no "-0"
-  return text;
-}
 
 std::string RowsText(const RowsValue& rows)
 {

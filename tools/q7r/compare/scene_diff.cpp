@@ -2,12 +2,12 @@
 
 #include <algorithm>
 #include <charconv>
-#include <cstdio>
 #include <unordered_set>
 
 #include "listing/node_path.h"
 #include "listing/parameter_names.h"
 #include "listing/values.h"
+#include "output/number_text.h"
 
 namespace q7r
 {
@@ -41,13 +41,6 @@ const char* NameOf(const BaseList2D* node, std::string_view key)
     return row ? row->name : nullptr;
   }
   return nullptr;
-}
-
-std::string TimeText(const BaseTime& time)
-{
-  char text[40];
-  std::snprintf(text, sizeof text, "%.10g", time.Get());
-  return text;
 }
 
 void RecordOwn(NodeRecord& record, BaseList2D& node, const Scope& scope) { SceneTeller(record, scope).TellOwn(node); }
@@ -213,7 +206,7 @@ void SceneDiff::CompareCurves(const CCurve* curveA, const CCurve* curveB, const 
     const bool isOne = keyA && keyB && comparison_.AreEqual(keyA->GetTime().Get(), keyB->GetTime().Get());
     const bool isOfA = keyA && (isOne || !keyB || keyA->GetTime().Get() < keyB->GetTime().Get());
     const bool isOfB = isOne || !isOfA;
-    const std::string keyPath = Below(path, TimeText((isOfA ? keyA : keyB)->GetTime()));
+    const std::string keyPath = Below(path, NumberText((isOfA ? keyA : keyB)->GetTime().Get()));
     if (isOne)
       CompareKeys(*keyA, *keyB, keyPath);
     else

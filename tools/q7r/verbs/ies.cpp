@@ -1,11 +1,11 @@
 // q7r ies: what a photometric file holds.
-#include <cstdio>
 #include <memory>
 
 #include "file_list.h"
 #include "listing/ies_text.h"
 #include "listing/parameter_names.h"
 #include "output/json_output.h"
+#include "output/number_text.h"
 #include "output/standard_output.h"
 #include "scene_file.h"
 #include "standard_input.h"
@@ -52,21 +52,16 @@ const char* VersionText(Long version)
   return version == kIESVersion1991 ? "IESNA91" : version == kIESVersion1995 ? "IESNA:LM-63-1995" : "another";
 }
 
+constexpr int kDigits = 7;
+
 const char* TiltText(Long mode)
 {
   return mode == kIESTiltNone ? "none" : mode == kIESTiltInclude ? "included" : "not told";
 }
 
-std::string NumberText(Real number)
-{
-  char text[40];
-  std::snprintf(text, sizeof text, "%.7g", number);
-  return text;
-}
-
 std::string SizeOf(const Vector& size)
 {
-  return NumberText(size.x) + " x " + NumberText(size.y) + " x " + NumberText(size.z) + " m";
+  return NumberText(size.x, kDigits) + " x " + NumberText(size.y, kDigits) + " x " + NumberText(size.z, kDigits) + " m";
 }
 
 // "74, 0 to 180 degrees".
@@ -75,7 +70,8 @@ std::string AnglesText(const GeTempDynArray<Real>& angles)
   const Long count = angles.GetCount();
   if (count == 0)
     return "none";
-  return std::to_string(count) + ", " + NumberText(angles[0]) + " to " + NumberText(angles[count - 1]) + " degrees";
+  return std::to_string(count) + ", " + NumberText(angles[0], kDigits) + " to " +
+         NumberText(angles[count - 1], kDigits) + " degrees";
 }
 
 void Row(const char* label, const std::string& text)
@@ -97,9 +93,9 @@ void PrintIES(const IESLight& light)
   Row("size", SizeOf(light.size));
   Row("vertical angles", AnglesText(light.verticalAngles));
   Row("horizontal angles", AnglesText(light.horizontalAngles));
-  Row("maxCandela", NumberText(light.maxCandela));
-  Row("totalFlux", NumberText(light.GetTotalFlux()));
-  Row("lumens", NumberText(light.GetLumens()));
+  Row("maxCandela", NumberText(light.maxCandela, kDigits));
+  Row("totalFlux", NumberText(light.GetTotalFlux(), kDigits));
+  Row("lumens", NumberText(light.GetLumens(), kDigits));
 }
 
 void PrintIESJson(const IESLight& light)
