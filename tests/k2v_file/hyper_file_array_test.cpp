@@ -179,7 +179,10 @@ TEST(HyperFileArray, PutsAndTakesLongColumnsTogetherAsOneByOne)
   std::vector<Vector> points(kRows);
   for (std::size_t i = 0; i < points.size(); ++i)
     points[i] = {std::sin(double(i)), double(i), i % 1000 == 0 ? std::nan("") : -1.5 * double(i)};
+  const auto note = [](Long place, void* list) { static_cast<std::vector<Long>*>(list)->push_back(place); };
+  std::vector<Long> oneByOne; // where progress is told
   const Bytes whole = WithHeader(WriteToMemory([&](HyperFile& file) {
+    file.SetWriteProgress(note, &oneByOne);
     file.WriteChar(1);
     for (Real* first : {&points[0].x, &points[0].y, &points[0].z})
       file.WriteArray(first, kArrayReal, sizeof(Vector), kRows);
@@ -197,12 +200,14 @@ TEST(HyperFileArray, PutsAndTakesLongColumnsTogetherAsOneByOne)
     SCOPED_TRACE(paths[i]);
     HyperFile file;
     ASSERT_TRUE(file.Open(kSceneIdent, Filename(paths[i].c_str()), kHyperFileWrite));
+    std::vector<Long> told;
     if (i == 1)
-      file.SetWriteProgress([](Long, void*) {}, nullptr);
+      file.SetWriteProgress(note, &told);
     file.WriteChar(1);
     const Bool written = file.WriteColumns(points.data(), kArrayReal, sizeof(Vector), kRows, 3, sizeof(Real));
     EXPECT_EQ(file.WriteLong(5) && file.Close(), i < 3);
     EXPECT_EQ(written, i < 3);
+    EXPECT_EQ(told, i == 1 ? oneByOne : std::vector<Long>());
     EXPECT_EQ(file.GetError(), i < 3 ? FILEERROR_NONE : FILEERROR_WRITE);
     EXPECT_TRUE(i > 1 || ReadWholeFile(paths[i]) == whole);
   }
