@@ -41,10 +41,15 @@ const ObjectRecord* ObjectRecord::Get() { return GetLearned<ObjectRecord>(); }
 
 Bool ObjectRecord::Learn()
 {
-  node_ = NodeRecord::Get();
-  tag_ = TextureTagRecord::Get();
-  transform_ = TransformRecord::Get();
-  if (!node_ || !tag_ || !transform_ || !LearnForm(withTag_, false, true) || !LearnForm(withSum_, true, false))
+  const NodeRecord* node = NodeRecord::Get();
+  const TextureTagRecord* tag = TextureTagRecord::Get();
+  const TransformRecord* transform = TransformRecord::Get();
+  if (!node || !tag || !transform)
+    return false;
+  node_ = *node;
+  tag_ = *tag;
+  transform_ = *transform;
+  if (!LearnForm(withTag_, false, true) || !LearnForm(withSum_, true, false))
     return false;
   const auto ticksOf = [](const Form& form) { return form.record.GetReadTicks({0, form.record.GetSize()}); };
   ticks_ = ticksOf(withTag_) + ticksOf(withSum_);
@@ -66,7 +71,7 @@ Bool ObjectRecord::LearnForm(Form& form, Bool withSum, Bool withTag)
 Bool ObjectRecord::FindParts(Form& form, Bool withTag) const
 {
   PreparedRecord& record = form.record;
-  const RecordPart& rest = node_->GetRestPart();
+  const RecordPart& rest = node_.GetRestPart();
   const LLong header = record.FindChunk(kChunkNodeHeader);
   const LLong data = record.FindChunk(kChunkNodeData); // holds the type, a number, and the name
   const LLong tag = record.FindChunk(kTagTexture);
@@ -81,10 +86,10 @@ Bool ObjectRecord::FindParts(Form& form, Bool withTag) const
   form.tag = tag - form.end.from;
   form.transform = transform - form.end.from;
   record.SetNumberField(data + 1);
-  return record.TakeFieldsOf(node_->GetRecord(), node_->GetFieldsPart(), header) &&
-         record.TakeFieldsOf(node_->GetRecord(), rest, form.middle.from) &&
-         (!withTag || record.TakeFieldsOf(tag_->GetRecord(), tag_->GetBody(), tag)) &&
-         record.TakeFieldsOf(transform_->GetRecord(), transform_->GetBody(), transform);
+  return record.TakeFieldsOf(node_.GetRecord(), node_.GetFieldsPart(), header) &&
+         record.TakeFieldsOf(node_.GetRecord(), rest, form.middle.from) &&
+         (!withTag || record.TakeFieldsOf(tag_.GetRecord(), tag_.GetBody(), tag)) &&
+         record.TakeFieldsOf(transform_.GetRecord(), transform_.GetBody(), transform);
 }
 
 // The form of which that part stands `ahead`, at `place`; null if it is none of them.

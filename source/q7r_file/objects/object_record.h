@@ -50,9 +50,9 @@ class ObjectRecord
   // Passes over what Find found, and reads the name on the way. False, with the file's error, when memory is short.
   static Bool Pass(HyperFile& file, const Found& found, String& name);
 
-  const NodeRecord& GetNode() const { return *node_; }
-  const TextureTagRecord& GetTag() const { return *tag_; }
-  const TransformRecord& GetTransform() const { return *transform_; }
+  const NodeRecord& GetNode() const { return node_; }
+  const TextureTagRecord& GetTag() const { return tag_; }
+  const TransformRecord& GetTransform() const { return transform_; }
 
  private:
   Bool LearnForm(Form& form, Bool withSum, Bool withTag);
@@ -60,9 +60,9 @@ class ObjectRecord
   const Form* FindForm(const HyperFile& file, RecordPart Form::*part, LLong ahead, const UChar*& place) const;
   Bool FindEnd(const HyperFile& file, LLong ahead, Found& found) const;
 
-  const NodeRecord* node_ = nullptr;
-  const TextureTagRecord* tag_ = nullptr;
-  const TransformRecord* transform_ = nullptr;
+  NodeRecord node_;
+  TextureTagRecord tag_;
+  TransformRecord transform_;
   Form withTag_;    // and without a sum
   Form withSum_;    // and without a tag
   LLong ticks_ = 0; // of an object with all that it may have
