@@ -54,17 +54,21 @@ FileBytes BytesOfTree(BaseObject& root, Bool withHeader = false)
   return WriteToMemory([&](HyperFile& file) { root.WriteAsChunk(file, kObjectGeneric); }, withHeader);
 }
 
+void EnterChunk(HyperFile& file)
+{
+  UChar tag = 0;
+  Long id = 0;
+  Long level = 0;
+  EXPECT_TRUE(file.ReadValueHeader(tag) && file.ReadChunkStart(id, level));
+}
+
 // What is told of a reading, and what was read.
 auto ReadOnto(const FileBytes& bytes, Bool generally, BaseObject& target)
 {
   const ReproducibleRun run(2, DateTime());
   PreparedRecord::SetEnabled(!generally);
   MemoryReadFile memory(bytes);
-  UChar tag = 0;
-  Long id = 0;
-  Long level = 0;
-  memory.file.ReadValueHeader(tag);
-  memory.file.ReadChunkStart(id, level);
+  EnterChunk(memory.file);
   const Bool read = target.ReadChunkLoop(memory.file, true);
   const FileProblem problem = memory.file.GetProblem();
   const Long depth = memory.file.GetChunkDepth();
@@ -116,11 +120,7 @@ void ExpectInOnePiece(Node& node, Node&& copy, Long label, bool whole, int write
   for (int write = 0; write < writes; ++write)
     bytes = WriteToMemory([&](HyperFile& file) { node.WriteAsChunk(file, label); }, true);
   MemoryReadFile memory(bytes);
-  UChar mark = 0;
-  Long id = 0;
-  Long level = 0;
-  memory.file.ReadValueHeader(mark);
-  memory.file.ReadChunkStart(id, level);
+  EnterChunk(memory.file);
   const LLong start = memory.file.GetPosition();
   EXPECT_EQ(copy.ReadInOnePiece(memory.file), whole);
   EXPECT_EQ(memory.file.GetPosition(), whole ? memory.file.GetLength() : start);
@@ -196,11 +196,7 @@ TEST_F(NodeRecords, TellProgressAtTheSamePlaces)
     memory.file.SetReadProgress(
         [](Long number, void* list) { static_cast<std::vector<Long>*>(list)->push_back(number); }, &told[generally]);
     const ObjectPtr root(AllocObject(kObjectNull));
-    UChar tag = 0;
-    Long id = 0;
-    Long level = 0;
-    memory.file.ReadValueHeader(tag);
-    memory.file.ReadChunkStart(id, level);
+    EnterChunk(memory.file);
     EXPECT_TRUE(root->ReadChunkLoop(memory.file, true));
   }
   EXPECT_GE(told[0].size(), 50U);
