@@ -16,7 +16,7 @@ constexpr Long kLineOfLink = 843;
 constexpr LLong kFewTrunks = 256;
 // A larger id wasn't counted but is, say, an address.
 constexpr GeAliasID kCountedIds = 1 << 23;
-constexpr GeAliasID kLeafEntries = 512;
+constexpr GeAliasID kLeafEntries = 64;
 constexpr GeAliasID kLeafIds = kLeafEntries * TrunkPage::kTrunks;
 constexpr GeAliasID kLeaves = kCountedIds / kLeafIds;
 
@@ -74,7 +74,7 @@ AliasTrunk* TransArray::NeedTrunk(GeAliasID id, GeAliasGoal& goal)
 {
   const Entry* entry = FindEntry(id);
   const ULong place = id % TrunkPage::kTrunks;
-  return entry && (entry->made >> place & 1) != 0 ? entry->page->Trunks() + place : FindOrMakeTrunk(id, goal);
+  return entry && entry->IsMade(place) ? entry->page->Trunks() + place : FindOrMakeTrunk(id, goal);
 }
 
 // The same for one that isn't in a page yet.
@@ -89,7 +89,7 @@ AliasTrunk* TransArray::FindOrMakeTrunk(GeAliasID id, GeAliasGoal& goal)
       DeleteObj(trunk);
   } else if (Entry* entry = NeedEntry(id)) {
     const ULong place = id % TrunkPage::kTrunks;
-    entry->made |= ULLong{1} << place;
+    entry->SetMade(place);
     trunk = ::new (static_cast<void*>(entry->page->Trunks() + place)) AliasTrunk(goal, ids_.Take());
     trunk->place = place % TrunkPage::kTrunks;
     trunk->inPage = 1;
@@ -142,7 +142,9 @@ Bool TransArray::Register(GeAliasID id, GeAliasLink& link, AliasTrunk* source)
     ReportAssertion(kModule, kLineOfLink, "the goal of this id has gone");
     return true;
   }
-  return link.SetTrunk(trunk) && (trunk->goal != &awaited_ || SetOrigin(id, source));
+  // Asked first, so that a load needn't wait for the trunk to come out of memory before it goes on with what follows.
+  const Bool mayHaveOrigin = source || !origins_.IsEmpty();
+  return link.SetTrunk(trunk) && (!mayHaveOrigin || trunk->goal != &awaited_ || SetOrigin(id, source));
 }
 
 // What the links that wait under this id go back to; null for nothing. False when memory is short.
@@ -217,7 +219,7 @@ void TransArray::ReleaseLeaf(Entry* leaf)
       continue;
     entry->page->live = 1; // it stays until all are told
     for (ULong place = 0; place < TrunkPage::kTrunks; ++place) {
-      if ((entry->made >> place & 1) == 0)
+      if (!entry->IsMade(place))
         continue;
       ++entry->page->live;
       Release(entry->page->Trunks() + place);

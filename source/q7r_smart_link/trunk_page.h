@@ -11,7 +11,7 @@ namespace _torvane_
 // They lie behind this head, and are constructed one by one as their ids turn up. A page goes with the last of them.
 struct TrunkPage
 {
-  static constexpr ULong kTrunks = 64;
+  static constexpr ULong kTrunks = 512;
 
   // Null when memory is short.
   static TrunkPage* Make();

@@ -195,7 +195,7 @@ struct AliasTrunk
   AliasTrunk(GeAliasGoal& trunkGoal, GeAliasID trunkId);
   ~AliasTrunk() { Empty(); }
 
-  static constexpr int kIdBits = 56;
+  static constexpr int kIdBits = 53;
 
   // Deletes a trunk that no translation leads to. Null does nothing.
   static void Delete(AliasTrunk* trunk);
@@ -208,7 +208,7 @@ struct AliasTrunk
   GeAliasID id : kIdBits;
   GeAliasID inTranslation : 1; // a TransArray leads here
   GeAliasID inPage : 1;        // lies among those of a translation's page, else in a block of its own
-  GeAliasID place : 6;         // there
+  GeAliasID place : 9;         // there
   GeTempPublicList2D<GeAliasXLink> xlinks;
   GoalIterator* iterators = nullptr; // those that stand on this trunk
 };
@@ -241,11 +241,16 @@ class TransArray : public GeMemory
   LLong GetCount() const { return count_; }
 
  private:
-  // What is known of a page.
+  // What is known of a page. Its trunks' bits stay in the cache of a processor where the trunks themselves don't.
   struct Entry
   {
+    static constexpr ULong kWord = 64; // bits
+
+    Bool IsMade(ULong place) const { return (made[place / kWord] >> place % kWord & 1) != 0; }
+    void SetMade(ULong place) { made[place / kWord] |= ULLong{1} << place % kWord; }
+
     TrunkPage* page; // null as long as none of its ids turned up
-    ULLong made;     // a bit for each trunk in it that is there; asked before the page itself is looked at
+    ULLong made[8];  // a bit for each trunk in it that is there; asked before the page itself is looked at
   };
 
   Entry* FindEntry(GeAliasID id) const;

@@ -31,6 +31,7 @@ class IdTable
   IdTable(const IdTable&) = delete;
   IdTable& operator=(const IdTable&) = delete;
 
+  Bool IsEmpty() const { return count_ == 0; }
   // Null where nothing stands under that id.
   T* Find(GeAliasID id) const { return slots_ ? SlotOf(id).item : nullptr; }
   // Puts `item` under an id that isn't there yet. False, with nothing changed, when memory is short.
