@@ -69,12 +69,13 @@ inline void Prepare(const std::function<void()>& work)
   InFreshProcess([&] { return work(), Run(); });
 }
 
-// A benchmark's one iteration: `measure()` gives its Run. The counters "peak MB" and, in the run of a benchmark's
-// second argument, which is twice the first, "twice": how many times as long it took. To be registered with OneBest.
+// A benchmark's one iteration: `measure()` gives its Run. The counters "peak MB" and, where the first argument is twice
+// that of the run before, "twice": how many times as long it took. To be registered with an argument, and with OneBest.
 template <typename Measured>
 Run RunOnce(benchmark::State& state, Measured&& measure)
 {
-  static double first = 0; // one for each benchmark, since each has a type of its own here
+  static double first = 0; // of the run before with the same kind of work
+  static std::int64_t firstSize = 0;
   Run run;
   for ([[maybe_unused]] auto iteration : state) {
     try {
@@ -86,9 +87,10 @@ Run RunOnce(benchmark::State& state, Measured&& measure)
     state.SetIterationTime(run.time.count());
   }
   state.counters["peak MB"] = static_cast<double>(run.memory) * 1e-6;
-  if (first > 0)
+  if (first > 0 && state.range(0) == 2 * firstSize)
     state.counters["twice"] = run.time.count() / first;
   first = run.time.count();
+  firstSize = state.range(0);
   return run;
 }
 
