@@ -52,6 +52,7 @@ void AliasTrunk::Delete(AliasTrunk* trunk)
 // The entry of the page that an id belongs to, or null.
 TransArray::Entry* TransArray::FindEntry(GeAliasID id) const
 {
+  static_assert(8 * sizeof(Entry::made) == TrunkPage::kTrunks, "a bit for each trunk");
   Entry* leaf = leaves_ && id < kCountedIds ? leaves_[id / kLeafIds] : nullptr;
   return leaf ? leaf + id / TrunkPage::kTrunks % kLeafEntries : nullptr;
 }
